@@ -1,0 +1,237 @@
+// Radii, equal spheres, meridian arc, conformal latitude and normal gravity of an ellipsoid.
+
+#include <cmath>
+
+#include "foundation/meridian_arc.hpp"
+#include "foundation/numeric.hpp"
+#include "tidewater/foundation.h"
+
+namespace tidewater {
+namespace {
+
+// How far beyond a pole the meridian functions hold a latitude instead of refusing it.
+constexpr double kPoleMargin = 1e-12;
+// Below this eccentricity the meridian functions take the sphere.
+constexpr double kSphereLimit = 1e-12;
+
+double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
+
+}  // namespace
+
+MeridianArc::MeridianArc(double a, double e) : a_(a), sphere_(e < kSphereLimit) {
+  if (e >= 1 || e < 0) {
+    bad_ = TW_BAD_ECCENTRICITY;
+  } else if (a <= 0) {
+    bad_ = TW_BAD_SEMI_MAJOR;
+  }
+  const double b = a * std::sqrt(1 - e * e);
+  const double n = (a - b) / (a + b);
+  const double n2 = n * n;
+  const double n3 = n2 * n;
+  const double n4 = n2 * n2;
+  const double c2 = -1.5 * (n - n3 / 8);
+  const double c4 = 0.9375 * (n2 - n4 / 4);
+  const double c6 = -0.7291666666666666 * n3;
+  const double c8 = 0.615234375 * n4;
+  n_ = n;
+  g_ = a / (1 + n);
+  mean_ = 1 + n2 / 4 + n4 / 64;
+  t0_ = c2 - c6;
+  t1_ = 2 * c4 - 4 * c8;
+  t2_ = 4 * c6;
+  t3_ = 8 * c8;
+}
+
+double MeridianArc::tail(double lat) const {
+  const double c = std::cos(2 * lat);
+  return (((t3_ * c + t2_) * c + t1_) * c + t0_) * std::sin(2 * lat);
+}
+
+TWstatus MeridianArc::forward(double lat, double* distance) const {
+  if (bad_ != TW_SUCCESS) return bad_;
+  TWstatus status = TW_SUCCESS;
+  if (std::fabs(lat) > kHalfPi + kPoleMargin) return TW_BAD_LATITUDE;
+  if (std::fabs(lat) > kHalfPi) {
+    status = TW_I_LATITUDE_LIMITED;
+    lat = hold_at_pole(lat);
+  }
+  *distance = sphere_ ? a_ * lat : g_ * (mean_ * lat + tail(lat));
+  return status;
+}
+
+TWstatus MeridianArc::inverse(double distance, double* lat) const {
+  if (bad_ != TW_SUCCESS) return bad_;
+  // The limits are those of the mean term of the arc, not of the arc computed at the pole.
+  const double per_radian = sphere_ ? a_ : g_ * mean_;
+  const double size = std::fabs(distance);
+  if (per_radian * (kHalfPi + kPoleMargin) < size) return TW_BAD_LATITUDE;
+  if (per_radian * kHalfPi < size) {
+    *lat = hold_at_pole(distance);
+    return TW_I_LATITUDE_LIMITED;
+  }
+  if (sphere_) {
+    *lat = distance / a_;
+    return TW_SUCCESS;
+  }
+  constexpr int kMostRounds = 50;
+  const double start = distance * (1 + n_) / (mean_ * a_);
+  double p = start;
+  double previous = 0;
+  int rounds = 0;
+  do {
+    previous = p;
+    p = start - tail(previous) / mean_;
+    ++rounds;
+  } while (!(std::fabs(p - previous) <= 1e-12) && rounds < kMostRounds);
+  // Wanted: the count alone decides, also when the last round did converge.
+  if (rounds == kMostRounds || std::fabs(p) > kHalfPi) return TW_BAD_PARAMETER;
+  *lat = p;
+  return TW_SUCCESS;
+}
+
+}  // namespace tidewater
+
+using namespace tidewater;
+
+void TWRparal(double a, double e, double lat, double* radius, TWstatus* status) {
+  *status = TW_SUCCESS;
+  if (std::fabs(lat) > kHalfPi) {
+    *status = TW_BAD_LATITUDE;
+    return;
+  }
+  const double w = 1 - square(e) * square(std::sin(lat));
+  *radius = a * std::cos(lat) / std::sqrt(w);
+}
+
+void TWRmerid(double a, double e, double lat, double* radius, TWstatus* status) {
+  *status = TW_SUCCESS;
+  if (std::fabs(lat) > kHalfPi) {
+    *status = TW_BAD_LATITUDE;
+    return;
+  }
+  const double w = 1 - square(e) * square(std::sin(lat));
+  *radius = a * (1 - square(e)) / std::sqrt(cube(w));
+}
+
+void TWgaussian_R(double a, double e, double lat, double* radius, TWstatus* status) {
+  *status = TW_SUCCESS;
+  if (square(e) >= 1) {
+    *status = TW_BAD_ECCENTRICITY;
+    return;
+  }
+  const double w = 1 - square(e) * square(std::sin(lat));
+  *radius = a * std::sqrt(1 - square(e)) / w;
+}
+
+void TWeq_surf_R(double a, double e, double* radius, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double q = square(e);
+  if (q >= 1) {
+    *status = TW_BAD_ECCENTRICITY;
+    return;
+  }
+  *radius =
+      a * (1 - ((0.022156084656084655 * q + 0.04722222222222222) * q + 0.16666666666666666) * q);
+}
+
+void TWeq_vol_R(double a, double e, double* radius, TWstatus* status) {
+  *status = TW_SUCCESS;
+  if (square(e) >= 1) {
+    *status = TW_BAD_ECCENTRICITY;
+    return;
+  }
+  *radius = a * std::pow(1 - square(e), 0.16666666666666666);
+}
+
+void TWmerid_dist_f(double a, double e, double lat, double* distance, TWstatus* status) {
+  *status = MeridianArc(a, e).forward(lat, distance);
+}
+
+void TWmerid_dist_i(double a, double e, double distance, double* lat, TWstatus* status) {
+  *status = MeridianArc(a, e).inverse(distance, lat);
+}
+
+void TWdM_dphi(double a, double e2, double lat, double* derivative, TWstatus* status) {
+  *status = TW_SUCCESS;
+  // Wanted: a negative square is let through, unlike a negative eccentricity in the arc functions.
+  if (e2 >= 1) {
+    *status = TW_BAD_ECCENTRICITY;
+    return;
+  }
+  if (a <= 0) {
+    *status = TW_BAD_SEMI_MAJOR;
+    return;
+  }
+  if (std::fabs(lat) > kHalfPi + kPoleMargin) {
+    *status = TW_BAD_LATITUDE;
+    return;
+  }
+  if (std::fabs(lat) > kHalfPi) {
+    *status = TW_I_LATITUDE_LIMITED;
+    lat = hold_at_pole(lat);
+  }
+  if (e2 < kSphereLimit) {
+    *derivative = a;
+    return;
+  }
+  const double b = a * std::sqrt(1 - e2);
+  const double n = (a - b) / (a + b);
+  const double n2 = n * n;
+  const double n3 = n2 * n;
+  const double n4 = n2 * n2;
+  const double mean = 1 + n2 / 4 + n4 / 64;
+  const double d2 = 1.5 * (n - n3 / 8);
+  const double d4 = 0.9375 * (n2 - n4 / 4);
+  const double d6 = 0.7291666666666666 * n3;
+  const double d8 = 0.615234375 * n4;
+  *derivative = a / (1 + n) *
+                (mean - 2 * d2 * std::cos(2 * lat) + 4 * d4 * std::cos(4 * lat) -
+                 6 * d6 * std::cos(6 * lat) + 8 * d8 * std::cos(8 * lat));
+}
+
+void TWgeod_conflat(double e, double lat, double* conformal_lat, TWstatus* status) {
+  *status = TW_SUCCESS;
+  if (std::fabs(lat) > kHalfPi) {
+    *status = TW_BAD_LATITUDE;
+    return;
+  }
+  const double es = e * std::sin(lat);
+  *conformal_lat =
+      2 * std::atan(std::pow((1 - es) / (1 + es), e / 2) * std::tan(lat / 2 + kQuarterPi)) -
+      kHalfPi;
+}
+
+void TWconflat_geod(double e, double conformal_lat, double* lat, TWstatus* status) {
+  *status = TW_SUCCESS;
+  if (conformal_lat < -kHalfPi || conformal_lat > kHalfPi) {
+    *status = TW_BAD_LATITUDE;
+    return;
+  }
+  constexpr int kMostRounds = 10;
+  const double t = std::tan(conformal_lat / 2 + kQuarterPi);
+  double p = conformal_lat;
+  double previous = 0;
+  int rounds = 0;
+  do {
+    previous = p;
+    const double es = e * std::sin(previous);
+    p = 2 * std::atan(std::pow((1 + es) / (1 - es), e / 2) * t) - kHalfPi;
+    ++rounds;
+  } while (!(std::fabs(p - previous) <= 1e-12) && rounds < kMostRounds);
+  // Wanted: the count alone decides, and the word is that of a bad latitude.
+  if (rounds == kMostRounds) {
+    *status = TW_BAD_LATITUDE;
+    return;
+  }
+  *lat = p;
+}
+
+int32_t TWnormal_grav(double a, double e, double gamma_equator, double gamma_pole, double lat,
+                      double height, double* gravity, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double b = a * std::sqrt(1 - square(e));
+  const double k = (b * gamma_pole) / (a * gamma_equator) - 1;
+  const double s2 = square(std::sin(lat));
+  *gravity = gamma_equator * (1 + k * s2) / std::sqrt(1 - square(e) * s2) - height * 3.086e-6;
+  return 1;
+}

@@ -1,0 +1,148 @@
+// A local rectangular frame on a point of the ellipsoid.
+
+#include <cmath>
+
+#include "foundation/numeric.hpp"
+#include "tidewater/foundation.h"
+
+using namespace tidewater;
+
+namespace {
+
+// Geocentric position in units of the semi-major axis.
+CoordinateTriple normalised_xyz(double e2, double lon, double lat, double h) {
+  const double sin_lat = std::sin(lat);
+  const double cos_lat = std::cos(lat);
+  const double nu = 1 / std::sqrt(1 - e2 * square(sin_lat));
+  return {(nu + h) * cos_lat * std::cos(lon), (nu + h) * cos_lat * std::sin(lon),
+          ((1 - e2) * nu + h) * sin_lat};
+}
+
+// Lengths and azimuth components below this count as zero.
+constexpr double kTiny = 1e-15;
+
+}  // namespace
+
+void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double h0, double* azimuth,
+             double* x0, double* y0, double* z0, double lon1, double lat1, double h1, double lon2,
+             double lat2, double h2, double* matrix, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double e2 = e * e;
+  const CoordinateTriple origin = normalised_xyz(e2, lon0, lat0, h0 / a);
+  *x0 = origin.x;
+  *y0 = origin.y;
+  *z0 = origin.z;
+  const double sin_lon = std::sin(lon0);
+  const double cos_lon = std::cos(lon0);
+  const double sin_lat = std::sin(lat0);
+  const double cos_lat = std::cos(lat0);
+  double* m = matrix;
+  m[6] = cos_lat * cos_lon;
+  m[7] = cos_lat * sin_lon;
+  m[8] = sin_lat;
+  if (mode == 1) {
+    const double s = std::sin(*azimuth);
+    const double c = std::cos(*azimuth);
+    m[0] = -s * sin_lon - c * sin_lat * cos_lon;
+    m[1] = s * cos_lon - c * sin_lat * sin_lon;
+    m[2] = c * cos_lat;
+    m[3] = c * sin_lon - s * sin_lat * cos_lon;
+    m[4] = -c * cos_lon - s * sin_lat * sin_lon;
+    m[5] = s * cos_lat;
+    return;
+  }
+  const CoordinateTriple from = normalised_xyz(e2, lon1, lat1, h1 / a);
+  const CoordinateTriple to = normalised_xyz(e2, lon2, lat2, h2 / a);
+  const double dx = to.x - from.x;
+  const double dy = to.y - from.y;
+  const double dz = to.z - from.z;
+  const double length = std::sqrt(dx * dx + dy * dy + dz * dz);
+  if (length <= kTiny) {
+    *status = TW_BAD_PARAMETER;
+    return;
+  }
+  // Wanted: the rows are not normalised afterwards, so a line that is not horizontal at the origin
+  // gives rows shorter than one.
+  m[3] = (m[7] * dz - m[8] * dy) / length;
+  m[4] = (m[8] * dx - m[6] * dz) / length;
+  m[5] = (m[6] * dy - m[7] * dx) / length;
+  m[0] = m[8] * m[4] - m[7] * m[5];
+  m[1] = m[5] * m[6] - m[3] * m[8];
+  m[2] = m[7] * m[3] - m[6] * m[4];
+  if (std::fabs(m[5]) > kTiny || std::fabs(m[2]) > kTiny) {
+    *azimuth = std::atan2(m[5], m[2]);
+  } else if (std::fabs(m[1]) > kTiny || std::fabs(m[0]) > kTiny) {  // the origin is a pole
+    *azimuth = lat0 >= 0 ? std::atan2(m[1], -m[0]) + lon0 : std::atan2(m[1], m[0]) - lon0;
+  } else {
+    *status = TW_BAD_PARAMETER;
+  }
+}
+
+void TWlsr_f(double a, double e, double x0, double y0, double z0, const double* matrix,
+             int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double e2 = e * e;
+  const double* m = matrix;
+  for (int32_t i = 0; i < count; ++i) {
+    const auto [lon, lat, height] = in[i];
+    const auto [x, y, z] = normalised_xyz(e2, lon, lat, height / a);
+    const double dx = x - x0;
+    const double dy = y - y0;
+    const double dz = z - z0;
+    out[i] = {m[0] * dx + m[1] * dy + m[2] * dz, m[3] * dx + m[4] * dy + m[5] * dz,
+              m[6] * dx + m[7] * dy + m[8] * dz};
+  }
+}
+
+void TWlsr_i(double a, double e, double x0, double y0, double z0, const double* matrix,
+             int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double* m = matrix;
+  for (int32_t i = 0; i < count; ++i) {
+    const auto [x, y, z] = in[i];
+    out[i] = {a * (x0 + m[0] * x + m[3] * y + m[6] * z), a * (y0 + m[1] * x + m[4] * y + m[7] * z),
+              a * (z0 + m[2] * x + m[5] * y + m[8] * z)};
+  }
+  TWxyz_to_llh(a, e, count, out, out, status);
+}
+
+namespace {
+
+// The frame with x east, y north, z up.
+struct EastNorthUp {
+  double x0 = 0, y0 = 0, z0 = 0;
+  double matrix[9] = {};
+
+  EastNorthUp(double a, double e, double lon0, double lat0, double h0, TWstatus* status) {
+    double azimuth = kHalfPi;
+    TWlsr_c(1, a, e, lon0, lat0, h0, &azimuth, &x0, &y0, &z0, 0, 0, 0, 0, 0, 0, matrix, status);
+  }
+};
+
+}  // namespace
+
+void TWllh_to_lsr(double a, double e, double scale, double lon0, double lat0, double h0,
+                  int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
+                  TWstatus* status) {
+  const EastNorthUp frame(a, e, lon0, lat0, h0, status);
+  TWlsr_f(a, e, frame.x0, frame.y0, frame.z0, frame.matrix, count, in, out, status);
+  const double unit = a * scale;
+  for (int32_t i = 0; i < count; ++i) {
+    out[i].x *= unit;
+    out[i].y *= unit;
+    out[i].z *= unit;
+  }
+}
+
+void TWlsr_to_llh(double a, double e, double scale, double lon0, double lat0, double h0,
+                  int32_t count, CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+  const EastNorthUp frame(a, e, lon0, lat0, h0, status);
+  const double unit = a * scale;
+  // Wanted: the caller's input array is normalised in place and stays so.
+  for (int32_t i = 0; i < count; ++i) {
+    in[i].x /= unit;
+    in[i].y /= unit;
+    in[i].z /= unit;
+  }
+  TWlsr_i(a, e, frame.x0, frame.y0, frame.z0, frame.matrix, count, in, out, status);
+}

@@ -1,0 +1,62 @@
+// Helpers on the plane: scale and origin of a grid, chord deviation, and two interpolators.
+
+#include <cmath>
+
+#include "foundation/numeric.hpp"
+#include "tidewater/foundation.h"
+
+using namespace tidewater;
+
+void TWab_to_en(double s1, double s2, double false_easting, double false_northing, int32_t count,
+                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  for (int32_t i = 0; i < count; ++i) {
+    const double x = in[i].x;
+    const double y = in[i].y;
+    out[i].x = x * s2 * s1 + false_easting;
+    out[i].y = y * s2 * s1 + false_northing;
+  }
+}
+
+void TWen_to_ab(double s1, double s2, double false_easting, double false_northing, int32_t count,
+                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  for (int32_t i = 0; i < count; ++i) {
+    const double x = in[i].x;
+    const double y = in[i].y;
+    out[i].x = (x - false_easting) / s1 / s2;
+    out[i].y = (y - false_northing) / s1 / s2;
+  }
+}
+
+void TWpt_line_dist(const CoordinateTriple* points, int32_t count, double* distance,
+                    TWstatus* status) {
+  *status = TW_SUCCESS;
+  double most = 0;
+  for (int64_t i = 0; i + 2 < count; i += 2) {
+    const double ax = points[i + 2].x - points[i].x;
+    const double ay = points[i + 2].y - points[i].y;
+    const double bx = points[i + 1].x - points[i].x;
+    const double by = points[i + 1].y - points[i].y;
+    const double d2 = square(by * ax - bx * ay) / (ay * ay + ax * ax);
+    if (d2 > most) most = d2;
+  }
+  *distance = std::sqrt(most);
+}
+
+void TWbilinear_interpolation(double p00, double p01, double p10, double p11, double fx, double fy,
+                              double* result, TWstatus* status) {
+  *status = TW_SUCCESS;
+  *result = (p11 - p10 - p01 + p00) * fy * fx + (p01 - p00) * fy + (p10 - p00) * fx + p00;
+}
+
+void TWqterp2(const float* t, const float* f0, const float* f1, const float* f2, float* result,
+              TWstatus* status) {
+  *status = TW_SUCCESS;
+  const float d1 = *f1 - *f0;
+  const float d2 = *f2 - *f1;
+  const float dd = d2 - d1;
+  const double p = static_cast<double>(*t);
+  *result = static_cast<float>((p - 1) * p * static_cast<double>(dd) * 0.5 +
+                               p * static_cast<double>(d1) + static_cast<double>(*f0));
+}

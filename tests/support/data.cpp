@@ -1,0 +1,38 @@
+#include "support/data.hpp"
+
+#include <unistd.h>
+
+#include <cstdlib>
+#include <fstream>
+
+namespace fs = std::filesystem;
+
+namespace tidewater::test {
+
+fs::path shared_data() {
+  const char* named = std::getenv("TIDEWATER_DATA");
+  const fs::path folder = named ? named : TIDEWATER_SHARED_DATA;
+  return fs::is_directory(folder) ? folder : fs::path();
+}
+
+fs::path proj_data() {
+  const fs::path folder = "/usr/share/proj";
+  return fs::is_directory(folder) ? folder : fs::path();
+}
+
+ScratchFolder::ScratchFolder() {
+  std::string name = (fs::temp_directory_path() / "tidewater-XXXXXX").string();
+  if (!mkdtemp(name.data())) throw std::runtime_error("no scratch folder");
+  path_ = name;
+}
+
+ScratchFolder::~ScratchFolder() {
+  std::error_code ignored;
+  fs::remove_all(path_, ignored);
+}
+
+void ScratchFolder::write(const std::string& name, const std::string& bytes) const {
+  std::ofstream(path_ / name, std::ios::binary) << bytes;
+}
+
+}  // namespace tidewater::test
