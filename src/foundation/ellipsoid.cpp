@@ -92,7 +92,7 @@ TWstatus MeridianArc::inverse(double distance, double* lat) const {
     do {
       step = (p - start + tail(p) / mean_) / (1 + tail_slope(p) / mean_);
       p -= step;
-    } while (std::fabs(step) > 1e-8);
+    } while (std::fabs(step) > 1e-6);  // what is left is of the order of its square
   } else {
     constexpr int kMostRounds = 50;
     double previous = 0;
