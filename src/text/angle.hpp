@@ -1,0 +1,11 @@
+// What the coordinate texts need of the angle texts.
+#pragma once
+
+#include "tidewater/text.h"
+
+namespace tidewater {
+
+// The unit with its narrow format made wide, cut at the 15 characters that fit.
+AngleUnit with_wide_format(const AngleUnit& unit);
+
+}  // namespace tidewater
