@@ -1,6 +1,7 @@
 // Meridian arc of the ellipsoid of unit semi-major axis, and the latitude at an arc, by series.
-// Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), eq. 3-21, 3-26,
-// here to e^8; the last term carries the sign with which these projections use it.
+// Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), eq. 3-21, 3-26.
+// Wanted: the arc's terms in e^8 are not those of the full expansion.  On the earth's ellipsoids
+// that makes up to 1.5e-10, a millimetre.
 #pragma once
 
 #include <cmath>
@@ -20,9 +21,7 @@ struct ArcSeries {
     return {1 - e2 / 4 - 3 * e4 / 64 - 5 * e6 / 256 - 175 * e8 / 16384,
             0.375 * (e2 + e4 / 4 + 15 * e6 / 128 - 455 * e8 / 4096),
             0.05859375 * (e4 + 3 * e6 / 4 - 77 * e8 / 128),
-            0.011393229166666666 * (e6 - 41 * e8 / 32),
-            // Wanted: the full expansion has a plus here.
-            -315 * e8 / 131072};
+            0.011393229166666666 * (e6 - 41 * e8 / 32), -315 * e8 / 131072};
   }
 
   // The multiple angles follow from the one sine and cosine of the latitude.
