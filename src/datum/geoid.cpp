@@ -1,0 +1,279 @@
+// Geoid undulation: quadratic interpolation in a window of 22 by 22 nodes that is read from the
+// grid files when a point leaves it.
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+#include <memory>
+#include <new>
+
+#include "datum/grid_file.hpp"
+#include "datum/grid_window.hpp"
+#include "foundation/numeric.hpp"
+#include "tidewater/datum.h"
+#include "tidewater/foundation.h"
+
+using namespace tidewater;
+
+namespace {
+
+constexpr int kListLine = 275;
+constexpr std::size_t kNameColumn = 15;
+constexpr int32_t kMostGrids = 50;
+constexpr int32_t kSide = 22;        // nodes of the window each way
+constexpr int32_t kHalf = 11;        // nodes from a point's own to the window's last
+constexpr int32_t kLower = 10;       // nodes from a point's own to the window's first
+constexpr int32_t kLeastNodes = 12;  // of a grid each way: the window is placed by so many
+
+// The window that the last load left. It belongs to the process, not to a control block.
+struct {
+  GeoidWindow bounds;
+  float data[kSide * kSide];  // metres, south to north, west to east
+  int32_t grid;
+} held;
+
+double wide(float value) { return static_cast<double>(value); }
+
+float narrow(double value) { return static_cast<float>(value); }
+
+// Nodes in a length, to the nearest.
+std::int64_t nodes_in(double length, double spacing) { return cut(length / spacing + 0.5); }
+
+bool read_grid(const char* directory, const char* name, GeoidGrid* grid) {
+  GridHeader header;
+  if (!read_header(directory, name, ".geo", &header)) return false;
+  copy_text(name, grid->name);
+  grid->nc = header.nc;
+  grid->nr = header.nr;
+  grid->xmin = header.xmin;
+  grid->ymin = header.ymin;
+  // The counts become doubles first: a damaged one has no predecessor among the integers.
+  grid->xmax = narrow((static_cast<double>(header.nc) - 1) * wide(header.dx) + wide(header.xmin));
+  grid->ymax = narrow((static_cast<double>(header.nr) - 1) * wide(header.dy) + wide(header.ymin));
+  grid->dx = header.dx;
+  grid->dy = header.dy;
+  return true;
+}
+
+// The window gives way to every other grid, better or worse, seen from the point itself.
+void give_way_to_others(const GeoidControl& control, int32_t chosen, double x, double y,
+                        GeoidWindow* w, std::int64_t* ix, std::int64_t* iy) {
+  const double dx = wide(w->dx);
+  const double dy = wide(w->dy);
+  const auto amount = [](double reach, double spacing) {
+    const std::int64_t nodes = nodes_in(reach, spacing);
+    return nodes > 0 ? nodes - 1 : nodes;  // the window keeps a node on the other's edge
+  };
+  for (int32_t g = 0; g < grids_of(control); ++g) {
+    if (g == chosen) continue;
+    const auto reach = reach_into(*w, control.grids[g], x, y);
+    give_way({amount(reach[kWest], dx), amount(reach[kNorth], dy), amount(reach[kEast], dx),
+              amount(reach[kSouth], dy)},
+             w, ix, iy);
+  }
+}
+
+void clip(float grid_min, float grid_max, double spacing, float* min, float* max, int32_t* count) {
+  std::int64_t nodes = *count;
+  if (*min < grid_min) {
+    nodes -= nodes_in(wide(grid_min) - wide(*min), spacing);
+    *min = grid_min;
+  }
+  if (*max > grid_max) {
+    nodes -= nodes_in(wide(*max) - wide(grid_max), spacing);
+    *max = grid_max;
+  }
+  // Fewer than none is none: a window that gave way may have left its grid.
+  *count = static_cast<int32_t>(std::max<std::int64_t>(nodes, 0));
+}
+
+TWstatus read_window(std::FILE* file, const GeoidGrid& grid, const GeoidWindow& w, float* data) {
+  const std::int64_t record = record_bytes(grid.nc);
+  const std::int64_t first_record = nodes_in(wide(w.ymin) - wide(grid.ymin), wide(grid.dy)) + 1;
+  const std::int64_t first_float = nodes_in(wide(w.xmin) - wide(grid.xmin), wide(grid.dx)) + 1;
+  if (w.nc < 1 || w.nr < 1 || first_float < 0 || first_float + w.nc > std::int64_t{grid.nc} + 1 ||
+      first_record < 0 || first_record > std::numeric_limits<std::int64_t>::max() / record - w.nr) {
+    return TW_GEOID_READ_ERROR;
+  }
+  const std::int64_t offset = first_record * record;
+  const std::int64_t size = w.nr * record;
+  // The read would be short; a damaged header must not ask for a buffer larger than its file.
+  if (length_of(file) < offset + size) return TW_GEOID_READ_ERROR;
+  const std::unique_ptr<unsigned char[]> buffer(
+      new (std::nothrow) unsigned char[static_cast<std::size_t>(size)]);
+  if (!buffer) return TW_NO_MEMORY;
+  if (!seek_to(file, offset) || !read_exactly(file, buffer.get(), static_cast<std::size_t>(size))) {
+    return TW_GEOID_READ_ERROR;
+  }
+  for (int32_t r = 0; r < w.nr; ++r) {
+    const unsigned char* p = buffer.get() + r * record + first_float * 4;
+    for (int32_t c = 0; c < w.nc; ++c) data[r * kSide + c] = decode_f32(p + std::ptrdiff_t{4} * c);
+  }
+  return TW_SUCCESS;
+}
+
+// Where a point stands on one axis: the first of its three nodes in the window, and its distance
+// from it in spacings.
+struct Stand {
+  std::int64_t node;
+  float t;
+};
+
+Stand stand_of(double value, double grid_min, double window_min, double spacing, int32_t count) {
+  std::int64_t in_grid = cut((value - grid_min) / spacing);
+  std::int64_t node = in_grid - nodes_in(window_min - grid_min, spacing);
+  const std::int64_t beyond = std::max<std::int64_t>(node + 3 - count, 0);
+  node -= beyond;
+  in_grid -= beyond;
+  float t = narrow((value - static_cast<double>(in_grid) * spacing - grid_min) / spacing);
+  if (t < 0.5F && node >= 1) {
+    --node;
+    t += 1.0F;
+  }
+  return {node, t};
+}
+
+// The loop of the two directions: the undulation is added with sign 1, taken off with sign -1.
+void shift_heights(double sign, int32_t count, const CoordinateTriple* in,
+                   const GeoidControl* control, CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  bool outside = false;
+  for (int32_t i = 0; i < count; ++i) {
+    const CoordinateTriple point = in[i];
+    double undulation = 0;
+    TWget_geo90(point.x, point.y, point.z, control, &undulation, status);
+    if (!TW_OK(*status)) return;
+    out[i] = point;
+    if (*status == TW_I_OUTSIDE_GEOID) {
+      outside = true;
+      *status = TW_SUCCESS;
+    } else {
+      out[i].z = point.z + sign * undulation;
+    }
+  }
+  if (outside) *status = TW_I_OUTSIDE_GEOID;
+}
+
+}  // namespace
+
+int32_t TWgeo90_c(const char* directory, GeoidControl* control, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const FileHandle list = open_grid_list(directory);
+  if (!list) {
+    *status = TW_GEOID_FILE_ERROR;
+    return 1;
+  }
+  copy_text(directory, control->directory);
+  int32_t count = 0;
+  char line[kListLine];
+  char name[kListLine];
+  while (count < kMostGrids && next_line(list.get(), line, kListLine)) {
+    if (line[0] == '*' || !first_token(line, name)) continue;
+    if (std::strlen(line) <= kNameColumn || !first_token(line + kNameColumn, name)) {
+      *status = TW_GEOID_FILE_ERROR;
+      return 1;
+    }
+    if (!read_grid(directory, name, &control->grids[count])) {
+      *status = TW_GEOID_READ_ERROR;
+      return 1;
+    }
+    ++count;
+  }
+  control->grid_count = count;
+  return 1;
+}
+
+void TWgeo90_local(double x, double y, double /*unused*/, const GeoidControl* control,
+                   GeoidWindow* window, float* data, int32_t* grid_index, TWstatus* status) {
+  *status = TW_SUCCESS;
+  *grid_index = 0;
+  const int32_t chosen = first_grid_holding(*control, x, y);
+  if (chosen < 0) {
+    *status = TW_I_OUTSIDE_GEOID;
+    return;
+  }
+  const GeoidGrid& grid = control->grids[chosen];
+  if (!grid_can_be(grid, kLeastNodes)) {
+    *status = TW_GEOID_READ_ERROR;
+    return;
+  }
+  const FileHandle file = open_grid(GridPath(control->directory, grid.name, ".geo").text());
+  if (!file) {
+    *status = TW_GEOID_READ_ERROR;
+    return;
+  }
+  *grid_index = chosen;
+
+  const double dx = wide(grid.dx);
+  const double dy = wide(grid.dy);
+  std::int64_t ix = cut(std::floor((x - wide(grid.xmin)) / dx));
+  std::int64_t iy = cut(std::floor((y - wide(grid.ymin)) / dy));
+  if (iy + kHalf >= grid.nr) {
+    iy = grid.nr - kHalf - 1;
+  } else if (iy - kLower < 0) {
+    iy = kLower;
+  }
+  if (ix + kHalf >= grid.nc) {
+    ix = grid.nc - kHalf - 1;
+  } else if (ix - kLower < 0) {
+    ix = kLower;
+  }
+  GeoidWindow& w = *window;
+  w.nc = kSide;
+  w.nr = kSide;
+  w.dx = grid.dx;
+  w.dy = grid.dy;
+  w.xmin = narrow(wide(grid.xmin) + static_cast<double>(ix - kLower) * dx);
+  w.ymin = narrow(wide(grid.ymin) + static_cast<double>(iy - kLower) * dy);
+  w.xmax = narrow(wide(w.xmin) + (kSide - 1) * dx);
+  w.ymax = narrow(wide(w.ymin) + (kSide - 1) * dy);
+  give_way_to_others(*control, chosen, x, y, &w, &ix, &iy);
+  clip(grid.xmin, grid.xmax, dx, &w.xmin, &w.xmax, &w.nc);
+  clip(grid.ymin, grid.ymax, dy, &w.ymin, &w.ymax, &w.nr);
+  *status = read_window(file.get(), grid, w, data);
+}
+
+void TWget_geo90(double lon, double lat, double height, const GeoidControl* control,
+                 double* undulation, TWstatus* status) {
+  *status = TW_SUCCESS;
+  double x = lon * kDegreesPerRadian;
+  const double y = lat * kDegreesPerRadian;
+  x = add_turns_while(x, -360, [](double v) { return v > 0; });
+  x = add_turns_while(x, 360, [](double v) { return v <= -360; });
+  const GeoidWindow& w = held.bounds;
+  const auto inside = [](double value, float spacing, float min, float max) {
+    // The outer cell all round is not used.
+    return value - wide(spacing) > wide(min) && value + wide(spacing) < wide(max);
+  };
+  if (!inside(x, w.dx, w.xmin, w.xmax) || !inside(y, w.dy, w.ymin, w.ymax)) {
+    TWgeo90_local(x, y, height, control, &held.bounds, held.data, &held.grid, status);
+  }
+  if (*status != TW_SUCCESS) return;
+  // Wanted: bounds of the grid that has the window's index in this block, whichever it is.
+  const GeoidGrid& grid = control->grids[held.grid];
+  const Stand column = stand_of(x, wide(grid.xmin), wide(w.xmin), wide(w.dx), w.nc);
+  const Stand row = stand_of(y, wide(grid.ymin), wide(w.ymin), wide(w.dy), w.nr);
+  if (column.node < 0 || row.node < 0) {
+    // The window gave way to other grids so far that three nodes for the point are not in it.
+    *status = TW_GEOID_READ_ERROR;
+    return;
+  }
+  float across[3];
+  for (int k = 0; k < 3; ++k) {
+    const float* p = held.data + (row.node + k) * kSide + column.node;
+    TWqterp2(&column.t, p, p + 1, p + 2, &across[k], status);
+  }
+  float result = 0;
+  TWqterp2(&row.t, &across[0], &across[1], &across[2], &result, status);
+  *undulation = wide(result);
+}
+
+void TWgeo90_f(int32_t count, const CoordinateTriple* in, const GeoidControl* control,
+               CoordinateTriple* out, TWstatus* status) {
+  shift_heights(1, count, in, control, out, status);
+}
+
+void TWgeo90_i(int32_t count, const CoordinateTriple* in, const GeoidControl* control,
+               CoordinateTriple* out, TWstatus* status) {
+  shift_heights(-1, count, in, control, out, status);
+}

@@ -1,0 +1,95 @@
+// Files of shift and geoid grids: the list area.par and the records of grids, decoded byte by byte.
+#pragma once
+
+#include <array>
+#include <bit>
+#include <cstddef>
+#include <cstdint>
+#include <cstdio>
+#include <memory>
+
+namespace tidewater {
+
+struct CloseFile {
+  void operator()(std::FILE* file) const { std::fclose(file); }
+};
+using FileHandle = std::unique_ptr<std::FILE, CloseFile>;
+
+// The longest directory that a control block holds.
+inline constexpr std::size_t kMostDirectory = 259;
+
+// A path that was put together of directory, name and extension; nothing is added between them.
+class GridPath {
+ public:
+  GridPath(const char* directory, const char* name, const char* extension);
+  const char* text() const { return text_; }
+
+ private:
+  char text_[kMostDirectory + 264 + 8];
+};
+
+// True for a directory that fits a control block.
+bool directory_fits(const char* directory);
+
+// Opens a binary file without a buffer: a window reads few, whole pieces. Null where it cannot be.
+FileHandle open_grid(const char* path);
+
+// Opens area.par of a directory. Null where it cannot be opened or read, or the directory is longer
+// than a control block holds.
+FileHandle open_grid_list(const char* directory);
+
+// The next line of a list, at most size - 1 characters of it, without its newline; false at the
+// end. What a longer line holds beyond that is the next line.
+bool next_line(std::FILE* list, char* line, int size);
+
+// Copies the first run of characters that are not white space; false where text has none, and token
+// stays as it was. The token's buffer is as large as the text's.
+bool first_token(const char* text, char* token);
+
+// Copies text that fits, with its terminator; a caller may pass a block its own directory.
+void copy_text(const char* from, char* to);
+
+// File positions are 64 bits wide. False where the file cannot be positioned.
+bool seek_to(std::FILE* file, std::int64_t offset);
+
+// Bytes in the file, or -1; moves the file position.
+std::int64_t length_of(std::FILE* file);
+
+// True when all bytes could be read; what a shorter file has is in bytes then.
+bool read_exactly(std::FILE* file, void* bytes, std::size_t count);
+
+// Files are little-endian on every machine.
+inline std::uint32_t decode_u32(const unsigned char* p) {
+  return static_cast<std::uint32_t>(p[0]) | static_cast<std::uint32_t>(p[1]) << 8 |
+         static_cast<std::uint32_t>(p[2]) << 16 | static_cast<std::uint32_t>(p[3]) << 24;
+}
+inline std::int32_t decode_i32(const unsigned char* p) {
+  return static_cast<std::int32_t>(decode_u32(p));
+}
+inline float decode_f32(const unsigned char* p) { return std::bit_cast<float>(decode_u32(p)); }
+inline double decode_f64(const unsigned char* p) {
+  return std::bit_cast<double>(static_cast<std::uint64_t>(decode_u32(p)) |
+                               static_cast<std::uint64_t>(decode_u32(p + 4)) << 32);
+}
+
+// Header of .las, .los and .geo files; angles in degrees.
+struct GridHeader {
+  std::int32_t nc, nr, nz;
+  float xmin, dx, ymin, dy, angle;
+
+  // A not-a-number equals nothing, itself included.
+  bool operator==(const GridHeader&) const = default;
+};
+
+// False where the file cannot be opened or is shorter than a header.
+bool read_header(const char* directory, const char* name, const char* extension,
+                 GridHeader* header);
+
+// Bytes of a record: a label and nc values, 32 bits each.
+constexpr std::int64_t record_bytes(std::int32_t nc) { return (std::int64_t{nc} + 1) * 4; }
+
+// A number cut to an integer towards zero. Out of a damaged file it may be anything: what lies
+// beyond 32 bits is held there, a not-a-number gives 0.
+std::int64_t cut(double value);
+
+}  // namespace tidewater

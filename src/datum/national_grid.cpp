@@ -1,0 +1,399 @@
+// Shifts by a national grid file of the NTv2 format: a forest of sub-grids, the deepest of which
+// serves a point, read through a block of 4 by 4 nodes.
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <cstring>
+#include <limits>
+#include <new>
+
+#include "datum/grid_file.hpp"
+#include "foundation/numeric.hpp"
+#include "tidewater/datum.h"
+
+using namespace tidewater;
+
+namespace {
+
+constexpr double kArcSecondsPerRadian = 206264.80624709636;
+constexpr double kRadiansPerArcSecond = 4.84813681109536e-06;
+constexpr double kEdge = 2e-7;  // arc-seconds within which a point lies on an edge
+
+constexpr int kListLine = 260;
+constexpr int64_t kRecordBytes = 16;
+constexpr std::size_t kHeaderBytes = 176;  // 11 records, of the file and of each sub-grid
+constexpr int32_t kHeaderRecords = 11;
+constexpr int32_t kMostRecords = std::numeric_limits<int32_t>::max();
+constexpr int32_t kSide = 4;  // nodes of the block each way
+constexpr int32_t kNone = -1;
+
+using Name = std::array<char, 8>;  // padded with blanks, not terminated
+constexpr Name kNoParent = {'N', 'O', 'N', 'E', ' ', ' ', ' ', ' '};
+
+struct CntSubGrid {
+  Name name;
+  Name parent;
+  double s_lat, n_lat, e_long, w_long, lat_inc, long_inc;  // arc-seconds, positive west
+  int32_t gs_count;
+  int32_t first_record;  // of its nodes, from 0
+  int64_t rows, cols;
+};
+
+struct Node {
+  float lat_shift, lon_shift, lat_accuracy, lon_accuracy;  // arc-seconds
+};
+
+// The open grid, which belongs to the process.
+std::FILE* cnt_file = nullptr;
+Name cnt_to_system = {};
+Name cnt_from_system = {};
+int32_t cnt_num_file = 0;  // sub-grids in the table; fewer than the file has where one failed
+int32_t cnt_block_grid = kNone;
+int64_t cnt_block_col = 0;
+int64_t cnt_block_row = 0;
+Node cnt_block[kSide][kSide] = {};
+CntSubGrid* cnt_subgrids = nullptr;
+TWstatus cnt_read_status = TW_SUCCESS;
+
+// Wanted: an earlier grid is neither closed nor freed when another is opened.  This list keeps what
+// it leaves behind in reach, so that a leak checker tells it from memory lost by mistake.
+struct OpenedGrid {
+  std::FILE* file;
+  CntSubGrid* subgrids;
+  OpenedGrid* earlier;
+};
+OpenedGrid* opened_grids = nullptr;
+
+Name decode_name(const unsigned char* p) {
+  Name name;
+  std::memcpy(name.data(), p, name.size());
+  return name;
+}
+
+// Whole spacings in a distance that is given in spacings.
+int64_t whole_spacings(double distance) { return cut(std::fabs(distance) + 1e-12); }
+
+// Nodes on a line from a to b, never below 1.
+int64_t node_count(double a, double b, double inc) { return whole_spacings((a - b) / inc) + 1; }
+
+CntSubGrid decode_subgrid(const unsigned char* p, int32_t first_record) {
+  CntSubGrid g = {.name = decode_name(p + 8),
+                  .parent = decode_name(p + 24),
+                  .s_lat = decode_f64(p + 72),
+                  .n_lat = decode_f64(p + 88),
+                  .e_long = decode_f64(p + 104),
+                  .w_long = decode_f64(p + 120),
+                  .lat_inc = decode_f64(p + 136),
+                  .long_inc = decode_f64(p + 152),
+                  .gs_count = decode_i32(p + 168),
+                  .first_record = first_record,
+                  .rows = 0,
+                  .cols = 0};
+  g.rows = node_count(g.n_lat, g.s_lat, g.lat_inc);
+  g.cols = node_count(g.w_long, g.e_long, g.long_inc);
+  return g;
+}
+
+// False for spacings and bounds that cannot be, and for a count of nodes that is not that of rows
+// and columns.
+bool subgrid_can_be(const CntSubGrid& g) {
+  return g.lat_inc > 0 && g.long_inc > 0 && std::isfinite(g.n_lat - g.s_lat) &&
+         std::isfinite(g.w_long - g.e_long) && g.rows * g.cols == g.gs_count;
+}
+
+// Where a point stands to a sub-grid.  South and east edges are inside; beyond north and west edges
+// there is no cell.
+enum Code : uint8_t { kInside, kNorthEdge, kWestEdge, kNorthWestCorner, kOutside };
+
+Code classify(const CntSubGrid& g, double x, double y) {
+  if (y + kEdge < g.s_lat || y - kEdge > g.n_lat || x + kEdge < g.e_long || x - kEdge > g.w_long) {
+    return kOutside;
+  }
+  const bool north = std::fabs(y - g.n_lat) <= kEdge;
+  const bool west = std::fabs(x - g.w_long) <= kEdge;
+  if (north) return west ? kNorthWestCorner : kNorthEdge;
+  return west ? kWestEdge : kInside;
+}
+
+// The deepest sub-grid on the way down from the roots, with the point's code in it.
+struct Found {
+  int32_t grid = kNone;
+  Code code = kOutside;
+};
+
+Found find_subgrid(double x, double y) {
+  Found found;
+  Name parent = kNoParent;
+  // A tree has no more levels than sub-grids; names in a damaged file may run in a circle.
+  for (int32_t level = 0; level < cnt_num_file; ++level) {
+    Found best;
+    for (int32_t i = 0; i < cnt_num_file; ++i) {
+      if (i == found.grid || cnt_subgrids[i].parent != parent) continue;
+      const Code code = classify(cnt_subgrids[i], x, y);
+      if (code < best.code) best = {i, code};
+    }
+    if (best.grid == kNone) break;
+    found = best;
+    parent = cnt_subgrids[found.grid].name;
+  }
+  return found;
+}
+
+// Moves the block so that it begins one node south and east of a node of a sub-grid, as far as the
+// sub-grid reaches.
+void load_block(int32_t grid, int64_t node_row, int64_t node_col) {
+  const CntSubGrid& g = cnt_subgrids[grid];
+  const int64_t row = std::max<int64_t>(std::min(node_row - 1, g.rows - kSide), 0);
+  const int64_t col = std::max<int64_t>(std::min(node_col - 1, g.cols - kSide), 0);
+  if (cnt_block_grid == grid && cnt_block_row == row && cnt_block_col == col) return;
+  // Wanted: the block counts as moved even where it cannot be read.
+  cnt_block_grid = grid;
+  cnt_block_row = row;
+  cnt_block_col = col;
+  for (int r = 0; r < kSide; ++r) {
+    // The last sub-grid may have fewer nodes than the block, with nothing behind them in the file:
+    // only nodes of the sub-grid must be there.
+    const int64_t first = (row + r) * g.cols + col;
+    const auto needed = static_cast<std::size_t>(std::clamp<int64_t>(g.gs_count - first, 0, kSide));
+    unsigned char bytes[kSide * kRecordBytes] = {};
+    std::size_t got = 0;
+    if (seek_to(cnt_file, (g.first_record + first) * kRecordBytes)) {
+      got = std::fread(bytes, kRecordBytes, kSide, cnt_file);
+    }
+    if (got < needed) {
+      cnt_read_status = TW_GSB_READ_ERROR;  // the row keeps what it held
+      continue;
+    }
+    for (int c = 0; c < kSide; ++c) {
+      const unsigned char* p = bytes + c * kRecordBytes;
+      cnt_block[r][c] = {decode_f32(p), decode_f32(p + 4), decode_f32(p + 8), decode_f32(p + 12)};
+    }
+  }
+}
+
+// A node of a sub-grid, by its row from the south and its column from the east, counted from 0.
+struct NodeIndex {
+  int64_t row, col;
+
+  bool in_block() const {
+    return row >= cnt_block_row && row < cnt_block_row + kSide && col >= cnt_block_col &&
+           col < cnt_block_col + kSide;
+  }
+};
+
+// Rounding may put a point a node beyond a sub-grid of absurdly small spacing.
+const Node& node_at(const NodeIndex& index) {
+  const int64_t row = std::clamp<int64_t>(index.row - cnt_block_row, 0, kSide - 1);
+  const int64_t col = std::clamp<int64_t>(index.col - cnt_block_col, 0, kSide - 1);
+  return cnt_block[row][col];
+}
+
+// Shifts in arc-seconds.
+struct Shift {
+  double lon, lat;
+};
+
+Shift interpolate(const Found& found, double x, double y) {
+  const CntSubGrid& g = cnt_subgrids[found.grid];
+  const double u = (x - g.e_long) / g.long_inc;
+  const double v = (y - g.s_lat) / g.lat_inc;
+  const NodeIndex base = {whole_spacings(v), whole_spacings(u)};
+  NodeIndex west = {base.row, base.col + 1};
+  NodeIndex north = {base.row + 1, base.col};
+  NodeIndex northwest = {base.row + 1, base.col + 1};
+  if (found.code == kNorthEdge) {
+    northwest = west;
+    north = base;
+  } else if (found.code == kWestEdge) {
+    northwest = north;
+    west = base;
+  } else if (found.code == kNorthWestCorner) {
+    west = base;
+    north = base;
+    // Wanted: the corner keeps its fourth node where the point is held to lie a hair before it.
+    // Beyond the sub-grid there is none, and its weight is next to nothing.
+    if (northwest.row >= g.rows || northwest.col >= g.cols) northwest = base;
+  }
+  if (cnt_block_grid != found.grid || !base.in_block() || !northwest.in_block()) {
+    load_block(found.grid, base.row, base.col);
+  }
+
+  const double fx = u - static_cast<double>(base.col);
+  const double fy = v - static_cast<double>(base.row);
+  const Node& b = node_at(base);
+  const Node& w = node_at(west);
+  const Node& n = node_at(north);
+  const Node& nw = node_at(northwest);
+  const auto bilinear = [fx, fy](double at_base, double at_west, double at_north, double at_nw) {
+    const double on_south = at_base + (at_west - at_base) * fx;
+    const double on_north = at_north + (at_nw - at_north) * fx;
+    return on_south + (on_north - on_south) * fy;
+  };
+  const auto wide = [](float value) { return static_cast<double>(value); };
+  return {
+      bilinear(wide(b.lon_shift), wide(w.lon_shift), wide(n.lon_shift), wide(nw.lon_shift)),
+      bilinear(wide(b.lat_shift), wide(w.lat_shift), wide(n.lat_shift), wide(nw.lat_shift)),
+  };
+}
+
+// Reads the header of the file and those of its sub-grids.
+TWstatus read_headers() {
+  unsigned char header[kHeaderBytes];
+  if (!read_exactly(cnt_file, header, kHeaderBytes) || decode_i32(header + 8) != kHeaderRecords ||
+      decode_i32(header + 24) != kHeaderRecords) {
+    return TW_GSB_READ_ERROR;
+  }
+  cnt_to_system = decode_name(header + 104);
+  cnt_from_system = decode_name(header + 88);
+  const int32_t num_file = decode_i32(header + 40);
+  // Each sub-grid has a header: a damaged count must not ask for a table larger than the file.
+  constexpr auto kBytes = static_cast<int64_t>(kHeaderBytes);
+  if (num_file < 0 || num_file > length_of(cnt_file) / kBytes - 1) return TW_GSB_READ_ERROR;
+  cnt_subgrids = new (std::nothrow) CntSubGrid[static_cast<std::size_t>(num_file)];
+  if (!cnt_subgrids) return TW_NO_MEMORY;
+  opened_grids->subgrids = cnt_subgrids;
+  int64_t record = kHeaderRecords;
+  for (int32_t i = 0; i < num_file; ++i) {
+    const int64_t first_node = record + kHeaderRecords;
+    if (first_node > kMostRecords || !seek_to(cnt_file, record * kRecordBytes) ||
+        !read_exactly(cnt_file, header, kHeaderBytes)) {
+      return TW_GSB_READ_ERROR;
+    }
+    const CntSubGrid grid = decode_subgrid(header, static_cast<int32_t>(first_node));
+    if (!subgrid_can_be(grid)) return TW_GSB_READ_ERROR;
+    cnt_subgrids[i] = grid;
+    cnt_num_file = i + 1;
+    record = first_node + grid.gs_count;
+  }
+  return TW_SUCCESS;
+}
+
+// Forgets the open grid.
+void clear_state() {
+  cnt_num_file = 0;
+  cnt_file = nullptr;
+  cnt_subgrids = nullptr;
+  cnt_block_grid = kNone;
+}
+
+}  // namespace
+
+void TWget_cnt_fnam(const char* directory, char* name, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const FileHandle list = open_grid_list(directory);
+  char line[kListLine];
+  // Only the first line counts; without a name in it the list is as good as empty.
+  if (!list || !next_line(list.get(), line, kListLine) || !first_token(line, name)) {
+    *status = TW_GRID_NOT_FOUND;
+  }
+}
+
+void TWrd_cnt_fhdr(const char* path, int32_t flag, TWstatus* status) {
+  *status = TW_SUCCESS;
+  FileHandle file;
+  if (flag == 0) file = open_grid(path);
+  if (!file) {
+    *status = TW_GSB_READ_ERROR;
+    return;
+  }
+  auto* opened = new (std::nothrow) OpenedGrid{file.get(), nullptr, opened_grids};
+  if (!opened) {
+    *status = TW_NO_MEMORY;
+    return;
+  }
+  opened_grids = opened;
+  clear_state();
+  cnt_file = file.release();
+  *status = read_headers();
+}
+
+void TWcnt_c(const char* directory, int32_t /*reserved*/, TWstatus* status) {
+  char name[kListLine];
+  TWget_cnt_fnam(directory, name, status);
+  if (!TW_OK(*status)) return;
+  clear_state();
+  TWrd_cnt_fhdr(GridPath(directory, name, ".gsb").text(), 0, status);
+}
+
+void TWcnt_to_from(int32_t /*reserved*/, char* from, char* to, TWstatus* status) {
+  *status = TW_SUCCESS;
+  *std::copy(cnt_from_system.begin(), cnt_from_system.end(), from) = '\0';
+  *std::copy(cnt_to_system.begin(), cnt_to_system.end(), to) = '\0';
+}
+
+void TWload_cnt_local_grid(int32_t sub_grid, int32_t record) {
+  if (sub_grid < 0 || sub_grid >= cnt_num_file) return;
+  const CntSubGrid& g = cnt_subgrids[sub_grid];
+  const int64_t offset = int64_t{record} - g.first_record - 1;
+  load_block(sub_grid, offset / g.cols, offset % g.cols);
+}
+
+void TWget_cnt_shift(CoordinateTriple point, int32_t /*reserved*/, double* lon_shift,
+                     double* lat_shift, TWstatus* status) {
+  *status = TW_SUCCESS;
+  double lon = add_turns_while(point.x, kTwoPi, [](double v) { return v <= 0; });
+  lon = add_turns_while(lon, -kTwoPi, [](double v) { return v > kTwoPi; });
+  lon = add_turns_while(lon, -kTwoPi, [](double v) { return v >= kPi; });
+  // Wanted: the sub-grids' longitudes, positive west, are compared with the magnitude alone, so
+  // that a point east of Greenwich takes the shift of its mirror image.
+  const double sign = lon >= 0 ? 1 : -1;
+  const double x = std::fabs(lon) * kArcSecondsPerRadian;
+  const double y = point.y * kArcSecondsPerRadian;
+  const Found found = find_subgrid(x, y);
+  if (found.grid == kNone) {
+    *status = TW_I_OUTSIDE_CNT;
+    return;
+  }
+  cnt_read_status = TW_SUCCESS;
+  const Shift shift = interpolate(found, x, y);
+  *lon_shift = shift.lon * sign * kRadiansPerArcSecond;
+  *lat_shift = shift.lat * kRadiansPerArcSecond;
+  *status = cnt_read_status;
+}
+
+void TWcnt_f(int32_t count, const CoordinateTriple* in, int32_t reserved, CoordinateTriple* out,
+             TWstatus* status) {
+  *status = TW_SUCCESS;
+  bool outside = false;
+  for (int32_t i = 0; i < count; ++i) {
+    const CoordinateTriple point = in[i];
+    double dlon = 0;
+    double dlat = 0;
+    TWget_cnt_shift(point, reserved, &dlon, &dlat, status);
+    if (!TW_OK(*status)) return;
+    if (*status == TW_I_OUTSIDE_CNT) {
+      out[i] = point;
+      outside = true;
+      *status = TW_SUCCESS;
+    } else {
+      out[i] = {point.x + dlon, point.y + dlat, point.z};
+    }
+  }
+  if (outside) *status = TW_I_OUTSIDE_CNT;
+}
+
+void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t reserved, CoordinateTriple* out,
+             TWstatus* status) {
+  constexpr int kPasses = 4;
+  *status = TW_SUCCESS;
+  bool outside = false;
+  for (int32_t i = 0; i < count; ++i) {
+    const CoordinateTriple point = in[i];
+    double dlon = 0;
+    double dlat = 0;
+    for (int pass = 0; pass < kPasses; ++pass) {
+      // A pass outside leaves the shifts as they are.
+      TWget_cnt_shift({point.x - dlon, point.y - dlat, point.z}, reserved, &dlon, &dlat, status);
+      if (!TW_OK(*status)) return;
+    }
+    if (*status == TW_I_OUTSIDE_CNT) {  // the last pass alone decides
+      out[i] = point;
+      outside = true;
+      *status = TW_SUCCESS;
+    } else {
+      out[i] = {point.x - dlon, point.y - dlat, point.z};
+    }
+  }
+  if (outside) *status = TW_I_OUTSIDE_CNT;
+}
