@@ -1,0 +1,15 @@
+// The subcommands, each in a source of its own.
+#pragma once
+
+#include <CLI/CLI.hpp>
+
+namespace tidewater::command {
+
+// Exit statuses: 0 when everything was converted, 1 when some lines were not.
+inline constexpr int kSomeRefused = 1;
+inline constexpr int kUsageError = 2;
+
+// Each registers its subcommand; exit_status is set when it has run.
+void add_convert(CLI::App& app, int& exit_status);
+
+}  // namespace tidewater::command
