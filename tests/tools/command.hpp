@@ -1,0 +1,40 @@
+// Runs a command of this build, as a user would, and keeps what it says.
+#pragma once
+
+#include <sys/wait.h>
+
+#include <cstdio>
+#include <fstream>
+#include <sstream>
+#include <string>
+
+#include "support/data.hpp"
+
+namespace tidewater::test {
+
+struct Outcome {
+  std::string out;
+  std::string err;
+  int status = -1;
+};
+
+inline std::string contents(const std::filesystem::path& file) {
+  std::ostringstream text;
+  text << std::ifstream(file, std::ios::binary).rdbuf();
+  return text.str();
+}
+
+// Runs a line of shell in which "tidewater" and "twstore" are those of this build.
+inline Outcome shell(const std::string& line, const std::string& input = "") {
+  const ScratchFolder scratch;
+  scratch.write("in", input);
+  scratch.write("script", "PATH=" TIDEWATER_COMMANDS ":$PATH\n" + line + "\n");
+  const std::string folder = scratch.path().string();
+  const std::string command =
+      "bash " + folder + "/script <" + folder + "/in >" + folder + "/out 2>" + folder + "/err";
+  const int status = std::system(command.c_str());
+  return {contents(scratch.path() / "out"), contents(scratch.path() / "err"),
+          WIFEXITED(status) ? WEXITSTATUS(status) : -1};
+}
+
+}  // namespace tidewater::test

@@ -1,0 +1,402 @@
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cmath>
+#include <cstring>
+#include <regex>
+#include <string>
+#include <vector>
+
+#include "command.hpp"
+#include "support/points.hpp"
+#include "support/proj_peer.hpp"
+
+using namespace tidewater::test;
+
+namespace {
+
+std::vector<std::string> lines(const std::string& text) {
+  std::vector<std::string> all;
+  std::istringstream stream(text);
+  for (std::string line; std::getline(stream, line);) all.push_back(line);
+  return all;
+}
+
+std::vector<double> numbers(const std::string& line) {
+  std::vector<double> all;
+  std::istringstream stream(line);
+  for (double value = 0; stream >> value;) all.push_back(value);
+  return all;
+}
+
+// A folder that names one of the distribution's national grids.
+struct NationalGrid : ScratchFolder {
+  explicit NationalGrid(const std::string& name) {
+    std::filesystem::create_symlink(proj_data() / (name + ".gsb"), path() / (name + ".gsb"));
+    write("area.par", name + "\n");
+  }
+};
+
+TEST(Convert, DecimalDegreesToUtm) {
+  // EPSG Guidance Note 7-2 has no UTM example; these are PROJ's figures for +proj=utm +zone=30.
+  const Outcome r = shell("tidewater convert", "48.3903 -4.4863 Brest\n");
+  EXPECT_EQ(r.out, "389969.007 5360749.100 30N Brest\n");
+  EXPECT_EQ(r.err, "1 converted, 0 outside the grids, 0 refused\n");
+  EXPECT_EQ(r.status, 0);
+}
+
+TEST(Convert, AgreesWithProjInEveryZone) {
+  TIDEWATER_NEED_PROJ();
+#ifdef TIDEWATER_HAVE_PROJ
+  for (int zone = 1; zone <= 60; zone += 7) {
+    for (const double lat : {-70.5, -12.25, 33.0, 71.0}) {
+      const double lon = 6 * zone - 183 + 2.25;
+      const ProjPeer peer("+proj=utm +ellps=WGS84 +zone=" + std::to_string(zone) +
+                          (lat < 0 ? " +south" : ""));
+      const CoordinateTriple p = peer.forward({degrees(lon), degrees(lat), 0});
+      std::ostringstream input;
+      input << lat << ' ' << lon << '\n';
+      const Outcome r = shell("tidewater convert -p 4 -e 'WGS 84'", input.str());
+      const auto n = numbers(r.out);
+      ASSERT_GE(n.size(), 2u) << r.out << r.err;
+      EXPECT_NEAR(n[0], p.x, 1e-3);
+      // the arc's series to e^8, that of the grid's own manual, is up to 2 mm off the exact arc
+      EXPECT_NEAR(n[1], p.y, 2e-3);
+      const std::string name = std::to_string(zone) + (lat < 0 ? "S" : "N");
+      EXPECT_NE(r.out.find(' ' + name + '\n'), std::string::npos) << r.out;
+    }
+  }
+#endif
+}
+
+TEST(Convert, ZonesOfNorwayAndSvalbard) {
+  // DMA TM 8358.1: 32V reaches from 3 to 12 E, and 31X, 33X, 35X, 37X cover 0 to 42 E
+  const Outcome r = shell("tidewater convert | awk '{print $3}'",
+                          "60 4\n55.9 4\n64 4\n71.9 7\n72 8.9\n72 9\n72 20.9\n72 21\n80 33\n80 42\n"
+                          "-60 4\n0 -180\n0 180\n0 179.9\n");
+  EXPECT_EQ(r.out, "32N\n31N\n31N\n32N\n31N\n33N\n33N\n35N\n37N\n38N\n31S\n1N\n1N\n60N\n");
+}
+
+TEST(Convert, TownsOfBrittanyThroughTheNationalGrid) {
+  if (proj_data().empty() || !std::filesystem::exists(proj_data() / "ntf_r93.gsb")) {
+    GTEST_SKIP() << "ntf_r93.gsb is not installed";
+  }
+  const NationalGrid grid("ntf_r93");
+  const std::string towns = TIDEWATER_SOURCE "/examples/brittany_ntf.txt";
+  const Outcome r =
+      shell("tidewater convert --format dms --hemisphere behind --zone 30N --shift ntv2:" +
+            grid.path().string() + " " + towns);
+  EXPECT_EQ(r.status, 0) << r.err;
+  EXPECT_NE(r.err.find("12 converted, 0 outside the grids, 0 refused"), std::string::npos) << r.err;
+  TIDEWATER_NEED_PROJ();
+#ifdef TIDEWATER_HAVE_PROJ
+  const ProjPeer peer(
+      "+proj=pipeline +step +proj=hgridshift +grids=ntf_r93.gsb "
+      "+step +proj=utm +zone=30 +ellps=GRS80");
+  ASSERT_TRUE(peer.ok());
+  const auto given = lines(contents(towns));
+  const auto got = lines(r.out);
+  ASSERT_EQ(given.size(), got.size());
+  int compared = 0;
+  const std::regex position(R"((\d+):(\d+):([\d.]+)N (\d+):(\d+):([\d.]+)W (.*))");
+  for (std::size_t i = 0; i < given.size(); ++i) {
+    std::smatch m;
+    if (!std::regex_match(given[i], m, position)) {
+      EXPECT_EQ(given[i], got[i]);  // the comment is passed through
+      continue;
+    }
+    const double lat = degrees(std::stod(m[1]), std::stod(m[2]), std::stod(m[3]));
+    const double lon = -degrees(std::stod(m[4]), std::stod(m[5]), std::stod(m[6]));
+    const CoordinateTriple expected = peer.forward({lon, lat, 0});
+    const auto n = numbers(got[i]);
+    ASSERT_EQ(n.size(), 2u) << got[i];
+    EXPECT_NEAR(n[0], expected.x, 1e-3) << given[i];
+    EXPECT_NEAR(n[1], expected.y, 1e-3) << given[i];
+    EXPECT_NE(got[i].find(' ' + m[7].str()), std::string::npos);
+    ++compared;
+  }
+  EXPECT_EQ(compared, 12);
+#endif
+}
+
+TEST(Convert, NationalGridThereAndBack) {
+  if (proj_data().empty()) GTEST_SKIP() << "no national grid is installed";
+  const NationalGrid grid("ntf_r93");
+  const std::string shift = " --shift ntv2:" + grid.path().string();
+  const Outcome r = shell("tidewater convert --to geodetic -p 10" + shift +
+                              " | tidewater convert --to geodetic -p 8 --inverse" + shift,
+                          "48.3903 -4.4863 Brest\n47.25 -1.55 Nantes\n");
+  EXPECT_EQ(r.out, "48.39030000 -4.48630000 Brest\n47.25000000 -1.55000000 Nantes\n");
+  EXPECT_EQ(r.status, 0) << r.err;
+}
+
+TEST(Convert, NationalGridRefusesTheEast) {
+  if (proj_data().empty()) GTEST_SKIP() << "no national grid is installed";
+  const NationalGrid grid("ntf_r93");
+  const Outcome r = shell("tidewater convert --to geodetic --shift ntv2:" + grid.path().string(),
+                          "48.85 2.35 Paris\n48.39 -4.49 Brest\n20 -30 sea\n");
+  const auto got = lines(r.out);
+  ASSERT_EQ(got.size(), 3u);
+  EXPECT_EQ(got[0], "* * Paris");
+  EXPECT_EQ(got[1].rfind("48.39", 0), 0u);
+  EXPECT_EQ(got[2], "* * sea");
+  EXPECT_NE(r.err.find("standard input:1: \"48.85 2.35 Paris\": east of Greenwich"),
+            std::string::npos)
+      << r.err;
+  EXPECT_NE(r.err.find("standard input:3: \"20 -30 sea\": outside the national grid "
+                       "(TW_I_OUTSIDE_CNT)"),
+            std::string::npos)
+      << r.err;
+  EXPECT_NE(r.err.find("1 converted, 1 outside the grids, 1 refused"), std::string::npos);
+  EXPECT_EQ(r.status, 1);
+}
+
+TEST(Convert, MeadesRanchThroughNadcon) {
+  TIDEWATER_NEED_SHARED_DATA();
+  const Outcome r = shell(
+      "tidewater convert --format dms --hemisphere behind --to geodetic --out-format dms "
+      "--shift nadcon:" +
+          (shared_data() / "nadcon").string(),
+      "39:13:26.686N 98:32:30.506W Meades Ranch\n10:0:0N 40:0:0W Atlantic\n");
+  const auto got = lines(r.out);
+  ASSERT_EQ(got.size(), 2u) << r.err;
+  double d = 0, m = 0, s = 0, e = 0, n = 0, t = 0;
+  ASSERT_EQ(std::sscanf(got[0].c_str(), "%lf:%lf:%lf %lf:%lf:%lf", &d, &m, &s, &e, &n, &t), 6);
+  // published NAD 83 position 39 13 26.71220 N, 98 32 31.74604 W; the grid itself is 0.009 off
+  EXPECT_EQ(d, 39);
+  EXPECT_EQ(m, 13);
+  EXPECT_NEAR(s, 26.71220, 0.02);
+  EXPECT_EQ(e, -98);
+  EXPECT_EQ(n, 32);
+  EXPECT_NEAR(t, 31.74604, 0.02);
+  EXPECT_EQ(got[1], "* * Atlantic");
+  EXPECT_NE(r.err.find("TW_I_OUTSIDE_NADCON"), std::string::npos);
+  EXPECT_NE(r.err.find("1 converted, 1 outside the grids, 0 refused"), std::string::npos);
+  EXPECT_EQ(r.status, 1);
+}
+
+TEST(Convert, EveryAngleFormatThereAndBack) {
+  const std::string start = "48.390300000 -4.486300000 a\n-33.450000000 151.250000000 b\n";
+  for (const char* form : {"degrees", "grads", "dms", "packed"}) {
+    for (const char* signs : {"hemisphere sign", "hemisphere front", "hemisphere behind",
+                              "reverse both", "reverse lat", "reverse lon"}) {
+      for (const char* order : {"lat-lon", "lon-lat"}) {
+        const std::string format = std::string("format ") + form;
+        const std::string there =
+            std::string(" --out-") + format + " --out-" + signs + " --out-order " + order + " -p 8";
+        const std::string back =
+            std::string(" --") + format + " --" + signs + " --order " + order + " -p 9";
+        const Outcome r = shell(
+            "tidewater convert --to geodetic" + there + " | tidewater convert --to geodetic" + back,
+            start);
+        EXPECT_EQ(r.out, start) << there << r.err;
+      }
+    }
+  }
+}
+
+TEST(Convert, TextOfEachFormat) {
+  const auto written = [](const std::string& options) {
+    return shell("tidewater convert --to geodetic " + options, "-0.5 151.25\n").out;
+  };
+  EXPECT_EQ(written(""), "-0.500000000 151.250000000\n");
+  EXPECT_EQ(written("-p 2 --out-format grads"), "-0.56 168.06\n");
+  EXPECT_EQ(written("-p 1 --out-format dms"), "-0:30:00.0 151:15:00.0\n");
+  EXPECT_EQ(written("-p 0 --out-format packed --out-hemisphere behind"), "0.3000S 151.1500E\n");
+  EXPECT_EQ(written("-p 0 --out-format dms --out-hemisphere front --out-order lon-lat"),
+            "E151:15:00 S0:30:00\n");
+  EXPECT_EQ(written("-p 1 --out-reverse lon"), "-0.5 -151.2\n");
+}
+
+TEST(Convert, PackedMinusZeroIsSouth) {
+  // the library's own reader takes it for positive; the command does not
+  const Outcome r =
+      shell("tidewater convert --to geodetic -p 3 --format packed", "-0.3000 1.3000\n");
+  EXPECT_EQ(r.out, "-0.500 1.500\n");
+}
+
+TEST(Convert, GeocentricOnNamedAndGivenEllipsoids) {
+  // EPSG Guidance Note 7-2, 4.1.1
+  const std::string input = "53:48:33.820 2:07:46.380 73.0 WGS\n";
+  const Outcome named = shell("tidewater convert --to geocentric --format dms -e wgs84", input);
+  const auto n = numbers(named.out);
+  ASSERT_EQ(n.size(), 3u);
+  EXPECT_NEAR(n[0], 3771793.968, 1e-3);
+  EXPECT_NEAR(n[1], 140253.342, 1e-3);
+  EXPECT_NEAR(n[2], 5124304.349, 1e-3);
+  const Outcome given =
+      shell("tidewater convert --to geocentric --format dms -e 6378137,298.257223563", input);
+  EXPECT_EQ(given.out, named.out);
+  EXPECT_EQ(shell("tidewater convert --to geocentric -p 0 -e 1000,0", "0 90\n").out, "0 1000 0\n");
+}
+
+TEST(Convert, WhatIsNotAPositionIsPassedThrough) {
+  const Outcome r =
+      shell("tidewater convert --zone 30N",
+            "# a comment\n\n   \n48 -3 12.5 a name, with # and , in it\n48, -3; b\r\n");
+  EXPECT_EQ(r.out,
+            "# a comment\n\n   \n500000.000 5316300.218 12.500 a name, with # and , in it\n"
+            "500000.000 5316300.218; b\n");
+  EXPECT_EQ(r.status, 0) << r.err;
+}
+
+TEST(Convert, BadLinesAreMarkedAndTold) {
+  const struct {
+    const char* options;
+    const char* line;
+    const char* word;
+  } bad[] = {
+      {"", "abc", "TW_BAD_TEXT"},
+      {"", "48", "TW_BAD_TEXT"},
+      {"", "48 -4x", "TW_BAD_TEXT"},
+      {"", "48N -4", "TW_BAD_TEXT"},
+      {"", "4-8 -4", "TW_BAD_TEXT"},
+      {"", "48:30 -4", "TW_BAD_TEXT"},
+      {"", "1e1 -4", "TW_BAD_TEXT"},
+      {"", ". -4", "TW_BAD_TEXT"},
+      {"", "90.1 0", "TW_BAD_LATITUDE"},
+      {"", "48 361", "TW_BAD_LONGITUDE"},
+      {"", "84.1 0", "TW_BAD_LATITUDE"},
+      {"--zone 30N", "48 60", "TW_RANGE_ERROR"},
+      {"--format dms", "48:60:00 0:0:0", "TW_BAD_TEXT"},
+      {"--format dms", "48:00:60 0:0:0", "TW_BAD_TEXT"},
+      {"--format dms", "48:00: 0:0:0", "TW_BAD_TEXT"},
+      {"--format packed", "48.6000 0.0", "TW_BAD_TEXT"},
+      {"--format packed", "48.0060 0.0", "TW_BAD_TEXT"},
+      {"--hemisphere front", "48N 4W", "TW_BAD_TEXT"},
+      {"--hemisphere front", "E48 W4", "TW_BAD_TEXT"},
+      {"--hemisphere behind", "48 4", "TW_BAD_TEXT"},
+      {"--hemisphere behind", "-48N 4W", "TW_BAD_TEXT"},
+  };
+  for (const auto& b : bad) {
+    const Outcome r =
+        shell(std::string("tidewater convert ") + b.options, std::string(b.line) + "\n");
+    EXPECT_EQ(r.out.rfind("* *", 0), 0u) << b.line << ": " << r.out;
+    EXPECT_NE(r.err.find(std::string("standard input:1: \"") + b.line + "\": "), std::string::npos)
+        << r.err;
+    EXPECT_NE(r.err.find(std::string("(") + b.word + ")"), std::string::npos) << b.line << r.err;
+    EXPECT_NE(r.err.find("0 converted, 0 outside the grids, 1 refused"), std::string::npos);
+    EXPECT_EQ(r.status, 1);
+  }
+}
+
+TEST(Convert, GoodLinesAroundABadOneAreConverted) {
+  const Outcome r = shell("tidewater convert --to geodetic -p 1", "1 1 a\nrubbish b\n2 2 c\n");
+  EXPECT_EQ(r.out, "1.0 1.0 a\n* *\n2.0 2.0 c\n");
+  EXPECT_NE(r.err.find("standard input:2: \"rubbish b\""), std::string::npos);
+  EXPECT_NE(r.err.find("2 converted, 0 outside the grids, 1 refused"), std::string::npos);
+}
+
+TEST(Convert, FilesAndStandardInput) {
+  const ScratchFolder scratch;
+  scratch.write("one", "1 1 one\n");
+  scratch.write("two", "2 2 two");  // no newline at the end
+  const std::string f = scratch.path().string();
+  const Outcome r =
+      shell("tidewater convert --to geodetic -p 0 " + f + "/one - " + f + "/two", "3 3 three\n");
+  EXPECT_EQ(r.out, "1 1 one\n3 3 three\n2 2 two\n");
+  const Outcome absent = shell("tidewater convert " + f + "/three");
+  EXPECT_EQ(absent.status, 2);
+  EXPECT_NE(absent.err.find("three: No such file"), std::string::npos) << absent.err;
+  EXPECT_EQ(shell("tidewater convert " + f).status, 2);  // a folder
+}
+
+TEST(Convert, ManyLinesInBatches) {
+  std::string input;
+  for (int i = 0; i < 20000; ++i) input += i % 1000 == 7 ? "bad\n" : "12.5 33.25 x\n";
+  const Outcome r = shell("tidewater convert --to geodetic -p 2", input);
+  const auto got = lines(r.out);
+  ASSERT_EQ(got.size(), 20000u);
+  for (std::size_t i = 0; i < got.size(); ++i) {
+    ASSERT_EQ(got[i], i % 1000 == 7 ? "* *" : "12.50 33.25 x") << i;
+  }
+  EXPECT_NE(r.err.find("standard input:19008: \"bad\""), std::string::npos);
+  EXPECT_NE(r.err.find("19980 converted, 0 outside the grids, 20 refused"), std::string::npos);
+}
+
+TEST(Convert, ALineOfAMillionCharactersIsRefused) {
+  const Outcome r = shell("tidewater convert --to geodetic -p 0",
+                          "1 1 " + std::string(1000000, 'x') + "\n2 2 y\n");
+  const auto got = lines(r.out);
+  ASSERT_EQ(got.size(), 2u);
+  EXPECT_EQ(got[0].substr(0, 3), "* *");
+  EXPECT_LT(got[0].size(), 70000u);  // held in bounded memory
+  EXPECT_EQ(got[1], "2 2 y");
+  EXPECT_LT(r.err.size(), 1000u);
+}
+
+TEST(Convert, GarbageIsRefusedAndNothingElse) {
+  std::string garbage;
+  unsigned state = 1;
+  for (int i = 0; i < 200000; ++i) {
+    state = state * 1664525u + 1013904223u;
+    garbage += static_cast<char>(state >> 24);
+  }
+  for (const char* options : {"", "--format dms --hemisphere behind", "--format packed"}) {
+    const Outcome r = shell(std::string("tidewater convert ") + options, garbage);
+    EXPECT_TRUE(r.status == 0 || r.status == 1) << r.status;
+  }
+}
+
+TEST(Convert, DecimalPointWhateverTheLocale) {
+  const Outcome r =
+      shell("export LC_ALL=de_DE.UTF-8; tidewater convert --to geodetic -p 2", "48.25 -4.75 x\n");
+  EXPECT_EQ(r.out, "48.25 -4.75 x\n");
+}
+
+TEST(Convert, OptionsThatDoNotFit) {
+  for (const char* options :
+       {"--zone 61N", "--zone 30", "--zone N", "--zone 0S", "-e Nowhere", "-e 6378137,0.5",
+        "-e 6378137,", "-e -1,298", "--shift nadcon:/nowhere", "--shift ntv2:/nowhere",
+        "--shift ntv2:", "--shift other:x", "--inverse", "--format dm", "-p 99", "--to moon",
+        "--hemisphere front --reverse lat"}) {
+    const Outcome r = shell(std::string("tidewater convert ") + options, "1 1\n");
+    EXPECT_EQ(r.status, 2) << options;
+    EXPECT_EQ(r.out, "") << options;
+    EXPECT_NE(r.err, "") << options;
+  }
+  EXPECT_EQ(shell("tidewater").status, 2);
+  EXPECT_EQ(shell("tidewater nothing").status, 2);
+  EXPECT_EQ(shell("tidewater --help").status, 0);
+  EXPECT_EQ(shell("tidewater --version").out, TIDEWATER_VERSION "\n");
+}
+
+TEST(Convert, ExamplesOfTheHelpWorkAsPrinted) {
+  const Outcome help = shell("tidewater convert --help");
+  EXPECT_EQ(help.status, 0);
+  int examples = 0;
+  for (const std::string& line : lines(help.out)) {
+    const std::size_t start = line.find_first_not_of(' ');
+    if (start == std::string::npos || line.compare(start, 5, "echo ") != 0) continue;
+    const Outcome r = shell(line);
+    EXPECT_EQ(r.status, 0) << line << r.err;
+    EXPECT_NE(r.err.find("1 converted, 0 outside the grids, 0 refused"), std::string::npos) << line;
+    ++examples;
+  }
+  EXPECT_EQ(examples, 4);
+}
+
+TEST(Convert, AFullDiskIsSaid) {
+  if (!std::filesystem::exists("/dev/full")) GTEST_SKIP() << "no /dev/full here";
+  const Outcome r = shell("tidewater convert >/dev/full", "1 1\n");
+  EXPECT_EQ(r.status, 2);
+  EXPECT_NE(r.err.find("standard output cannot be written"), std::string::npos) << r.err;
+}
+
+TEST(Convert, ProgressOnATerminalForLongFiles) {
+  if (shell("command -v script").status != 0) GTEST_SKIP() << "no terminal to be had";
+  const ScratchFolder scratch;
+  std::string input;
+  while (input.size() < (6u << 20)) input += "12.5 33.25 some name behind the position\n";
+  scratch.write("long", input);
+  const std::string f = scratch.path().string();
+  const Outcome r = shell("script -qec 'tidewater convert --to geodetic " + f + "/long >" + f +
+                          "/out' /dev/null");
+  EXPECT_NE(r.out.find("%"), std::string::npos);
+  EXPECT_NE(r.out.find("##"), std::string::npos);
+  // not where standard error is no terminal
+  const Outcome quiet = shell("tidewater convert --to geodetic " + f + "/long >/dev/null");
+  EXPECT_EQ(quiet.err.find('#'), std::string::npos);
+}
+
+}  // namespace
