@@ -37,7 +37,7 @@ Form form_of(const AngleUnit& unit) {
   return format == u"dd.mmss" ? Form::packed : Form::decimal;
 }
 
-// The value as the other side of the text has it: read and written angles are turned alike.
+// Modes 1 to 3 negate an angle, in reading as in writing.
 double with_axis_sense(double value, const AngleUnit& unit, int16_t axis) {
   const bool reversed = unit.hemisphere_mode == 1 ||
                         (unit.hemisphere_mode == 2 && axis == kLatitude) ||
@@ -172,6 +172,7 @@ std::string angle_text(double value, const AngleUnit& unit, int16_t axis) {
   const double v = std::fabs(value) / unit.factor;
 
   std::string text;
+  // An infinite value has no degrees and minutes.
   if (form == Form::decimal || !std::isfinite(v)) {
     text = decimal_text(value / unit.factor, unit.precision);
   } else {
