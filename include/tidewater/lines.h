@@ -60,8 +60,7 @@ TW_API void geodesic_int(double x, double k, int16_t flag, double b, double e2, 
  *                      leaves the latitude of end unwritten
  */
 TW_API void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, double a,
-                           double e, CoordinateTriple* end, double* back_azimuth,
-                           TWstatus* status);
+                           double e, CoordinateTriple* end, double* back_azimuth, TWstatus* status);
 
 /**
  * Length and azimuths of the line between two points, by Newton's method on the reduced latitude of
@@ -144,15 +143,15 @@ TW_API void TWgeodesic_buf(int16_t mode, CoordinateTriple start, CoordinateTripl
  *                      past a pole is not reported, and the latitude of end is then unwritten
  */
 TW_API void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distance, double a,
-                           double e, CoordinateTriple* end, double* back_azimuth,
-                           TWstatus* status);
+                           double e, CoordinateTriple* end, double* back_azimuth, TWstatus* status);
 
 /**
  * Length and azimuths of the line between two points.  The longitude difference is taken as it
  * stands: a line across the 180th meridian goes the long way.
  * @param start,end     the points; their heights are not read
  * @param a,e           ellipsoid
- * @param azimuth       azimuth at start towards end, radians, 0 to 2 pi; 3 pi/2 for identical points
+ * @param azimuth       azimuth at start towards end, radians, 0 to 2 pi; 3 pi/2 for identical
+ * points
  * @param back_azimuth  azimuth at end towards start
  * @param distance      length of the line
  * @param status        the word of the last inner call, TWmerid_dist_f() of the start's latitude;

@@ -49,8 +49,8 @@ void TWmol_bdk_f(int32_t count, const CoordinateTriple* in, double s, const doub
   *status = TW_SUCCESS;
   const double scale = 1 + s;
   for (int32_t i = 0; i < count; ++i) {
-    const auto r = rotate(rotation, {(in[i].x - px) * scale, (in[i].y - py) * scale,
-                                     (in[i].z - pz) * scale});
+    const auto r =
+        rotate(rotation, {(in[i].x - px) * scale, (in[i].y - py) * scale, (in[i].z - pz) * scale});
     out[i] = {r.x + qx, r.y + qy, r.z + qz};
   }
 }
