@@ -66,11 +66,11 @@ struct CosinePowerSeries {
   }
 };
 
-// What the projections that use the cosine-power form share: the arc and its inverse.
+// What the projections that use the form in powers of the cosine share.
 struct ArcConstants {
   double c0;
-  CosinePowerSeries arc;
-  CosinePowerSeries foot;
+  CosinePowerSeries arc;   // of the latitude
+  CosinePowerSeries foot;  // of the rectifying latitude
 
   static ArcConstants of(double e2) {
     const ArcSeries a = ArcSeries::of(e2);
@@ -78,12 +78,10 @@ struct ArcConstants {
     return {a.a0, CosinePowerSeries::of(-a.a2, a.a4, -a.a6, a.a8),
             CosinePowerSeries::of(b.b2, b.b4, b.b6, b.b8)};
   }
-};
 
-// M(p) = c0 p + the series; sin 2p and cos 2p from the sine and cosine of p.
-inline double meridian_arc(double c0, const CosinePowerSeries& series, double lat, double sin_lat,
-                           double cos_lat) {
-  return c0 * lat + series.sum(2 * cos_lat * sin_lat, square(cos_lat) - square(sin_lat));
-}
+  double meridian_arc(double lat) const {
+    return c0 * lat + arc.sum(std::sin(2 * lat), std::cos(2 * lat));
+  }
+};
 
 }  // namespace tidewater

@@ -1,7 +1,7 @@
 // Transverse Mercator projection of the ellipsoid by series about the central meridian.
 // Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 60-64; the
-// higher terms of the forward series: Thomas, Conformal Projections in Geodesy and Cartography,
-// U.S. Coast and Geodetic Survey Special Publication 251 (1952), p. 2.
+// last terms of the forward series: Defense Mapping Agency Technical Manual 8358.2, The Universal
+// Grids (1989), chapter 2.
 
 #include <cmath>
 
