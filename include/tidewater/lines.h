@@ -22,8 +22,9 @@ extern "C" {
 /** @name Geodesic lines (Bessel 1825, Astronomische Nachrichten 4, pp. 241-254)
  *
  *  A line is described by its vertex, the point of highest reduced latitude on it, and integrated
- *  outward from there by a five-term binomial expansion; on the earth's ellipsoids its lengths are
- *  within 0.1 mm of the exact ones.
+ *  outward from there by a five-term binomial expansion.  On the earth's ellipsoids a solved line
+ * is within 0.1 mm of the exact one; a line whose vertex lies within a degree of a pole, or within
+ *  0.001 degrees of the equator, loses digits (up to some decimetres across the line).
  *  @{ */
 
 /**
@@ -68,9 +69,13 @@ TW_API void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distan
  *
  * NEARLY ANTIPODAL POINTS ARE NOT SOLVED: where the iteration fails, the length is that along the
  * parallel for points on one parallel, and otherwise a times the sine of the spherical arc, which
- * is far too short; the status is #TW_SUCCESS all the same.  Points that are antipodal on a
- * meridian circle to 1e-14 radians are joined over the north pole.  A point within 1e-14 of a pole
- * is reached along the meridian of the other, with azimuths of 0 and pi.
+ * is far too short.  Whether the vertex lies ahead of a point is decided on the sphere: a long line
+ * that leaves a point within some tenths of a degree of due east or west can come out short by up
+ * to a thousandth of its length.  The status is #TW_SUCCESS all the same.
+ *
+ * Points that are antipodal on a meridian circle to 1e-14 radians are joined over the north pole. A
+ * point within 1e-14 of a pole is reached along the meridian of the other, with azimuths of 0 and
+ * pi.
  * @param start,end     the points; their heights are not read
  * @param a,e           ellipsoid; a sphere for e below 1e-12
  * @param azimuth       azimuth at start towards end, radians, 0 to 2 pi
