@@ -646,44 +646,567 @@ TW_API void TWconic_s(double e, double k0, double n, double G, double C0, double
                       CoordinateTriple* out, TWstatus* status);
 /** @} */
 
-/** @name State plane zones
+/** @name State plane zones (Claire 1968, C&GS Publication 62-4; Stem 1989, NOAA Manual NOS NGS 5)
+ *
+ *  Parameters of the zones of the State Plane Coordinate Systems, by zone number.  The projection
+ * of a zone is TWt_merc_f(), TWlam_f() or TWo_merc_f(), by its type.
  *  @{ */
 
+/**
+ * A zone of the 1927 system.  False values come out in metres, turned from US survey feet
+ * (1200/3937).
+ * @param zone_text               the zone number in the start of a text: blanks and a sign may
+ * stand before it, anything behind it
+ * @param type                    0 transverse Mercator, 1 Lambert with two parallels, -1 oblique
+ * Mercator
+ * @param lon0,lat0               origin, radians
+ * @param false_easting           metres
+ * @param false_northing          metres
+ * @param k0                      scale on the central line
+ * @param lat1,lat2               standard parallels, radians; written for type 1 alone
+ * @param lon_center,lat_center   centre of the oblique line, radians; written for type -1 alone
+ * @param azimuth                 of the oblique line, radians; written for type -1 alone
+ * @param status                  #TW_BAD_ZONE for a zone that is not in the list, or no number;
+ * nothing is written
+ */
+TW_API void TWspcs27(const char* zone_text, int16_t* type, double* lon0, double* lat0,
+                     double* false_easting, double* false_northing, double* k0, double* lat1,
+                     double* lat2, double* lon_center, double* lat_center, double* azimuth,
+                     TWstatus* status);
+
+/**
+ * A zone of the 1983 system.
+ * @param zone_text               the zone number in the start of a text: blanks and a sign may
+ * stand before it, anything behind it
+ * @param type                    0 transverse Mercator, 1 Lambert with two parallels, -1 oblique
+ * Mercator
+ * @param lon0,lat0               origin, radians
+ * @param false_easting           metres
+ * @param false_northing          metres
+ * @param k0                      scale on the central line
+ * @param lat1,lat2               standard parallels, radians; written for type 1 alone
+ * @param lon_center,lat_center   centre of the oblique line, radians; written for type -1 alone
+ * @param azimuth                 of the oblique line, radians; written for type -1 alone
+ * @param status                  #TW_BAD_ZONE for a zone that is not in the list, or no number;
+ * nothing is written
+ */
+TW_API void TWspcs83(const char* zone_text, int16_t* type, double* lon0, double* lat0,
+                     double* false_easting, double* false_northing, double* k0, double* lat1,
+                     double* lat2, double* lon_center, double* lat_center, double* azimuth,
+                     TWstatus* status);
 /** @} */
 
-/** @name Stereographic
+/** @name Stereographic projection of the ellipsoid (Snyder 1987, pp. 154-163)
+ *
+ *  Oblique through the conformal latitude where C is exactly 0, polar otherwise.  A point within
+ * 1e-12 of the origin in longitude and in latitude is the origin.  Differences of longitude are not
+ * wrapped.
  *  @{ */
 
+/**
+ * Constants (Snyder 1987, eq. 14-15, 3-1, 21-33).  An origin within 1e-14 of a pole is polar.
+ * @param e       first eccentricity
+ * @param lat0    latitude of origin, radians
+ * @param C       0 for an oblique origin; else the polar factor, negative at the south pole
+ * @param m0      radius of the parallel of origin; unwritten at a pole
+ * @param chi0    conformal latitude of origin; unwritten at a pole
+ * @param status  #TW_BAD_LATITUDE beyond a pole; C and m0 are written, chi0 is not
+ */
+TW_API void TWstereo_c(double e, double lat0, double* C, double* m0, double* chi0,
+                       TWstatus* status);
+
+/**
+ * Forward (Snyder 1987, eq. 21-24, 21-25, 21-27; polar 21-30, 21-33).
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param C,m0,chi0  constants of TWstereo_c()
+ * @param count      number of points
+ * @param in         longitude, latitude
+ * @param out        x, y; may be in
+ * @param status     #TW_BAD_LATITUDE beyond a pole: skip
+ */
+TW_API void TWstereo_f(double e, double lon0, double lat0, double C, double m0, double chi0,
+                       int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
+                       TWstatus* status);
+
+/**
+ * Inverse, to 1e-12 radians (Snyder 1987, eq. 20-14, 21-36 to 21-38; polar 7-9, 20-16).
+ *
+ * On the oblique road the longitude is a plain arctangent, so it NEVER LIES MORE THAN 90 DEGREES
+ * from lon0.  On the polar road of the south lon0 is negated at each point that is not the origin,
+ * so with a lon0 other than 0 the longitudes of points in an array ALTERNATE between right and
+ * shifted by twice lon0.  At the end every output within 2e-12 of a pole, skipped or not, gets lon0
+ * as it then stands.
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param C,m0,chi0  constants of TWstereo_c()
+ * @param count      number of points
+ * @param in         x, y
+ * @param out        longitude, latitude; may be in
+ * @param status     #TW_BAD_LATITUDE when no latitude was found (oblique), #TW_NOT_CONVERGED when
+ * ten passes were used (polar): skip
+ */
+TW_API void TWstereo_i(double e, double lon0, double lat0, double C, double m0, double chi0,
+                       int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
+                       TWstatus* status);
+
+/**
+ * Scale (Snyder 1987, eq. 21-26; polar 21-32).
+ * @param e          first eccentricity
+ * @param k0         scale at the origin
+ * @param lon0,lat0  origin
+ * @param C,m0,chi0  constants of TWstereo_c()
+ * @param count      number of points
+ * @param in         longitude, latitude
+ * @param out        (k, k, k k); may be in
+ * @param status     #TW_BAD_LATITUDE beyond a pole: skip
+ * @return           k of the last point worked on; k0 where that point failed, and for no points
+ */
+TW_API double TWstereo_s(double e, double k0, double lon0, double lat0, double C, double m0,
+                         double chi0, int32_t count, const CoordinateTriple* in,
+                         CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Scale at the origin that makes the scale true at a latitude.
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param C,m0,chi0  constants of TWstereo_c()
+ * @param lat_ts     latitude of true scale; for C = 0 the angular distance from lat0, not negative,
+ * laid off southwards in the northern hemisphere and northwards in the southern
+ * @param k0         the scale
+ * @param status     #TW_BAD_DATA for lat_ts beyond pi/2, or negative with C = 0; k0 unwritten.
+ *                   #TW_BAD_LATITUDE where the distance runs over a pole; k0 is then 1
+ */
+TW_API void TWstereo_latTs(double e, double lon0, double lat0, double C, double m0, double chi0,
+                           double lat_ts, double* k0, TWstatus* status);
+
+/**
+ * Latitude of true scale for a scale at the origin, by the secant method to 1e-9 radians.
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param C,m0,chi0  constants of TWstereo_c()
+ * @param k0         the scale, above 0 and at most 1
+ * @param lat_ts     latitude of true scale; for C = 0 the angular distance from lat0
+ * @param status     #TW_BAD_SCALE_LATITUDE for a k0 out of range; lat_ts unwritten. #TW_RANGE_ERROR
+ * when no latitude was found, otherwise the word of the last scale evaluated; lat_ts is written in
+ * both cases
+ */
+TW_API void TWstereo_sTlat(double e, double lon0, double lat0, double C, double m0, double chi0,
+                           double k0, double* lat_ts, TWstatus* status);
 /** @} */
 
 /** @name Double stereographic
+ *
+ *  The ellipsoid onto the Gauss sphere, the graticule of that turned to the origin as its pole, and
+ * the polar stereographic of the sphere.  The word of each call is that of the last stage that ran.
  *  @{ */
 
+/**
+ * Constants.
+ * @param e           first eccentricity
+ * @param lat0        latitude of origin, radians
+ * @param chi_g,c,t   constants of TWgaussII_c()
+ * @param C           constant of TWstereo_c() for the pole of a sphere: 2
+ * @param m0,chi0     left unwritten, as by TWstereo_c() at a pole
+ * @param status      word of the last stage; a failing TWgaussII_c() leaves C unwritten
+ */
+TW_API void TWstereo3_c(double e, double lat0, double* chi_g, double* c, double* t, double* C,
+                        double* m0, double* chi0, TWstatus* status);
+
+/**
+ * Forward.
+ * @param e           first eccentricity
+ * @param lon0        longitude of origin
+ * @param chi_g,c,t   constants of TWstereo3_c()
+ * @param C,m0,chi0   constants of TWstereo3_c()
+ * @param count       number of points
+ * @param in          longitude, latitude
+ * @param out         x, y; may be in
+ * @param status      word of the last stage; where one fails, out holds what that stage left
+ */
+TW_API void TWstereo3_f(double e, double lon0, double chi_g, double c, double t, double C,
+                        double m0, double chi0, int32_t count, const CoordinateTriple* in,
+                        CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Inverse.
+ * @param e           first eccentricity
+ * @param lon0        longitude of origin
+ * @param chi_g,c,t   constants of TWstereo3_c()
+ * @param C,m0,chi0   constants of TWstereo3_c()
+ * @param count       number of points
+ * @param in          x, y
+ * @param out         longitude, latitude; may be in
+ * @param status      word of the last stage; where one fails, out holds what that stage left
+ */
+TW_API void TWstereo3_i(double e, double lon0, double chi_g, double c, double t, double C,
+                        double m0, double chi0, int32_t count, const CoordinateTriple* in,
+                        CoordinateTriple* out, TWstatus* status);
 /** @} */
 
-/** @name Azimuthal equidistant
+/** @name Azimuthal equidistant projection of the ellipsoid (Snyder 1987, pp. 191-202)
+ *
+ *  By a series in the distance, good to centimetres some hundred kilometres from the origin; past a
+ *  quarter turn on the meridian of the origin the distance is the meridian arc.
  *  @{ */
 
+/**
+ * Constants.  This call has NO STATUS and never fails.
+ * @param e     first eccentricity
+ * @param lat0  latitude of origin, radians
+ * @param n1    radius of curvature in the prime vertical at the origin
+ * @param g     e sin(lat0) / sqrt(1 - e^2)
+ */
+TW_API void TWaz_eq_c(double e, double lat0, double* n1, double* g);
+
+/**
+ * Forward (Snyder 1987, eq. 25-19 to 25-25).  The difference of longitude is not wrapped.
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param n1,g       constants of TWaz_eq_c()
+ * @param count      number of points
+ * @param in         longitude, latitude
+ * @param out        x, y; may be in
+ * @param status     #TW_SUCCESS, or the word of the last meridian arc that was computed
+ */
+TW_API void TWaz_eq_f(double e, double lon0, double lat0, double n1, double g, int32_t count,
+                      const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Inverse (Snyder 1987, eq. 25-26 to 25-36).  The longitude is not wrapped.
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param n1         constant of TWaz_eq_c(); g is not needed
+ * @param count      number of points
+ * @param in         x, y
+ * @param out        longitude, latitude; may be in
+ * @param status     always #TW_SUCCESS
+ */
+TW_API void TWaz_eq_i(double e, double lon0, double lat0, double n1, int32_t count,
+                      const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Scale on the SPHERE (Snyder 1987, eq. 25-2); at an origin off the poles it is not a number.
+ * @param lon0,lat0  origin
+ * @param k0         central scale
+ * @param count      number of points
+ * @param in         longitude, latitude
+ * @param out        (k, k0, k k0); may be in
+ * @param status     #TW_BAD_LATITUDE beyond a pole: fill
+ */
+TW_API void TWaz_eq_s(double lon0, double lat0, double k0, int32_t count,
+                      const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 /** @} */
 
-/** @name Lambert azimuthal equal-area
+/** @name Lambert azimuthal equal-area projection (Snyder 1987, pp. 182-190)
+ *
+ *  Sphere for e exactly 0.  The input array and the count come FIRST in TWlam_az_eq_f(),
+ *  TWlam_az_eq_i() and TWlam_az_eq_s().
  *  @{ */
 
+/**
+ * Constants (Snyder 1987, eq. 3-11 to 3-13, 14-15, 24-20).
+ * @param e                  first eccentricity
+ * @param lon0               not read
+ * @param lat0               latitude of origin, radians
+ * @param e2,q1,qp,rq        e squared, q at the origin and at the pole, authalic radius; unwritten
+ * for a sphere
+ * @param m1,sin_b1,cos_b1   radius of the parallel and authalic latitude of the origin; unwritten
+ * for a sphere and for an origin within 1e-12 of a pole
+ * @param sin_lat0,cos_lat0  always written
+ * @param D                  unwritten as m1
+ * @param status             always #TW_SUCCESS
+ */
+TW_API void TWlam_az_eq_c(double e, double lon0, double lat0, double* e2, double* q1, double* qp,
+                          double* rq, double* m1, double* sin_b1, double* cos_b1, double* sin_lat0,
+                          double* cos_lat0, double* D, TWstatus* status);
+
+/**
+ * Forward (Snyder 1987, eq. 24-2, 24-17 to 24-27).  The difference of longitude is not wrapped; a
+ * point within 1e-7 of the antipode of the origin is moved 1e-7 off it.
+ * @param in                 longitude, latitude
+ * @param count              number of points
+ * @param e                  first eccentricity
+ * @param lon0,lat0          origin
+ * @param e2,q1,qp,rq,m1     constants of TWlam_az_eq_c(); e2, q1 and m1 are not read
+ * @param sin_b1,cos_b1      constants of TWlam_az_eq_c()
+ * @param sin_lat0,cos_lat0  constants of TWlam_az_eq_c()
+ * @param D                  constant of TWlam_az_eq_c()
+ * @param out                x, y; may be in
+ * @param status             #TW_NOT_CONVERGED for |q / qp| beyond 1 and 1e-12: stop;
+ *                           #TW_I_LATITUDE_LIMITED for a lesser excess, held at 1
+ */
+TW_API void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, double lon0,
+                          double lat0, double e2, double q1, double qp, double rq, double m1,
+                          double sin_b1, double cos_b1, double sin_lat0, double cos_lat0, double D,
+                          CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Inverse (Snyder 1987, eq. 20-14, 24-28 to 24-31, 3-16), to 1e-13 radians.  A longitude of exactly
+ * -pi becomes pi.
+ * @param in                 x, y
+ * @param count              number of points
+ * @param e                  first eccentricity
+ * @param lon0,lat0          origin
+ * @param e2,qp,rq           constants of TWlam_az_eq_c(); q1 and m1 are not in the list
+ * @param sin_b1,cos_b1      constants of TWlam_az_eq_c()
+ * @param sin_lat0,cos_lat0  constants of TWlam_az_eq_c()
+ * @param D                  constant of TWlam_az_eq_c()
+ * @param out                longitude, latitude; may be in
+ * @param status             #TW_NOT_CONVERGED outside the disc by more than 1e-12 (sphere) or
+ * 0.0005 (ellipsoid) of its radius, when 50 passes were used, or for a latitude beyond a pole:
+ * stop.  #TW_I_LATITUDE_LIMITED for a lesser excess, held at 1
+ */
+TW_API void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double lon0,
+                          double lat0, double e2, double qp, double rq, double sin_b1,
+                          double cos_b1, double sin_lat0, double cos_lat0, double D,
+                          CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Scale (Snyder 1987, eq. 24-2; polar 24-23a, 24-32).  At an origin off the poles it is that of the
+ * SPHERE, on the ellipsoid too.
+ * @param in                 longitude, latitude
+ * @param count              number of points
+ * @param lon0,lat0          origin
+ * @param e,e2,qp            first eccentricity, and constants of TWlam_az_eq_c()
+ * @param k0                 central scale
+ * @param sin_lat0,cos_lat0  constants of TWlam_az_eq_c()
+ * @param out                (k k0, k0 / k, k0 k0); may be in
+ * @param status             always #TW_SUCCESS
+ */
+TW_API void TWlam_az_eq_s(const CoordinateTriple* in, int32_t count, double lon0, double lat0,
+                          double e, double e2, double qp, double k0, double sin_lat0,
+                          double cos_lat0, CoordinateTriple* out, TWstatus* status);
 /** @} */
 
-/** @name Gnomonic
+/** @name Gnomonic projection of the sphere (Snyder 1987, pp. 164-168)
+ *
+ *  An origin within 5e-10 of a pole or of the equator takes the formula of that aspect.
  *  @{ */
 
+/**
+ * Cosine and sine of the latitude of origin.
+ * @param lat0      latitude of origin, radians; not tested
+ * @param cos_lat0  its cosine
+ * @param sin_lat0  its sine
+ * @param status    always #TW_SUCCESS
+ */
+TW_API void TWgnomon_c(double lat0, double* cos_lat0, double* sin_lat0, TWstatus* status);
+
+/**
+ * The fixed parameters of the projection: three zeros.
+ * @param value1,value2,value3  0
+ * @param status                always #TW_SUCCESS
+ */
+TW_API void TWgnomon_param(double* value1, double* value2, double* value3, TWstatus* status);
+
+/**
+ * Forward (Snyder 1987, eq. 22-4 to 22-11).  The OUTPUT ARRAY COMES BEFORE THE INPUT ARRAY.
+ * @param lon0,lat0          origin; the difference of longitude is not wrapped
+ * @param cos_lat0,sin_lat0  constants of TWgnomon_c()
+ * @param count              number of points
+ * @param out                x, y; may be in
+ * @param in                 longitude, latitude
+ * @param status             #TW_NOT_CONVERGED on or behind the horizon (the cosine of the distance
+ * from the origin is 1e-13 or less): stop
+ */
+TW_API void TWgnomon_f(double lon0, double lat0, double cos_lat0, double sin_lat0, int32_t count,
+                       CoordinateTriple* out, const CoordinateTriple* in, TWstatus* status);
+
+/**
+ * Inverse (Snyder 1987, eq. 20-14 to 20-17, 22-12).  Longitudes of exactly -pi and pi both stay.
+ * @param lon0,lat0          origin
+ * @param cos_lat0,sin_lat0  constants of TWgnomon_c()
+ * @param count              number of points
+ * @param in                 x, y
+ * @param out                longitude, latitude; may be in
+ * @param status             always #TW_SUCCESS
+ */
+TW_API void TWgnomon_i(double lon0, double lat0, double cos_lat0, double sin_lat0, int32_t count,
+                       const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Scale (Snyder 1987, eq. 22-2, 22-3): k = k0 / cos c across the ray from the origin and h = k /
+ * cos c along it.
+ * @param lon0               longitude of origin
+ * @param lat0               not read
+ * @param k0                 central scale
+ * @param cos_lat0,sin_lat0  constants of TWgnomon_c()
+ * @param count              number of points
+ * @param in                 longitude, latitude
+ * @param out                (k, h, k h); may be in
+ * @param status             #TW_I_LATITUDE_LIMITED on or behind the horizon: fill
+ */
+TW_API void TWgnomon_s(double lon0, double lat0, double k0, double cos_lat0, double sin_lat0,
+                       int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
+                       TWstatus* status);
 /** @} */
 
-/** @name Orthographic
+/** @name Orthographic projection of the ellipsoid (Snyder 1987, pp. 145-153)
+ *
+ *  The surface point as seen from straight above the origin, by way of geocentric space.  Heights
+ * are taken for 0.  The semi-major axis is part of the calls but drops out.
  *  @{ */
 
+/**
+ * Geocentric position of the origin, and the rotation to its local axes.
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin, radians
+ * @param x0,y0,z0   geocentric position, in units of the semi-major axis
+ * @param r          nine doubles, row by row: east, north, up
+ * @param status     always #TW_SUCCESS
+ */
+TW_API void TWortho_c(double e, double lon0, double lat0, double* x0, double* y0, double* z0,
+                      double* r, TWstatus* status);
+
+/**
+ * Forward.
+ * @param a          not read
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param x0,y0,z0   constants of TWortho_c()
+ * @param r          constant of TWortho_c()
+ * @param count      number of points
+ * @param in         longitude, latitude
+ * @param out        x, y; may be in
+ * @param status     #TW_I_LATITUDE_LIMITED for a point more than 90 degrees from the origin: STOP,
+ * although the word counts as good
+ */
+TW_API void TWortho_f(double a, double e, double lon0, double lat0, double x0, double y0, double z0,
+                      const double* r, int32_t count, const CoordinateTriple* in,
+                      CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Inverse, by iteration along the local vertical to 1e-9 radians.  An inner call sets the word
+ * anew, so a word of an earlier point does not outlast a later point that is computed.
+ * @param a          not read
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param x0,y0,z0   constants of TWortho_c()
+ * @param r          constant of TWortho_c()
+ * @param count      number of points
+ * @param in         x, y
+ * @param out        longitude, latitude; may be in
+ * @param status     #TW_I_LATITUDE_LIMITED for a point at or beyond sqrt(1 - e^2) from the origin:
+ * STOP, although the word counts as good; and when the passes were used up: the last values are
+ * written, the loop goes on
+ */
+TW_API void TWortho_i(double a, double e, double lon0, double lat0, double x0, double y0, double z0,
+                      const double* r, int32_t count, const CoordinateTriple* in,
+                      CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Scale on the SPHERE (Snyder 1987, eq. 20-5): the cosine of the distance from the origin.
+ * Latitudes within 1e-10 of a pole are held as in TWmerc_s(), the south pole just past the NORTH
+ * pole.
+ * @param lon0,lat0  origin
+ * @param k0         not read
+ * @param count      number of points
+ * @param in         longitude, latitude
+ * @param out        (1, h, h); may be in
+ * @param status     #TW_BAD_LATITUDE beyond a pole: written with h of the PREVIOUS point (0 at the
+ * first)
+ */
+TW_API void TWortho_s(double lon0, double lat0, double k0, int32_t count,
+                      const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 /** @} */
 
-/** @name Vertical and tilted perspective
+/** @name Vertical and tilted perspective (Snyder 1987, pp. 169-181)
+ *
+ *  Sphere for e exactly 0.  Heights are READ from element z of the input and COPIED to the output;
+ * h, h0 and the heights are in the unit of a, x and y in units of a.
  *  @{ */
 
+/**
+ * Constants (Snyder 1987, eq. 23-17, 23-18).
+ * @param a       semi-major axis
+ * @param e       first eccentricity
+ * @param lat0    latitude of origin, radians
+ * @param h       height of the point of perspective above the reference surface
+ * @param h0      height of the reference surface
+ * @param p       distance of the point of perspective from the centre, in units of a
+ * @param phi_g   geocentric latitude of the point of perspective
+ * @param status  #TW_BAD_PARAMETER when ten passes did not settle to 1e-12; the values are written
+ */
+TW_API void TWpersp_c(double a, double e, double lat0, double h, double h0, double* p,
+                      double* phi_g, TWstatus* status);
+
+/**
+ * Vertical perspective, forward (Snyder 1987, eq. 23-13 to 23-16; sphere 22-4, 22-5, 23-3).
+ * @param a          semi-major axis
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param h0         not read
+ * @param h          height of the point of perspective
+ * @param p,phi_g    constants of TWpersp_c()
+ * @param count      number of points
+ * @param in         longitude, latitude, height
+ * @param out        x, y, height; may be in
+ * @param status     #TW_NOT_CONVERGED beyond the horizon of a SPHERE: stop.  On the ellipsoid
+ * nothing fails, and what lies behind the horizon is projected as it comes
+ */
+TW_API void TWpersp_vert_f(double a, double e, double lon0, double lat0, double h0, double h,
+                           double p, double phi_g, int32_t count, const CoordinateTriple* in,
+                           CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Vertical perspective, inverse (Snyder 1987, eq. 23-19 to 23-30).
+ * @param a          semi-major axis
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param h0         not read
+ * @param h          height of the point of perspective
+ * @param p,phi_g    constants of TWpersp_c()
+ * @param count      number of points
+ * @param in         x, y, and the height to which the point belongs
+ * @param out        longitude, latitude, height; may be in
+ * @param status     #TW_I_LATITUDE_LIMITED when ten passes were used: written with the last values
+ */
+TW_API void TWpersp_vert_i(double a, double e, double lon0, double lat0, double h0, double h,
+                           double p, double phi_g, int32_t count, const CoordinateTriple* in,
+                           CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Tilted perspective, forward (Snyder 1987, eq. 23-7 to 23-12): the vertical one, tilted, then
+ * turned.
+ * @param a          semi-major axis
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param h0         not read
+ * @param h          height of the point of perspective
+ * @param p,phi_g    constants of TWpersp_c()
+ * @param tilt_a     turns the image in its plane before the tilt
+ * @param tilt_b     the tilt itself, which foreshortens
+ * @param rot        turns the image by rot LESS PI: half a turn at 0, nothing at pi and at -pi
+ * @param count      number of points
+ * @param in         longitude, latitude, height
+ * @param out        x, y, height; may be in
+ * @param status     as TWpersp_vert_f(), with the rest of the output then neither tilted nor turned
+ */
+TW_API void TWpersp_f(double a, double e, double lon0, double lat0, double h0, double h, double p,
+                      double phi_g, double tilt_a, double tilt_b, double rot, int32_t count,
+                      const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
+
+/**
+ * Tilted perspective, inverse.  The rotation is undone IN THE INPUT ARRAY, which this call CHANGES
+ * unless rot is pi or -pi.
+ * @param a          semi-major axis
+ * @param e          first eccentricity
+ * @param lon0,lat0  origin
+ * @param h0         not read
+ * @param h          height of the point of perspective
+ * @param p,phi_g    constants of TWpersp_c()
+ * @param tilt_a     as in TWpersp_f()
+ * @param tilt_b     as in TWpersp_f()
+ * @param rot        as in TWpersp_f()
+ * @param count      number of points
+ * @param in         x, y, and the height to which the point belongs; CHANGED by the call
+ * @param out        longitude, latitude, height; may be in
+ * @param status     as TWpersp_vert_i()
+ */
+TW_API void TWpersp_i(double a, double e, double lon0, double lat0, double h0, double h, double p,
+                      double phi_g, double tilt_a, double tilt_b, double rot, int32_t count,
+                      CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 /** @} */
 
 /** @name Polyconic (Snyder 1987, pp. 124-131)

@@ -1,0 +1,80 @@
+// Direct and inverse problem of the rhumb line, the straight line on the Mercator map.
+
+#include <cmath>
+
+#include "foundation/numeric.hpp"
+#include "tidewater/conformal.h"
+#include "tidewater/foundation.h"
+#include "tidewater/lines.h"
+
+using namespace tidewater;
+
+namespace {
+
+double parallel_radius(double a, double e, double lat) {
+  return std::cos(lat) * a / std::sqrt(1 - e * e * square(std::sin(lat)));
+}
+
+double into_full_turn(double azimuth) {
+  if (azimuth < -1e-12) azimuth += kTwoPi;
+  if (azimuth >= kTwoPi) azimuth -= kTwoPi;
+  return azimuth;
+}
+
+}  // namespace
+
+// Every inner call is given the caller's word, so that the word at the end is that of the last one;
+// what a failing call leaves unwritten is used as it stands.
+
+void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distance, double a, double e,
+                    CoordinateTriple* end, double* back_azimuth, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double lon1 = start.x;
+  const double lat1 = start.y;
+  if (azimuth != kHalfPi && azimuth != 4.71238898038469) {  // 3 pi / 2
+    double arc = 0;
+    TWmerid_dist_f(a, e, lat1, &arc, status);
+    TWmerid_dist_i(a, e, arc + std::cos(azimuth) * distance, &end->y, status);
+    double y1 = 0;
+    double y2 = 0;
+    TWmerc_c(e, end->y, &y2, status);
+    TWmerc_c(e, lat1, &y1, status);
+    end->x = lon1 + (y2 - y1) * std::tan(azimuth);
+  } else {
+    // Wanted: a positive distance goes east for azimuth 3 pi / 2 too.
+    end->x = lon1 + distance / parallel_radius(a, e, lat1);
+    end->y = lat1;
+  }
+  end->z = start.z;
+  double back = azimuth + kPi;
+  if (back > 6.283185307179585) back -= kTwoPi;
+  *back_azimuth = back;
+}
+
+void TWrhmbline_inv(CoordinateTriple start, CoordinateTriple end, double a, double e,
+                    double* azimuth, double* back_azimuth, double* distance, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double lat1 = start.y;
+  const double lat2 = end.y;
+  double forward = 0;
+  double length = 0;
+  if (lat2 != lat1) {
+    double y1 = 0;
+    double y2 = 0;
+    TWmerc_c(e, lat2, &y2, status);
+    TWmerc_c(e, lat1, &y1, status);
+    // Wanted: the longitude difference as it stands, not the short way round.
+    forward = std::atan2(end.x - start.x, y2 - y1);
+    double m1 = 0;
+    double m2 = 0;
+    TWmerid_dist_f(a, e, lat2, &m2, status);
+    TWmerid_dist_f(a, e, lat1, &m1, status);
+    length = (m2 - m1) / std::cos(forward);
+  } else {
+    forward = end.x <= start.x ? 3 * kHalfPi : kHalfPi;
+    length = parallel_radius(a, e, lat1) * (end.x - start.x);
+  }
+  *distance = std::fabs(length);
+  *back_azimuth = into_full_turn(forward + kPi);
+  *azimuth = into_full_turn(forward);
+}

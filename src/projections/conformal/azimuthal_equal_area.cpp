@@ -1,0 +1,243 @@
+// Lambert azimuthal equal-area projection of the sphere and the ellipsoid.
+
+#include <cmath>
+
+#include "foundation/numeric.hpp"
+#include "projections/authalic.hpp"
+#include "projections/parallel_radius.hpp"
+#include "tidewater/conformal.h"
+
+using namespace tidewater;
+
+namespace {
+
+// Nearer than this to a pole or to the equator, an origin takes the polar or equatorial road.
+constexpr double kAspectMargin = 1e-12;
+// How far the sine of an authalic latitude may stand beyond 1 and still be held there.
+constexpr double kTightLimit = 1.000000000001;
+// Wanted: looser in the inverse on the ellipsoid.
+constexpr double kLooseLimit = 1.0005;
+
+bool is_polar(double lat0) { return std::fabs(std::fabs(lat0) - kHalfPi) < kAspectMargin; }
+
+// Holds a sine at 1 or -1.  False, with the word, when it lies beyond the limit.
+bool hold_sine(double limit, double& u, TWstatus* status) {
+  if (std::fabs(u) > limit) {
+    *status = TW_NOT_CONVERGED;
+    return false;
+  }
+  if (std::fabs(u) > 1) {
+    u = std::copysign(1.0, u);
+    *status = TW_I_LATITUDE_LIMITED;
+  }
+  return true;
+}
+
+// Moves a point off the antipode of the origin, where the projection has no value.
+void leave_antipode(bool polar, double lat0, double& lat, double& d) {
+  constexpr double kStep = 1e-7;
+  if (!(std::fabs(lat + lat0) < kStep)) return;
+  if (polar) {
+    lat += lat <= 0 ? kStep : -kStep;
+  } else if (std::fabs(std::fabs(d) - kPi) < kStep) {
+    const bool inside = kPi - std::fabs(d) >= 0;
+    d += (d <= 0) == inside ? kStep : -kStep;
+  }
+}
+
+// The geodetic latitude of an authalic q, by Newton's rule (Snyder 1987, eq. 3-16).  False when the
+// passes were used up.
+bool latitude_of_q(double e, double e2, double q, double& lat) {
+  constexpr int kMostPasses = 50;
+  double difference = 1;
+  int passes = 0;
+  while (!(difference <= 1e-13)) {
+    if (++passes == kMostPasses) return false;
+    const double s = std::sin(lat);
+    const double es = e * s;
+    const double w = 1 - e2 * (s * s);
+    const double t = std::log((1 - es) / (1 + es)) / (2 * e) + q / (1 - e2) - s / w;
+    const double next = t * (w * w) / (2 * std::cos(lat)) + lat;
+    difference = std::fabs(next - lat);
+    lat = next;
+  }
+  return true;
+}
+
+}  // namespace
+
+void TWlam_az_eq_c(double e, double /*lon0*/, double lat0, double* e2, double* q1, double* qp,
+                   double* rq, double* m1, double* sin_b1, double* cos_b1, double* sin_lat0,
+                   double* cos_lat0, double* D, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const double sin_0 = std::sin(lat0);
+  const double cos_0 = std::cos(lat0);
+  *sin_lat0 = sin_0;
+  *cos_lat0 = cos_0;
+  if (e == 0) return;
+  const double q_origin = authalic_q(e, sin_0);
+  const double q_pole = authalic_q(e, 1);
+  const double radius = std::sqrt(q_pole / 2);
+  *e2 = e * e;
+  *q1 = q_origin;
+  *qp = q_pole;
+  *rq = radius;
+  if (is_polar(lat0)) return;
+  const double m_origin = parallel_radius(e * e, sin_0, cos_0);
+  const double b1 = std::asin(q_origin / q_pole);
+  const double cos_b = std::cos(b1);
+  *m1 = m_origin;
+  *sin_b1 = std::sin(b1);
+  *cos_b1 = cos_b;
+  *D = m_origin / (cos_b * radius);
+}
+
+void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, double lon0, double lat0,
+                   double /*e2*/, double /*q1*/, double qp, double rq, double /*m1*/, double sin_b1,
+                   double cos_b1, double sin_lat0, double cos_lat0, double D, CoordinateTriple* out,
+                   TWstatus* status) {
+  *status = TW_SUCCESS;
+  const bool sphere = e == 0;
+  const bool polar = is_polar(lat0);
+  const bool equatorial = std::fabs(lat0) < kAspectMargin;
+  for (int32_t i = 0; i < count; ++i) {
+    double d = in[i].x - lon0;
+    double lat = in[i].y;
+    leave_antipode(polar, lat0, lat, d);
+    const double sin_d = std::sin(d);
+    const double cos_d = std::cos(d);
+
+    if (polar) {
+      double r = 0;
+      if (sphere) {
+        const double w = kQuarterPi - lat / 2;
+        r = 2 * (lat0 >= 0 ? std::sin(w) : std::cos(w));
+      } else {
+        const double q = authalic_q(e, std::sin(lat));
+        r = std::sqrt(lat0 >= 0 ? qp - q : qp + q);
+      }
+      out[i].x = r * sin_d;
+      out[i].y = lat0 >= 0 ? -r * cos_d : r * cos_d;
+      continue;
+    }
+
+    // Sine and cosine of the latitude on the sphere: the authalic one on the ellipsoid.
+    double s = std::sin(lat);
+    double c = 0;
+    if (sphere) {
+      c = std::cos(lat);
+    } else {
+      s = authalic_q(e, s) / qp;
+      if (!hold_sine(kTightLimit, s, status)) return;
+      c = std::sqrt((1 - s) * (1 + s));
+    }
+    if (equatorial) {
+      const double b = std::sqrt(2 / (c * cos_d + 1));
+      out[i].x = b * c * sin_d;
+      out[i].y = sphere ? b * s : rq * rq * b * s;
+    } else if (sphere) {
+      const double b = std::sqrt(2 / (c * cos_lat0 * cos_d + sin_lat0 * s + 1));
+      out[i].x = b * c * sin_d;
+      out[i].y = (cos_lat0 * s - c * sin_lat0 * cos_d) * b;
+    } else {
+      const double b = std::sqrt(2 / (c * cos_b1 * cos_d + s * sin_b1 + 1)) * rq;
+      out[i].x = c * D * sin_d * b;
+      out[i].y = (s * cos_b1 - c * cos_d * sin_b1) * b / D;
+    }
+  }
+}
+
+void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double lon0, double lat0,
+                   double e2, double qp, double rq, double sin_b1, double cos_b1, double sin_lat0,
+                   double cos_lat0, double D, CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  constexpr double kLatLimit = 1.5707963267958966;  // pi/2 and 1e-12
+  const bool sphere = e == 0;
+  const bool polar = is_polar(lat0);
+  for (int32_t i = 0; i < count; ++i) {
+    const double x = in[i].x;
+    const double y = in[i].y;
+    double lon = lon0;
+    double lat = lat0;
+    if (sphere) {
+      const double rho = std::sqrt(x * x + y * y);
+      if (rho != 0) {
+        double u = rho / 2;
+        if (!hold_sine(kTightLimit, u, status)) return;
+        const double c = 2 * std::asin(u);
+        const double sin_c = std::sin(c);
+        const double cos_c = std::cos(c);
+        if (polar) {
+          lon = std::atan2(x, lat0 < 0 ? y : -y) + lon0;
+        } else {
+          lon = std::atan2(x * sin_c, cos_lat0 * cos_c * rho - sin_lat0 * sin_c * y) + lon0;
+        }
+        lat = std::asin(cos_lat0 * sin_c * y / rho + sin_lat0 * cos_c);
+      }
+    } else {
+      double q = 0;
+      if (polar) {
+        const double rho = std::sqrt(x * x + y * y);
+        q = std::fabs(qp - rho * rho);
+        if (lat0 < 0) q = -q;
+        lon = std::atan2(x, lat0 < 0 ? y : -y) + lon0;
+      } else {
+        const double rho = std::sqrt(square(x / D) + square(D * y));
+        if (rho == 0) {
+          q = sin_b1 * qp;
+        } else {
+          double u = rho / (2 * rq);
+          if (!hold_sine(kLooseLimit, u, status)) return;
+          const double ce = 2 * std::asin(u);
+          const double sin_ce = std::sin(ce);
+          const double cos_ce = std::cos(ce);
+          q = (D * sin_ce * cos_b1 * y / rho + cos_ce * sin_b1) * qp;
+          lon = std::atan2(x * sin_ce, D * cos_ce * cos_b1 * rho - D * D * sin_ce * sin_b1 * y) +
+                lon0;
+        }
+      }
+      double u = q / 2;
+      if (!hold_sine(kLooseLimit, u, status)) return;
+      lat = std::asin(u);
+      if (!latitude_of_q(e, e2, q, lat)) {
+        *status = TW_NOT_CONVERGED;
+        return;
+      }
+    }
+    if (lat < -kLatLimit || lat > kLatLimit) {
+      *status = TW_NOT_CONVERGED;
+      return;
+    }
+    out[i].x = wrap_above_then_at_or_below(lon);
+    out[i].y = lat;
+  }
+}
+
+void TWlam_az_eq_s(const CoordinateTriple* in, int32_t count, double lon0, double lat0, double e,
+                   double e2, double qp, double k0, double sin_lat0, double cos_lat0,
+                   CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const bool sphere = e == 0;
+  const bool polar = is_polar(lat0);
+  const bool equatorial = std::fabs(lat0) < kAspectMargin;
+  for (int32_t i = 0; i < count; ++i) {
+    const double d = in[i].x - lon0;
+    const double lat = in[i].y;
+    double k = 0;
+    if (!polar) {
+      // Wanted: the form of the sphere, also on the ellipsoid.
+      k = equatorial ? std::sqrt(2 / (std::cos(lat) * std::cos(d) + 1))
+                     : std::sqrt(2 / (cos_lat0 * std::cos(d) * std::cos(lat) +
+                                      sin_lat0 * std::sin(lat) + 1));
+    } else if (sphere) {
+      const double w = kQuarterPi - lat / 2;
+      k = 1 / (lat0 >= 0 ? std::cos(w) : std::sin(w));
+    } else {
+      const double s = std::sin(lat);
+      const double q = authalic_q(e, s);
+      k = std::sqrt(lat0 >= 0 ? qp - q : q + qp) / parallel_radius(e2, s, std::cos(lat));
+    }
+    const double h = 1 / k;
+    out[i] = {k * k0, h * k0, h * k * k0 * k0};
+  }
+}
