@@ -554,7 +554,8 @@ TW_API void TWalbers_f(double e, double lon0, double n, double C, double rho0, i
  * @param out     longitude, latitude
  * @param status  #TW_NOT_CONVERGED for a point outside the cone's fan or beyond its poles: stop;
  *                #TW_I_LATITUDE_LIMITED for a latitude held at a pole, or one that took all 30
- *                steps, both written
+ *                steps, both written; on the ellipsoid a point a hair beyond the SOUTH pole comes
+ *                out at the north pole with this word
  */
 TW_API void TWalbers_i(double e, double lon0, double n, double C, double rho0, int32_t count,
                        const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);

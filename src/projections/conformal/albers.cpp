@@ -95,6 +95,8 @@ class AuthalicInverse {
     }
   }
 
+  // Wanted: after a step without bound, as the vanishing cosine of either pole makes it, the north
+  // pole is within the tolerance and is looked at first.
   bool held_near_pole() {
     const double tolerance = std::max(1.5 * std::fabs(delta_), 4e-05);
     if (std::fabs(lat_ - kHalfPi) < tolerance) {
