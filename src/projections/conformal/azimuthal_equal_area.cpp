@@ -4,6 +4,7 @@
 
 #include "foundation/numeric.hpp"
 #include "projections/authalic.hpp"
+#include "projections/isometric_latitude.hpp"
 #include "projections/parallel_radius.hpp"
 #include "tidewater/conformal.h"
 
@@ -45,24 +46,74 @@ void leave_antipode(bool polar, double lat0, double& lat, double& d) {
   }
 }
 
-// The geodetic latitude of an authalic q, by Newton's rule (Snyder 1987, eq. 3-16).  False when the
-// passes were used up.
-bool latitude_of_q(double e, double e2, double q, double& lat) {
-  constexpr int kMostPasses = 50;
-  double difference = 1;
-  int passes = 0;
-  while (!(difference <= 1e-13)) {
-    if (++passes == kMostPasses) return false;
-    const double s = std::sin(lat);
-    const double es = e * s;
-    const double w = 1 - e2 * (s * s);
-    const double t = std::log((1 - es) / (1 + es)) / (2 * e) + q / (1 - e2) - s / w;
-    const double next = t * (w * w) / (2 * std::cos(lat)) + lat;
-    difference = std::fabs(next - lat);
-    lat = next;
+// From q back to the geodetic latitude, by Newton's rule (Snyder 1987, eq. 3-16).
+class LatitudeOfQ {
+ public:
+  LatitudeOfQ(double e, double e2, double qp)
+      : e_(e), e2_(e2), qp_(qp), series_(std::fabs(e) <= kSeriesEccentricity) {
+    const double e4 = e2 * e2;
+    const double e6 = e4 * e2;
+    p2_ = e2 / 3 + 31 * e4 / 180 + 517 * e6 / 5040;
+    p4_ = 23 * e4 / 360 + 251 * e6 / 3780;
+    p6_ = 761 * e6 / 45360;
   }
-  return true;
-}
+
+  // u is half of q, held at 1.  False when the passes were used up.
+  bool find(double q, double u, double& lat) const {
+    constexpr int kMostPasses = 50;
+    double tolerance = 1e-13;
+    lat = std::asin(u);
+    if (series_) {
+      const double sin_beta = q / qp_;
+      // Beyond the pole by more than rounding there is no root, and the passes would be used up.
+      if (std::fabs(sin_beta) > kTightLimit) return false;
+      if (std::fabs(sin_beta) >= 1) {
+        lat = std::copysign(kHalfPi, sin_beta);
+        return true;
+      }
+      lat = near(sin_beta);
+      // So near to the root, what a pass leaves is of the order of the square of its step.
+      tolerance = 1e-8;
+    }
+    double difference = 1;
+    int passes = 0;
+    while (!(difference <= tolerance)) {
+      if (++passes == kMostPasses) return false;
+      const double step = correction(q, lat);
+      difference = std::fabs(step);
+      lat += step;
+    }
+    return true;
+  }
+
+ private:
+  // By the authalic latitude beta to 1e-9 (Snyder 1987, eq. 3-18).
+  double near(double sin_beta) const {
+    const double cos_beta = std::sqrt((1 - sin_beta) * (1 + sin_beta));
+    const double s2 = 2 * sin_beta * cos_beta;
+    const double c2 = 1 - 2 * sin_beta * sin_beta;
+    // sin 4b = 2 s2 c2, sin 6b = s2 (4 c2^2 - 1)
+    return std::asin(sin_beta) + s2 * (p2_ + 2 * c2 * p4_ + (4 * c2 * c2 - 1) * p6_);
+  }
+
+  // (q - q(lat)) w^2 / (2 (1 - e^2) cos lat), with both q taken off that of the nearer pole: so the
+  // difference keeps its digits where q hardly changes any more.
+  double correction(double q, double lat) const {
+    const double side = lat < 0 ? -1 : 1;
+    const double s = side * std::sin(lat);
+    const double c = std::cos(lat);
+    const double w = 1 - e2_ * (s * s);
+    const double u = c * c / (1 + s);  // 1 - sin
+    const double from_pole =
+        u * (1 + e2_ * s) / (w * (1 - e2_)) + std::atanh(e_ * u / (1 - e2_ * s)) / e_;
+    const double t = side * ((side * q - qp_) / (1 - e2_) + from_pole);
+    return t * (w * w) / (2 * c);
+  }
+
+  double e_, e2_, qp_;
+  bool series_;
+  double p2_ = 0, p4_ = 0, p6_ = 0;
+};
 
 }  // namespace
 
@@ -154,6 +205,7 @@ void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double l
   constexpr double kLatLimit = 1.5707963267958966;  // pi/2 and 1e-12
   const bool sphere = e == 0;
   const bool polar = is_polar(lat0);
+  const LatitudeOfQ latitude_of(e, e2, qp);
   for (int32_t i = 0; i < count; ++i) {
     const double x = in[i].x;
     const double y = in[i].y;
@@ -198,8 +250,7 @@ void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double l
       }
       double u = q / 2;
       if (!hold_sine(kLooseLimit, u, status)) return;
-      lat = std::asin(u);
-      if (!latitude_of_q(e, e2, q, lat)) {
+      if (!latitude_of.find(q, u, lat)) {
         *status = TW_NOT_CONVERGED;
         return;
       }

@@ -101,6 +101,19 @@ void polar_forward(double e, double lon0, double lat0, double C, int32_t count,
   }
 }
 
+// The latitude of a conformal latitude that is given by its sine.  False where TWconflat_geod
+// refuses it: not a number, or its passes used up.
+bool latitude_of_conformal(double e, double sin_chi, double& lat) {
+  if (std::fabs(e) <= kSeriesEccentricity) {
+    // The passes are never used up there.  The root is tan(pi/4 - chi/2).
+    lat = latitude_at_rest(e, std::sqrt((1 - sin_chi) / (1 + sin_chi)));
+    return !std::isnan(lat);
+  }
+  TWstatus word = TW_SUCCESS;
+  TWconflat_geod(e, std::asin(sin_chi), &lat, &word);
+  return word == TW_SUCCESS;
+}
+
 void oblique_inverse(double e, double lon0, double lat0, double m0, double chi0, int32_t count,
                      const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   const double sin_chi0 = std::sin(chi0);
@@ -117,11 +130,8 @@ void oblique_inverse(double e, double lon0, double lat0, double m0, double chi0,
     const double ce = 2 * std::atan(rho * cos_chi0 / (2 * m0));
     const double sin_ce = std::sin(ce);
     const double cos_ce = std::cos(ce);
-    const double chi = std::asin(sin_ce * y * cos_chi0 / rho + cos_ce * sin_chi0);
     double lat = 0;
-    TWstatus word = TW_SUCCESS;
-    TWconflat_geod(e, chi, &lat, &word);
-    if (word != TW_SUCCESS) {
+    if (!latitude_of_conformal(e, sin_ce * y * cos_chi0 / rho + cos_ce * sin_chi0, lat)) {
       *status = TW_BAD_LATITUDE;
       continue;
     }
@@ -132,10 +142,29 @@ void oblique_inverse(double e, double lon0, double lat0, double m0, double chi0,
   }
 }
 
+// The latitude p with t(p) = w, by at most ten passes.  False when they were used up.
+bool latitude_of_tangent(double e, double w, double& lat) {
+  if (std::fabs(e) <= kSeriesEccentricity) {
+    // Six passes are enough there: what they come to rest at is found directly.
+    lat = latitude_at_rest(e, w);
+    return !std::isnan(lat);
+  }
+  constexpr int kMostPasses = 10;
+  lat = kHalfPi - 2 * std::atan(w);
+  double previous = 0;
+  int passes = 0;
+  do {
+    previous = lat;
+    lat = next_latitude(e, w, previous);
+    ++passes;
+  } while (!(std::fabs(lat - previous) <= kEpsilon) && passes < kMostPasses);
+  // Wanted: the count alone decides, also when the last pass did converge.
+  return passes < kMostPasses;
+}
+
 // Returns lon0 as the loop leaves it.
 double polar_inverse(double e, double lon0, double lat0, double C, int32_t count,
                      const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  constexpr int kMostPasses = 10;
   for (int32_t i = 0; i < count; ++i) {
     double x = in[i].x;
     double y = in[i].y;
@@ -153,16 +182,8 @@ double polar_inverse(double e, double lon0, double lat0, double C, int32_t count
       y = -y;
     }
     const double w = rho / std::fabs(C);
-    double lat = kHalfPi - 2 * std::atan(w);
-    double previous = 0;
-    int passes = 0;
-    do {
-      previous = lat;
-      lat = next_latitude(e, w, previous);
-      ++passes;
-    } while (!(std::fabs(lat - previous) <= kEpsilon) && passes < kMostPasses);
-    // Wanted: the count alone decides, also when the last pass did converge.
-    if (passes == kMostPasses) {
+    double lat = 0;
+    if (!latitude_of_tangent(e, w, lat)) {
       *status = TW_NOT_CONVERGED;
       continue;
     }
