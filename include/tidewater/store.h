@@ -38,6 +38,9 @@ typedef uint32_t TWstoreword;
 #define TW_STORE_SUCCESS UINT32_C(0x09608009)      /**< The operation worked, the row was found. */
 #define TW_STORE_END_OF_TABLE UINT32_C(0x0960801B) /**< No further row; the low bit is set. */
 
+/** Longest packed row, in bytes: no store gives more, and the library's buffers hold as much. */
+#define TW_STORE_ROW_LIMIT 512
+
 /**
  * Opens a store and makes it the current one.
  * @param path  the store's file, as the caller of the library gave it
@@ -58,7 +61,8 @@ TW_STORE_API TWstoreword OLB7R3_PF_reset_table(const char* table);
 TW_STORE_API TWstoreword OLB7R3_PF_define_table_search(const char* table, const char* column);
 
 /**
- * Copies the next row of a walk and moves on.
+ * Copies the next row of a walk and moves on.  After OLB7R3_PF_reset_table() alone the walk has the
+ * natural order.
  * @param table  name
  * @param row    buffer as long as the table's packed rows
  */

@@ -1,0 +1,193 @@
+#include "checker.hpp"
+
+#include <algorithm>
+#include <array>
+
+#include "tidewater/store.h"
+
+namespace tabdll {
+
+namespace {
+
+// A field that the library reads.  Fields without a column are read by their place alone and may
+// have any name.
+struct Expected {
+  const char* column;
+  FieldType type;
+  int64_t offset;
+  int64_t size;
+  const char* names = nullptr;  // the kind of table that the text names
+};
+
+struct ExpectedTable {
+  const char* name;
+  std::size_t row_size;  // 0: any that holds the fields
+  std::vector<Expected> fields;
+};
+
+constexpr FieldType kText = FieldType::kText;
+constexpr FieldType kInt16 = FieldType::kInt16;
+constexpr FieldType kInt32 = FieldType::kInt32;
+constexpr FieldType kFloat64 = FieldType::kFloat64;
+
+const std::vector<ExpectedTable>& library_tables() {
+  static const std::vector<ExpectedTable> tables = {
+      {"system",
+       68,
+       {{"cs_class", kText, 0, 16},
+        {"cs_name", kText, 16, 41},
+        {"cs_num", kInt16, 58, 2},
+        {nullptr, kInt16, 60, 2},
+        {nullptr, kInt32, 64, 4}}},
+      {"dt_models",
+       68,
+       {{"dt_class", kText, 0, 16},
+        {"dt_name", kText, 16, 41},
+        {"dt_num", kInt16, 58, 2},
+        {nullptr, kInt16, 60, 2},
+        {nullptr, kInt32, 64, 4}}},
+      {"vert_datum", 48, {{"vert_datum_num", kInt32, 0, 4}, {"vert_datum_name", kText, 4, 44}}},
+      {"undul",
+       76,
+       {{"undul_class", kText, 0, 16},
+        {"undul_name", kText, 16, 41},
+        {nullptr, kText, 57, 17},
+        {"number", kInt16, 74, 2}}},
+      {"spcs27_tbl", 44, {{"zone_number", kInt16, 0, 2}, {"zone_name", kText, 2, 42}}},
+      {"spcs83_tbl", 44, {{"zone_number", kInt16, 0, 2}, {"zone_name", kText, 2, 42}}},
+      {"Satellites",
+       120,
+       {{"sat_name", kText, 0, 32},
+        {nullptr, kFloat64, 32, 8},
+        {nullptr, kFloat64, 40, 8},
+        {nullptr, kFloat64, 48, 8},
+        {nullptr, kFloat64, 56, 8},
+        {nullptr, kFloat64, 64, 8},
+        {nullptr, kFloat64, 72, 8},
+        {nullptr, kFloat64, 80, 8},
+        {nullptr, kFloat64, 88, 8},
+        {nullptr, kInt32, 96, 4},
+        {nullptr, kInt16, 100, 2},
+        {nullptr, kInt16, 102, 2},
+        {nullptr, kInt16, 104, 2},
+        {"id", kInt16, 106, 2}}},
+      {"mre models",
+       144,
+       {{"model name", kText, 0, 44},
+        {"num", kInt32, 44, 4},
+        {nullptr, kText, 74, 21, "regression terms"},
+        {nullptr, kText, 95, 21, "regression terms"},
+        {nullptr, kText, 116, 21, "regression terms"}}},
+      {"Complex Models",
+       112,
+       {{"Model Name", kText, 0, 44},
+        {"Number", kInt32, 44, 4},
+        {nullptr, kText, 88, 24, "coefficients"}}},
+      {"magnetic models",
+       136,
+       {{"model name", kText, 0, 42},
+        {"model number", kInt16, 42, 2},
+        {nullptr, kText, 44, 28, "epochs"},
+        {nullptr, kFloat64, 72, 8},
+        {nullptr, kInt16, 80, 2},
+        {nullptr, kText, 82, 30},
+        {nullptr, kFloat64, 112, 8},
+        {nullptr, kFloat64, 120, 8},
+        {nullptr, kFloat64, 128, 8}}}};
+  return tables;
+}
+
+// The kinds of tables that rows name.
+const std::vector<ExpectedTable>& named_tables() {
+  static const std::vector<ExpectedTable> tables = {
+      {"regression terms",
+       16,
+       {{nullptr, kFloat64, 0, 8}, {nullptr, kInt16, 8, 2}, {nullptr, kInt16, 10, 2}}},
+      {"coefficients", 24, {{nullptr, kFloat64, 8, 8}, {nullptr, kFloat64, 16, 8}}},
+      {"epochs",
+       0,
+       {{"Epoch date", kFloat64, 0, 8},
+        {nullptr, kInt16, 8, 2},
+        {nullptr, kText, 10, 33, "coefficients"}}}};
+  return tables;
+}
+
+class Checker {
+ public:
+  explicit Checker(const TableStore& store) : store_(store) {}
+
+  std::vector<std::string> run() {
+    for (const ExpectedTable& table : library_tables()) check(table.name, table);
+    return std::move(faults_);
+  }
+
+ private:
+  void fault(const std::string& table, const std::string& what) {
+    faults_.push_back("table \"" + table + "\": " + what);
+  }
+
+  void check(const std::string& name, const ExpectedTable& expected) {
+    if (std::find(checked_.begin(), checked_.end(), name) != checked_.end()) return;
+    checked_.push_back(name);
+    const auto found = store_.tables().find(name);
+    if (found == store_.tables().end()) return fault(name, "missing");
+    const Layout& layout = found->second;
+    if (expected.row_size != 0 && layout.row_size() != expected.row_size) {
+      fault(name, "rows of " + std::to_string(layout.row_size()) + " bytes, expected " +
+                      std::to_string(expected.row_size));
+    }
+    bool fits = true;
+    for (const Expected& e : expected.fields) fits = check_field(name, layout, e) && fits;
+    if (fits) check_rows(name, expected);
+  }
+
+  bool check_field(const std::string& name, const Layout& layout, const Expected& e) {
+    const auto field = std::find_if(layout.fields.begin(), layout.fields.end(),
+                                    [&](const Field& f) { return f.offset == e.offset; });
+    const bool there = field != layout.fields.end() && field->type == e.type &&
+                       field->size == e.size && (!e.column || field->column == e.column);
+    if (!there) {
+      fault(name,
+            "no " + std::string(type_name(e.type)) + " of " + std::to_string(e.size) +
+                " bytes at byte " + std::to_string(e.offset) +
+                (e.column ? " with the column \"" + std::string(e.column) + "\"" : std::string()));
+    }
+    return there;
+  }
+
+  void check_rows(const std::string& name, const ExpectedTable& expected) {
+    Walk walk = store_.walk(name, nullptr);
+    std::array<char, TW_STORE_ROW_LIMIT> row;
+    for (int number = 1;; ++number) {
+      try {
+        if (!walk.next(row.data())) return;
+      } catch (const StoreError& e) {
+        fault(name, "row " + std::to_string(number) + ": " + e.what());
+        continue;
+      }
+      for (const Expected& e : expected.fields) {
+        if (e.names) check_named(name, number, row.data() + e.offset, e.names);
+      }
+    }
+  }
+
+  void check_named(const std::string& name, int number, const std::string& named,
+                   std::string_view kind) {
+    if (!store_.tables().contains(named)) {
+      return fault(name, "row " + std::to_string(number) + ": no table \"" + named + "\"");
+    }
+    const auto expected = std::find_if(named_tables().begin(), named_tables().end(),
+                                       [kind](const ExpectedTable& t) { return t.name == kind; });
+    check(named, *expected);
+  }
+
+  const TableStore& store_;
+  std::vector<std::string> checked_;
+  std::vector<std::string> faults_;
+};
+
+}  // namespace
+
+std::vector<std::string> faults_of(const TableStore& store) { return Checker(store).run(); }
+
+}  // namespace tabdll
