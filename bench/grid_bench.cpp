@@ -1,0 +1,119 @@
+// Shift grids and geoid on a track, whose points follow one another, and scattered at random. A
+// scattered point nearly always makes a new window be read from the files.
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <memory>
+#include <string>
+
+#include "harness.hpp"
+#include "tidewater/datum.h"
+
+using namespace tidewater::bench;
+namespace fs = std::filesystem;
+
+namespace {
+
+constexpr double kDegree = 3.14159265358979323846 / 180;
+
+// A line across the box, a few metres to hundreds of metres from point to point.
+std::vector<CoordinateTriple> track(double west, double south, double east, double north) {
+  std::vector<CoordinateTriple> points(kPoints);
+  for (int32_t i = 0; i < kPoints; ++i) {
+    const double t = static_cast<double>(i) / kPoints;
+    points[static_cast<std::size_t>(i)] = {(west + t * (east - west)) * kDegree,
+                                           (south + t * (north - south)) * kDegree, 100};
+  }
+  return points;
+}
+
+// The folder of real grids: $TIDEWATER_DATA, or shared/data beside the project.
+fs::path data() {
+  const char* named = std::getenv("TIDEWATER_DATA");
+  return named ? named : TIDEWATER_SHARED_DATA;
+}
+
+void add_nadcon() {
+  const auto control = std::make_shared<NadconControl>();
+  TWstatus status = 0;
+  TWnadcon_c((data() / "nadcon/").string().c_str(), control.get(), &status);
+  if (!TW_OK(status)) return;
+  for (const auto& [name, points] :
+       {std::pair{"track", track(-120, 30, -75, 45)}, {"scattered", box(-120, 30, -75, 45)}}) {
+    const auto forward = [control, points = points, out = points]() mutable {
+      TWstatus word = 0;
+      TWnadcon_f(kPoints, points.data(), control.get(), out.data(), &word);
+      keep(out.back().y);
+    };
+    add({std::string("NADCON forward, ") + name,
+         "PROJ",
+         forward,
+         proj_kernel("+proj=hgridshift +grids=conus", true, points),
+         {}});
+  }
+}
+
+// A grid that lies west of Greenwich, where ours and the peer's longitudes agree.
+void add_national() {
+  const fs::path folder = fs::temp_directory_path() / "tidewater-bench-ntf";
+  const fs::path grid = "/usr/share/proj/ntf_r93.gsb";
+  if (!fs::exists(grid)) return;
+  fs::create_directories(folder);
+  fs::copy_file(grid, folder / "ntf_r93.gsb", fs::copy_options::overwrite_existing);
+  std::ofstream(folder / "area.par") << "ntf_r93\n";
+  TWstatus status = 0;
+  TWcnt_c((folder.string() + "/").c_str(), 0, &status);
+  if (!TW_OK(status)) return;
+  for (const auto& [name, points] :
+       {std::pair{"track", track(-4.5, 43, -0.1, 50)}, {"scattered", box(-4.5, 43, -0.1, 50)}}) {
+    const char* definition = "+proj=hgridshift +grids=ntf_r93.gsb";
+    const auto forward = [points = points, out = points]() mutable {
+      TWstatus word = 0;
+      TWcnt_f(kPoints, points.data(), 0, out.data(), &word);
+      keep(out.back().y);
+    };
+    const auto inverse = [points = points, out = points]() mutable {
+      TWstatus word = 0;
+      TWcnt_i(kPoints, points.data(), 0, out.data(), &word);
+      keep(out.back().y);
+    };
+    add({std::string("NTv2 forward, ") + name,
+         "PROJ",
+         forward,
+         proj_kernel(definition, true, points),
+         {}});
+    add({std::string("NTv2 inverse, ") + name,
+         "PROJ",
+         inverse,
+         proj_kernel(definition, false, points),
+         {}});
+  }
+}
+
+void add_geoid() {
+  const auto control = std::make_shared<GeoidControl>();
+  TWstatus status = 0;
+  TWgeo90_c((data() / "geoid/").string().c_str(), control.get(), &status);
+  if (!TW_OK(status)) return;
+  for (const auto& [name, points] :
+       {std::pair{"track", track(-125, 25, -75, 50)}, {"scattered", box(-125, 25, -75, 50)}}) {
+    const auto forward = [control, points = points, out = points]() mutable {
+      TWstatus word = 0;
+      TWgeo90_f(kPoints, points.data(), control.get(), out.data(), &word);
+      keep(out.back().z);
+    };
+    add({std::string("Geoid height, ") + name,
+         "PROJ (bilinear)",
+         forward,
+         proj_kernel("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1", true, points),
+         {}});
+  }
+}
+
+const Suite suite([] {
+  add_nadcon();
+  add_national();
+  add_geoid();
+});
+
+}  // namespace

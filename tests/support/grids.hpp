@@ -1,0 +1,148 @@
+// Small grid files made up for the tests, byte by byte.
+#pragma once
+
+#include <algorithm>
+#include <bit>
+#include <cstdint>
+#include <functional>
+#include <string>
+#include <vector>
+
+namespace tidewater::test {
+
+inline void append_u32(std::string& bytes, std::uint32_t v) {
+  for (int shift = 0; shift < 32; shift += 8) bytes += static_cast<char>(v >> shift & 0xFF);
+}
+inline void append_i32(std::string& bytes, std::int32_t v) {
+  append_u32(bytes, static_cast<std::uint32_t>(v));
+}
+inline void append_f32(std::string& bytes, float v) {
+  append_u32(bytes, std::bit_cast<std::uint32_t>(v));
+}
+inline void append_f64(std::string& bytes, double v) {
+  const auto u = std::bit_cast<std::uint64_t>(v);
+  append_u32(bytes, static_cast<std::uint32_t>(u));
+  append_u32(bytes, static_cast<std::uint32_t>(u >> 32));
+}
+
+inline std::uint32_t u32_at(const std::string& bytes, std::size_t offset) {
+  std::uint32_t v = 0;
+  for (std::size_t k = 4; k-- > 0;) v = v << 8 | static_cast<unsigned char>(bytes.at(offset + k));
+  return v;
+}
+inline std::int32_t i32_at(const std::string& bytes, std::size_t offset) {
+  return static_cast<std::int32_t>(u32_at(bytes, offset));
+}
+inline float f32_at(const std::string& bytes, std::size_t offset) {
+  return std::bit_cast<float>(u32_at(bytes, offset));
+}
+inline double f64_at(const std::string& bytes, std::size_t offset) {
+  return std::bit_cast<double>(std::uint64_t{u32_at(bytes, offset + 4)} << 32 |
+                               u32_at(bytes, offset));
+}
+
+// A .las, .los or .geo file.
+struct GridFile {
+  float xmin, ymin;
+  std::int32_t nc, nr;
+  std::function<float(int row, int col)> value;
+  float dx = 1, dy = 1;
+  std::int32_t nz = 1;
+  float angle = 0;
+  float label = 7777;
+
+  // The header takes 96 bytes whatever the record's length: of fewer than 23 columns it covers the
+  // first records.
+  std::string bytes() const {
+    std::string header(64, 'T');
+    append_i32(header, nc);
+    append_i32(header, nr);
+    append_i32(header, nz);
+    for (const float f : {xmin, dx, ymin, dy, angle}) append_f32(header, f);
+    std::string all(4 * (static_cast<std::size_t>(nc) + 1), 'H');
+    for (int r = 0; r < nr; ++r) {
+      append_f32(all, label);
+      for (int c = 0; c < nc; ++c) append_f32(all, value(r, c));
+    }
+    all.resize(std::max(all.size(), header.size()));
+    return all.replace(0, header.size(), header);
+  }
+};
+
+// A sub-grid of a .gsb file: bounds and spacing in arc-seconds, longitudes positive west.
+struct SubGrid {
+  std::string name, parent;
+  double s_lat, n_lat, e_long, w_long, inc;
+  std::function<float(int row, int col)> lat, lon;
+  std::int32_t count_error = 0;
+  double long_inc = 0;  // 0: as inc
+
+  int rows() const { return static_cast<int>((n_lat - s_lat) / inc + 1.5); }
+  int cols() const {
+    return static_cast<int>((w_long - e_long) / (long_inc == 0 ? inc : long_inc) + 1.5);
+  }
+};
+
+struct GsbFile {
+  std::vector<SubGrid> grids;
+  std::string from = "OLD     ", to = "NEW     ";
+  std::int32_t num_orec = 11, num_srec = 11;
+  std::int32_t num_file = -1;  // -1: as many as there are
+  bool end_record = true;
+
+  static std::string key(const char* name) {
+    std::string k(name);
+    k.resize(8, ' ');
+    return k;
+  }
+  static void integer(std::string& all, const char* name, std::int32_t v) {
+    all += key(name);
+    append_i32(all, v);
+    append_i32(all, 0x55555555);
+  }
+  static void text(std::string& all, const char* name, std::string v) {
+    v.resize(8, ' ');
+    all += key(name) + v;
+  }
+  static void real(std::string& all, const char* name, double v) {
+    all += key(name);
+    append_f64(all, v);
+  }
+
+  std::string bytes() const {
+    std::string all;
+    integer(all, "NUM_OREC", num_orec);
+    integer(all, "NUM_SREC", num_srec);
+    integer(all, "NUM_FILE", num_file < 0 ? static_cast<std::int32_t>(grids.size()) : num_file);
+    text(all, "GS_TYPE", "SECONDS");
+    text(all, "VERSION", "NTv2.0");
+    text(all, "SYSTEM_F", from);
+    text(all, "SYSTEM_T", to);
+    for (const char* name : {"MAJOR_F", "MINOR_F", "MAJOR_T", "MINOR_T"}) real(all, name, 6378137);
+    for (const SubGrid& g : grids) {
+      text(all, "SUB_NAME", g.name);
+      text(all, "PARENT", g.parent);
+      text(all, "CREATED", "");
+      text(all, "UPDATED", "");
+      real(all, "S_LAT", g.s_lat);
+      real(all, "N_LAT", g.n_lat);
+      real(all, "E_LONG", g.e_long);
+      real(all, "W_LONG", g.w_long);
+      real(all, "LAT_INC", g.inc);
+      real(all, "LONG_INC", g.long_inc == 0 ? g.inc : g.long_inc);
+      integer(all, "GS_COUNT", g.rows() * g.cols() + g.count_error);
+      for (int r = 0; r < g.rows(); ++r) {
+        for (int c = 0; c < g.cols(); ++c) {
+          append_f32(all, g.lat(r, c));
+          append_f32(all, g.lon(r, c));
+          append_f32(all, -1);
+          append_f32(all, -1);
+        }
+      }
+    }
+    if (end_record) real(all, "END", 3.33e32);
+    return all;
+  }
+};
+
+}  // namespace tidewater::test
