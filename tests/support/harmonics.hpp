@@ -20,8 +20,9 @@ class Triangle {
     block_.assign(rows * (rows + 1) / 2, value);
     for (std::size_t n = 0; n < rows; ++n) rows_.push_back(block_.data() + n * (n + 1) / 2);
   }
-  Triangle(const Triangle&) = delete;
-  Triangle& operator=(const Triangle&) = delete;
+  // A move takes the block along, and the rows keep pointing into it.
+  Triangle(Triangle&&) = default;
+  Triangle& operator=(Triangle&&) = default;
 
   int32_t degree() const { return degree_; }
   double** rows() { return rows_.data(); }
