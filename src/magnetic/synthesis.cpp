@@ -2,6 +2,7 @@
 // then a sum over order.  No Legendre function is formed.
 
 #include <cmath>
+#include <cstring>
 #include <initializer_list>
 
 #include "foundation/numeric.hpp"
@@ -44,106 +45,124 @@ struct Argument {
   double q2;
 };
 
-// y and its derivative d by theta at the last degree done and at the one above it, for kOrders
-// orders.
-template <int kOrders>
+// Two neighbouring orders side by side; arithmetic goes element by element.
+using Pair = double __attribute__((vector_size(2 * sizeof(double))));
+
+template <class Value>
+Value load(const double* place) {
+  Value value;
+  std::memcpy(&value, place, sizeof value);
+  return value;
+}
+
+// The sum y and its derivative d by theta, at the last degree done and at the one above it.
+template <class Value>
 struct Chain {
-  double y[kOrders] = {};
-  double y_above[kOrders] = {};
-  double d[kOrders] = {};
-  double d_above[kOrders] = {};
+  Value y = {};
+  Value y_above = {};
+  Value d = {};
+  Value d_above = {};
+
+  void descend(Value a_cos, Value b_q2, Value term) {
+    const Value next = a_cos * y + b_q2 * y_above + term;
+    y_above = y;
+    y = next;
+  }
+
+  // Comes before descend(): it needs y of the degree above.
+  void descend_slope(Value a_cos, Value a_sin, Value b_q2) {
+    const Value next = a_cos * d + b_q2 * d_above - a_sin * y;
+    d_above = d;
+    d = next;
+  }
 };
 
-// The sums over degree of kOrders neighbouring orders, m and up.  One pass serves all terms, so
-// that constants and coefficients are read once, and the orders' chains overlap in the processor.
-template <Mode kMode, int kOrders>
-class DegreeSums {
- public:
-  DegreeSums(const Series& series, const Argument& at, int32_t m)
-      : series_(series), at_(at), m_(m) {
-    int32_t n = series.N;
-    for (; n >= m + kOrders - 1; --n) step<kOrders>(n);
-    for (; n >= m; --n) step<1>(n);  // the lowest degree, which the first order alone has
-  }
+Chain<double> lane(const Chain<Pair>& chain, int j) {
+  return {chain.y[j], chain.y_above[j], chain.d[j], chain.d_above[j]};
+}
 
-  void store(const Sums& sums) const {
-    for (int j = 0; j < kOrders; ++j) {
-      const int32_t m = m_ + j;
-      if constexpr (kMode == kGravity) sums.dC[m] = c_.y[j];
-      if constexpr (kSlope) sums.dC[m] = c_.d[j];
-      if constexpr (kSlope) sums.C[m] = c_.y[j];
-      // The recurrence is linear: that of the terms -S gives the negative of that of S.
-      if constexpr (kAlong) sums.lC[m] = -s_.y[j];
-      if constexpr (kOutward) sums.rC[m] = rc_.y[j];
-      if (m == 0) continue;  // a sine term has no order 0
-      if constexpr (kMode == kGravity) sums.dS[m] = s_.y[j];
-      if constexpr (kSlope) sums.dS[m] = s_.d[j];
-      if constexpr (kSlope) sums.S[m] = s_.y[j];
-      if constexpr (kAlong) sums.lS[m] = c_.y[j];
-      if constexpr (kOutward) sums.rS[m] = rs_.y[j];
-    }
-  }
-
- private:
+// The sums over degree of one order, or of a pair.  One pass serves all terms of a mode, so that
+// constants and coefficients are read once.
+template <Mode kMode, class Value>
+struct DegreeSums {
   static constexpr bool kSlope = kMode == kGradient || kMode == kAlongTheta;
   static constexpr bool kAlong = kMode == kGradient || kMode == kAlongLambda;
   static constexpr bool kOutward = kMode == kGradient || kMode == kRadial;
-  static constexpr bool kValue = kMode != kRadial;
 
-  // Takes the first kLanes orders down to degree n.
-  template <int kLanes>
-  void step(int32_t n) {
-    // Nothing stands above degree N, where y and d are zero.
-    static constexpr double kNone[kOrders] = {};
-    const double* a = n < series_.N ? series_.rec_a[n + 1] + m_ : kNone;
-    const double* b = n < series_.N - 1 ? series_.rec_b[n + 2] + m_ : kNone;
-    const double* C = series_.C[n] + m_;
-    const double* S = series_.S[n] + m_;
-    for (int j = 0; j < kLanes; ++j) {
-      const double a_cos = a[j] * at_.tcos;
-      const double a_sin = a[j] * at_.tsin;
-      const double b_q2 = b[j] * at_.q2;
-      if constexpr (kSlope) {
-        descend_slope(c_, j, a_cos, a_sin, b_q2);
-        descend_slope(s_, j, a_cos, a_sin, b_q2);
-      }
-      if constexpr (kValue) {
-        descend(c_, j, a_cos, b_q2, C[j]);
-        descend(s_, j, a_cos, b_q2, S[j]);
-      }
-      if constexpr (kOutward) {
-        descend(rc_, j, a_cos, b_q2, (n + 1.0) * C[j]);
-        descend(rs_, j, a_cos, b_q2, (n + 1.0) * S[j]);
-      }
+  // At the degree of the series, above which y and d are zero.
+  DegreeSums(const Series& series, int32_t m) {
+    const int32_t n = series.N;
+    c.y = load<Value>(series.C[n] + m);
+    s.y = load<Value>(series.S[n] + m);
+    radial_c.y = (n + 1.0) * c.y;
+    radial_s.y = (n + 1.0) * s.y;
+  }
+
+  // Goes down to degree n from n + 1.
+  void step(const Series& series, const Argument& at, int32_t m, int32_t n) {
+    static constexpr double kNone[2] = {};
+    const auto a = load<Value>(series.rec_a[n + 1] + m);
+    const auto b = load<Value>(n + 2 <= series.N ? series.rec_b[n + 2] + m : kNone);
+    const auto C = load<Value>(series.C[n] + m);
+    const auto S = load<Value>(series.S[n] + m);
+    const Value a_cos = a * at.tcos;
+    const Value a_sin = a * at.tsin;
+    const Value b_q2 = b * at.q2;
+    if constexpr (kSlope) {
+      c.descend_slope(a_cos, a_sin, b_q2);
+      s.descend_slope(a_cos, a_sin, b_q2);
+    }
+    if constexpr (kMode != kRadial) {
+      c.descend(a_cos, b_q2, C);
+      s.descend(a_cos, b_q2, S);
+    }
+    if constexpr (kOutward) {
+      radial_c.descend(a_cos, b_q2, (n + 1.0) * C);
+      radial_s.descend(a_cos, b_q2, (n + 1.0) * S);
     }
   }
 
-  using Chains = Chain<kOrders>;
+  // One order of a pair.
+  DegreeSums(const DegreeSums<kMode, Pair>& pair, int j)
+      : c(lane(pair.c, j)),
+        s(lane(pair.s, j)),
+        radial_c(lane(pair.radial_c, j)),
+        radial_s(lane(pair.radial_s, j)) {}
 
-  static void descend(Chains& chain, int j, double a_cos, double b_q2, double term) {
-    const double y = a_cos * chain.y[j] + b_q2 * chain.y_above[j] + term;
-    chain.y_above[j] = chain.y[j];
-    chain.y[j] = y;
-  }
-
-  // Before descend(): the derivative needs y of the degree above.
-  static void descend_slope(Chains& chain, int j, double a_cos, double a_sin, double b_q2) {
-    const double d = a_cos * chain.d[j] + b_q2 * chain.d_above[j] - a_sin * chain.y[j];
-    chain.d_above[j] = chain.d[j];
-    chain.d[j] = d;
-  }
-
-  Series series_;
-  Argument at_;
-  int32_t m_;
-  Chains c_, s_, rc_, rs_;
+  Chain<Value> c, s;                // of the terms C and S
+  Chain<Value> radial_c, radial_s;  // of the terms (n + 1) C and (n + 1) S
 };
 
 template <Mode kMode>
+void store(const DegreeSums<kMode, double>& of, int32_t m, const Sums& sums) {
+  using Wanted = DegreeSums<kMode, double>;
+  if constexpr (kMode == kGravity) sums.dC[m] = of.c.y;
+  if constexpr (Wanted::kSlope) sums.dC[m] = of.c.d;
+  if constexpr (Wanted::kSlope) sums.C[m] = of.c.y;
+  // The recurrence is linear: the terms -S give the negative of what S gives.
+  if constexpr (Wanted::kAlong) sums.lC[m] = -of.s.y;
+  if constexpr (Wanted::kOutward) sums.rC[m] = of.radial_c.y;
+  if (m == 0) return;  // a sine term has no order 0
+  if constexpr (kMode == kGravity) sums.dS[m] = of.s.y;
+  if constexpr (Wanted::kSlope) sums.dS[m] = of.s.d;
+  if constexpr (Wanted::kSlope) sums.S[m] = of.s.y;
+  if constexpr (Wanted::kAlong) sums.lS[m] = of.c.y;
+  if constexpr (Wanted::kOutward) sums.rS[m] = of.radial_s.y;
+}
+
+template <Mode kMode>
 void sum_degrees(const Series& series, const Argument& at, const Sums& sums) {
+  const int32_t N = series.N;
   int32_t m = 0;
-  for (; m < series.N; m += 2) DegreeSums<kMode, 2>(series, at, m).store(sums);
-  if (m == series.N) DegreeSums<kMode, 1>(series, at, m).store(sums);
+  for (; m < N; m += 2) {
+    DegreeSums<kMode, Pair> both(series, m);
+    for (int32_t n = N - 1; n > m; --n) both.step(series, at, m, n);
+    store(DegreeSums<kMode, double>(both, 1), m + 1, sums);
+    DegreeSums<kMode, double> first(both, 0);
+    first.step(series, at, m, m);  // the degree that only the first order of the pair has
+    store(first, m, sums);
+  }
+  if (m == N) store(DegreeSums<kMode, double>(series, m), m, sums);
 }
 
 // Cosines and sines of the multiples of a longitude, in the two places of each row of rec_b that
