@@ -5,6 +5,7 @@
 #ifndef TIDEWATER_DATUM_H
 #define TIDEWATER_DATUM_H
 
+#include "tidewater/catalogue.h"
 #include "tidewater/frame.h"
 
 #ifdef __cplusplus
@@ -284,14 +285,6 @@ TW_API void TWconform2_i(double x0, double y0, double sx, double sy, double a0, 
                          double a2, double b0, double b1, double b2, int32_t count,
                          const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 /** @} */
-
-/** One term of a regression sum, and one row of its table in the parameter store. */
-typedef struct MreTerm {
-  double coefficient; /**< Arc-seconds, or metres in a height sum. */
-  int16_t u_power;    /**< Power of U, 0 to 9. */
-  int16_t v_power;    /**< Power of V, 0 to 9. */
-  int32_t unused;     /**< Not read. */
-} MreTerm;
 
 /** @name Multiple regression (DMA TR 8350.2, 1991, appendix D)
  *  @{ */

@@ -32,7 +32,7 @@ class Powers {
 double sum_of(const MreTerm* terms, int32_t count, const Powers& u, const Powers& v) {
   double sum = 0;
   for (int32_t i = 0; i < count; ++i) {
-    sum += terms[i].coefficient * u[terms[i].u_power] * v[terms[i].v_power];
+    sum += terms[i].coefficient * u[terms[i].power_u] * v[terms[i].power_v];
   }
   return sum;
 }

@@ -12,8 +12,8 @@ constexpr double kSecond = kPi / 180 / 3600;
 MreTerm term(double coefficient, int u, int v) {
   MreTerm t = {};
   t.coefficient = coefficient;
-  t.u_power = static_cast<int16_t>(u);
-  t.v_power = static_cast<int16_t>(v);
+  t.power_u = static_cast<int16_t>(u);
+  t.power_v = static_cast<int16_t>(v);
   return t;
 }
 

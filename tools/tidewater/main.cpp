@@ -4,6 +4,7 @@
 #include <cstdlib>
 
 #include "commands.hpp"
+#include "magnetic.hpp"
 
 int main(int argc, char** argv) {
   // The library's text functions follow the user's locale; a command that is used in scripts reads
@@ -15,6 +16,7 @@ int main(int argc, char** argv) {
   app.require_subcommand(1);
   int exit_status = 0;
   tidewater::command::add_convert(app, exit_status);
+  tidewater::tools::add_magnetic(app, exit_status);
   try {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {
