@@ -8,15 +8,38 @@
 
 namespace tidewater {
 
-// ((1 - e sin p) / (1 + e sin p))^(e/2): how the ellipsoid departs from the sphere.
+// Up to this eccentricity, above that of every ellipsoid of the earth, series stand in for the
+// library's functions; they are exact to the last bit or two there.
+inline constexpr double kSeriesEccentricity = 0.1;
+
+// e atanh(e sin p): how the ellipsoid's isometric latitude falls short of the sphere's.
+inline double eccentric_term(double e, double sin_lat) {
+  const double x = e * sin_lat;
+  if (std::fabs(e) <= kSeriesEccentricity) {
+    const double q = x * x;
+    const double high = (1.0 / 9 + q / 11) + (q * q) * (1.0 / 13 + q / 15);
+    return e * x * ((1 + q / 3) + (q * q) * ((1.0 / 5 + q / 7) + (q * q) * high));
+  }
+  return e * std::atanh(x);
+}
+
+// exp(-d) for d = eccentric_term(e, ...).
+inline double eccentric_decay(double e, double d) {
+  if (std::fabs(e) <= kSeriesEccentricity) {  // then d is at most 0.0101
+    const double d2 = d * d;
+    return (1 - d) + d2 * ((1.0 / 2 - d / 6) + d2 * ((1.0 / 24 - d / 120) + d2 / 720));
+  }
+  return std::exp(-d);
+}
+
+// ((1 - e sin p) / (1 + e sin p))^(e/2) = exp(-e atanh(e sin p)).
 inline double eccentric_factor(double e, double sin_lat) {
-  const double es = e * sin_lat;
-  return std::pow((1 - es) / (1 + es), e / 2);
+  return eccentric_decay(e, eccentric_term(e, sin_lat));
 }
 
 // ln(tan(p/2 + pi/4) ((1 - e sin p) / (1 + e sin p))^(e/2)), the Mercator ordinate of latitude p.
 inline double isometric_latitude(double e, double lat) {
-  return std::log(std::tan(lat / 2 + kQuarterPi) * eccentric_factor(e, std::sin(lat)));
+  return std::log(std::tan(lat / 2 + kQuarterPi)) - eccentric_term(e, std::sin(lat));
 }
 
 // t(p) = tan(pi/4 - p/2) / ((1 - e sin p) / (1 + e sin p))^(e/2) = exp(-isometric latitude).
@@ -27,6 +50,29 @@ inline double isometric_colatitude_tangent(double e, double lat) {
 // One pass of the fixed point that takes t(p) back to the latitude p.
 inline double next_latitude(double e, double t, double lat) {
   return kHalfPi - 2 * std::atan(t * eccentric_factor(e, std::sin(lat)));
+}
+
+// The latitude p with t(p) = t: where the passes of next_latitude come to rest.
+//
+// With T = tan(pi/4 - p/2) = exp(-v), the fixed point is v = y + e atanh(e tanh v).  Newton's
+// method on d = v - y needs neither logarithm nor sine, and for earth's ellipsoids is done after
+// two steps.
+inline double latitude_at_rest(double e, double t) {
+  if (t > 1) return -latitude_at_rest(e, 1 / t);  // the south mirrors the north; also for infinity
+  const double e2 = e * e;
+  double tangent = t;
+  double d = 0;
+  double step = 0;
+  do {
+    const double q = tangent * tangent;
+    const double sin_lat = (1 - q) / (1 + q);
+    const double cos2 = 4 * q / square(1 + q);
+    step = (d - eccentric_term(e, sin_lat)) / (1 - e2 * cos2 / (1 - e2 * square(sin_lat)));
+    d -= step;
+    tangent = t * eccentric_decay(e, d);
+    // What a step leaves is of the order of its square.
+  } while (std::fabs(step) > 1e-9);
+  return kHalfPi - 2 * std::atan(tangent);
 }
 
 }  // namespace tidewater

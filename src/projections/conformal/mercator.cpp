@@ -14,17 +14,6 @@ namespace {
 // The forward formula loses the ordinate this close to a pole.
 constexpr double kForwardLatLimit = kHalfPi - 1e-14;
 
-// The latitude whose t(p) is t, to 1e-14.  There is no limit of passes; a not-a-number ends them.
-double latitude_of(double e, double t) {
-  double lat = kHalfPi - 2 * std::atan(t);
-  double previous = 0;
-  do {
-    previous = lat;
-    lat = next_latitude(e, t, previous);
-  } while (std::fabs(lat - previous) > 1e-14);
-  return lat;
-}
-
 }  // namespace
 
 void TWmerc_c(double e, double lat0, double* y0, TWstatus* status) {
@@ -58,7 +47,7 @@ void TWmerc_i(double e, double lon0, double y0, int32_t count, const CoordinateT
     const double x = in[i].x;
     const double y = in[i].y;
     out[i].x = wrap_at_or_below_then_above(x + lon0);
-    out[i].y = latitude_of(e, std::exp(-(y + y0)));
+    out[i].y = latitude_at_rest(e, std::exp(-(y + y0)));
   }
 }
 

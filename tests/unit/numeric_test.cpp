@@ -1,0 +1,89 @@
+#include "foundation/numeric.hpp"
+
+#include <gtest/gtest.h>
+
+#include "projections/isometric_latitude.hpp"
+#include "projections/pole_hold.hpp"
+#include "support/points.hpp"
+
+using namespace tidewater;
+using test::kInfinity;
+using test::kNaN;
+
+namespace {
+
+TEST(Wraps, DifferInWhatBecomesOfHalfATurn) {
+  EXPECT_EQ(wrap_above_then_at_or_below(-kPi), kPi);
+  EXPECT_EQ(wrap_above_then_below(-kPi), -kPi);
+  EXPECT_EQ(wrap_at_or_below_then_above(-kPi), kPi);
+  EXPECT_EQ(wrap_below_then_above(-kPi), -kPi);
+  EXPECT_EQ(wrap_turns_below_then_above(-kPi), -kPi);
+  EXPECT_EQ(wrap_turns_above_then_at_or_below(-kPi), kPi);
+  for (const auto wrap : {wrap_above_then_at_or_below, wrap_above_then_below,
+                          wrap_at_or_below_then_above, wrap_below_then_above}) {
+    EXPECT_EQ(wrap(kPi), kPi);
+    EXPECT_EQ(wrap(1), 1);
+    EXPECT_EQ(wrap(4), 4 - kTwoPi);
+    EXPECT_EQ(wrap(-4), kTwoPi - 4);
+    EXPECT_EQ(wrap(20), 20 - kTwoPi);  // one turn at most
+    EXPECT_TRUE(std::isnan(wrap(kNaN)));
+  }
+}
+
+TEST(Wraps, WholeTurnsAreTheFiguresOfSingleSteps) {
+  for (const double start : {-31.0, 31.0, 1000.0, -12345.0, 400000.0}) {
+    double stepped = start;
+    while (stepped < -kPi) stepped += kTwoPi;
+    while (stepped > kPi) stepped -= kTwoPi;
+    EXPECT_EQ(wrap_turns_below_then_above(start), stepped);
+  }
+}
+
+TEST(Wraps, EndAtOnceForWhatCannotBeBroughtBack) {
+  EXPECT_EQ(wrap_turns_below_then_above(1e300), 1e300);
+  EXPECT_EQ(wrap_turns_below_then_above(-kInfinity), -kInfinity);
+  EXPECT_EQ(wrap_turns_above_then_at_or_below(kInfinity), kInfinity);
+  EXPECT_TRUE(std::isnan(wrap_turns_below_then_above(kNaN)));
+  // far out, but a turn still changes it
+  const double near = wrap_turns_below_then_above(1e12);
+  EXPECT_LE(std::fabs(near), kPi);
+  EXPECT_NEAR(near, std::remainder(1e12, kTwoPi), 1e-9);
+}
+
+TEST(IsometricLatitude, FactorIsThePower) {
+  for (const double e : {0.0, 0.0818, 0.1, 0.2, 0.9}) {
+    for (double s = -1; s <= 1; s += 0.125) {
+      const double power = std::pow((1 - e * s) / (1 + e * s), e / 2);
+      EXPECT_NEAR(eccentric_factor(e, s) / power, 1, 1e-15 / (1 - e));
+    }
+  }
+  EXPECT_TRUE(std::isnan(eccentric_factor(1.5, 0.9)));  // a negative base
+  EXPECT_EQ(eccentric_factor(1, 1), 0);
+}
+
+TEST(IsometricLatitude, RestsWhereTheFixedPointRests) {
+  for (const double e : {0.0, 0.0818, 0.3, 0.8}) {
+    for (double t = 1e-8; t < 1e9; t *= 3.7) {
+      double lat = kHalfPi - 2 * std::atan(t);
+      double previous = 0;
+      do {
+        previous = lat;
+        lat = next_latitude(e, t, previous);
+      } while (std::fabs(lat - previous) > 1e-14);
+      // the fixed point stops short by its last step times its contraction
+      EXPECT_NEAR(latitude_at_rest(e, t), lat, 2e-15 + 1e-14 * e * e / (1 - e * e));
+    }
+  }
+  EXPECT_EQ(latitude_at_rest(0.08, kInfinity), -kHalfPi);
+  EXPECT_EQ(latitude_at_rest(0.08, 0), kHalfPi);
+  EXPECT_TRUE(std::isnan(latitude_at_rest(0.08, kNaN)));
+}
+
+TEST(PoleHold, TheSouthPoleGoesPastTheNorthPole) {
+  EXPECT_EQ(hold_off_poles(kHalfPi, 1e-10), kHalfPi - 1e-10);
+  EXPECT_EQ(hold_off_poles(-kHalfPi, 1e-10), kHalfPi + 1e-10);
+  EXPECT_EQ(hold_off_poles(kHalfPi - 2e-10, 1e-10), kHalfPi - 2e-10);
+  EXPECT_EQ(hold_off_poles(-kHalfPi + 2e-10, 1e-10), -kHalfPi + 2e-10);
+}
+
+}  // namespace
