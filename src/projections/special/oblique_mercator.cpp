@@ -31,6 +31,24 @@ bool held_asin(double sine, double* angle) {
   return false;
 }
 
+// The latitude with t(p) = w.  The iteration ends when fifteen of its steps, not one, have been
+// small, and so leaves an ellipsoid of the earth at rest, where Newton's method takes it at once.
+double latitude_of(double e, double w) {
+  if (std::fabs(e) <= kSeriesEccentricity) return latitude_at_rest(e, w);
+  double lat = kHalfPi - 2 * std::atan(w);
+  CycleWatch watch;
+  for (int small_steps = 0; small_steps < 15;) {
+    const double previous = lat;
+    lat = next_latitude(e, w, previous);
+    if (!(std::fabs(lat - previous) >= 1e-10)) {
+      ++small_steps;
+    } else if (watch.seen(lat)) {
+      break;
+    }
+  }
+  return lat;
+}
+
 // The constants as far as they have been worked out.
 struct Constants {
   double B = 0, A = 0, E = 0, lon0 = 0, gamma0 = 0;
@@ -185,20 +203,8 @@ void TWo_merc_i(double e, double alpha, double gamma0, double lon0, double E, do
       continue;
     }
     const double w = std::pow(E / std::sqrt((1 + U) / (1 - U)), 1 / B);
-    double lat = kHalfPi - 2 * std::atan(w);
-    // Wanted: the iteration ends when fifteen steps, not one, have been small.
-    CycleWatch watch;
-    for (int small_steps = 0; small_steps < 15;) {
-      const double previous = lat;
-      lat = next_latitude(e, w, previous);
-      if (!(std::fabs(lat - previous) >= 1e-10)) {
-        ++small_steps;
-      } else if (watch.seen(lat)) {
-        break;
-      }
-    }
     out[i].x = lon0 - std::atan2(cos_g * S - sin_g * V, std::cos(B * u / A)) / B;
-    out[i].y = lat;
+    out[i].y = latitude_of(e, w);
   }
 }
 

@@ -4,7 +4,6 @@
 
 #include "foundation/numeric.hpp"
 #include "projections/isometric_latitude.hpp"
-#include "projections/special/cycle_watch.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater;
@@ -13,12 +12,6 @@ namespace {
 
 // Largest argument of a hyperbolic function: beyond it the result would overflow.
 constexpr double kHyperbolicLimit = 700;
-
-// Isometric latitude in the form with two logarithms.
-double two_log_isometric(double e, double lat) {
-  const double es = e * std::sin(lat);
-  return std::log(std::tan(lat / 2 + kQuarterPi)) - e / 2 * std::log((es + 1) / (1 - es));
-}
 
 double half_log_ratio(double g) { return std::log((g + 1) / (1 - g)) / 2; }
 
@@ -35,7 +28,7 @@ void TWrso_c(double e, double lon_c, double lat_c, double skew, double* A, doubl
   const double nu = 1 / w;
   *B = std::sqrt(e2 / (1 - e2) * square(square(c)) + 1);
   *A = std::sqrt(nu * rho) * *B;
-  const double psi = two_log_isometric(e, lat_c);
+  const double psi = isometric_latitude(e, lat_c);
   const double r = *A / nu / c;
   // Wanted: r below 1, near the equator, is not tested for.
   *C = std::log(std::sqrt(r * r - 1) + r) - *B * psi;
@@ -59,7 +52,7 @@ void TWrso_f(double lon0, double skew, double A, double B, double C, double e, i
   const double cos_g = std::cos(skew);
   for (int32_t i = 0; i < count; ++i) {
     const double d = (lon0 - in[i].x) * B;
-    const double W = two_log_isometric(e, in[i].y) * B + C;
+    const double W = isometric_latitude(e, in[i].y) * B + C;
     if (std::fabs(W) > kHyperbolicLimit) {
       *status = TW_RANGE_ERROR;
       return;
@@ -92,15 +85,7 @@ void TWrso_i(double lon0, double skew, double A, double B, double C, double e, i
     const double sin_u = std::sin(u);
     out[i].x = lon0 - std::atan((-(cos_g * S) - sin_u * sin_g) / std::cos(u)) / B;
     const double W = half_log_ratio((cos_g * sin_u - S * sin_g) / std::cosh(v));
-    const double w = std::exp(-((W - C) / B));
-    double lat = kHalfPi - 2 * std::atan(w);
-    double previous = 0;
-    CycleWatch watch;
-    do {
-      previous = lat;
-      lat = next_latitude(e, w, previous);
-    } while (std::fabs(lat - previous) > 1e-14 && !watch.seen(lat));
-    out[i].y = lat;
+    out[i].y = latitude_at_rest(e, std::exp(-((W - C) / B)));
   }
 }
 
@@ -114,7 +99,7 @@ void TWrso_s(double e, double k0, double /*unused1*/, double /*unused2*/, double
   for (int32_t i = 0; i < count; ++i) {
     const double lat = in[i].y;
     const double d = (lon0 - in[i].x) * B;
-    const double W = two_log_isometric(e, lat) * B + C;
+    const double W = isometric_latitude(e, lat) * B + C;
     if (std::fabs(W) > kHyperbolicLimit) {
       *status = TW_RANGE_ERROR;
       return;
