@@ -63,6 +63,7 @@ inline double latitude_at_rest(double e, double t) {
   double tangent = t;
   double d = 0;
   double step = 0;
+  int passes = 0;
   do {
     const double q = tangent * tangent;
     const double sin_lat = (1 - q) / (1 + q);
@@ -70,8 +71,9 @@ inline double latitude_at_rest(double e, double t) {
     step = (d - eccentric_term(e, sin_lat)) / (1 - e2 * cos2 / (1 - e2 * square(sin_lat)));
     d -= step;
     tangent = t * eccentric_decay(e, d);
-    // What a step leaves is of the order of its square.
-  } while (std::fabs(step) > 1e-9);
+    // What a step leaves is of the order of its square.  Eleven passes serve up to e = 0.999999;
+    // from 1 - 1e-10 on rounding alone may keep the steps up.
+  } while (std::fabs(step) > 1e-9 && ++passes < 100);
   return kHalfPi - 2 * std::atan(tangent);
 }
 
