@@ -164,6 +164,10 @@ TEST_F(Twstore, CheckNamesWhatTheLibraryWillMiss) {
 TEST_F(Twstore, CheckReadsEveryRow) {
   std::filesystem::copy_file(TIDEWATER_STORE, sources_.store());
   EXPECT_EQ(run("check").code, 0);
+  // A magnetic model with the number 0 is a name alone and names no table.
+  alter(sources_.store(),
+        "INSERT INTO \"magnetic models\" VALUES ('none', 0, '', 0, 0, '', 0, 0, 0)");
+  EXPECT_EQ(run("check").code, 0);
   alter(sources_.store(), "UPDATE system SET cs_num = 70000 WHERE cs_name = 'Mercator'");
   const Result result = run("check");
   EXPECT_EQ(result.code, 1);
