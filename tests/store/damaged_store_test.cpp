@@ -199,7 +199,7 @@ TEST_F(DamagedStore, AViewInATablesPlaceIsNotRead) {
 TEST_F(DamagedStore, TruncatedAtEveryPage) {
   const std::string whole = read_file(TIDEWATER_STORE);
   ASSERT_GT(whole.size(), 100000u);
-  for (std::size_t size = 0; size < whole.size(); size += 1777) {
+  for (std::size_t size = 0; size < whole.size(); size += 2999) {
     folder_.write("cut", whole.substr(0, size));
     read_all(path("cut"));
   }
@@ -208,7 +208,7 @@ TEST_F(DamagedStore, TruncatedAtEveryPage) {
 TEST_F(DamagedStore, RandomBytesInARealStore) {
   const std::string whole = read_file(TIDEWATER_STORE);
   std::mt19937 random(20);
-  for (int i = 0; i < 200; ++i) {
+  for (int i = 0; i < 80; ++i) {
     std::string damaged = whole;
     // Half of the damage goes to the first pages, where the schema and the layouts lie.
     const std::size_t reach = i % 2 == 0 ? 12288 : damaged.size();
