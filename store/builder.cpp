@@ -31,6 +31,11 @@ Number parse(const CsvFile& file, const CsvRecord& record, std::size_t column,
   return value;
 }
 
+void require_sound(const fs::path& path, const std::string& name, const Layout& layout) {
+  const std::string fault = fault_of(layout);
+  if (!fault.empty()) throw SourceError(path.string() + ": layout " + name + ": " + fault);
+}
+
 Layouts read_layouts(const fs::path& path) {
   const CsvFile file = read_csv(path);
   const std::size_t name = file.column("layout");
@@ -56,10 +61,7 @@ Layouts read_layouts(const fs::path& path) {
       throw SourceError(path, r.line, "layout " + r.cells[name] + ": " + fault);
     }
   }
-  for (const auto& [layout_name, layout] : layouts) {
-    const std::string fault = fault_of(layout);
-    if (!fault.empty()) throw SourceError(path.string() + ": layout " + layout_name + ": " + fault);
-  }
+  for (const auto& [layout_name, layout] : layouts) require_sound(path, layout_name, layout);
   return layouts;
 }
 

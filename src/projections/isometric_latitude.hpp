@@ -17,8 +17,8 @@ inline double eccentric_term(double e, double sin_lat) {
   const double x = e * sin_lat;
   if (std::fabs(e) <= kSeriesEccentricity) {
     const double q = x * x;
-    const double high = (1.0 / 9 + q / 11) + (q * q) * (1.0 / 13 + q / 15);
-    return e * x * ((1 + q / 3) + (q * q) * ((1.0 / 5 + q / 7) + (q * q) * high));
+    const double high = (1.0 / 9 + q * (1.0 / 11)) + (q * q) * (1.0 / 13 + q * (1.0 / 15));
+    return e * x * ((1 + q * (1.0 / 3)) + (q * q) * ((1.0 / 5 + q * (1.0 / 7)) + (q * q) * high));
   }
   return e * std::atanh(x);
 }
@@ -27,7 +27,8 @@ inline double eccentric_term(double e, double sin_lat) {
 inline double eccentric_decay(double e, double d) {
   if (std::fabs(e) <= kSeriesEccentricity) {  // then d is at most 0.0101
     const double d2 = d * d;
-    return (1 - d) + d2 * ((1.0 / 2 - d / 6) + d2 * ((1.0 / 24 - d / 120) + d2 / 720));
+    return (1 - d) + d2 * ((1.0 / 2 - d * (1.0 / 6)) +
+                           d2 * ((1.0 / 24 - d * (1.0 / 120)) + d2 * (1.0 / 720)));
   }
   return std::exp(-d);
 }
