@@ -86,6 +86,11 @@ std::int64_t length_of(std::FILE* file) {
 #endif
 }
 
+bool may_hold(std::FILE* file, std::int64_t end) {
+  constexpr std::int64_t kSmall = 1 << 24;
+  return end <= kSmall || end <= length_of(file);
+}
+
 bool read_exactly(std::FILE* file, void* bytes, std::size_t count) {
   return std::fread(bytes, 1, count, file) == count;
 }

@@ -55,6 +55,10 @@ bool seek_to(std::FILE* file, std::int64_t offset);
 // Bytes in the file, or -1; moves the file position.
 std::int64_t length_of(std::FILE* file);
 
+// False where the file ends before so many bytes.  It is only looked at for many: a damaged header
+// must not ask for memory that no file fills.
+bool may_hold(std::FILE* file, std::int64_t end);
+
 // True when all bytes could be read; what a shorter file has is in bytes then.
 bool read_exactly(std::FILE* file, void* bytes, std::size_t count);
 

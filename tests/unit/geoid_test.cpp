@@ -455,7 +455,7 @@ TEST_F(GeoidMoves, OffThePointIsAnError) {
   // In the first cell, with the other grid beginning at the point's own meridian: two columns are
   // left, which is too few to interpolate in.
   write_grid(folder, "wide", {-100, 0, 81, 81, place});
-  write_grid(folder, "other", box(-99.5F, 10, -30, 70));
+  write_grid(folder, "other", box(-99.5F, -5, -30, 70));
   const Opened opened = open(folder, {"wide", "other"});
   Loaded(opened.control, -99.5, 5.5).expect_nodes(-100, 0, 0, 0, 22, 2);
   CoordinateTriple out = kUntouchedPoint;
