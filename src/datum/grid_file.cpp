@@ -3,7 +3,6 @@
 #include "datum/grid_file.hpp"
 
 #include <algorithm>
-#include <cmath>
 #include <cstring>
 #include <string_view>
 
@@ -109,12 +108,6 @@ bool read_header(const char* directory, const char* name, const char* extension,
              .dy = decode_f32(bytes + 88),
              .angle = decode_f32(bytes + 92)};
   return true;
-}
-
-std::int64_t cut(double value) {
-  constexpr double kMost = 2147483648.0;
-  if (std::isnan(value)) return 0;
-  return static_cast<std::int64_t>(std::clamp(value, -kMost, kMost));
 }
 
 }  // namespace tidewater

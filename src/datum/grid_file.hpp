@@ -3,6 +3,7 @@
 
 #include <array>
 #include <bit>
+#include <cmath>
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
@@ -94,6 +95,11 @@ constexpr std::int64_t record_bytes(std::int32_t nc) { return (std::int64_t{nc} 
 
 // A number cut to an integer towards zero. Out of a damaged file it may be anything: what lies
 // beyond 32 bits is held there, a not-a-number gives 0.
-std::int64_t cut(double value);
+inline std::int64_t cut(double value) {
+  constexpr double kMost = 2147483648.0;
+  if (std::fabs(value) <= kMost) return static_cast<std::int64_t>(value);
+  if (std::isnan(value)) return 0;
+  return static_cast<std::int64_t>(std::copysign(kMost, value));
+}
 
 }  // namespace tidewater
