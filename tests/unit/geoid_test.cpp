@@ -8,6 +8,7 @@
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
+#include "support/little_memory.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
 #include "tidewater/datum.h"
@@ -678,6 +679,29 @@ TEST_F(Geoid, HeadersOfImpossibleSizes) {
     write_grid(folder, "g", {-100, 20, 60, 50, place, spacing, 1});
     EXPECT_EQ(Loaded(open(folder, {"g"}).control, -95.5, 23.5).status, TW_I_OUTSIDE_GEOID);
   }
+}
+
+TEST_F(Geoid, NoMemoryForTheRecords) {
+  TIDEWATER_NEED_MEMORY_LIMIT();
+  // Twenty-two records of 64 megabytes, in a file without content.
+  constexpr std::int32_t kColumns = 1 << 24;
+  std::string bytes(64, ' ');
+  for (const std::int32_t n : {kColumns, 30, 1}) append_i32(bytes, n);
+  for (const float f : {-100.0F, 4e-6F, 20.0F, 1.0F, 0.0F}) append_f32(bytes, f);
+  folder.write("g.geo", bytes);
+  fs::resize_file(folder.path() / "g.geo", 4 * (std::uintmax_t{kColumns} + 1) * 31);
+  const Opened opened = open(folder, {"g"});
+  EXPECT_EQ(opened.status, TW_SUCCESS);
+  const auto fails = [&] {
+    const Loaded loaded(opened.control, -95.5, 35.5);
+    CoordinateTriple out = kUntouchedPoint;
+    const CoordinateTriple in = at(-95.5, 35.5);
+    TWstatus status = 0;
+    TWgeo90_f(1, &in, &opened.control, &out, &status);
+    return loaded.status == TW_NO_MEMORY && loaded.window.nc == 22 && loaded.window.ymin == 25 &&
+           loaded.data[0] == -1 && status == TW_NO_MEMORY && out.z == kUntouched;
+  };
+  EXPECT_EXIT(exit_with_little_memory(fails), testing::ExitedWithCode(0), "");
 }
 
 TEST_F(Geoid, DamagedHeadersDoNoHarm) {
