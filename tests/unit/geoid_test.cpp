@@ -2,9 +2,7 @@
 
 #include <array>
 #include <cstring>
-#include <fstream>
 #include <random>
-#include <sstream>
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
@@ -162,10 +160,7 @@ TEST_F(Geoid, RealGridsAtTheirNodesAndBetween) {
   EXPECT_STREQ(opened.control.grids[1].name, "europe96");
   std::mt19937 random(96);
   for (const char* name : {"namer96", "europe96"}) {
-    std::ostringstream all;
-    all << std::ifstream(shared_data() / "geoid" / (std::string(name) + ".geo"), std::ios::binary)
-               .rdbuf();
-    const std::string bytes = all.str();
+    const std::string bytes = file_bytes(shared_data() / "geoid" / (std::string(name) + ".geo"));
     const int nc = i32_at(bytes, 64), nr = i32_at(bytes, 68);
     const double xmin = f32_at(bytes, 76), dx = f32_at(bytes, 80);
     const double ymin = f32_at(bytes, 84), dy = f32_at(bytes, 88);

@@ -2,9 +2,7 @@
 
 #include <array>
 #include <cstring>
-#include <fstream>
 #include <random>
-#include <sstream>
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
@@ -19,12 +17,6 @@ namespace {
 
 CoordinateTriple at(double lon, double lat, double height = 5) {
   return {degrees(lon), degrees(lat), height};
-}
-
-std::string file_bytes(const fs::path& path) {
-  std::ostringstream all;
-  all << std::ifstream(path, std::ios::binary).rdbuf();
-  return all.str();
 }
 
 // Every node tells its place: longitude shifts 100 row + col, latitude shifts the negative.

@@ -5,7 +5,6 @@
 #include <cstring>
 #include <fstream>
 #include <random>
-#include <sstream>
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
@@ -122,9 +121,7 @@ TEST_F(NationalGrid, CanadasGridAgainstItsNodes) {
   TWstatus status = 0;
   TWcnt_c((shared_data() / "ntv2/").c_str(), 0, &status);
   ASSERT_EQ(status, TW_SUCCESS);
-  std::ostringstream all;
-  all << std::ifstream(shared_data() / "ntv2/canada.gsb", std::ios::binary).rdbuf();
-  const std::string bytes = all.str();
+  const std::string bytes = file_bytes(shared_data() / "ntv2/canada.gsb");
 
   struct Header {
     std::string name, parent;
