@@ -16,7 +16,7 @@ namespace {
 
 constexpr double kDegree = 3.14159265358979323846 / 180;
 
-// A line across the box, a few metres to hundreds of metres from point to point.
+// A line of some 200 km, a point every 50 m.
 std::vector<CoordinateTriple> track(double west, double south, double east, double north) {
   std::vector<CoordinateTriple> points(kPoints);
   for (int32_t i = 0; i < kPoints; ++i) {
@@ -39,7 +39,7 @@ void add_nadcon() {
   TWnadcon_c((data() / "nadcon/").string().c_str(), control.get(), &status);
   if (!TW_OK(status)) return;
   for (const auto& [name, points] :
-       {std::pair{"track", track(-120, 30, -75, 45)}, {"scattered", box(-120, 30, -75, 45)}}) {
+       {std::pair{"track", track(-100, 38, -98, 39)}, {"scattered", box(-120, 30, -75, 45)}}) {
     const auto forward = [control, points = points, out = points]() mutable {
       TWstatus word = 0;
       TWnadcon_f(kPoints, points.data(), control.get(), out.data(), &word);
@@ -65,7 +65,7 @@ void add_national() {
   TWcnt_c((folder.string() + "/").c_str(), 0, &status);
   if (!TW_OK(status)) return;
   for (const auto& [name, points] :
-       {std::pair{"track", track(-4.5, 43, -0.1, 50)}, {"scattered", box(-4.5, 43, -0.1, 50)}}) {
+       {std::pair{"track", track(-2, 46, -0.5, 47.5)}, {"scattered", box(-4.5, 43, -0.1, 50)}}) {
     const char* definition = "+proj=hgridshift +grids=ntf_r93.gsb";
     const auto forward = [points = points, out = points]() mutable {
       TWstatus word = 0;
@@ -96,7 +96,7 @@ void add_geoid() {
   TWgeo90_c((data() / "geoid/").string().c_str(), control.get(), &status);
   if (!TW_OK(status)) return;
   for (const auto& [name, points] :
-       {std::pair{"track", track(-125, 25, -75, 50)}, {"scattered", box(-125, 25, -75, 50)}}) {
+       {std::pair{"track", track(-100, 38, -98, 39)}, {"scattered", box(-125, 25, -75, 50)}}) {
     const auto forward = [control, points = points, out = points]() mutable {
       TWstatus word = 0;
       TWgeo90_f(kPoints, points.data(), control.get(), out.data(), &word);

@@ -338,17 +338,17 @@ TW_API void TWgeneric_i(TWtransform forward, TWcontext context, double start_lon
 /** @name NADCON grids
  *
  *  Shifts interpolated in pairs of grid files: .las with shifts of the latitude, positive north,
- * and .los with shifts of the longitude, positive WEST, both in arc-seconds (Dewhurst 1990, NADCON:
- * the application of minimum curvature-derived surfaces in the transformation of positional data,
- * NOAA Technical Memorandum NOS NGS-50).  The file area.par of a directory names the pairs in order
- * of priority, one a line: the first word of the line, without extension; the rest is a comment.  A
- *  line without a word names the grid above it again.
+ *  and .los with shifts of the longitude, positive WEST, both in arc-seconds (Dewhurst 1990,
+ *  NADCON: the application of minimum curvature-derived surfaces in the transformation of
+ *  positional data, NOAA Technical Memorandum NOS NGS-50).  The file area.par of a directory
+ *  names the pairs in order of priority, one a line: the first word of the line, without
+ *  extension; the rest is a comment.  A line without a word names the grid above it again.
  *
  *  A grid holds a point strictly inside its bounds.  The nodes around the last point, 4 by 4, are
  *  kept in a window of the PROCESS: points inside it are served from it whatever control block is
  *  passed, others load it anew from the files.  So points in the order of a line are fast, points
- * at random cost two opened files each, and calls must not run at once.  A node whose value is
- * beyond 180 in size has no data and takes the mean of its cell's three others.
+ *  at random cost two opened files each, and calls must not run at once.  A node whose value is
+ *  beyond 180 in size has no data and takes the mean of its cell's three others.
  *  @{ */
 
 /** A grid of the list, as its two file headers tell it; degrees, negative west of Greenwich. */
@@ -381,9 +381,9 @@ typedef struct NadconWindow {
  * @param directory  folder with its separator behind it, at most 259 characters
  * @param control    filled; on a failure at a grid its count stays as it was, while directory and
  *                   earlier grids are written
- * @param status     #TW_GRID_NOT_FOUND where area.par cannot be opened, or its first line is blank:
- *                   control untouched; #TW_GRID_FILE_ERROR where a grid file is missing or short,
- * or the two headers of a grid differ
+ * @param status     #TW_GRID_NOT_FOUND where area.par cannot be opened, or its first line is
+ *                   blank: control untouched; #TW_GRID_FILE_ERROR where a grid file is missing or
+ *                   short, or the two headers of a grid differ
  * @return 1; no part of the contract
  */
 TW_API int32_t TWnadcon_c(const char* directory, NadconControl* control, TWstatus* status);
@@ -395,9 +395,9 @@ TW_API int32_t TWnadcon_c(const char* directory, NadconControl* control, TWstatu
  * @param control  of TWnadcon_c()
  * @param out      shifted longitude, in (-pi, pi], latitude; height copied; may be in
  * @param status   #TW_I_OUTSIDE_NADCON if any point lay outside all grids: copied with its
- * longitude brought into (-pi, pi], the others shifted; #TW_GRID_FILE_ERROR, #TW_NO_MEMORY where a
- * window could not be loaded: the point, and later ones up to the next load, stay unwritten, and
- * the next load clears the word
+ *                 longitude brought into (-pi, pi], the others shifted; #TW_GRID_FILE_ERROR,
+ *                 #TW_NO_MEMORY where a window could not be loaded: the point, and later ones up
+ *                 to the next load, stay unwritten, and the next load clears the word
  */
 TW_API void TWnadcon_f(int32_t count, const CoordinateTriple* in, const NadconControl* control,
                        CoordinateTriple* out, TWstatus* status);
@@ -410,26 +410,29 @@ TW_API void TWnadcon_f(int32_t count, const CoordinateTriple* in, const NadconCo
  * @param control  of TWnadcon_c()
  * @param out      longitude in (-pi, pi], latitude; height copied; may be in
  * @param status   #TW_I_OUTSIDE_NADCON if any point lay outside, then or on a later pass: copied
- * with its longitude brought into (-pi, pi]; #TW_GRID_FILE_ERROR, #TW_NO_MEMORY only if the LAST
- * point met it and none lay outside; at such a point only the longitude that stands in out is
- * brought into (-pi, pi]
+ *                 with its longitude brought into (-pi, pi]; #TW_GRID_FILE_ERROR, #TW_NO_MEMORY
+ *                 only if the LAST point met it and none lay outside; at such a point only the
+ *                 longitude that stands in out is brought into (-pi, pi]
  */
 TW_API void TWnadcon_i(int32_t count, const CoordinateTriple* in, const NadconControl* control,
                        CoordinateTriple* out, TWstatus* status);
 
 /**
- * Finds the first grid that holds a point and loads the 4 by 4 nodes around it.  Near a grid's edge
- * the window stays inside; where it would reach into a grid of higher priority, it is moved off.
+ * Finds the first grid that holds a point and loads the 4 by 4 nodes around it.  Near a grid's
+ * edge the window stays inside; where it would reach into a grid of higher priority, it is moved
+ * off.
  * @param x,y        degrees, x in (-360, 0]
  * @param unused     ignored
  * @param control    of TWnadcon_c()
  * @param window     bounds of the nodes read
- * @param lon_table  16 doubles, shifts of the longitude: rows from the south, columns from the west
+ * @param lon_table  16 doubles, shifts of the longitude: rows from the south, columns from the
+ *                   west
  * @param lat_table  16 doubles, shifts of the latitude
- * @param status     #TW_I_OUTSIDE_NADCON outside all grids, #TW_GRID_FILE_ERROR for a grid of fewer
- *                   than four rows or columns, or of impossible sizes, and for files that cannot be
- *                   opened: window untouched; #TW_NO_MEMORY, and #TW_GRID_FILE_ERROR for files that
- *                   are too short: window written, the tables that could not be read untouched
+ * @param status     #TW_I_OUTSIDE_NADCON outside all grids, #TW_GRID_FILE_ERROR for a grid of
+ *                   fewer than four rows or columns, or of impossible sizes, and for files that
+ *                   cannot be opened: window untouched; #TW_NO_MEMORY, and #TW_GRID_FILE_ERROR
+ *                   for files that are too short: window written, the tables that could not be
+ *                   read untouched
  */
 TW_API void TWloc_grids(double x, double y, double unused, const NadconControl* control,
                         NadconWindow* window, double* lon_table, double* lat_table,
@@ -439,20 +442,21 @@ TW_API void TWloc_grids(double x, double y, double unused, const NadconControl* 
 /** @name National grids
  *
  *  Shifts interpolated in one NTv2 grid shift file (.gsb) of rectangular sub-grids, finer ones
- * nested in coarser ones (Junkins and Farley 1995, NTv2: National Transformation Version 2
- * Developer's Guide, Geomatics Canada).  TWcnt_c() opens the file for the PROCESS; the nodes around
- * the last point, 4 by 4, are kept.  Calls of this group must not run at once.
+ *  nested in coarser ones (Junkins and Farley 1995, NTv2: National Transformation Version 2
+ *  Developer's Guide, Geomatics Canada).  TWcnt_c() opens the file for the PROCESS; the nodes
+ *  around the last point, 4 by 4, are kept.  Calls of this group must not run at once.
  *
- *  Longitudes in such files are positive west.  The sign of a point's longitude is dropped and put
- *  back on its shift: the functions serve grids of the western hemisphere, and a point east of
- *  Greenwich is shifted as its mirror image.
+ *  Longitudes in such files are positive west.  The sign of a point's longitude is dropped and
+ *  put back on its shift: the functions serve grids of the western hemisphere, and a point east
+ *  of Greenwich is shifted as its mirror image.
  *
  *  Arguments named reserved are ignored.
  *  @{ */
 
 /**
- * Opens the grid file that the first word of area.par names, without its extension .gsb, and reads
- * its headers.  An earlier file stays open, and its table in memory, to the end of the process.
+ * Opens the grid file that the first word of area.par names, without its extension .gsb, and
+ * reads its headers.  An earlier file stays open, and its table in memory, to the end of the
+ * process.
  * @param directory  folder with its separator behind it, at most 259 characters
  * @param reserved   ignored
  * @param status     #TW_GRID_NOT_FOUND as TWget_cnt_fnam(): the grid open before stays in use;
@@ -465,8 +469,8 @@ TW_API void TWcnt_c(const char* directory, int32_t reserved, TWstatus* status);
  * First word of the first line of area.par.
  * @param directory  folder with its separator behind it, at most 259 characters
  * @param name       at least 260 characters
- * @param status     #TW_GRID_NOT_FOUND where area.par cannot be opened, is empty, or begins with a
- *                   blank line; name unwritten
+ * @param status     #TW_GRID_NOT_FOUND where area.par cannot be opened, is empty, or begins with
+ *                   a blank line; name unwritten
  */
 TW_API void TWget_cnt_fnam(const char* directory, char* name, TWstatus* status);
 
@@ -475,8 +479,9 @@ TW_API void TWget_cnt_fnam(const char* directory, char* name, TWstatus* status);
  * @param path    the file
  * @param flag    0
  * @param status  #TW_GSB_READ_ERROR for another flag, a file that cannot be opened, a header that
- * is short or not of 11 records, a count of sub-grids that cannot be, and a sub-grid whose spacings
- * cannot be or whose rows and columns do not make its count of nodes; #TW_NO_MEMORY
+ *                is short or not of 11 records, a count of sub-grids that cannot be, and a sub-
+ *                grid whose spacings cannot be or whose rows and columns do not make its count of
+ *                nodes; #TW_NO_MEMORY
  */
 TW_API void TWrd_cnt_fhdr(const char* path, int32_t flag, TWstatus* status);
 
@@ -504,16 +509,16 @@ TW_API void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t reserved,
                     CoordinateTriple* out, TWstatus* status);
 
 /**
- * Shift at one point, bilinear in the cell of the deepest sub-grid that holds it.  Edges belong to
- * a sub-grid to 2e-7 arc-seconds; of several children that hold a point, one with the point off its
- * north and west edges comes first, then the order in the file decides.
+ * Shift at one point, bilinear in the cell of the deepest sub-grid that holds it.  Edges belong
+ * to a sub-grid to 2e-7 arc-seconds; of several children that hold a point, one with the point
+ * off its north and west edges comes first, then the order in the file decides.
  * @param point      longitude, latitude
  * @param reserved   ignored
  * @param lon_shift  radians, to be added
  * @param lat_shift  radians, to be added
  * @param status     #TW_I_OUTSIDE_CNT outside all sub-grids, or with no grid open: shifts
- * unwritten; #TW_GSB_READ_ERROR where nodes could not be read: shifts written all the same, from
- * the nodes that were in their place before
+ *                   unwritten; #TW_GSB_READ_ERROR where nodes could not be read: shifts written
+ *                   all the same, from the nodes that were in their place before
  */
 TW_API void TWget_cnt_shift(CoordinateTriple point, int32_t reserved, double* lon_shift,
                             double* lat_shift, TWstatus* status);
@@ -528,8 +533,8 @@ TW_API void TWget_cnt_shift(CoordinateTriple point, int32_t reserved, double* lo
 TW_API void TWcnt_to_from(int32_t reserved, char* from, char* to, TWstatus* status);
 
 /**
- * Loads the nodes around a record of a sub-grid, 4 by 4, unless they are the ones kept.  A failure
- * is told by no word; an index of no sub-grid does nothing.
+ * Loads the nodes around a record of a sub-grid, 4 by 4, unless they are the ones kept.  A
+ * failure is told by no word; an index of no sub-grid does nothing.
  * @param sub_grid  index of the sub-grid in the file, from 0
  * @param record    number of the node's record in the file, from 1
  */
@@ -540,11 +545,11 @@ TW_API void TWload_cnt_local_grid(int32_t sub_grid, int32_t record);
  *
  *  Undulations N, in metres, interpolated in .geo files, which have the form of .las files.  The
  *  height above the ellipsoid is that above the geoid plus N.  The file area.par of a directory
- * lists the grids in order of priority: 15 columns of free text, then the base name of the file.
- * Blank lines and lines with an asterisk in the first column are skipped.
+ *  lists the grids in order of priority: 15 columns of free text, then the base name of the file.
+ *  Blank lines and lines with an asterisk in the first column are skipped.
  *
- *  A grid holds a point strictly inside its bounds.  The nodes around the last point, 22 by 22, are
- *  kept in a window of the PROCESS: points inside it, off its outer cells, are served from it
+ *  A grid holds a point strictly inside its bounds.  The nodes around the last point, 22 by 22,
+ *  are kept in a window of the PROCESS: points inside it, off its outer cells, are served from it
  *  whatever control block is passed, others load it anew.  Calls must not run at once.
  *  @{ */
 
@@ -573,14 +578,14 @@ typedef struct GeoidWindow {
 } GeoidWindow;
 
 /**
- * Reads area.par and the headers of the grids that it names, at most 50.  Lines are read in pieces
- * of 274 characters.
+ * Reads area.par and the headers of the grids that it names, at most 50.  Lines are read in
+ * pieces of 274 characters.
  * @param directory  folder with its separator behind it, at most 259 characters
  * @param control    filled; on a failure at a line its count stays as it was, while directory and
  *                   earlier grids are written
  * @param status     #TW_GEOID_FILE_ERROR where area.par cannot be opened: control untouched; and
- * for a line of fewer than 16 characters or without a name; #TW_GEOID_READ_ERROR where a grid file
- * is missing or its header short
+ *                   for a line of fewer than 16 characters or without a name;
+ *                   #TW_GEOID_READ_ERROR where a grid file is missing or its header short
  * @return 1; no part of the contract
  */
 TW_API int32_t TWgeo90_c(const char* directory, GeoidControl* control, TWstatus* status);
@@ -592,7 +597,8 @@ TW_API int32_t TWgeo90_c(const char* directory, GeoidControl* control, TWstatus*
  * @param control  of TWgeo90_c()
  * @param out      longitude, latitude copied, height plus N; may be in
  * @param status   #TW_I_OUTSIDE_GEOID if any point lay outside all grids: copied, the others
- * shifted; #TW_GEOID_READ_ERROR, #TW_NO_MEMORY where a window could not be loaded: stop
+ *                 shifted; #TW_GEOID_READ_ERROR, #TW_NO_MEMORY where a window could not be
+ *                 loaded: stop
  */
 TW_API void TWgeo90_f(int32_t count, const CoordinateTriple* in, const GeoidControl* control,
                       CoordinateTriple* out, TWstatus* status);
@@ -615,7 +621,8 @@ TW_API void TWgeo90_i(int32_t count, const CoordinateTriple* in, const GeoidCont
  * @param height      ignored
  * @param control     of TWgeo90_c(); the bounds of its grid with the window's index are used
  * @param undulation  metres
- * @param status      #TW_I_OUTSIDE_GEOID, #TW_GEOID_READ_ERROR, #TW_NO_MEMORY; undulation unwritten
+ * @param status      #TW_I_OUTSIDE_GEOID, #TW_GEOID_READ_ERROR, #TW_NO_MEMORY; undulation
+ *                    unwritten
  */
 TW_API void TWget_geo90(double lon, double lat, double height, const GeoidControl* control,
                         double* undulation, TWstatus* status);
@@ -630,9 +637,10 @@ TW_API void TWget_geo90(double lon, double lat, double height, const GeoidContro
  * @param data        22 rows of 22 floats: rows from the south, columns from the west
  * @param grid_index  index of the grid; 0 where none was opened
  * @param status      #TW_I_OUTSIDE_GEOID outside all grids, #TW_GEOID_READ_ERROR for a grid of
- * fewer than twelve rows or columns, or of impossible sizes, and for a file that cannot be opened:
- * window untouched; #TW_NO_MEMORY, and #TW_GEOID_READ_ERROR for a file that is too short: window
- * written, data untouched
+ *                    fewer than twelve rows or columns, or of impossible sizes, and for a file
+ *                    that cannot be opened: window untouched; #TW_NO_MEMORY, and
+ *                    #TW_GEOID_READ_ERROR for a file that is too short: window written, data
+ *                    untouched
  */
 TW_API void TWgeo90_local(double x, double y, double unused, const GeoidControl* control,
                           GeoidWindow* window, float* data, int32_t* grid_index, TWstatus* status);

@@ -97,8 +97,7 @@ TWstatus read_window(std::FILE* file, const GeoidGrid& grid, const GeoidWindow& 
   }
   const std::int64_t offset = first_record * record;
   const std::int64_t size = w.nr * record;
-  // The read would be short; a damaged header must not ask for a buffer larger than its file.
-  if (length_of(file) < offset + size) return TW_GEOID_READ_ERROR;
+  if (!may_hold(file, offset + size)) return TW_GEOID_READ_ERROR;
   const std::unique_ptr<unsigned char[]> buffer(
       new (std::nothrow) unsigned char[static_cast<std::size_t>(size)]);
   if (!buffer) return TW_NO_MEMORY;

@@ -3,7 +3,6 @@
 #include "datum/grid_file.hpp"
 
 #include <algorithm>
-#include <cmath>
 #include <cstring>
 #include <string_view>
 
@@ -86,6 +85,11 @@ std::int64_t length_of(std::FILE* file) {
 #endif
 }
 
+bool may_hold(std::FILE* file, std::int64_t end) {
+  constexpr std::int64_t kSmall = 1 << 24;
+  return end <= kSmall || end <= length_of(file);
+}
+
 bool read_exactly(std::FILE* file, void* bytes, std::size_t count) {
   return std::fread(bytes, 1, count, file) == count;
 }
@@ -104,12 +108,6 @@ bool read_header(const char* directory, const char* name, const char* extension,
              .dy = decode_f32(bytes + 88),
              .angle = decode_f32(bytes + 92)};
   return true;
-}
-
-std::int64_t cut(double value) {
-  constexpr double kMost = 2147483648.0;
-  if (std::isnan(value)) return 0;
-  return static_cast<std::int64_t>(std::clamp(value, -kMost, kMost));
 }
 
 }  // namespace tidewater

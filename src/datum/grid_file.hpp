@@ -3,6 +3,7 @@
 
 #include <array>
 #include <bit>
+#include <cmath>
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
@@ -55,6 +56,10 @@ bool seek_to(std::FILE* file, std::int64_t offset);
 // Bytes in the file, or -1; moves the file position.
 std::int64_t length_of(std::FILE* file);
 
+// False where the file ends before so many bytes.  It is only looked at for many: a damaged header
+// must not ask for memory that no file fills.
+bool may_hold(std::FILE* file, std::int64_t end);
+
 // True when all bytes could be read; what a shorter file has is in bytes then.
 bool read_exactly(std::FILE* file, void* bytes, std::size_t count);
 
@@ -90,6 +95,11 @@ constexpr std::int64_t record_bytes(std::int32_t nc) { return (std::int64_t{nc} 
 
 // A number cut to an integer towards zero. Out of a damaged file it may be anything: what lies
 // beyond 32 bits is held there, a not-a-number gives 0.
-std::int64_t cut(double value);
+inline std::int64_t cut(double value) {
+  constexpr double kMost = 2147483648.0;
+  if (std::fabs(value) <= kMost) return static_cast<std::int64_t>(value);
+  if (std::isnan(value)) return 0;
+  return static_cast<std::int64_t>(std::copysign(kMost, value));
+}
 
 }  // namespace tidewater

@@ -71,8 +71,7 @@ TWstatus read_tables(std::FILE* los, std::FILE* las, int32_t nc, std::int64_t ix
   }
   const std::int64_t offset = iy * record;
   const std::int64_t end = offset + kSide * record;
-  // Both reads would be short; a damaged header must not ask for a buffer larger than its file.
-  if (length_of(los) < end && length_of(las) < end) return TW_GRID_FILE_ERROR;
+  if (!may_hold(los, end) && !may_hold(las, end)) return TW_GRID_FILE_ERROR;  // both too short
   const std::unique_ptr<unsigned char[]> buffer(
       new (std::nothrow) unsigned char[static_cast<std::size_t>(kSide * record)]);
   if (!buffer) return TW_NO_MEMORY;

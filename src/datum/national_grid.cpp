@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <array>
+#include <bit>
 #include <cmath>
 #include <cstring>
 #include <limits>
@@ -64,6 +65,11 @@ struct OpenedGrid {
   OpenedGrid* earlier;
 };
 OpenedGrid* opened_grids = nullptr;
+
+// As one number, not as a call of the library for each sub-grid that is looked at.
+bool same(const Name& a, const Name& b) {
+  return std::bit_cast<uint64_t>(a) == std::bit_cast<uint64_t>(b);
+}
 
 Name decode_name(const unsigned char* p) {
   Name name;
@@ -129,7 +135,7 @@ Found find_subgrid(double x, double y) {
   for (int32_t level = 0; level < cnt_num_file; ++level) {
     Found best;
     for (int32_t i = 0; i < cnt_num_file; ++i) {
-      if (i == found.grid || cnt_subgrids[i].parent != parent) continue;
+      if (i == found.grid || !same(cnt_subgrids[i].parent, parent)) continue;
       const Code code = classify(cnt_subgrids[i], x, y);
       if (code < best.code) best = {i, code};
     }
@@ -151,42 +157,34 @@ void load_block(int32_t grid, int64_t node_row, int64_t node_col) {
   cnt_block_grid = grid;
   cnt_block_row = row;
   cnt_block_col = col;
-  for (int r = 0; r < kSide; ++r) {
-    // The last sub-grid may have fewer nodes than the block, with nothing behind them in the file:
-    // only nodes of the sub-grid must be there.
+  // One read for the four rows saves most of the time of a load, as long as they are near enough.
+  constexpr int64_t kMostBytes = 32768;
+  unsigned char bytes[kMostBytes];
+  const int64_t row_bytes = g.cols * kRecordBytes;
+  const int rows_at_once = (kSide - 1) * row_bytes + kSide * kRecordBytes <= kMostBytes ? kSide : 1;
+  for (int r = 0; r < kSide; r += rows_at_once) {
     const int64_t first = (row + r) * g.cols + col;
-    const auto needed = static_cast<std::size_t>(std::clamp<int64_t>(g.gs_count - first, 0, kSide));
-    unsigned char bytes[kSide * kRecordBytes] = {};
-    std::size_t got = 0;
+    const int64_t span = (rows_at_once - 1) * row_bytes + kSide * kRecordBytes;
+    std::size_t read = 0;
     if (seek_to(cnt_file, (g.first_record + first) * kRecordBytes)) {
-      got = std::fread(bytes, kRecordBytes, kSide, cnt_file);
+      read = std::fread(bytes, 1, static_cast<std::size_t>(span), cnt_file);
     }
-    if (got < needed) {
-      cnt_read_status = TW_GSB_READ_ERROR;  // the row keeps what it held
-      continue;
-    }
-    for (int c = 0; c < kSide; ++c) {
-      const unsigned char* p = bytes + c * kRecordBytes;
-      cnt_block[r][c] = {decode_f32(p), decode_f32(p + 4), decode_f32(p + 8), decode_f32(p + 12)};
+    const auto got = static_cast<int64_t>(read);
+    for (int k = 0; k < rows_at_once; ++k) {
+      // The last sub-grid may have fewer nodes than the block, with nothing behind them in the
+      // file: only nodes of the sub-grid must be there.
+      const int64_t nodes = std::clamp<int64_t>(g.gs_count - (first + k * g.cols), 0, kSide);
+      if (nodes > 0 && k * row_bytes + nodes * kRecordBytes > got) {
+        cnt_read_status = TW_GSB_READ_ERROR;  // the row keeps what it held
+        continue;
+      }
+      for (int64_t c = 0; c < nodes; ++c) {
+        const unsigned char* p = bytes + k * row_bytes + c * kRecordBytes;
+        cnt_block[r + k][c] = {decode_f32(p), decode_f32(p + 4), decode_f32(p + 8),
+                               decode_f32(p + 12)};
+      }
     }
   }
-}
-
-// A node of a sub-grid, by its row from the south and its column from the east, counted from 0.
-struct NodeIndex {
-  int64_t row, col;
-
-  bool in_block() const {
-    return row >= cnt_block_row && row < cnt_block_row + kSide && col >= cnt_block_col &&
-           col < cnt_block_col + kSide;
-  }
-};
-
-// Rounding may put a point a node beyond a sub-grid of absurdly small spacing.
-const Node& node_at(const NodeIndex& index) {
-  const int64_t row = std::clamp<int64_t>(index.row - cnt_block_row, 0, kSide - 1);
-  const int64_t col = std::clamp<int64_t>(index.col - cnt_block_col, 0, kSide - 1);
-  return cnt_block[row][col];
 }
 
 // Shifts in arc-seconds.
@@ -194,47 +192,69 @@ struct Shift {
   double lon, lat;
 };
 
+bool in_block(int64_t row, int64_t col) {
+  return row >= cnt_block_row && row < cnt_block_row + kSide && col >= cnt_block_col &&
+         col < cnt_block_col + kSide;
+}
+
 Shift interpolate(const Found& found, double x, double y) {
   const CntSubGrid& g = cnt_subgrids[found.grid];
   const double u = (x - g.e_long) / g.long_inc;
   const double v = (y - g.s_lat) / g.lat_inc;
-  const NodeIndex base = {whole_spacings(v), whole_spacings(u)};
-  NodeIndex west = {base.row, base.col + 1};
-  NodeIndex north = {base.row + 1, base.col};
-  NodeIndex northwest = {base.row + 1, base.col + 1};
-  if (found.code == kNorthEdge) {
-    northwest = west;
-    north = base;
-  } else if (found.code == kWestEdge) {
-    northwest = north;
-    west = base;
-  } else if (found.code == kNorthWestCorner) {
-    west = base;
-    north = base;
-    // Wanted: the corner keeps its fourth node where the point is held to lie a hair before it.
-    // Beyond the sub-grid there is none, and its weight is next to nothing.
-    if (northwest.row >= g.rows || northwest.col >= g.cols) northwest = base;
-  }
-  if (cnt_block_grid != found.grid || !base.in_block() || !northwest.in_block()) {
-    load_block(found.grid, base.row, base.col);
+  // The base node of the cell, from 0; on an edge it serves for the nodes beyond as well.
+  const int64_t row = whole_spacings(v);
+  const int64_t col = whole_spacings(u);
+  const int64_t to_west = found.code == kInside || found.code == kNorthEdge ? 1 : 0;
+  const int64_t to_north = found.code == kInside || found.code == kWestEdge ? 1 : 0;
+  // Wanted: at the corner the fourth node is still that of the cell, which has all the weight for a
+  // point that lies a hair before it.  Beyond the sub-grid there is none, and next to no weight.
+  const bool own_corner = found.code == kNorthWestCorner && row + 1 < g.rows && col + 1 < g.cols;
+  const int64_t to_corner_row = own_corner ? 1 : to_north;
+  const int64_t to_corner_col = own_corner ? 1 : to_west;
+  if (cnt_block_grid != found.grid || !in_block(row, col) ||
+      !in_block(row + to_corner_row, col + to_corner_col)) {
+    load_block(found.grid, row, col);
   }
 
-  const double fx = u - static_cast<double>(base.col);
-  const double fy = v - static_cast<double>(base.row);
-  const Node& b = node_at(base);
-  const Node& w = node_at(west);
-  const Node& n = node_at(north);
-  const Node& nw = node_at(northwest);
-  const auto bilinear = [fx, fy](double at_base, double at_west, double at_north, double at_nw) {
-    const double on_south = at_base + (at_west - at_base) * fx;
-    const double on_north = at_north + (at_nw - at_north) * fx;
+  // Rounding may put a point a node beyond a sub-grid of absurdly small spacing.
+  const int64_t r = std::clamp<int64_t>(row - cnt_block_row, 0, kSide - 1);
+  const int64_t c = std::clamp<int64_t>(col - cnt_block_col, 0, kSide - 1);
+  const auto held = [](int64_t index) { return std::min<int64_t>(index, kSide - 1); };
+  const Node& base = cnt_block[r][c];
+  const Node& west = cnt_block[r][held(c + to_west)];
+  const Node& north = cnt_block[held(r + to_north)][c];
+  const Node& northwest = cnt_block[held(r + to_corner_row)][held(c + to_corner_col)];
+  const double fx = u - static_cast<double>(col);
+  const double fy = v - static_cast<double>(row);
+  const auto bilinear = [&](float Node::*field) {
+    const auto b = static_cast<double>(base.*field);
+    const auto w = static_cast<double>(west.*field);
+    const auto n = static_cast<double>(north.*field);
+    const auto nw = static_cast<double>(northwest.*field);
+    const double on_south = b + (w - b) * fx;
+    const double on_north = n + (nw - n) * fx;
     return on_south + (on_north - on_south) * fy;
   };
-  const auto wide = [](float value) { return static_cast<double>(value); };
-  return {
-      bilinear(wide(b.lon_shift), wide(w.lon_shift), wide(n.lon_shift), wide(nw.lon_shift)),
-      bilinear(wide(b.lat_shift), wide(w.lat_shift), wide(n.lat_shift), wide(nw.lat_shift)),
-  };
+  return {bilinear(&Node::lon_shift), bilinear(&Node::lat_shift)};
+}
+
+// Shift of a point in radians, with the call's word; unwritten outside all sub-grids.
+TWstatus shift_at(double lon, double lat, double* lon_shift, double* lat_shift) {
+  lon = add_turns_while(lon, kTwoPi, [](double v) { return v <= 0; });
+  lon = add_turns_while(lon, -kTwoPi, [](double v) { return v > kTwoPi; });
+  lon = add_turns_while(lon, -kTwoPi, [](double v) { return v >= kPi; });
+  // Wanted: the sub-grids' longitudes, positive west, are compared with the magnitude alone, so
+  // that a point east of Greenwich takes the shift of its mirror image.
+  const double sign = lon >= 0 ? 1 : -1;
+  const double x = std::fabs(lon) * kArcSecondsPerRadian;
+  const double y = lat * kArcSecondsPerRadian;
+  const Found found = find_subgrid(x, y);
+  if (found.grid == kNone) return TW_I_OUTSIDE_CNT;
+  cnt_read_status = TW_SUCCESS;
+  const Shift shift = interpolate(found, x, y);
+  *lon_shift = shift.lon * sign * kRadiansPerArcSecond;
+  *lat_shift = shift.lat * kRadiansPerArcSecond;
+  return cnt_read_status;
 }
 
 // Reads the header of the file and those of its sub-grids.
@@ -331,28 +351,10 @@ void TWload_cnt_local_grid(int32_t sub_grid, int32_t record) {
 
 void TWget_cnt_shift(CoordinateTriple point, int32_t /*reserved*/, double* lon_shift,
                      double* lat_shift, TWstatus* status) {
-  *status = TW_SUCCESS;
-  double lon = add_turns_while(point.x, kTwoPi, [](double v) { return v <= 0; });
-  lon = add_turns_while(lon, -kTwoPi, [](double v) { return v > kTwoPi; });
-  lon = add_turns_while(lon, -kTwoPi, [](double v) { return v >= kPi; });
-  // Wanted: the sub-grids' longitudes, positive west, are compared with the magnitude alone, so
-  // that a point east of Greenwich takes the shift of its mirror image.
-  const double sign = lon >= 0 ? 1 : -1;
-  const double x = std::fabs(lon) * kArcSecondsPerRadian;
-  const double y = point.y * kArcSecondsPerRadian;
-  const Found found = find_subgrid(x, y);
-  if (found.grid == kNone) {
-    *status = TW_I_OUTSIDE_CNT;
-    return;
-  }
-  cnt_read_status = TW_SUCCESS;
-  const Shift shift = interpolate(found, x, y);
-  *lon_shift = shift.lon * sign * kRadiansPerArcSecond;
-  *lat_shift = shift.lat * kRadiansPerArcSecond;
-  *status = cnt_read_status;
+  *status = shift_at(point.x, point.y, lon_shift, lat_shift);
 }
 
-void TWcnt_f(int32_t count, const CoordinateTriple* in, int32_t reserved, CoordinateTriple* out,
+void TWcnt_f(int32_t count, const CoordinateTriple* in, int32_t /*reserved*/, CoordinateTriple* out,
              TWstatus* status) {
   *status = TW_SUCCESS;
   bool outside = false;
@@ -360,7 +362,7 @@ void TWcnt_f(int32_t count, const CoordinateTriple* in, int32_t reserved, Coordi
     const CoordinateTriple point = in[i];
     double dlon = 0;
     double dlat = 0;
-    TWget_cnt_shift(point, reserved, &dlon, &dlat, status);
+    *status = shift_at(point.x, point.y, &dlon, &dlat);
     if (!TW_OK(*status)) return;
     if (*status == TW_I_OUTSIDE_CNT) {
       out[i] = point;
@@ -373,7 +375,7 @@ void TWcnt_f(int32_t count, const CoordinateTriple* in, int32_t reserved, Coordi
   if (outside) *status = TW_I_OUTSIDE_CNT;
 }
 
-void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t reserved, CoordinateTriple* out,
+void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t /*reserved*/, CoordinateTriple* out,
              TWstatus* status) {
   constexpr int kPasses = 4;
   *status = TW_SUCCESS;
@@ -384,7 +386,7 @@ void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t reserved, Coordi
     double dlat = 0;
     for (int pass = 0; pass < kPasses; ++pass) {
       // A pass outside leaves the shifts as they are.
-      TWget_cnt_shift({point.x - dlon, point.y - dlat, point.z}, reserved, &dlon, &dlat, status);
+      *status = shift_at(point.x - dlon, point.y - dlat, &dlon, &dlat);
       if (!TW_OK(*status)) return;
     }
     if (*status == TW_I_OUTSIDE_CNT) {  // the last pass alone decides

@@ -4,11 +4,20 @@
 #include <algorithm>
 #include <bit>
 #include <cstdint>
+#include <filesystem>
+#include <fstream>
 #include <functional>
+#include <sstream>
 #include <string>
 #include <vector>
 
 namespace tidewater::test {
+
+inline std::string file_bytes(const std::filesystem::path& path) {
+  std::ostringstream all;
+  all << std::ifstream(path, std::ios::binary).rdbuf();
+  return all.str();
+}
 
 inline void append_u32(std::string& bytes, std::uint32_t v) {
   for (int shift = 0; shift < 32; shift += 8) bytes += static_cast<char>(v >> shift & 0xFF);

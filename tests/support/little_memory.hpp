@@ -1,4 +1,4 @@
-// Runs work in a process of its own that cannot have more than 4 GB of memory, so that a large
+// Runs work in a process of its own that has little memory, so that a large
 // allocation fails.  The address sanitizer reserves more than that for itself.
 #pragma once
 
@@ -13,7 +13,7 @@ namespace tidewater::test {
 
 template <class Work>
 [[noreturn]] void exit_with_little_memory(Work work) {
-  const rlim_t size = rlim_t{1} << 32;
+  constexpr rlim_t size = 600u << 20;
   const rlimit limit = {size, size};
   std::_Exit(setrlimit(RLIMIT_AS, &limit) == 0 && work() ? 0 : 1);
 }

@@ -2,12 +2,11 @@
 
 #include <array>
 #include <cstring>
-#include <fstream>
 #include <random>
-#include <sstream>
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
+#include "support/little_memory.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
 #include "tidewater/datum.h"
@@ -161,10 +160,7 @@ TEST_F(Geoid, RealGridsAtTheirNodesAndBetween) {
   EXPECT_STREQ(opened.control.grids[1].name, "europe96");
   std::mt19937 random(96);
   for (const char* name : {"namer96", "europe96"}) {
-    std::ostringstream all;
-    all << std::ifstream(shared_data() / "geoid" / (std::string(name) + ".geo"), std::ios::binary)
-               .rdbuf();
-    const std::string bytes = all.str();
+    const std::string bytes = file_bytes(shared_data() / "geoid" / (std::string(name) + ".geo"));
     const int nc = i32_at(bytes, 64), nr = i32_at(bytes, 68);
     const double xmin = f32_at(bytes, 76), dx = f32_at(bytes, 80);
     const double ymin = f32_at(bytes, 84), dy = f32_at(bytes, 88);
@@ -455,7 +451,7 @@ TEST_F(GeoidMoves, OffThePointIsAnError) {
   // In the first cell, with the other grid beginning at the point's own meridian: two columns are
   // left, which is too few to interpolate in.
   write_grid(folder, "wide", {-100, 0, 81, 81, place});
-  write_grid(folder, "other", box(-99.5F, 10, -30, 70));
+  write_grid(folder, "other", box(-99.5F, -5, -30, 70));
   const Opened opened = open(folder, {"wide", "other"});
   Loaded(opened.control, -99.5, 5.5).expect_nodes(-100, 0, 0, 0, 22, 2);
   CoordinateTriple out = kUntouchedPoint;
@@ -678,6 +674,29 @@ TEST_F(Geoid, HeadersOfImpossibleSizes) {
     write_grid(folder, "g", {-100, 20, 60, 50, place, spacing, 1});
     EXPECT_EQ(Loaded(open(folder, {"g"}).control, -95.5, 23.5).status, TW_I_OUTSIDE_GEOID);
   }
+}
+
+TEST_F(Geoid, NoMemoryForTheRecords) {
+  TIDEWATER_NEED_MEMORY_LIMIT();
+  // Twenty-two records of 64 megabytes, in a file without content.
+  constexpr std::int32_t kColumns = 1 << 24;
+  std::string bytes(64, ' ');
+  for (const std::int32_t n : {kColumns, 30, 1}) append_i32(bytes, n);
+  for (const float f : {-100.0F, 4e-6F, 20.0F, 1.0F, 0.0F}) append_f32(bytes, f);
+  folder.write("g.geo", bytes);
+  fs::resize_file(folder.path() / "g.geo", 4 * (std::uintmax_t{kColumns} + 1) * 31);
+  const Opened opened = open(folder, {"g"});
+  EXPECT_EQ(opened.status, TW_SUCCESS);
+  const auto fails = [&] {
+    const Loaded loaded(opened.control, -95.5, 35.5);
+    CoordinateTriple out = kUntouchedPoint;
+    const CoordinateTriple in = at(-95.5, 35.5);
+    TWstatus status = 0;
+    TWgeo90_f(1, &in, &opened.control, &out, &status);
+    return loaded.status == TW_NO_MEMORY && loaded.window.nc == 22 && loaded.window.ymin == 25 &&
+           loaded.data[0] == -1 && status == TW_NO_MEMORY && out.z == kUntouched;
+  };
+  expect_with_little_memory(fails);
 }
 
 TEST_F(Geoid, DamagedHeadersDoNoHarm) {

@@ -2,12 +2,11 @@
 
 #include <array>
 #include <cstring>
-#include <fstream>
 #include <random>
-#include <sstream>
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
+#include "support/little_memory.hpp"
 #include "support/points.hpp"
 #include "tidewater/datum.h"
 
@@ -18,12 +17,6 @@ namespace {
 
 CoordinateTriple at(double lon, double lat, double height = 5) {
   return {degrees(lon), degrees(lat), height};
-}
-
-std::string file_bytes(const fs::path& path) {
-  std::ostringstream all;
-  all << std::ifstream(path, std::ios::binary).rdbuf();
-  return all.str();
 }
 
 // Every node tells its place: longitude shifts 100 row + col, latitude shifts the negative.
@@ -976,6 +969,32 @@ TEST_F(Nadcon, CountThatNoBlockCanHold) {
   EXPECT_EQ(Loaded(opened.control, -95.5, 23.5).status, TW_I_OUTSIDE_NADCON);
   opened.control.grid_count = -3;
   EXPECT_EQ(Loaded(opened.control, -95.5, 23.5).status, TW_I_OUTSIDE_NADCON);
+}
+
+TEST_F(Nadcon, NoMemoryForTheRecords) {
+  TIDEWATER_NEED_MEMORY_LIMIT();
+  // Four records of a quarter of a gigabyte, in files without content.
+  constexpr std::int32_t kColumns = 1 << 26;
+  std::string bytes(64, ' ');
+  for (const std::int32_t n : {kColumns, 6, 1}) append_i32(bytes, n);
+  for (const float f : {-100.0F, 1e-6F, 20.0F, 1.0F, 0.0F}) append_f32(bytes, f);
+  for (const char* name : {"g.los", "g.las"}) {
+    folder.write(name, bytes);
+    fs::resize_file(folder.path() / name, 4 * (std::uintmax_t{kColumns} + 1) * 7);
+  }
+  const Opened opened = open(folder, "g\n");
+  EXPECT_EQ(opened.status, TW_SUCCESS);
+  const auto fails = [&] {
+    const Loaded loaded(opened.control, -95.5, 22.5);
+    CoordinateTriple out = kUntouchedPoint;
+    const CoordinateTriple in = at(-95.5, 22.5);
+    TWstatus status = 0;
+    TWnadcon_f(1, &in, &opened.control, &out, &status);
+    return loaded.status == TW_NO_MEMORY && loaded.window.nc == 4 && loaded.window.ymin == 21 &&
+           loaded.lon[0] == kUntouched && loaded.lat[0] == kUntouched && status == TW_NO_MEMORY &&
+           out.x == kUntouched;
+  };
+  expect_with_little_memory(fails);
 }
 
 TEST_F(Nadcon, DamagedHeadersDoNoHarm) {

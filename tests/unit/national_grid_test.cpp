@@ -5,10 +5,10 @@
 #include <cstring>
 #include <fstream>
 #include <random>
-#include <sstream>
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
+#include "support/little_memory.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
 #include "tidewater/datum.h"
@@ -121,9 +121,7 @@ TEST_F(NationalGrid, CanadasGridAgainstItsNodes) {
   TWstatus status = 0;
   TWcnt_c((shared_data() / "ntv2/").c_str(), 0, &status);
   ASSERT_EQ(status, TW_SUCCESS);
-  std::ostringstream all;
-  all << std::ifstream(shared_data() / "ntv2/canada.gsb", std::ios::binary).rdbuf();
-  const std::string bytes = all.str();
+  const std::string bytes = file_bytes(shared_data() / "ntv2/canada.gsb");
 
   struct Header {
     std::string name, parent;
@@ -709,6 +707,22 @@ TEST_F(NationalGrid, SmallLastSubGridNeedsNoEndRecord) {
       for (double c = 0; c <= lon_cells; c += 0.25) expect_plane(100 + c, 40 + r);
     }
   }
+}
+
+TEST_F(NationalGrid, NoMemoryForTheTable) {
+  TIDEWATER_NEED_MEMORY_LIMIT();
+  // As many headers as the file has room for, in a file without content.
+  GsbFile file{{root()}};
+  file.num_file = 1 << 23;
+  folder.write("grid.gsb", file.bytes());
+  folder.write("area.par", "grid\n");
+  fs::resize_file(folder.path() / "grid.gsb", 176 * ((std::uintmax_t{1} << 23) + 1));
+  const auto fails = [&] {
+    TWstatus status = 0;
+    TWcnt_c(folder.directory().c_str(), 0, &status);
+    return status == TW_NO_MEMORY && shift_at(west(107.5, 45.5)).status == TW_I_OUTSIDE_CNT;
+  };
+  expect_with_little_memory(fails);
 }
 
 TEST_F(NationalGrid, DamagedHeadersDoNoHarm) {
