@@ -159,7 +159,7 @@ class EllipsoidInverse {
     const double xr = x * inverse_R;
     const double yr = y * inverse_R + lat0_;
     const double off = yr - p;
-    if (!(std::fabs(off) < 0.02 && std::fabs(xr) < 0.2 * at.cos && at.cos > 0.1 &&
+    if (!(std::fabs(off) < 0.02 && std::fabs(xr) < 0.2 * at.cos && std::fabs(p) < 1.47 &&
           std::fabs(y) < 3 && e2_ <= 0.01)) {
       return false;
     }
