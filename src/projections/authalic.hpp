@@ -1,9 +1,8 @@
 // The function q of the equal-area projections.
 #pragma once
 
-#include <cmath>
-
 #include "foundation/numeric.hpp"
+#include "projections/isometric_latitude.hpp"
 
 namespace tidewater {
 
@@ -11,9 +10,9 @@ namespace tidewater {
 // limit 2 sin p on the sphere (Snyder 1987, eq. 3-12).  The logarithm is -2 atanh(e sin p), which
 // keeps its digits where e is small.
 inline double authalic_q(double e, double sin_lat) {
-  if (e == 0) return 2 * sin_lat;
-  const double es = e * sin_lat;
-  return (sin_lat / (1 - square(es)) + std::atanh(es) / e) * (1 - square(e));
+  const double e2 = square(e);
+  if (e2 == 0) return 2 * sin_lat;
+  return (sin_lat / (1 - e2 * square(sin_lat)) + eccentric_term(e, sin_lat) / e2) * (1 - e2);
 }
 
 }  // namespace tidewater

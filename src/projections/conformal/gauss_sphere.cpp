@@ -24,6 +24,16 @@ constexpr double kSphereMark = -1.0;
 
 bool is_sphere(double c) { return c < 0; }
 
+// The Mercator projection with e = 0 and its inverse, which needs no passes: the plane's longitudes
+// are wrapped as TWmerc_f and TWmerc_i do it.
+CoordinateTriple plane_of_sphere(double lon, double lat) {
+  return {wrap_above_then_below(lon), std::log(std::tan(lat / 2 + kQuarterPi)), 0};
+}
+
+CoordinateTriple sphere_of_plane(double x, double y) {
+  return {wrap_at_or_below_then_above(x), kHalfPi - 2 * std::atan(std::exp(-y)), 0};
+}
+
 }  // namespace
 
 void TWgaussII_c(double e, double lat0, double* chi0, double* c, double* t, double* R,
@@ -90,7 +100,9 @@ void TWgaussII_f(double e, double lon0, double c, double t, int32_t count,
     }
     TWmerc_f(e, lon0, 0.0, 1, in + i, out + i, status);
     TWgauII_f(c, t, 1, out + i, out + i, status);
-    TWmerc_i(0.0, 0.0, 0.0, 1, out + i, out + i, status);
+    const CoordinateTriple at = sphere_of_plane(out[i].x, out[i].y);
+    out[i].x = at.x;
+    out[i].y = at.y;
   }
 }
 
@@ -106,7 +118,9 @@ void TWgaussII_i(double e, double lon0, double c, double t, int32_t count,
       out[i].y = y;
       continue;
     }
-    TWmerc_f(0.0, 0.0, 0.0, 1, in + i, out + i, status);
+    const CoordinateTriple plane = plane_of_sphere(x, y);
+    out[i].x = plane.x;
+    out[i].y = plane.y;
     TWgauII_i(c, t, 1, out + i, out + i, status);
     TWmerc_i(e, lon0, 0.0, 1, out + i, out + i, status);
   }

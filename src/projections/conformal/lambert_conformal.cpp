@@ -22,6 +22,36 @@ double radius_of_parallel(double e, double lat) {
   return parallel_radius(square(e), std::sin(lat), std::cos(lat));
 }
 
+// t(p) of a latitude whose sine and cosine are at hand.  The half angle's tangent comes from them;
+// towards the poles, where a last bit of pi/4 - p/2 counts, from that difference.
+double colatitude_tangent(double e, double lat, double s, double c) {
+  if (std::fabs(lat) > 1.4) return isometric_colatitude_tangent(e, lat);
+  const double opposite = s < 0 ? 1 - s : c;
+  const double adjacent = s < 0 ? c : 1 + s;
+  return opposite / (adjacent * eccentric_factor(e, s));
+}
+
+// The latitude whose t(p) is w, by passes of the fixed point, fifteen at most.
+double latitude_of(double e, double w, TWstatus* status) {
+  // A pass brings a latitude nearer by the factor e^2 / (1 - e^2) at least, so that up to this
+  // eccentricity they come to rest within nine: Newton's method gets there with the same word.
+  if (std::fabs(e) <= kSeriesEccentricity) return latitude_at_rest(e, w);
+  constexpr int kMostPasses = 15;
+  double lat = kHalfPi - 2 * std::atan(w);
+  double old = 0;
+  int passes = 0;
+  do {
+    old = lat;
+    lat = next_latitude(e, w, old);
+    if (++passes == kMostPasses) {
+      // Wanted: a point that comes to rest in this very pass is told so too.
+      *status = TW_I_LATITUDE_LIMITED;
+      break;
+    }
+  } while (std::fabs(old - lat) > 1e-14);
+  return lat;
+}
+
 }  // namespace
 
 void TWlam_c(double e, double /*lon0*/, double lat0, double lat1, double lat2, double* C, double* n,
@@ -96,7 +126,8 @@ void TWlam_f(double e, double lon0, double C, double n, double rho0, int32_t cou
       out[i].y = rho0;
       continue;
     }
-    const double rho = std::pow(isometric_colatitude_tangent(e, lat), n) * C;
+    const double t = colatitude_tangent(e, lat, std::sin(lat), std::cos(lat));
+    const double rho = std::pow(t, n) * C;
     const double theta = d * n;
     out[i].x = rho * std::sin(theta);
     out[i].y = rho0 - rho * std::cos(theta);
@@ -106,7 +137,6 @@ void TWlam_f(double e, double lon0, double C, double n, double rho0, int32_t cou
 void TWlam_i(double e, double lon0, double C, double n, double rho0, int32_t count,
              CoordinateTriple* out, const CoordinateTriple* in, TWstatus* status) {
   *status = TW_SUCCESS;
-  constexpr int kMostPasses = 15;
   const double sign = n < 0 ? -1 : 1;
   const double inv = 1 / n;
   for (int32_t i = 0; i < count; ++i) {
@@ -114,29 +144,18 @@ void TWlam_i(double e, double lon0, double C, double n, double rho0, int32_t cou
     const double y = in[i].y;
     double lon = lon0;
     double lat = 0;
-    if (rho0 == 0 && std::hypot(x, y) < 1e-13) {
+    if (rho0 == 0 && std::sqrt(square(x) + square(y)) < 1e-13) {
       lat = n < 0 ? -kHalfPi : kHalfPi;
     } else {
       const double from_apex = rho0 - y;
-      const double rho = std::hypot(x, from_apex) * sign;
+      const double rho = std::sqrt(square(x) + square(from_apex)) * sign;
       double theta = 0;
       if (std::fabs(rho) > 1e-13) {
         theta = n > 0 ? std::atan2(x, from_apex) : std::atan2(-x, -from_apex);
       }
       lon = theta * inv + lon0;
       const double w = std::pow(rho / C, inv);
-      lat = kHalfPi - 2 * std::atan(w);
-      double old = 0;
-      int passes = 0;
-      do {
-        old = lat;
-        lat = next_latitude(e, w, old);
-        if (++passes == kMostPasses) {
-          // Wanted: a point that comes to rest in this very pass is told so too.
-          *status = TW_I_LATITUDE_LIMITED;
-          break;
-        }
-      } while (std::fabs(old - lat) > 1e-14);
+      lat = latitude_of(e, w, status);
     }
     lon = wrap_at_or_below_then_above(lon);
     if (std::fabs(std::fabs(lat) - kHalfPi) < 1e-13) lon = lon0;  // as given, not wrapped

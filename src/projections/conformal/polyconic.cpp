@@ -91,7 +91,7 @@ void TWpolycon_i(double e, double lon0, double m0, int32_t count, const Coordina
     }
     const double B = square(x) + square(A);
     double lat = A;
-    double next = A;
+    double next;
     double s = 0;
     double C = 0;
     for (int pass = 0;; ++pass) {
