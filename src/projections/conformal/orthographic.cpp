@@ -126,7 +126,8 @@ void TWortho_i(double /*a*/, double e, double lon0, double lat0, double x0, doub
       }
       held_lon = llh.x;
       held_lat = llh.y;
-      z = g2 / dz + z;
+      // A point that stands on the surface to the last bit stays: nothing over nothing is no step.
+      if (dz != 0) z = g2 / dz + z;
       if (pass > kMostPasses) {
         *status = TW_I_LATITUDE_LIMITED;  // the values at hand are written
         break;
