@@ -14,6 +14,10 @@ constexpr double kPoleMargin = 1e-12;
 // Below this eccentricity the meridian functions take the sphere.
 constexpr double kSphereLimit = 1e-12;
 
+// Third flattening up to which the inverse takes Newton's method; ellipsoids of the earth have
+// 0.0017.
+constexpr double kNewtonLimit = 0.003;
+
 double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
 
 }  // namespace
@@ -47,6 +51,13 @@ double MeridianArc::tail(double lat) const {
   return (((t3_ * c + t2_) * c + t1_) * c + t0_) * std::sin(2 * lat);
 }
 
+double MeridianArc::tail_slope(double lat) const {
+  const double c = std::cos(2 * lat);
+  const double s = std::sin(2 * lat);
+  return 2 * c * (((t3_ * c + t2_) * c + t1_) * c + t0_) -
+         2 * s * s * ((3 * t3_ * c + 2 * t2_) * c + t1_);
+}
+
 TWstatus MeridianArc::forward(double lat, double* distance) const {
   if (bad_ != TW_SUCCESS) return bad_;
   TWstatus status = TW_SUCCESS;
@@ -73,18 +84,29 @@ TWstatus MeridianArc::inverse(double distance, double* lat) const {
     *lat = distance / a_;
     return TW_SUCCESS;
   }
-  constexpr int kMostRounds = 50;
   const double start = distance * (1 + n_) / (mean_ * a_);
   double p = start;
-  double previous = 0;
-  int rounds = 0;
-  do {
-    previous = p;
-    p = start - tail(previous) / mean_;
-    ++rounds;
-  } while (!(std::fabs(p - previous) <= 1e-12) && rounds < kMostRounds);
-  // Wanted: the count alone decides, also when the last round did converge.
-  if (rounds == kMostRounds || std::fabs(p) > kHalfPi) return TW_BAD_PARAMETER;
+  if (n_ < kNewtonLimit) {
+    // Where the rounds below come to rest within a few, Newton's method is there in two steps.
+    double step = 0;
+    do {
+      step = (p - start + tail(p) / mean_) / (1 + tail_slope(p) / mean_);
+      p -= step;
+    } while (std::fabs(step) > 1e-6);  // what is left is of the order of its square
+  } else {
+    constexpr int kMostRounds = 50;
+    double previous = 0;
+    int rounds = 0;
+    do {
+      previous = p;
+      p = start - tail(previous) / mean_;
+      ++rounds;
+    } while (!(std::fabs(p - previous) <= 1e-12) && rounds < kMostRounds);
+    // Wanted: the count alone decides, also when the last round did converge.
+    if (rounds == kMostRounds) return TW_BAD_PARAMETER;
+  }
+  // Also for a not-a-number, with which the rounds would run into their limit.
+  if (!(std::fabs(p) <= kHalfPi)) return TW_BAD_PARAMETER;
   *lat = p;
   return TW_SUCCESS;
 }

@@ -18,7 +18,8 @@ class MeridianArc {
   TWstatus inverse(double distance, double* lat) const;
 
  private:
-  double tail(double lat) const;
+  double tail(double lat) const;        // T(p)
+  double tail_slope(double lat) const;  // dT/dp
 
   double a_;
   bool sphere_;

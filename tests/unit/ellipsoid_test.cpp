@@ -168,6 +168,11 @@ TEST(MeridianArc, RoundTripAndNotANumber) {
     const double arc = ask(TWmerid_dist_f, a, e, lat).value;
     EXPECT_NEAR(ask(TWmerid_dist_i, a, e, arc).value, lat, 1e-13);
   }
+  // an ellipsoid flat enough for the rounds to be taken one by one
+  for (double lat = -1.5; lat < 1.51; lat += 0.1) {
+    const double arc = ask(TWmerid_dist_f, 1, 0.2, lat).value;
+    EXPECT_NEAR(ask(TWmerid_dist_i, 1, 0.2, arc).value, lat, 1e-12);
+  }
   // rounds that never come to rest run into their limit
   EXPECT_EQ(ask(TWmerid_dist_i, a, e, kNaN).status, TW_BAD_PARAMETER);
   EXPECT_EQ(ask(TWmerid_dist_i, a, e, kNaN).value, kUntouched);
