@@ -847,7 +847,8 @@ TW_API void TWstereo3_i(double e, double lon0, double chi_g, double c, double t,
 
 /** @name Azimuthal equidistant projection of the ellipsoid (Snyder 1987, pp. 191-202)
  *
- *  By a series in the distance, good to centimetres some hundred kilometres from the origin; past a
+ *  By a series in the distance along the normal section: within millimetres 600 km from the
+ *  origin, with an azimuth that is off that of the geodesic by up to 6e-6 radians there.  Past a
  *  quarter turn on the meridian of the origin the distance is the meridian arc.
  *  @{ */
 
@@ -944,7 +945,8 @@ TW_API void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, d
 
 /**
  * Inverse (Snyder 1987, eq. 20-14, 24-28 to 24-31, 3-16), to 1e-13 radians.  A longitude of exactly
- * -pi becomes pi.
+ * -pi becomes pi.  From a polar origin of the ellipsoid a point past the equator comes out MIRRORED
+ * in the equator.
  * @param in                 x, y
  * @param count              number of points
  * @param e                  first eccentricity

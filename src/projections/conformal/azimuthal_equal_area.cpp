@@ -230,6 +230,7 @@ void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double l
       double q = 0;
       if (polar) {
         const double rho = std::sqrt(x * x + y * y);
+        // Wanted: without its sign, so that a point past the equator comes out mirrored in it.
         q = std::fabs(qp - rho * rho);
         if (lat0 < 0) q = -q;
         lon = std::atan2(x, lat0 < 0 ? y : -y) + lon0;

@@ -71,10 +71,13 @@ void TWaz_eq_f(double e, double lon0, double lat0, double n1, double g, int32_t 
     double sin_az = std::sin(azimuth);
     double cos_az = std::cos(azimuth);
     const bool on_meridian = std::fabs(sin_az) < kEpsilon;
-    const double spherical = std::acos(cos_d * cos_lat * cos_lat0 + sin_lat * sin_lat0);
+    // Wanted: the arc cosine is not held, and is not a number a hair beyond the antipode.  Below
+    // zero alone it can be more than a quarter turn.
+    const double cc = cos_d * cos_lat * cos_lat0 + sin_lat * sin_lat0;
+    const bool far_side = cc <= 0 && std::acos(cc) > kHalfPi;
 
     double c = 0;
-    if (on_meridian && (spherical > kHalfPi || std::fabs(d) > kHalfPi)) {
+    if (on_meridian && (far_side || std::fabs(d) > kHalfPi)) {
       // Along the meridian and past a quarter turn the series is left for the arc.  Each arc sets
       // the word anew: that of the last one stands.
       double m1 = 0;
@@ -104,7 +107,7 @@ void TWaz_eq_f(double e, double lon0, double lat0, double n1, double g, int32_t 
       } else {
         s = std::asin(std::clamp(sin_d * std::cos(psi) / sin_az, -1.0, 1.0));
       }
-      if (spherical > kHalfPi) s = beyond_quarter(s);
+      if (far_side) s = beyond_quarter(s);
       const double h = cos_az * h0;
       const double h2 = h * h;
       const double s2 = s * s;

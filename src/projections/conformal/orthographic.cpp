@@ -73,8 +73,9 @@ void TWortho_f(double /*a*/, double e, double lon0, double lat0, double x0, doub
     }
     const double sin_lat = std::sin(lat);
     const double cos_lat = std::cos(lat);
-    const double c = std::acos(cos_lat * std::cos(lon - lon0) * cos_lat0 + sin_lat * sin_lat0);
-    if (c > kHalfPi) {  // beyond the horizon
+    // The arc cosine decides, but below zero alone it can be more than a quarter turn.
+    const double cc = cos_lat * std::cos(lon - lon0) * cos_lat0 + sin_lat * sin_lat0;
+    if (cc <= 0 && std::acos(cc) > kHalfPi) {  // beyond the horizon
       *status = TW_I_LATITUDE_LIMITED;
       return;
     }
@@ -126,7 +127,8 @@ void TWortho_i(double /*a*/, double e, double lon0, double lat0, double x0, doub
       }
       held_lon = llh.x;
       held_lat = llh.y;
-      z = g2 / dz + z;
+      // A point that stands on the surface to the last bit stays: nothing over nothing is no step.
+      if (dz != 0) z = g2 / dz + z;
       if (pass > kMostPasses) {
         *status = TW_I_LATITUDE_LIMITED;  // the values at hand are written
         break;

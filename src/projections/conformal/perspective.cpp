@@ -54,18 +54,19 @@ class EllipsoidSight {
     const double f = -2 * b_ * a1_ * h_ - 2 * d_ * a2_ * y + d_ * h_ * a3_ + b_ * a3_ * y;
     const double quadratic = a2_ * y * y + a1_ * h_ * h_ - h_ * a3_ * y + a4_ * x * x;
     double grown = 1.0;
+    double t = 0;
+    double v = 0;
     LonLat at = {0, 0, false};
-    for (int pass = 0; pass < kMostPasses; ++pass) {
+    for (int pass = 0; pass < kMostPasses && !at.done; ++pass) {
       const double g = from_center_ - a4_ * grown;
-      const double t = (std::sqrt(f * f - 4 * g * quadratic) - f) / (2 * g);
-      const double v = y / t - d_;
+      t = (std::sqrt(f * f - 4 * g * quadratic) - f) / (2 * g);
+      v = y / t - d_;
       const double u = (b_ - h_ / t) * sin0_ + v * cos0_;
-      at.lon = std::atan2(a_ * x / t, ((b_ - h_ / t) * cos0_ - v * sin0_) * a_) + lon0_;
       if (pass == 0) {
         if (height == 0) {
           at.lat = std::atan(u / std::sqrt((a4_ - u * u) * a4_));
           at.done = true;
-          return at;
+          break;
         }
         at.lat = std::asin(u);
       }
@@ -73,13 +74,11 @@ class EllipsoidSight {
       const double s2 = square(std::sin(previous));
       const double w = 1 - s2 * e2_;
       at.lat = std::asin(u / (a4_ / std::sqrt(w) + height / a_));
-      if (std::fabs(at.lat - previous) < 1e-12) {
-        at.done = true;
-        return at;
-      }
+      at.done = std::fabs(at.lat - previous) < 1e-12;
       grown = square(1 / std::sqrt(w) + height / a_) -
               (1 / w - height * height / (a_ * a_ - a_ * a_ * e2_)) * s2 * e2_;
     }
+    at.lon = std::atan2(a_ * x / t, ((b_ - h_ / t) * cos0_ - v * sin0_) * a_) + lon0_;
     return at;
   }
 
@@ -97,29 +96,28 @@ class SphereSight {
     const double f = -2 * p_ * h_;
     const double quadratic = y * y + x * x + h_ * h_;
     double grown = 1.0;
+    double t = 0;
+    double v = 0;
     LonLat at = {0, 0, false};
-    for (int pass = 0; pass < kMostPasses; ++pass) {
+    for (int pass = 0; pass < kMostPasses && !at.done; ++pass) {
       const double g = p_ * p_ - grown;
-      const double t = (std::sqrt(f * f - 4 * g * quadratic) - f) / (2 * g);
-      const double v = y / t;
+      t = (std::sqrt(f * f - 4 * g * quadratic) - f) / (2 * g);
+      v = y / t;
       const double u = (p_ - h_ / t) * sin0_ + v * cos0_;
-      at.lon = std::atan2(a_ * x / t, ((p_ - h_ / t) * cos0_ - v * sin0_) * a_) + lon0_;
       if (pass == 0) {
         if (height == 0) {
           at.lat = std::atan(u / std::sqrt(1 - u * u));
           at.done = true;
-          return at;
+          break;
         }
         at.lat = std::asin(u);
       }
       const double previous = at.lat;
       at.lat = std::asin(u / (height / a_ + 1));
-      if (std::fabs(at.lat - previous) < 1e-12) {
-        at.done = true;
-        return at;
-      }
+      at.done = std::fabs(at.lat - previous) < 1e-12;
       grown = square(height / a_ + 1);
     }
+    at.lon = std::atan2(a_ * x / t, ((p_ - h_ / t) * cos0_ - v * sin0_) * a_) + lon0_;
     return at;
   }
 
