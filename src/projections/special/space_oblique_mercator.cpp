@@ -260,7 +260,7 @@ void TWsom_f(int16_t orbit, int16_t side, int16_t n_terms, double lon_n, double 
       }
       E = series.orbit.eccentric_anomaly(L);
       lt = (series.orbit.mean_anomaly(E) + om) * P + d;
-      L = std::atan(rise / std::cos(lt) + c_inc * std::tan(lt)) + base;
+      L = std::atan((rise + c_inc * std::sin(lt)) / std::cos(lt)) + base;
     }
     const double ph = std::asin((sin_lat * c_inc * G - std::sin(lt) * cos_lat * s_inc) /
                                 std::sqrt(1 - e2 * sin_lat * sin_lat));

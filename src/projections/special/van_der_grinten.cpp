@@ -16,9 +16,14 @@ constexpr double kPiSquared = 9.869604401089358;
 // The scale has no value this close to a pole.
 constexpr double kScaleLatLimit = kHalfPi - 1e-14;
 
-// Ordinate of the latitude on the central meridian.
+// cos(asin(s)); a not-a-number for a sine beyond 1.
+double cosine_of_sine(double s) { return std::sqrt((1 - s) * (1 + s)); }
+
+// Ordinate of the latitude on the central meridian: pi tan(theta / 2) with sin(theta) = 2 |lat| /
+// pi.
 double axis_ordinate(double lat) {
-  const double y = std::tan(std::asin(2 * std::fabs(lat / kPi)) / 2) * kPi;
+  const double s = 2 * std::fabs(lat / kPi);
+  const double y = s / (1 + cosine_of_sine(s)) * kPi;
   return lat < 0 ? -y : y;
 }
 
@@ -29,15 +34,13 @@ double latitude_of(double X, double Y, TWstatus* status) {
   CycleWatch watch;
   while (std::fabs(p - previous) > 1e-12) {
     previous = p;
-    const double v = 2 * p / kPi;
-    if (std::fabs(v) > 1) {
+    const double s = 2 * p / kPi;  // the sine of theta
+    if (std::fabs(s) > 1) {
       *status = TW_I_LATITUDE_LIMITED;
       break;
     }
-    const double theta = std::asin(v);
-    const double s = std::sin(theta);
-    const double c = std::cos(theta);
-    const double t = std::tan(theta / 2);
+    const double c = cosine_of_sine(s);
+    const double t = s / (1 + c);  // tan(theta / 2)
     const double G = c / (c + s - 1);
     const double B = Y / s - 1 / (c + 1);
     const double f = 2 - s;
@@ -117,7 +120,7 @@ void TWvdg_f(double lon0, double y0, int32_t count, const CoordinateTriple* in,
       out[i].y = axis_ordinate(lat) - y0;
     } else if (std::fabs(d) >= kAxisMargin && std::fabs(lat) >= kAxisMargin) {
       const double s = 2 * std::fabs(lat / kPi);
-      const double c = std::cos(std::asin(s));
+      const double c = cosine_of_sine(s);
       const double A = std::fabs(kPi / d - d / kPi) / 2;
       const double G = c / (s + c - 1);
       const double P = (2 / s - 1) * G;

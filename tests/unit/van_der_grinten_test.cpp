@@ -1,0 +1,242 @@
+#include <gtest/gtest.h>
+
+#include <random>
+
+#include "support/numeric_scale.hpp"
+#include "support/points.hpp"
+#include "support/proj_peer.hpp"
+#include "tidewater/special.h"
+
+using namespace tidewater::test;
+
+namespace {
+
+CoordinateTriple forward(double lon, double lat, double lon0 = 0, double y0 = 0) {
+  const CoordinateTriple in = {lon, lat, 0};
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 0;
+  TWvdg_f(lon0, y0, 1, &in, &out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_EQ(out.z, kUntouched);
+  return out;
+}
+
+CoordinateTriple inverse(double x, double y, double lon0 = 0, double y0 = 0) {
+  const CoordinateTriple in = {x, y, 0};
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 0;
+  TWvdg_i(lon0, y0, 1, &in, &out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  return out;
+}
+
+CoordinateTriple scale(double lon, double lat, double k0 = 1) {
+  const CoordinateTriple in = {lon, lat, 0};
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 0;
+  TWvdg_s(k0, 0, 1, &in, &out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  return out;
+}
+
+// The ordinate on the central meridian, by the half angle: tan(t / 2) = s / (1 + cos t).
+double axis(double lat) {
+  const double s = 2 * lat / kPi;
+  return kPi * s / (1 + std::sqrt(1 - s * s));
+}
+
+TEST(VanDerGrinten, SnydersNumericalExample) {
+  // Snyder 1987, p. 363: sphere of radius 1, 50 S, 160 W from 85 W.
+  const CoordinateTriple out = forward(degrees(-160), degrees(-50), degrees(-85));
+  expect_near(out, -1.1954154, -0.9960733, 5e-8);
+  const CoordinateTriple back = inverse(out.x, out.y, degrees(-85));
+  expect_near(back, degrees(-160), degrees(-50), 1e-12);
+}
+
+TEST(VanDerGrinten, AgreesWithProj) {
+  TIDEWATER_NEED_PROJ();
+#ifdef TIDEWATER_HAVE_PROJ
+  const ProjPeer peer("+proj=vandg +R=1 +lon_0=10");
+  ASSERT_TRUE(peer.ok());
+  for (double lat = -88; lat < 89; lat += 4.4) {
+    for (double lon = -160; lon < 180; lon += 23) {
+      const CoordinateTriple expected = peer.forward({degrees(lon), degrees(lat), 0});
+      // the ordinate is the root of a difference that cancels towards both axes
+      const double tolerance = 3e-14 / std::fabs(degrees(lon - 10) * degrees(lat));
+      expect_near(forward(degrees(lon), degrees(lat), degrees(10)), expected.x, expected.y,
+                  tolerance);
+    }
+  }
+#endif
+}
+
+TEST(VanDerGrinten, OriginLatitude) {
+  for (const double lat : {0.0, 0.5, -0.5, kPi / 2, -kPi / 2}) {
+    double y0 = kUntouched;
+    TWvdg_c(lat, &y0);
+    EXPECT_NEAR(y0, axis(lat), 1e-15);
+  }
+  double y0 = 0;
+  TWvdg_c(1.6, &y0);
+  EXPECT_TRUE(std::isnan(y0));
+  EXPECT_NEAR(forward(0, 0.5, 0, axis(0.5)).y, 0, 1e-15);
+}
+
+TEST(VanDerGrinten, Axes) {
+  const double y0 = 0.25;
+  expect_near(forward(0.8, 0, 0, y0), 0.8, -y0, 0);
+  expect_near(forward(0, 0.8, 0, y0), 0, axis(0.8) - y0, 1e-15);
+  expect_near(forward(0, -0.8, 0, y0), 0, -axis(0.8) - y0, 1e-15);
+  // near an axis x is the difference of longitude, even at a high latitude
+  expect_near(forward(0.000299, 1.2, 0, y0), 0.000299, axis(1.2) - y0, 1e-15);
+  expect_near(forward(1.2, -0.000299, 0, y0), 1.2, -axis(0.000299) - y0, 1e-15);
+  EXPECT_LT(forward(0.0003, 1.2).x, 0.00025);  // at the limit the map's own formula
+  EXPECT_NE(forward(1.2, 0.0003).x, 1.2);
+}
+
+TEST(VanDerGrinten, Poles) {
+  expect_near(forward(1, kPi / 2), 0, kPi, 1e-15);
+  expect_near(forward(1, -kPi / 2, 0, 0.5), 0, -kPi - 0.5, 1e-15);
+  EXPECT_TRUE(std::isnan(forward(1, 1.58).x));
+}
+
+TEST(VanDerGrinten, EdgeIsACircle) {
+  for (double lat = 0.1; lat < 1.5; lat += 0.2) {
+    const CoordinateTriple p = forward(kPi, lat);
+    EXPECT_NEAR(std::hypot(p.x, p.y), kPi, 1e-14);
+    EXPECT_GT(p.x, 0);
+    EXPECT_LT(forward(-kPi, lat).x, 0);  // exactly -pi stays
+  }
+}
+
+TEST(VanDerGrinten, SingleWrap) {
+  const CoordinateTriple p = forward(0.5, 0.4);
+  const CoordinateTriple above = forward(0.5 + 2 * kPi, 0.4), below = forward(0.5 - 2 * kPi, 0.4);
+  expect_near(above, p.x, p.y, 1e-14);
+  expect_near(below, p.x, p.y, 1e-14);
+  EXPECT_EQ(forward(0.5 + 4 * kPi, 0).x, 0.5 + 4 * kPi - 2 * kPi);  // one turn at most
+}
+
+TEST(VanDerGrinten, InverseNearTheAxes) {
+  expect_near(inverse(0.000299, axis(0.8), 0.1), 0.100299, 0.8, 1e-15);
+  expect_near(inverse(0.7, 0.0002, 0.1, -0.0001), 0.8,
+              std::sin(2 * std::atan(0.0001 / kPi)) * kPi / 2, 1e-15);
+  expect_near(inverse(0, -axis(0.8)), 0, -0.8, 1e-15);
+  // y0 counts for the sign
+  expect_near(inverse(0, -0.5, 0, 0.5 + axis(0.3)), 0, 0.3, 1e-15);
+  EXPECT_NE(inverse(0.0003, axis(0.8)).x, 0.0003);
+}
+
+TEST(VanDerGrinten, RoundTrip) {
+  std::mt19937 random(14);
+  std::uniform_real_distribution<double> lon(-3.1, 3.1), lat(-1.55, 1.55);
+  Points in(3000);
+  for (auto& q : in) q = {lon(random), lat(random), 2};
+  Points out = in;
+  TWstatus status = 0;
+  TWvdg_f(0.02, 0.3, 3000, out.data(), out.data(), &status);
+  TWvdg_i(0.02, 0.3, 3000, out.data(), out.data(), &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  for (std::size_t i = 0; i < in.size(); ++i) {
+    const double d = std::remainder(in[i].x - 0.02, 2 * kPi);
+    if (std::fabs(d) < 3e-3 || std::fabs(in[i].y) < 3e-3) continue;
+    // the last Newton step is not applied; the forward ordinate is the root of a difference that
+    // cancels towards the axes, and the condition near the poles costs the rest
+    const double colat = kPi / 2 - std::fabs(in[i].y);
+    const double cancelled = 2e-14 / std::fabs(d * in[i].y);
+    expect_near(out[i], 0.02 + d, in[i].y, 2, 1e-11 / colat / std::fabs(d) + cancelled);
+  }
+}
+
+TEST(VanDerGrinten, LatitudeBeyondThePoleIsInformation) {
+  // Outside the circle no latitude fits: the estimate passes the pole, the loop ends, the next
+  // point is done, the word stands.
+  const Points in = {{0.5, 4.5, 0}, {1, 1, 0}};
+  Points out = untouched(2);
+  TWstatus status = 0;
+  TWvdg_i(0, 0, 2, in.data(), out.data(), &status);
+  EXPECT_EQ(status, TW_I_LATITUDE_LIMITED);
+  EXPECT_NE(out[0].y, kUntouched);
+  EXPECT_GT(std::fabs(out[0].y), kPi / 2);
+  const CoordinateTriple alone = inverse(1, 1);
+  expect_near(out[1], alone.x, alone.y, 0);
+}
+
+TEST(VanDerGrinten, EveryInputLeavesTheLoop) {
+  std::mt19937 random(15);
+  std::uniform_real_distribution<double> wide(-10, 10), exponent(-4, 2);
+  Points in;
+  for (int i = 0; i < 20000; ++i) {
+    in.push_back({wide(random), wide(random), 0});
+    in.push_back({std::pow(10, exponent(random)), std::pow(10, exponent(random)), 0});
+  }
+  for (const double v : {1e300, static_cast<double>(kInfinity), kNaN, 0.1}) {
+    for (const double w : {1e300, static_cast<double>(kInfinity), kNaN, 0.1})
+      in.push_back({v, w, 0});
+  }
+  Points out = untouched(in.size());
+  TWstatus status = 0;
+  TWvdg_i(0, 0, static_cast<int32_t>(in.size()), in.data(), out.data(), &status);
+  for (const auto& q : out) EXPECT_NE(q.y, kUntouched);
+  TWvdg_f(0, 0, static_cast<int32_t>(in.size()), in.data(), out.data(), &status);
+  TWvdg_s(1, 0, static_cast<int32_t>(in.size()), in.data(), out.data(), &status);
+}
+
+TEST(VanDerGrinten, ScaleByDifferentiation) {
+  const auto map = [](const CoordinateTriple& q) { return forward(q.x, q.y); };
+  for (double lat = -1.44; lat < 1.46; lat += 0.31) {  // off the equator's margin
+    for (double lon = -2.9; lon < 3; lon += 0.4) {
+      const CoordinateTriple ours = scale(lon, lat, 0.9);
+      const CoordinateTriple expected = numeric_scale(map, lon, lat, 0);
+      EXPECT_NEAR(ours.x, 0.9 * expected.x, 1e-7 * expected.x) << lon << ' ' << lat;
+      EXPECT_NEAR(ours.y, 0.9 * expected.y, 1e-7 * expected.y) << lon << ' ' << lat;
+      EXPECT_NEAR(ours.z, 0.81 * expected.z, 1e-7 * expected.z) << lon << ' ' << lat;
+    }
+  }
+}
+
+TEST(VanDerGrinten, ScaleNearTheAxes) {
+  // near the equator the unit partials, k divided by the cosine
+  expect_near(scale(1, 0.000299), 1 / std::cos(0.000299), 1, 1 / std::cos(0.000299), 1e-15);
+  // near the central meridian: dy/dlat of pi tan(asin(2 lat / pi) / 2), by hand
+  const double lat = 0.8, s = 2 * lat / kPi, t = std::asin(s);
+  const double slope = 1 / std::pow(std::cos(t / 2), 2) / std::cos(t);
+  const double A = (kPi - std::sqrt(kPi * kPi - 4 * lat * lat)) * kPi / (2 * lat);
+  const CoordinateTriple at = scale(0.0003, lat);
+  EXPECT_NEAR(at.y, slope, 1e-13);
+  EXPECT_NEAR(at.x, (1 - A * A / (kPi * kPi)) / std::cos(lat), 1e-14);
+  EXPECT_NEAR(at.z, at.x * at.y, 1e-14);
+  // the same a little off, from the general formulas
+  const CoordinateTriple off = scale(0.00031, lat);
+  expect_near(off, at.x, at.y, at.z, 1e-6);
+}
+
+TEST(VanDerGrinten, ScaleFillsAtThePoles) {
+  const double limit = kPi / 2 - 1e-14;
+  const Points in = {{1, limit, 0}, {1, -limit, 0}, {1, 0.5, 0}, {1, 3, 0}};
+  Points out = untouched(4);
+  TWstatus status = 0;
+  TWvdg_s(3, 0, 4, in.data(), out.data(), &status);
+  EXPECT_EQ(status, TW_BAD_LATITUDE);
+  for (const int i : {0, 1, 3}) expect_near(out[static_cast<std::size_t>(i)], 3, 3, 9, 0);
+  EXPECT_NE(out[2].x, 3);
+  const Points inside = {{1, std::nextafter(limit, 0), 0}};
+  TWvdg_s(3, 0, 1, inside.data(), out.data(), &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+}
+
+TEST(VanDerGrinten, NothingToDo) {
+  CoordinateTriple q = kUntouchedPoint;
+  for (const int32_t count : {0, -1}) {
+    TWstatus status = 0;
+    TWvdg_f(0, 0, count, &q, &q, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    TWvdg_i(0, 0, count, &q, &q, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    TWvdg_s(1, 0, count, &q, &q, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    expect_untouched(q);
+  }
+}
+
+}  // namespace
