@@ -93,8 +93,8 @@ TW_API void TWbipocc_param(double* lon_a, double* lat_a, double* lat_b, double* 
  * @param z1,z2         polar distances of the standard parallels
  * @param lon_b         longitude of pole B
  * @param n             cone constant
- * @param k             scale that would share the error; formed from fixed arcs of 26 and 52
- * degrees
+ * @param k             central scale that balances the error, for the caller to apply; its arcs of
+ * 26 and 52 degrees are fixed degrees
  * @param f             size of the cone
  * @param az_ab,az_ba   azimuth from A to B, and from B to A westward
  * @param t             sum of the half-arc powers of the standard parallels
