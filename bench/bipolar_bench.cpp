@@ -19,7 +19,7 @@ std::vector<CoordinateTriple> scaled(std::vector<CoordinateTriple> points, doubl
 }
 
 void bipolar_rows() {
-  const auto points = box(-120, -30, -60, 60);
+  const auto points = box(-110, 0, -70, 45);
   double lon_a, lat_a, lat_b, ab, z1, z2, fe, fn, lon_c, lat_c;
   double lon_b, n, k, f, az_ab, az_ba, t, rho_c, z_c, az_c;
   TWstatus status = 0;

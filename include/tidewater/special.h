@@ -287,7 +287,8 @@ TW_API void TWIMWmodPoly_i(double e, double lon0, double lat1, double r1, double
 /** @name Oblique Lambert and Krovak
  *
  *  The ellipsoid goes to a conformal sphere, the sphere's graticule is turned about the cone's
- * pole, and a Lambert conic maps the turned sphere.
+ * pole, and a Lambert conic maps the turned sphere.  Plane coordinates are in units of that
+ * sphere's radius, TWgaussian_R() at the latitude lat0 + (d1 + d2) / 2.
  *  @{ */
 
 /**
