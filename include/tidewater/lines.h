@@ -71,7 +71,9 @@ TW_API void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distan
  * parallel for points on one parallel, and otherwise a times the sine of the spherical arc, which
  * is far too short.  Whether the vertex lies ahead of a point is decided on the sphere: a long line
  * that leaves a point within some tenths of a degree of due east or west can come out short by up
- * to a thousandth of its length.  The status is #TW_SUCCESS all the same.
+ * to a thousandth of its length.  The iteration ends on a change of 0.0001 in the unit of a: GIVE
+ * THE ELLIPSOID IN METRES; on one of unit axis most lines end in that failure.  The status is
+ * #TW_SUCCESS all the same.
  *
  * Points that are antipodal on a meridian circle to 1e-14 radians are joined over the north pole. A
  * point within 1e-14 of a pole is reached along the meridian of the other, with azimuths of 0 and

@@ -1050,8 +1050,8 @@ TW_API void TWbipocc_param(double* lon_a, double* lat_a, double* lat_b, double* 
  * @param z1,z2         polar distances of the standard parallels
  * @param lon_b         longitude of pole B
  * @param n             cone constant
- * @param k             scale that would share the error; formed from fixed arcs of 26 and 52
- * degrees
+ * @param k             central scale that balances the error, for the caller to apply; its arcs of
+ * 26 and 52 degrees are fixed degrees
  * @param f             size of the cone
  * @param az_ab,az_ba   azimuth from A to B, and from B to A westward
  * @param t             sum of the half-arc powers of the standard parallels
@@ -1244,7 +1244,8 @@ TW_API void TWIMWmodPoly_i(double e, double lon0, double lat1, double r1, double
 /** @name Oblique Lambert and Krovak
  *
  *  The ellipsoid goes to a conformal sphere, the sphere's graticule is turned about the cone's
- * pole, and a Lambert conic maps the turned sphere.
+ * pole, and a Lambert conic maps the turned sphere.  Plane coordinates are in units of that
+ * sphere's radius, TWgaussian_R() at the latitude lat0 + (d1 + d2) / 2.
  *  @{ */
 
 /**

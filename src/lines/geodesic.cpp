@@ -12,7 +12,6 @@
 // binomial series to five terms.  F. W. Bessel, Ueber die Berechnung der geographischen Laengen und
 // Breiten aus geodaetischen Vermessungen, Astronomische Nachrichten 4 (1825), pp. 241-254.
 
-#include <algorithm>
 #include <cmath>
 #include <cstdint>
 
@@ -56,12 +55,39 @@ class VertexExpansion {
 
   // From the vertex to the point whose sine of reduced latitude is x.
   ArcAndLongitude to(double x, double k) const {
+    const Integrals i = integrate(x, k);
+    return {arc(i), longitude(i, x, k)};
+  }
+
+  // As to(); a point on the vertex or beyond it gives zeros.
+  ArcAndLongitude within(double x, double k) const {
+    if (std::fabs(x) >= std::fabs(k)) return {};
+    return to(x, k);
+  }
+
+  // The point itself, or the vertex for a point beyond it.  Wanted: on the positive side alone.
+  static double pull_back(double x, double k) { return x >= k ? k - 1e-18 : x; }
+
+  // As to(), with the point pulled back; and its two halves.
+  ArcAndLongitude pulled_back(double x, double k) const { return to(pull_back(x, k), k); }
+  double pulled_back_arc(double x, double k) const { return arc(integrate(pull_back(x, k), k)); }
+  double pulled_back_longitude(double x, double k) const {
+    x = pull_back(x, k);
+    return longitude(integrate(x, k), x, k);
+  }
+
+ private:
+  // Arc angle theta with cosine r, and f_j = k^(2j) * integral of cos^(2j) u du from 0 to theta.
+  struct Integrals {
+    double r, theta;
+    double f1, f2, f3, f4, f5;
+  };
+
+  static Integrals integrate(double x, double k) {
     const double r = x / k;
     const double s = std::sqrt(1 - r * r);
     const double theta = std::atan2(s, r);
-    const double cx = std::sqrt(1 - x * x);
-    const double ck = std::sqrt(1 - k * k);
-    // f_j = k^(2j) * integral of cos^(2j) u du from 0 to theta = g_j k^(2j) s / (2j)
+    // f_j = g_j k^(2j) s / (2j)
     const double r2 = r * r;
     const double k2 = k * k;
     const double r3 = r2 * r;
@@ -73,32 +99,30 @@ class VertexExpansion {
     const double g4 = 7.0 / 6 * g3 + r7;
     const double g5 = 9.0 / 8 * g4 + r7 * r2;
     const double k4 = k2 * k2;
-    const double f1 = g1 * k2 * s / 2;
-    const double f2 = g2 * k4 * s / 4;
-    const double f3 = g3 * (k4 * k2) * s / 6;
-    const double f4 = g4 * (k4 * k4) * s / 8;
-    const double f5 = g5 * (k4 * k4 * k2) * s / 10;
-    const double q = ck * r / cx;
-    ArcAndLongitude result;
-    result.arc =
-        b_ *
-        (theta + (arc_[0] * f1 + (arc_[1] * f2 + (arc_[2] * f3 + (arc_[3] * f4 + arc_[4] * f5)))));
-    if (q < 1) result.lon = std::atan2(std::sqrt(1 - q * q), q);
-    result.lon -=
-        ck * (lon_[0] * theta + (lon_[1] * f1 + (lon_[2] * f2 + (lon_[3] * f3 + lon_[4] * f4))));
-    return result;
+    return {r,
+            theta,
+            g1 * k2 * s / 2,
+            g2 * k4 * s / 4,
+            g3 * (k4 * k2) * s / 6,
+            g4 * (k4 * k4) * s / 8,
+            g5 * (k4 * k4 * k2) * s / 10};
   }
 
-  // As to(); a point on the vertex or beyond it gives zeros.
-  ArcAndLongitude within(double x, double k) const {
-    if (std::fabs(x) >= std::fabs(k)) return {};
-    return to(x, k);
+  double arc(const Integrals& i) const {
+    return b_ *
+           (i.theta + (arc_[0] * i.f1 +
+                       (arc_[1] * i.f2 + (arc_[2] * i.f3 + (arc_[3] * i.f4 + arc_[4] * i.f5)))));
   }
 
-  // As to(); a point beyond the vertex is pulled back to it.  Wanted: on the positive side alone.
-  ArcAndLongitude pulled_back(double x, double k) const { return to(x >= k ? k - 1e-18 : x, k); }
+  double longitude(const Integrals& i, double x, double k) const {
+    const double cx = std::sqrt(1 - x * x);
+    const double ck = std::sqrt(1 - k * k);
+    const double q = ck * i.r / cx;
+    const double sphere = q < 1 ? std::atan2(std::sqrt(1 - q * q), q) : 0;
+    return sphere - ck * (lon_[0] * i.theta +
+                          (lon_[1] * i.f1 + (lon_[2] * i.f2 + (lon_[3] * i.f3 + lon_[4] * i.f4))));
+  }
 
- private:
   double b_;
   double arc_[5];
   double lon_[5];
@@ -180,28 +204,22 @@ void direct_on_sphere(CoordinateTriple start, double azimuth, double angle, Coor
   end->y = lat2;
 }
 
-// The sine of reduced latitude w at an arc from the vertex, by Newton's method, with the longitude
-// from the vertex.  Running out of passes is not reported.
+// The sine of reduced latitude at an arc from the vertex, by Newton's method.  Running out of
+// passes is not reported.
 double latitude_sine_at(const VertexExpansion& expansion, double arc, double k, double b,
-                        double ep2, double* lon) {
+                        double ep2) {
   constexpr int kMostPasses = 11;
   double w = k * std::cos(arc / b);
   for (int pass = 0; pass < kMostPasses; ++pass) {
-    const auto at = expansion.pulled_back(w, k);
-    const double d = (at.arc - arc) * std::sqrt((k * k - w * w) / (ep2 * w * w + 1)) / b;
     const double previous = w;
+    const double d = (expansion.pulled_back_arc(w, k) - arc) *
+                     std::sqrt((k * k - w * w) / (ep2 * w * w + 1)) / b;
     w += d;
-    if (w == previous) {  // all further passes would be this one again
-      *lon = at.lon;
-      return w;
-    }
-    if (std::fabs(d) <= 1e-16) break;
+    if (std::fabs(d) <= 1e-16 || w == previous) break;  // a further pass would be this one again
   }
-  *lon = expansion.pulled_back(w, k).lon;
   return w;
 }
 
-// First estimate and the constants of the inverse iteration.
 constexpr int kMostInversePasses = 30;
 
 void inverse_on_meridian(double dl, double lat1, double lat2, double a, double e, double* azimuth,
@@ -450,11 +468,10 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
   if (before_vertex) arc = -arc;
 
   double w = k * std::cos(arc / b);
-  double lon = 0;
-  if (arc < 0.01) {
-    lon = arc / b * m;  // Wanted: the product, and a limit in the unit of a, not scaled.
-  } else {
-    w = latitude_sine_at(expansion, arc, k, b, ep2, &lon);
+  double lon = arc / b * m;  // Wanted: the product, and a limit in the unit of a, not scaled.
+  if (!(arc < 0.01)) {
+    w = latitude_sine_at(expansion, arc, k, b, ep2);
+    lon = expansion.pulled_back_longitude(w, k);
   }
   double c2 = std::sqrt(1 - w * w);
   if (c2 < m) c2 = m;

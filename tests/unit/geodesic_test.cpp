@@ -580,6 +580,20 @@ TEST(GeodesicInverse, NearlyAntipodalPointsAreNotSolved) {
   EXPECT_GT(r.distance, 20000);
 }
 
+TEST(GeodesicInverse, OnAUnitEllipsoidTheIterationEndsTooSoon) {
+  // Its limit of 0.0001 is not scaled: the change falls below it before it is small enough to be
+  // accepted, and the first estimate stays.
+  const double e = 0.0818;
+  const auto r = inverse({0, 0.3, 0}, {0.9, 0.8, 0}, {1, e});
+  const double cos_arc = sin_reduced(e, 0.3) * sin_reduced(e, 0.8) +
+                         cos_reduced(e, 0.3) * cos_reduced(e, 0.8) * std::cos(0.9);
+  EXPECT_NEAR(r.distance, std::sqrt(1 - cos_arc * cos_arc), 1e-15);
+  // In metres the same line is solved.
+  const double solved = inverse({0, 0.3, 0}, {0.9, 0.8, 0}, {6e6, e}).distance / 6e6;
+  EXPECT_NEAR(solved, std::acos(cos_arc), 5e-3);
+  EXPECT_GT(solved, r.distance + 0.05);
+}
+
 TEST(GeodesicInverse, EveryArgumentEnds) {
   const auto wgs84 = Ellipsoid::wgs84();
   for (const double odd : {kNaN, kInfinity, -kInfinity, 1e300, -1e300}) {

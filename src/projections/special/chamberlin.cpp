@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "foundation/numeric.hpp"
+#include "projections/turn_points.hpp"
 #include "tidewater/datum.h"
 #include "tidewater/lines.h"
 #include "tidewater/special.h"
@@ -48,14 +49,7 @@ void turn_to_north(double e, const CoordinateTriple* control, const double* side
   TWchamtri_f(e, control, sides, azimuths, plane, 2, probes, image, status);
   if (!TW_OK(*status)) return;
   const double angle = north - std::atan2(image[1].y - image[0].y, image[1].x - image[0].x);
-  const double s = std::sin(angle);
-  const double c = std::cos(angle);
-  for (int j = 0; j < 3; ++j) {
-    const double x = plane[j].x;
-    const double y = plane[j].y;
-    plane[j].x = x * c - y * s;
-    plane[j].y = y * c + x * s;
-  }
+  turn_points(angle, 3, plane);
 }
 
 }  // namespace

@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "foundation/numeric.hpp"
+#include "projections/turn_points.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/lines.h"
 #include "tidewater/special.h"
@@ -116,18 +117,6 @@ const CoordinateTriple* to_turned_sphere(double e, double lon0, double lon_added
     points = out;
   }
   return points;
-}
-
-// Turns points of the plane about its origin.
-void turn_points(double angle, int32_t count, CoordinateTriple* points) {
-  const double s = std::sin(angle);
-  const double c = std::cos(angle);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = points[i].x;
-    const double y = points[i].y;
-    points[i].x = x * c - y * s;
-    points[i].y = y * c + x * s;
-  }
 }
 
 }  // namespace
