@@ -98,6 +98,13 @@ struct DegreeSums {
     radial_s.y = (n + 1.0) * s.y;
   }
 
+  // One order of a pair.
+  DegreeSums(const DegreeSums<kMode, Pair>& pair, int j)
+      : c(lane(pair.c, j)),
+        s(lane(pair.s, j)),
+        radial_c(lane(pair.radial_c, j)),
+        radial_s(lane(pair.radial_s, j)) {}
+
   // Goes down to degree n from n + 1.
   void step(const Series& series, const Argument& at, int32_t m, int32_t n) {
     static constexpr double kNone[2] = {};
@@ -121,13 +128,6 @@ struct DegreeSums {
       radial_s.descend(a_cos, b_q2, (n + 1.0) * S);
     }
   }
-
-  // One order of a pair.
-  DegreeSums(const DegreeSums<kMode, Pair>& pair, int j)
-      : c(lane(pair.c, j)),
-        s(lane(pair.s, j)),
-        radial_c(lane(pair.radial_c, j)),
-        radial_s(lane(pair.radial_s, j)) {}
 
   Chain<Value> c, s;                // of the terms C and S
   Chain<Value> radial_c, radial_s;  // of the terms (n + 1) C and (n + 1) S
