@@ -53,6 +53,10 @@ class Triangle {
     block_.resize(rows * (rows + 1) / 2);
     for (std::size_t n = 0; n < rows; ++n) rows_.push_back(block_.data() + n * (n + 1) / 2);
   }
+  // A move takes the block along, and the rows keep pointing into it.
+  Triangle(Triangle&&) = default;
+  Triangle& operator=(Triangle&&) = default;
+
   double** rows() { return rows_.data(); }
 
  private:
@@ -150,6 +154,9 @@ class Model {
         rec_b_(degree_),
         main_(degree_),
         secular_(degree_) {
+    if (info.epoch_count > 2 && info.interval <= 0) {
+      throw std::runtime_error("the model " + info.name + " has no interval between its epochs");
+    }
     std::vector<Triangle> sets;
     for (const int32_t degree : info.degrees) {
       sets.emplace_back(degree);
