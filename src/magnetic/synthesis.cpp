@@ -18,6 +18,14 @@ constexpr double kAxisLimit = 1e-12;
 
 enum Mode : int16_t { kGradient = 0, kAlongTheta = 1, kAlongLambda = 2, kRadial = 3, kGravity = 4 };
 
+// The components that a mode gives.
+template <Mode kMode>
+constexpr bool kNorth = kMode == kGradient || kMode == kAlongTheta;
+template <Mode kMode>
+constexpr bool kEast = kMode == kGradient || kMode == kAlongLambda;
+template <Mode kMode>
+constexpr bool kDown = kMode == kGradient || kMode == kRadial;
+
 struct Series {
   int32_t N;
   double* const* C;
@@ -85,10 +93,6 @@ Chain<double> lane(const Chain<Pair>& chain, int j) {
 // constants and coefficients are read once.
 template <Mode kMode, class Value>
 struct DegreeSums {
-  static constexpr bool kSlope = kMode == kGradient || kMode == kAlongTheta;
-  static constexpr bool kAlong = kMode == kGradient || kMode == kAlongLambda;
-  static constexpr bool kOutward = kMode == kGradient || kMode == kRadial;
-
   // At the degree of the series, above which y and d are zero.
   DegreeSums(const Series& series, int32_t m) {
     const int32_t n = series.N;
@@ -97,6 +101,13 @@ struct DegreeSums {
     radial_c.y = (n + 1.0) * c.y;
     radial_s.y = (n + 1.0) * s.y;
   }
+
+  // One order of a pair.
+  DegreeSums(const DegreeSums<kMode, Pair>& pair, int j)
+      : c(lane(pair.c, j)),
+        s(lane(pair.s, j)),
+        radial_c(lane(pair.radial_c, j)),
+        radial_s(lane(pair.radial_s, j)) {}
 
   // Goes down to degree n from n + 1.
   void step(const Series& series, const Argument& at, int32_t m, int32_t n) {
@@ -108,7 +119,7 @@ struct DegreeSums {
     const Value a_cos = a * at.tcos;
     const Value a_sin = a * at.tsin;
     const Value b_q2 = b * at.q2;
-    if constexpr (kSlope) {
+    if constexpr (kNorth<kMode>) {
       c.descend_slope(a_cos, a_sin, b_q2);
       s.descend_slope(a_cos, a_sin, b_q2);
     }
@@ -116,18 +127,11 @@ struct DegreeSums {
       c.descend(a_cos, b_q2, C);
       s.descend(a_cos, b_q2, S);
     }
-    if constexpr (kOutward) {
+    if constexpr (kDown<kMode>) {
       radial_c.descend(a_cos, b_q2, (n + 1.0) * C);
       radial_s.descend(a_cos, b_q2, (n + 1.0) * S);
     }
   }
-
-  // One order of a pair.
-  DegreeSums(const DegreeSums<kMode, Pair>& pair, int j)
-      : c(lane(pair.c, j)),
-        s(lane(pair.s, j)),
-        radial_c(lane(pair.radial_c, j)),
-        radial_s(lane(pair.radial_s, j)) {}
 
   Chain<Value> c, s;                // of the terms C and S
   Chain<Value> radial_c, radial_s;  // of the terms (n + 1) C and (n + 1) S
@@ -135,19 +139,18 @@ struct DegreeSums {
 
 template <Mode kMode>
 void store(const DegreeSums<kMode, double>& of, int32_t m, const Sums& sums) {
-  using Wanted = DegreeSums<kMode, double>;
   if constexpr (kMode == kGravity) sums.dC[m] = of.c.y;
-  if constexpr (Wanted::kSlope) sums.dC[m] = of.c.d;
-  if constexpr (Wanted::kSlope) sums.C[m] = of.c.y;
+  if constexpr (kNorth<kMode>) sums.dC[m] = of.c.d;
+  if constexpr (kNorth<kMode>) sums.C[m] = of.c.y;
   // The recurrence is linear: the terms -S give the negative of what S gives.
-  if constexpr (Wanted::kAlong) sums.lC[m] = -of.s.y;
-  if constexpr (Wanted::kOutward) sums.rC[m] = of.radial_c.y;
+  if constexpr (kEast<kMode>) sums.lC[m] = -of.s.y;
+  if constexpr (kDown<kMode>) sums.rC[m] = of.radial_c.y;
   if (m == 0) return;  // a sine term has no order 0
   if constexpr (kMode == kGravity) sums.dS[m] = of.s.y;
-  if constexpr (Wanted::kSlope) sums.dS[m] = of.s.d;
-  if constexpr (Wanted::kSlope) sums.S[m] = of.s.y;
-  if constexpr (Wanted::kAlong) sums.lS[m] = of.c.y;
-  if constexpr (Wanted::kOutward) sums.rS[m] = of.radial_s.y;
+  if constexpr (kNorth<kMode>) sums.dS[m] = of.s.d;
+  if constexpr (kNorth<kMode>) sums.S[m] = of.s.y;
+  if constexpr (kEast<kMode>) sums.lS[m] = of.c.y;
+  if constexpr (kDown<kMode>) sums.rS[m] = of.radial_s.y;
 }
 
 template <Mode kMode>
@@ -190,25 +193,22 @@ struct OrderSums {
 
 template <Mode kMode>
 OrderSums sum_orders(const Series& series, const Argument& at, const Sums& sums) {
-  constexpr bool kTheta = kMode == kGradient || kMode == kAlongTheta;
-  constexpr bool kLambda = kMode == kGradient || kMode == kAlongLambda;
-  constexpr bool kOutward = kMode == kGradient || kMode == kRadial;
   double zA = 0, zB = 0, zL = 0, zR = 0, e = 0;
   double a_sin = 0, a_cos = 0;  // of order m + 1; nothing stands above order N
   for (int32_t m = series.N; m >= 0; --m) {
     const double cos_m = series.rec_b[m][m];
     const double sin_m = m > 0 ? series.rec_b[m][m - 1] : 0;
-    if constexpr (kTheta) {
+    if constexpr (kNorth<kMode>) {
       e = a_sin * e + a_cos * zB;
       zB = a_sin * zB + (sums.S[m] * sin_m + sums.C[m] * cos_m);
     }
-    if constexpr (kTheta || kMode == kGravity) {
+    if constexpr (kNorth<kMode> || kMode == kGravity) {
       zA = a_sin * zA + (sums.dC[m] * cos_m + sums.dS[m] * sin_m);
     }
-    if constexpr (kLambda) {
+    if constexpr (kEast<kMode>) {
       zL = a_sin * zL + (sums.lS[m] * sin_m + sums.lC[m] * cos_m) * m;
     }
-    if constexpr (kOutward) zR = a_sin * zR + (sums.rS[m] * sin_m + sums.rC[m] * cos_m);
+    if constexpr (kDown<kMode>) zR = a_sin * zR + (sums.rS[m] * sin_m + sums.rC[m] * cos_m);
     a_sin = series.rec_a[m][m] * at.tsin;
     a_cos = series.rec_a[m][m] * at.tcos;
   }

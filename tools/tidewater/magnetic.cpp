@@ -14,9 +14,9 @@
 #include <limits>
 #include <memory>
 #include <optional>
-#include <regex>
 #include <stdexcept>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "tidewater/tidewater.h"
@@ -41,9 +41,8 @@ constexpr std::size_t kTextField = 64;
 
 void require(TWstatus status, const std::string& what) {
   if (TW_OK(status)) return;
-  constexpr const char* kDigits = "0123456789ABCDEF";
   std::string word;
-  for (int shift = 28; shift >= 0; shift -= 4) word += kDigits[(status >> shift) & 15];
+  for (int shift = 28; shift >= 0; shift -= 4) word += "0123456789ABCDEF"[(status >> shift) & 15];
   throw std::runtime_error(what + " (status 0x" + word + ")");
 }
 
@@ -54,6 +53,10 @@ class Triangle {
     block_.resize(rows * (rows + 1) / 2);
     for (std::size_t n = 0; n < rows; ++n) rows_.push_back(block_.data() + n * (n + 1) / 2);
   }
+  // A move takes the block along, and the rows keep pointing into it.
+  Triangle(Triangle&&) = default;
+  Triangle& operator=(Triangle&&) = default;
+
   double** rows() { return rows_.data(); }
 
  private:
@@ -80,10 +83,9 @@ struct ModelInfo {
     std::string key = name;
     key.resize(kTextField);
     int16_t number = 0;
-    double lower_bound = 0, upper_bound = 0, constant_2 = 0;
     char text[kTextField] = {}, table[kTextField] = {};
     TWmagmdl_info(store.c_str(), key.data(), &number, 1, table, &radius, &normalisation, text,
-                  &lower_bound, &upper_bound, &constant_2, &epoch_count, &status);
+                  &first_date, &last_date, &interval, &epoch_count, &status);
     if (status == TW_NO_SUCH_MODEL) throw std::runtime_error("no model " + name + " in " + store);
     require(status, "the store " + store + " gives no model " + name);
     if (epoch_count < 2) return;
@@ -103,6 +105,8 @@ struct ModelInfo {
   std::string name;
   double radius = 0;
   int16_t normalisation = 0;
+  double first_date = 0, last_date = 0;  // what the model is published for
+  double interval = 0;                   // years between two epochs
   int32_t epoch_count = 0;
   std::vector<int32_t> degrees;
   std::vector<double> epochs;
@@ -150,6 +154,9 @@ class Model {
         rec_b_(degree_),
         main_(degree_),
         secular_(degree_) {
+    if (info.epoch_count > 2 && info.interval <= 0) {
+      throw std::runtime_error("the model " + info.name + " has no interval between its epochs");
+    }
     std::vector<Triangle> sets;
     for (const int32_t degree : info.degrees) {
       sets.emplace_back(degree);
@@ -171,8 +178,8 @@ class Model {
     }
     double last_date = kNowhere;
     TWhar_set_date(date, &last_date, 0, info.epoch_count, info.degrees.data(), info.epochs.data(),
-                   interval_of(info.epochs, date), c_sets.data(), s_sets.data(), &n_main_, &n_sec_,
-                   C_.rows(), S_.rows(), Ct_.rows(), St_.rows(), &status);
+                   info.interval, c_sets.data(), s_sets.data(), &n_main_, &n_sec_, C_.rows(),
+                   S_.rows(), Ct_.rows(), St_.rows(), &status);
     if (status == TW_BAD_DATE) {
       throw std::runtime_error("the model " + info.name + " does not reach that date");
     }
@@ -206,13 +213,6 @@ class Model {
   }
 
  private:
-  // Time between the two sets that a date lies between.
-  static double interval_of(const std::vector<double>& epochs, double date) {
-    std::size_t i = epochs.size() - 2;
-    while (i > 0 && epochs[i] > date) --i;
-    return epochs[i + 1] - epochs[i];
-  }
-
   double radius_;
   int32_t degree_;
   int32_t n_main_ = 0, n_sec_ = 0;
@@ -231,56 +231,103 @@ double decimal_year(std::chrono::year_month_day day) {
          static_cast<double>(passed.count()) / static_cast<double>(whole.count());
 }
 
+// A whole number of exactly so many digits.
+std::optional<int> read_digits(std::string_view text, std::size_t digits) {
+  int value = 0;
+  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
+  if (text.size() != digits || error != std::errc() || end != text.data() + digits || value < 0) {
+    return std::nullopt;
+  }
+  return value;
+}
+
 // A decimal year or a day as YYYY-MM-DD; an empty text is today.
 double read_date(const std::string& text) {
   using namespace std::chrono;
   if (text.empty()) return decimal_year(floor<days>(system_clock::now()));
-  static const std::regex kDay("(\\d{4})-(\\d{2})-(\\d{2})");
-  static const std::regex kYear("\\d{4}(\\.\\d*)?");
-  std::smatch found;
-  if (std::regex_match(text, found, kDay)) {
-    const auto part = [&](std::size_t i) { return static_cast<unsigned>(std::stoul(found[i])); };
-    const year_month_day date{year(static_cast<int>(part(1))), month(part(2)), day(part(3))};
-    if (date.ok()) return decimal_year(date);
-  } else if (std::regex_match(text, kYear)) {
-    double year_number = 0;
-    std::from_chars(text.data(), text.data() + text.size(), year_number);
-    return year_number;
+  if (text.size() == 10 && text[4] == '-' && text[7] == '-') {
+    const std::string_view all = text;
+    const auto y = read_digits(all.substr(0, 4), 4);
+    const auto m = read_digits(all.substr(5, 2), 2);
+    const auto d = read_digits(all.substr(8, 2), 2);
+    if (y && m && d) {
+      const auto date = year(*y) / *m / *d;
+      if (date.ok()) return decimal_year(date);
+    }
+  } else if (text.find_first_not_of("0123456789.") == std::string::npos) {
+    double value = 0;
+    const char* last = text.data() + text.size();
+    const auto [end, error] = std::from_chars(text.data(), last, value);
+    if (error == std::errc() && end == last) return value;
   }
   throw std::runtime_error("not a date: " + text + " (a decimal year or YYYY-MM-DD)");
+}
+
+constexpr std::string_view kDigits = "0123456789";
+constexpr std::string_view kBetween = " \t\r,;";
+
+std::vector<std::string> parts_of(const std::string& line) {
+  std::vector<std::string> parts;
+  for (std::size_t end = 0;;) {
+    const std::size_t start = line.find_first_not_of(kBetween, end);
+    if (start == std::string::npos) return parts;
+    end = std::min(line.find_first_of(kBetween, start), line.size());
+    parts.push_back(line.substr(start, end - start));
+  }
+}
+
+// Digits with one decimal point at most.
+bool is_number(std::string_view text) {
+  return text.find_first_of(kDigits) != std::string_view::npos &&
+         text.find_first_not_of("0123456789.") == std::string_view::npos &&
+         text.find('.') == text.rfind('.');
+}
+
+std::string_view without_sign(std::string_view text) {
+  if (!text.empty() && (text[0] == '-' || text[0] == '+')) text.remove_prefix(1);
+  return text;
+}
+
+// Degrees, degrees:minutes or degrees:minutes:seconds, without a sign.
+bool is_angle(std::string_view text) {
+  for (int part = 0; part < 3; ++part) {
+    const std::size_t colon = text.find(':');
+    if (!is_number(text.substr(0, colon))) return false;
+    if (colon == std::string_view::npos) return true;
+    text.remove_prefix(colon + 1);
+  }
+  return false;
+}
+
+bool is_hemisphere(char c) {
+  return std::string_view("NSEWnsew").find(c) != std::string_view::npos;
+}
+
+// The library's hemisphere mode of an angle: 0 for a sign or none, 4 for a letter in front, 5 for
+// one behind; nothing where the text is no angle.
+std::optional<int16_t> hemisphere_mode(std::string_view text) {
+  if (is_angle(without_sign(text))) return int16_t{0};
+  if (text.size() < 2) return std::nullopt;
+  if (is_hemisphere(text.front()) && is_angle(text.substr(1))) return int16_t{4};
+  if (is_hemisphere(text.back()) && is_angle(text.substr(0, text.size() - 1))) return int16_t{5};
+  return std::nullopt;
 }
 
 // A position of two angles and an optional height, parted by blanks or commas.  The angles are
 // decimal degrees or degrees:minutes:seconds, signed or with a hemisphere letter.
 std::optional<CoordinateTriple> read_position(const std::string& line, bool lon_first) {
-  static const std::regex kPart("[^ \\t\\r,;]+");
-  // The reader of the library takes what it cannot scan for zero, so the form is checked here.
-  static const std::string kNumber = "(\\d+\\.?\\d*|\\.\\d+)";
-  static const std::string kSexagesimal = kNumber + "(:" + kNumber + "){0,2}";
-  static const std::regex kSigned("[-+]?" + kSexagesimal);
-  static const std::regex kLetterBehind(kSexagesimal + "[NSEWnsew]");
-  static const std::regex kLetterInFront("[NSEWnsew]" + kSexagesimal);
-  static const std::regex kHeight("[-+]?" + kNumber);
   constexpr std::size_t kLongest = 100;  // the library's reader cuts at 150 characters
-
-  const std::vector<std::string> parts(std::sregex_token_iterator(line.begin(), line.end(), kPart),
-                                       {});
+  const std::vector<std::string> parts = parts_of(line);
   if (parts.size() < 2 || parts.size() > 3 || line.size() > kLongest) return std::nullopt;
-  if (parts.size() == 3 && !std::regex_match(parts[2], kHeight)) return std::nullopt;
+  // That reader takes what it cannot scan for zero, so the form is checked here.
+  const auto mode = hemisphere_mode(parts[0]);
+  if (!mode || hemisphere_mode(parts[1]) != mode) return std::nullopt;
+  if (parts.size() == 3 && !is_number(without_sign(parts[2]))) return std::nullopt;
   AngleUnit unit = {};
   // Decimal degrees are the colon form without minutes.
-  std::string("d:m:s").copy(unit.format, sizeof unit.format - 1);
+  std::string_view("d:m:s").copy(unit.format, sizeof unit.format - 1);
+  unit.hemisphere_mode = *mode;
   unit.factor = kRadiansPerSecond;
-  const auto both = [&](const std::regex& form) {
-    return std::regex_match(parts[0], form) && std::regex_match(parts[1], form);
-  };
-  if (both(kLetterInFront)) {
-    unit.hemisphere_mode = 4;
-  } else if (both(kLetterBehind)) {
-    unit.hemisphere_mode = 5;
-  } else if (!both(kSigned)) {
-    return std::nullopt;
-  }
   std::string text = parts[0] + ", " + parts[1];
   if (parts.size() == 3) text += ", " + parts[2];
   CoordinateTriple point = {};
@@ -426,6 +473,11 @@ bool run(const Options& options) {
       options.model.empty() ? newest_model(options.store) : ModelInfo(options.store, options.model);
   if (!info.usable()) throw std::runtime_error("the model " + info.name + " has no rates");
   Model model(options.store, info, date);
+  if (date < info.first_date || date > info.last_date) {
+    std::cerr << "tidewater magnetic: the model " << info.name << " is made for the years "
+              << fixed(info.first_date, 1) << " to " << fixed(info.last_date, 1)
+              << "; the field of " << fixed(date, 1) << " is extrapolated\n";
+  }
 
   bool all_read = true;
   std::vector<CoordinateTriple> points;
