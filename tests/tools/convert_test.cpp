@@ -401,7 +401,7 @@ TEST(Convert, ExamplesOfTheHelpWorkAsPrinted) {
     EXPECT_NE(r.err.find("1 converted, 0 outside the grids, 0 refused"), std::string::npos) << line;
     ++examples;
   }
-  EXPECT_EQ(examples, 4);
+  EXPECT_EQ(examples, 5);
 }
 
 TEST(Convert, AFullDiskIsSaid) {

@@ -47,6 +47,13 @@ AngleUnit AngleFormat::unit() const {
   return unit;
 }
 
+AngleFormat AngleFormat::without_hemisphere() const {
+  AngleFormat plain = *this;
+  plain.hemisphere = "sign";
+  plain.reverse = "none";
+  return plain;
+}
+
 void add_angle_options(CLI::App& app, AngleFormat& format, const std::string& prefix,
                        const std::string& group) {
   const auto add = [&](const std::string& name, std::string& value, const std::string& help,

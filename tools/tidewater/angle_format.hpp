@@ -20,6 +20,8 @@ struct AngleFormat {
   AngleUnit unit() const;
   // Nonzero when the latitude stands first.
   int16_t library_order() const { return order == "lat-lon" ? 1 : 0; }
+  // The same for an angle that is neither latitude nor longitude.
+  AngleFormat without_hemisphere() const;
 };
 
 // Adds --format, --hemisphere, --reverse and --order, each name with a prefix ("out-").

@@ -5,11 +5,12 @@
 
 namespace tidewater::command {
 
-// Exit statuses: 0 when everything was converted, 1 when some lines were not.
+// Exit statuses: 0 when every line was done, 1 when some lines were not.
 inline constexpr int kSomeRefused = 1;
 inline constexpr int kUsageError = 2;
 
 // Each registers its subcommand; exit_status is set when it has run.
 void add_convert(CLI::App& app, int& exit_status);
+void add_line(CLI::App& app, int& exit_status);
 
 }  // namespace tidewater::command

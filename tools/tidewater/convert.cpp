@@ -2,7 +2,6 @@
 
 #include <array>
 #include <cmath>
-#include <cstdio>
 #include <memory>
 #include <stdexcept>
 #include <string>
@@ -12,10 +11,9 @@
 #include "commands.hpp"
 #include "datum_shift.hpp"
 #include "ellipsoid.hpp"
-#include "line_reader.hpp"
+#include "geoid.hpp"
+#include "line_job.hpp"
 #include "position_text.hpp"
-#include "progress.hpp"
-#include "status_name.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 #include "tidewater/text.h"
@@ -26,7 +24,6 @@ namespace {
 
 constexpr double kPi = 3.141592653589793;
 constexpr double kDegree = 0.017453292519943295;
-constexpr std::size_t kBatch = 4096;
 
 // UTM's scale on the central meridian and its false easting.
 constexpr double kUtmScale = 0.9996;
@@ -43,27 +40,19 @@ struct Options {
   std::string to = "utm";
   std::string zone = "auto";
   std::string ellipsoid = "GRS 80";
-  std::string shift;
-  bool inverse = false;
+  ShiftRequest shift;
+  std::string from_ellipsoid;
+  std::string geoid;
+  bool geoid_to_ellipsoid = false;
   int precision = -1;
 };
 
-// One line of input and what becomes of it.
-struct Line {
-  std::string text;
-  std::size_t rest = 0;  // where what follows the position begins
-  bool is_position = false;
+// A position among the lines of a batch.
+struct Position {
+  std::size_t line = 0;
+  CoordinateTriple point = {};
   bool has_height = false;
-  int64_t number = 0;
-  TWstatus status = TW_SUCCESS;
-  const char* reason = nullptr;  // beside the status, where it says more
-  int16_t zone = 0;              // UTM zone, negative in the south
-};
-
-struct Counts {
-  int64_t converted = 0;
-  int64_t outside = 0;
-  int64_t refused = 0;
+  int16_t zone = 0;  // UTM zone, negative in the south
 };
 
 // The zone of the grid's definition, with the exceptions for Norway and Svalbard.
@@ -102,7 +91,7 @@ int16_t parse_zone(const std::string& text) {
   return static_cast<int16_t>(south ? -zone : zone);
 }
 
-class Converter {
+class Converter : public LineJob {
  public:
   explicit Converter(const Options& options)
       : options_(options), in_unit_(options.in.unit()), out_unit_(options.out.unit()) {
@@ -110,7 +99,8 @@ class Converter {
     a_ = ellipsoid.a;
     e_ = ellipsoid.e();
     if (options.zone != "auto") zone_ = parse_zone(options.zone);
-    if (!options.shift.empty()) shift_ = make_datum_shift(options.shift, options.inverse);
+    if (!options.shift.text.empty()) shift_ = make_datum_shift(options.shift);
+    if (!options.geoid.empty()) geoid_ = std::make_unique<Geoid>(options.geoid);
     TWstatus status = TW_SUCCESS;
     double b2 = 0, b4 = 0, b6 = 0;
     TWt_merc_c(e_, 0, 0, &arc_[0], &arc_[1], &arc_[2], &arc_[3], &arc_[4], &m0_, &b2, &b4, &b6,
@@ -118,140 +108,132 @@ class Converter {
     lines_.reserve(kBatch);
   }
 
-  void read(LineReader& reader, Progress& progress) {
-    std::string text;
-    while (reader.next(text)) {
-      lines_.push_back(parse(reader, text));
-      if (lines_.size() == kBatch) {
-        flush(reader.name(), progress);
-        progress.show(reader.bytes_read());
-      }
-    }
-    flush(reader.name(), progress);
-  }
-
-  const Counts& counts() const { return counts_; }
-
  private:
-  Line parse(const LineReader& reader, const std::string& text) const {
-    Line line;
-    line.text = text;
-    line.number = reader.number();
-    const std::size_t first = text.find_first_not_of(" \t");
-    if (first == std::string::npos || text[first] == '#') return line;
-    line.is_position = true;
-    PositionText position;
-    line.status =
-        reader.too_long() ? TW_BAD_TEXT : read_position(text, options_.in, in_unit_, position);
-    line.rest = text.size() - position.rest.size();
-    line.has_height = position.has_height;
-    points_.push_back(position.point);
-    return line;
+  void take(Line line) override {
+    if (line.is_data) {
+      PositionText text;
+      const TWstatus status = read_position(line.text, options_.in, in_unit_, text);
+      if (line.status == TW_SUCCESS) line.status = status;
+      line.rest = line.text.size() - text.rest.size();
+      Position position;
+      position.line = lines_.size();
+      position.point = text.point;
+      position.has_height = text.has_height;
+      positions_.push_back(position);
+    }
+    lines_.push_back(std::move(line));
   }
 
-  // Runs an array call over the good points of the batch.  An answer other than success is told
-  // apart point by point.
+  // The line of a position.
+  Line& line_of(const Position& position) { return lines_[position.line]; }
+
+  std::vector<Position*> good_positions() {
+    std::vector<Position*> good;
+    for (Position& position : positions_) {
+      if (line_of(position).status == TW_SUCCESS) good.push_back(&position);
+    }
+    return good;
+  }
+
+  // Runs an array call over the positions that are good so far.  An answer other than success is
+  // told apart point by point.
   template <class Call>
-  void run(std::vector<std::size_t>& good, std::vector<CoordinateTriple>& work, Call call) {
-    const std::vector<CoordinateTriple> before = work;
-    if (call(static_cast<int32_t>(work.size()), work.data()) == TW_SUCCESS) return;
-    std::vector<std::size_t> still_good;
-    std::vector<CoordinateTriple> kept;
-    for (std::size_t i = 0; i < good.size(); ++i) {
-      CoordinateTriple point = before[i];
+  void apply(const std::vector<Position*>& good, Call call) {
+    std::vector<CoordinateTriple> work(good.size());
+    for (std::size_t i = 0; i < good.size(); ++i) work[i] = good[i]->point;
+    if (call(static_cast<int32_t>(work.size()), work.data()) == TW_SUCCESS) {
+      for (std::size_t i = 0; i < good.size(); ++i) good[i]->point = work[i];
+      return;
+    }
+    for (Position* position : good) {
+      CoordinateTriple point = position->point;
       const TWstatus status = call(1, &point);
       if (status == TW_SUCCESS) {
-        still_good.push_back(good[i]);
-        kept.push_back(point);
+        position->point = point;
       } else {
-        positions_[good[i]]->status = status;
+        line_of(*position).status = status;
       }
     }
-    good = std::move(still_good);
-    work = std::move(kept);
   }
 
-  // Takes the points that reason refuses out of the batch.
+  // Marks the positions for which there is a reason.
   template <class Reason>
-  void refuse(std::vector<std::size_t>& good, std::vector<CoordinateTriple>& work, TWstatus status,
-              Reason reason) {
-    std::size_t kept = 0;
-    for (std::size_t i = 0; i < good.size(); ++i) {
-      if (const char* why = reason(work[i])) {
-        positions_[good[i]]->status = status;
-        positions_[good[i]]->reason = why;
-        continue;
-      }
-      good[kept] = good[i];
-      work[kept++] = work[i];
+  void refuse(TWstatus status, Reason reason) {
+    for (Position* position : good_positions()) {
+      if (const char* why = reason(position->point)) line_of(*position).refuse(status, why);
     }
-    good.resize(kept);
-    work.resize(kept);
   }
 
-  void flush(const std::string& name, Progress& progress) {
-    positions_.clear();
-    for (Line& line : lines_) {
-      if (line.is_position) positions_.push_back(&line);
-    }
-    std::vector<std::size_t> good;
-    std::vector<CoordinateTriple> work;
-    for (std::size_t i = 0; i < positions_.size(); ++i) {
-      if (positions_[i]->status == TW_SUCCESS) {
-        good.push_back(i);
-        work.push_back(points_[i]);
-      }
-    }
+  void end_batch() override {
+    // A geoid belongs to the datum of the heights above the ellipsoid: it is put on before the
+    // shift, and taken off behind it.
+    if (geoid_ && options_.geoid_to_ellipsoid) apply_geoid();
     if (shift_) {
-      refuse(good, work, TW_I_OUTSIDE_CNT,
-             [this](const CoordinateTriple& p) { return shift_->refusal(p); });
-      run(good, work, [this](int32_t count, CoordinateTriple* p) { return shift_->run(count, p); });
+      refuse(TW_I_OUTSIDE_CNT, [this](const CoordinateTriple& p) { return shift_->refusal(p); });
+      apply(good_positions(),
+            [this](int32_t count, CoordinateTriple* p) { return shift_->run(count, p); });
     }
+    if (geoid_ && !options_.geoid_to_ellipsoid) apply_geoid();
     if (options_.to == "utm") {
-      to_utm(good, work);
+      to_utm();
     } else if (options_.to == "geocentric") {
-      run(good, work, [this](int32_t count, CoordinateTriple* p) {
+      apply(good_positions(), [this](int32_t count, CoordinateTriple* p) {
         TWstatus status = TW_SUCCESS;
         TWllh_to_xyz(a_, e_, count, p, p, &status);
         return status;
       });
     }
-    for (std::size_t i = 0; i < good.size(); ++i) points_[good[i]] = work[i];
-    write(name, progress);
+    write_batch();
     lines_.clear();
-    points_.clear();
+    positions_.clear();
   }
 
-  void to_utm(std::vector<std::size_t>& good, std::vector<CoordinateTriple>& work) {
-    refuse(good, work, TW_BAD_LATITUDE, [](const CoordinateTriple& p) -> const char* {
+  // Only lines that have a height need the geoid.
+  void apply_geoid() {
+    std::vector<Position*> with_height;
+    for (Position* position : good_positions()) {
+      if (position->has_height) with_height.push_back(position);
+    }
+    apply(with_height, [this](int32_t count, CoordinateTriple* p) {
+      return options_.geoid_to_ellipsoid ? geoid_->to_ellipsoid(count, p)
+                                         : geoid_->from_ellipsoid(count, p);
+    });
+  }
+
+  void to_utm() {
+    refuse(TW_BAD_LATITUDE, [](const CoordinateTriple& p) -> const char* {
       const bool inside = p.y >= kUtmSouth && p.y <= kUtmNorth;
       return inside ? nullptr : "outside UTM's latitudes, 80 S to 84 N";
     });
-    for (std::size_t i = 0; i < good.size(); ++i) {
-      const int16_t zone = utm_zone(work[i]);
-      positions_[good[i]]->zone =
-          zone_ ? zone_ : static_cast<int16_t>(work[i].y < 0 ? -zone : zone);
-    }
     if (zone_) {
       const double lon0 = central_meridian(zone_);
-      refuse(good, work, TW_RANGE_ERROR, [lon0](const CoordinateTriple& p) -> const char* {
+      refuse(TW_RANGE_ERROR, [lon0](const CoordinateTriple& p) -> const char* {
         const double away = std::fabs(std::remainder(p.x - lon0, 2 * kPi));
         return away > kSeriesReach ? "over 50 degrees from the zone's central meridian" : nullptr;
       });
     }
+    const std::vector<Position*> good = good_positions();
+    for (Position* p : good) {
+      const int16_t zone = utm_zone(p->point);
+      p->zone = zone_ ? zone_ : static_cast<int16_t>(p->point.y < 0 ? -zone : zone);
+    }
     // Points of one zone that follow one another go through one call.
     for (std::size_t from = 0; from < good.size();) {
-      const int16_t zone = positions_[good[from]]->zone;
+      const int16_t zone = good[from]->zone;
       std::size_t to = from + 1;
-      while (to < good.size() && positions_[good[to]]->zone == zone) ++to;
-      const auto count = static_cast<int32_t>(to - from);
-      CoordinateTriple* points = &work[from];
-      TWstatus status = TW_SUCCESS;
-      double false_northing = 0;
-      TWrslv_utmhemi(zone < 0 ? 1 : 0, &false_northing, &status);
-      TWt_merc_f(e_, central_meridian(zone), arc_[0], arc_[1], arc_[2], arc_[3], arc_[4], m0_,
-                 count, points, points, &status);
-      TWab_to_en(a_, kUtmScale, kUtmFalseEasting, false_northing, count, points, points, &status);
+      while (to < good.size() && good[to]->zone == zone) ++to;
+      const auto begin = good.begin();
+      apply({begin + static_cast<std::ptrdiff_t>(from), begin + static_cast<std::ptrdiff_t>(to)},
+            [this, zone](int32_t count, CoordinateTriple* p) {
+              TWstatus status = TW_SUCCESS;
+              double false_northing = 0;
+              TWrslv_utmhemi(zone < 0 ? 1 : 0, &false_northing, &status);
+              TWt_merc_f(e_, central_meridian(zone), arc_[0], arc_[1], arc_[2], arc_[3], arc_[4],
+                         m0_, count, p, p, &status);
+              if (status != TW_SUCCESS) return status;
+              TWab_to_en(a_, kUtmScale, kUtmFalseEasting, false_northing, count, p, p, &status);
+              return status;
+            });
       from = to;
     }
   }
@@ -263,83 +245,46 @@ class Converter {
     return lon0;
   }
 
-  void write(const std::string& name, Progress& progress) {
+  void write_batch() {
     std::size_t next = 0;
     for (const Line& line : lines_) {
-      if (!line.is_position) {
+      if (!line.is_data) {
         out_ = line.text;
-      } else if (line.status == TW_SUCCESS) {
-        out_.clear();
-        append_position(line, points_[next]);
-        out_.append(line.text, line.rest);
-        ++counts_.converted;
       } else {
-        out_ = options_.to == "geocentric" ? "* * *" : "* *";
+        const Position& position = positions_[next++];
+        if (line.status == TW_SUCCESS) {
+          out_.clear();
+          append(position);
+          count_done();
+        } else {
+          out_ = options_.to == "geocentric" ? "* * *" : "* *";
+          complain(line);
+        }
         out_.append(line.text, line.rest);
-        progress.clear();
-        complain(name, line);
       }
-      if (line.is_position) ++next;
       out_ += '\n';
-      if (std::fwrite(out_.data(), 1, out_.size(), stdout) != out_.size()) {
-        throw std::runtime_error("standard output cannot be written");
-      }
+      write(out_);
     }
   }
 
-  void complain(const std::string& name, const Line& line) {
-    constexpr std::size_t kShown = 120;
-    std::string shown = line.text.substr(0, kShown);
-    for (char& c : shown) {
-      if (static_cast<unsigned char>(c) < ' ' || c == 127) c = '?';
-    }
-    std::fprintf(stderr, "%s:%lld: \"%s%s\": %s (%s)\n", name.c_str(),
-                 static_cast<long long>(line.number), shown.c_str(),
-                 line.text.size() > kShown ? "..." : "",
-                 line.reason ? line.reason : status_meaning(line.status), status_name(line.status));
-    ++(line.status == TW_I_OUTSIDE_NADCON || (line.status == TW_I_OUTSIDE_CNT && !line.reason)
-           ? counts_.outside
-           : counts_.refused);
-  }
-
-  void append_metres(double value) {
-    std::array<char, 400> field;  // holds the largest double
-    TWstatus status = TW_SUCCESS;
-    TWmet_to_ascii(value, static_cast<int16_t>(options_.precision >= 0 ? options_.precision : 3), 1,
-                   field.data(), &status);
-    if (!out_.empty()) out_ += ' ';
-    out_ += field.data();
-  }
-
-  void append_angle(double value, int16_t axis) {
-    std::array<char, 64> field;
-    TWstatus status = TW_SUCCESS;
-    TWrad_to_ascii(value, out_unit_, axis, field.data(), &status);
-    if (!out_.empty()) out_ += ' ';
-    out_ += field.data();
-  }
-
-  void append_position(const Line& line, const CoordinateTriple& p) {
-    if (options_.to == "geocentric") {
-      append_metres(p.x);
-      append_metres(p.y);
-      append_metres(p.z);
-      return;
-    }
-    if (options_.to == "utm") {
-      append_metres(p.x);
-      append_metres(p.y);
-    } else if (options_.out.order == "lat-lon") {
-      append_angle(p.y, 1);
-      append_angle(p.x, 0);
+  void append(const Position& position) {
+    const CoordinateTriple& p = position.point;
+    const int metres = options_.precision >= 0 ? options_.precision : 3;
+    if (options_.to == "geodetic") {
+      append_position(out_, p, options_.out, out_unit_);
     } else {
-      append_angle(p.x, 0);
-      append_angle(p.y, 1);
+      append_metres(out_, p.x, metres);
+      append_metres(out_, p.y, metres);
     }
-    if (line.has_height) append_metres(p.z);
+    if (options_.to == "geocentric" || position.has_height) append_metres(out_, p.z, metres);
     if (options_.to == "utm" && !zone_) {
-      out_ += ' ' + std::to_string(std::abs(line.zone)) + (line.zone < 0 ? 'S' : 'N');
+      out_ += ' ' + std::to_string(std::abs(position.zone)) + (position.zone < 0 ? 'S' : 'N');
     }
+  }
+
+  std::string summary(const Counts& counts) const override {
+    return std::to_string(counts.done) + " converted, " + std::to_string(counts.outside) +
+           " outside the grids, " + std::to_string(counts.refused) + " refused";
   }
 
   const Options& options_;
@@ -349,30 +294,24 @@ class Converter {
   double e_ = 0;
   int16_t zone_ = 0;  // 0: found from each position
   std::unique_ptr<DatumShift> shift_;
+  std::unique_ptr<Geoid> geoid_;
   std::array<double, 5> arc_ = {};
   double m0_ = 0;
   std::vector<Line> lines_;
-  std::vector<Line*> positions_;
-  mutable std::vector<CoordinateTriple> points_;
+  std::vector<Position> positions_;  // of the lines that are data, in their order
   std::string out_;
-  Counts counts_;
 };
 
 int convert(Options& options) {
-  if (options.files.empty()) options.files.push_back("-");
   if (options.precision >= 0 && options.to == "geodetic") options.out.precision = options.precision;
-  Converter converter(options);
-  for (const std::string& file : options.files) {
-    LineReader reader(file);
-    Progress progress(reader.size());
-    converter.read(reader, progress);
+  if (!options.geoid.empty() && !options.geoid_to_ellipsoid && options.to == "geocentric") {
+    throw std::invalid_argument("geocentric coordinates have no height above the geoid");
   }
-  if (std::fflush(stdout) != 0) throw std::runtime_error("standard output cannot be written");
-  const Counts& counts = converter.counts();
-  std::fprintf(stderr, "%lld converted, %lld outside the grids, %lld refused\n",
-               static_cast<long long>(counts.converted), static_cast<long long>(counts.outside),
-               static_cast<long long>(counts.refused));
-  return counts.outside + counts.refused > 0 ? kSomeRefused : 0;
+  if (!options.from_ellipsoid.empty()) {
+    options.shift.from = find_ellipsoid(options.from_ellipsoid);
+    options.shift.to = find_ellipsoid(options.ellipsoid);
+  }
+  return Converter(options).run(options.files);
 }
 
 const char* const kExamples = R"(Examples:
@@ -384,6 +323,8 @@ const char* const kExamples = R"(Examples:
   echo "-4.4863 48.3903" | tidewater convert --order lon-lat --zone 30N --ellipsoid "International 1924"
   # to packed degrees, minutes and seconds with a letter in front
   echo "48.3903 -4.4863" | tidewater convert --to geodetic --out-format packed --out-hemisphere front
+  # from Bessel's ellipsoid to WGS 84 by seven parameters
+  echo "50.9413 6.9583 53.2 Cologne" | tidewater convert --to geodetic --shift helmert:598.1,73.7,418.2,0.202,0.045,-2.455,6.7 --from-ellipsoid "Bessel 1841" -e "WGS 84"
 )";
 
 }  // namespace
@@ -401,18 +342,39 @@ void add_convert(CLI::App& app, int& exit_status) {
   command->add_option("files", options->files, "files to read; - or none: standard input");
   add_angle_options(*command, options->in, "", "Input");
   command
-      ->add_option("--shift", options->shift,
-                   "datum shift by grids: nadcon:DIR or ntv2:DIR, where DIR holds area.par and the "
-                   "grids that it names")
+      ->add_option("--shift", options->shift.text,
+                   "datum shift.  By grids: nadcon:DIR or ntv2:DIR, where DIR holds area.par and "
+                   "the grids that it names.  By formulas, with --from-ellipsoid: "
+                   "molodensky:DX,DY,DZ in metres, or helmert:DX,DY,DZ,RX,RY,RZ,PPM in metres, "
+                   "arc-seconds and parts per million, with the rotations of position vectors "
+                   "(EPSG method 1033; those of a coordinate frame have the other sign)")
       ->group("Datum");
   command
-      ->add_flag("--inverse", options->inverse, "shift from the grids' target datum to the source")
+      ->add_flag("--inverse", options->shift.inverse,
+                 "the shift turned round: the input is on its target datum, the output on its "
+                 "source datum")
+      ->needs("--shift")
+      ->group("Datum");
+  command
+      ->add_option("--from-ellipsoid", options->from_ellipsoid,
+                   "ellipsoid of the input, for a shift by formulas: a name, or A,RF")
       ->needs("--shift")
       ->group("Datum");
   command
       ->add_option("-e,--ellipsoid", options->ellipsoid,
                    "ellipsoid of the output: " + ellipsoid_names() + "; or A,RF")
       ->capture_default_str()
+      ->group("Datum");
+  command
+      ->add_option("--geoid", options->geoid,
+                   "heights above the ellipsoid become heights above the geoid, behind the shift; "
+                   "DIR holds area.par and the geoid grids that it names")
+      ->type_name("DIR")
+      ->group("Datum");
+  command
+      ->add_flag("--geoid-to-ellipsoid", options->geoid_to_ellipsoid,
+                 "the other way round, before the shift: the input's heights are above the geoid")
+      ->needs("--geoid")
       ->group("Datum");
   command
       ->add_option("--to", options->to,

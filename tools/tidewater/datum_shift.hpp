@@ -2,8 +2,10 @@
 #pragma once
 
 #include <memory>
+#include <optional>
 #include <string>
 
+#include "ellipsoid.hpp"
 #include "tidewater/frame.h"
 
 namespace tidewater::command {
@@ -17,7 +19,16 @@ class DatumShift {
   virtual const char* refusal(const CoordinateTriple&) const { return nullptr; }
 };
 
-// From "nadcon:DIR" or "ntv2:DIR".  Throws std::runtime_error when the grids cannot be used.
-std::unique_ptr<DatumShift> make_datum_shift(const std::string& text, bool inverse);
+struct ShiftRequest {
+  std::string text;  // nadcon:DIR, ntv2:DIR, molodensky:DX,DY,DZ, helmert:DX,DY,DZ,RX,RY,RZ,PPM
+  bool inverse = false;
+  // Of the points before and after they are shifted, in whichever direction; for a shift by
+  // formulas, which needs both.
+  std::optional<Ellipsoid> from;
+  std::optional<Ellipsoid> to;
+};
+
+// Throws std::runtime_error when the shift cannot be made.
+std::unique_ptr<DatumShift> make_datum_shift(const ShiftRequest& request);
 
 }  // namespace tidewater::command

@@ -16,6 +16,7 @@ int main(int argc, char** argv) {
   app.require_subcommand(1);
   int exit_status = 0;
   tidewater::command::add_convert(app, exit_status);
+  tidewater::command::add_line(app, exit_status);
   tidewater::tools::add_magnetic(app, exit_status);
   try {
     app.parse(argc, argv);

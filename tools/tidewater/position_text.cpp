@@ -1,8 +1,11 @@
 #include "position_text.hpp"
 
+#include <array>
 #include <charconv>
+#include <cmath>
 #include <cstring>
 
+#include "tidewater/foundation.h"
 #include "tidewater/text.h"
 
 namespace tidewater::command {
@@ -101,37 +104,78 @@ TWstatus read_angle(std::string_view field, const AngleFormat& format, const Ang
   return status;
 }
 
-bool read_height(std::string_view field, double& height) {
-  if (!field.empty() && field[0] == '+') field.remove_prefix(1);
-  std::string_view magnitude = field;
-  if (!magnitude.empty() && magnitude[0] == '-') magnitude.remove_prefix(1);
-  if (!is_plain_number(magnitude)) return false;
-  return std::from_chars(field.data(), field.data() + field.size(), height).ec == std::errc();
+void append_angle(std::string& text, double value, const AngleUnit& unit, int16_t axis) {
+  std::array<char, 64> field;
+  TWstatus status = TW_SUCCESS;
+  TWrad_to_ascii(value, unit, axis, field.data(), &status);
+  if (!text.empty()) text += ' ';
+  text += field.data();
 }
 
 }  // namespace
 
-TWstatus read_position(std::string_view line, const AngleFormat& format, const AngleUnit& unit,
-                       PositionText& position) {
-  position = {};
-  const std::string_view first = take_field(line);
-  const std::string_view second = take_field(line);
-  position.rest = line;
-  std::string_view after_height = line;
-  double height = 0;
-  if (read_height(take_field(after_height), height)) {
-    position.has_height = true;
-    position.rest = after_height;
-  }
+TWstatus take_position(std::string_view& text, const AngleFormat& format, const AngleUnit& unit,
+                       CoordinateTriple& point) {
+  const std::string_view first = take_field(text);
+  const std::string_view second = take_field(text);
   const bool lat_first = format.order == "lat-lon";
   double lon = 0;
   double lat = 0;
   TWstatus status = read_angle(lat_first ? second : first, format, unit, 0, lon);
   if (status == TW_SUCCESS) status = read_angle(lat_first ? first : second, format, unit, 1, lat);
-  if (status == TW_SUCCESS) TWverify_lon(lon, &position.point.x, &status);
-  if (status == TW_SUCCESS) TWverify_lat(lat, &position.point.y, &status);
-  position.point.z = height;
+  if (status == TW_SUCCESS) TWverify_lon(lon, &point.x, &status);
+  if (status == TW_SUCCESS) TWverify_lat(lat, &point.y, &status);
   return status;
+}
+
+TWstatus take_azimuth(std::string_view& text, const AngleFormat& format, double& azimuth) {
+  constexpr double kTurn = 6.283185307179587 + 1e-12;  // 360 degrees as any format reads them
+  const AngleFormat plain = format.without_hemisphere();
+  const TWstatus status = read_angle(take_field(text), plain, plain.unit(), 0, azimuth);
+  if (status != TW_SUCCESS) return status;
+  return std::fabs(azimuth) <= kTurn ? TW_SUCCESS : TW_RANGE_ERROR;
+}
+
+bool take_number(std::string_view& text, double& value) {
+  std::string_view rest = text;
+  std::string_view field = take_field(rest);
+  if (!field.empty() && field[0] == '+') field.remove_prefix(1);
+  std::string_view magnitude = field;
+  if (!magnitude.empty() && magnitude[0] == '-') magnitude.remove_prefix(1);
+  if (!is_plain_number(magnitude)) return false;
+  if (std::from_chars(field.data(), field.data() + field.size(), value).ec != std::errc()) {
+    return false;
+  }
+  text = rest;
+  return true;
+}
+
+TWstatus read_position(std::string_view line, const AngleFormat& format, const AngleUnit& unit,
+                       PositionText& position) {
+  position = {};
+  const TWstatus status = take_position(line, format, unit, position.point);
+  position.has_height = take_number(line, position.point.z);
+  position.rest = line;
+  return status;
+}
+
+void append_position(std::string& text, const CoordinateTriple& point, const AngleFormat& format,
+                     const AngleUnit& unit) {
+  const bool lat_first = format.order == "lat-lon";
+  append_angle(text, lat_first ? point.y : point.x, unit, lat_first ? 1 : 0);
+  append_angle(text, lat_first ? point.x : point.y, unit, lat_first ? 0 : 1);
+}
+
+void append_azimuth(std::string& text, double azimuth, const AngleFormat& format) {
+  append_angle(text, azimuth, format.without_hemisphere().unit(), 0);
+}
+
+void append_metres(std::string& text, double value, int decimals) {
+  std::array<char, 400> field;  // holds the largest double
+  TWstatus status = TW_SUCCESS;
+  TWmet_to_ascii(value, static_cast<int16_t>(decimals), 1, field.data(), &status);
+  if (!text.empty()) text += ' ';
+  text += field.data();
 }
 
 }  // namespace tidewater::command

@@ -1,0 +1,28 @@
+// Folders of grids, as the library wants them named.
+#pragma once
+
+#include <stdexcept>
+#include <string>
+
+#include "status_name.hpp"
+
+namespace tidewater::command {
+
+// The folder with its separator behind it.
+inline std::string grid_directory(std::string folder) {
+  constexpr std::size_t kLongest = 259;
+  if (folder.empty() || folder.back() != '/') folder += '/';
+  if (folder.size() > kLongest) {
+    throw std::runtime_error(folder + ": a folder of grids has at most 259 characters");
+  }
+  return folder;
+}
+
+inline void require_grids(TWstatus status, const std::string& directory) {
+  if (!TW_OK(status)) {
+    throw std::runtime_error(directory + ": " + status_meaning(status) + " (" +
+                             status_name(status) + ")");
+  }
+}
+
+}  // namespace tidewater::command
