@@ -277,23 +277,23 @@ TW_API void TWtsa_to_opk(double tilt, double swing, double azimuth, double* omeg
 
 /**
  * Geocentric rotations to tilt, swing, azimuth at a position.
- * @param Wx,Wy,Wz            angles
+ * @param wx,wy,wz            angles
  * @param lon,lat             ground position
  * @param tilt,swing,azimuth  angles out
  * @param status              always #TW_SUCCESS
  */
-TW_API void TWWxWyWzto_tsa(double Wx, double Wy, double Wz, double lon, double lat, double* tilt,
+TW_API void TWWxWyWzto_tsa(double wx, double wy, double wz, double lon, double lat, double* tilt,
                            double* swing, double* azimuth, TWstatus* status);
 
 /**
  * Tilt, swing, azimuth at a position to geocentric rotations; Wz is 0 where Wy stands at pi/2.
  * @param tilt,swing,azimuth  angles
  * @param lon,lat             ground position
- * @param Wx,Wy,Wz            angles out
+ * @param wx,wy,wz            angles out
  * @param status              always #TW_SUCCESS
  */
 TW_API void TWtsa_toWxWyWz(double tilt, double swing, double azimuth, double lon, double lat,
-                           double* Wx, double* Wy, double* Wz, TWstatus* status);
+                           double* wx, double* wy, double* wz, TWstatus* status);
 /** @} */
 
 /** @name Helpers on the plane

@@ -80,12 +80,12 @@ void TWtsa_to_opk(double tilt, double swing, double azimuth, double* omega, doub
   *kappa = std::atan2(-u, v);
 }
 
-void TWWxWyWzto_tsa(double Wx, double Wy, double Wz, double lon, double lat, double* tilt,
+void TWWxWyWzto_tsa(double wx, double wy, double wz, double lon, double lat, double* tilt,
                     double* swing, double* azimuth, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double cx = std::cos(Wx), sx = std::sin(Wx);
-  const double cy = std::cos(Wy), sy = std::sin(Wy);
-  const double cz = std::cos(Wz), sz = std::sin(Wz);
+  const double cx = std::cos(wx), sx = std::sin(wx);
+  const double cy = std::cos(wy), sy = std::sin(wy);
+  const double cz = std::cos(wz), sz = std::sin(wz);
   const double cl = std::cos(lon), sl = std::sin(lon);
   const double cb = std::cos(lat), sb = std::sin(lat);
   const double t = std::acos(cb * cl * sy - cb * sl * cy * sx + sb * cy * cx);
@@ -105,8 +105,8 @@ void TWWxWyWzto_tsa(double Wx, double Wy, double Wz, double lon, double lat, dou
   *swing = take_off_a_turn(-std::atan2(-(g2 * cl + sl * sz * cy), -(g1 * cl - cy * sl * cz)));
 }
 
-void TWtsa_toWxWyWz(double tilt, double swing, double azimuth, double lon, double lat, double* Wx,
-                    double* Wy, double* Wz, TWstatus* status) {
+void TWtsa_toWxWyWz(double tilt, double swing, double azimuth, double lon, double lat, double* wx,
+                    double* wy, double* wz, TWstatus* status) {
   *status = TW_SUCCESS;
   const double c0 = std::cos(tilt), s0 = std::sin(tilt);
   const double c1 = std::cos(swing), s1 = std::sin(swing);
@@ -123,9 +123,9 @@ void TWtsa_toWxWyWz(double tilt, double swing, double azimuth, double lon, doubl
   const double h7 = s2 * c1;
   const double h8 = h6 - h7 * c0;
   if (std::fabs(std::fabs(w) - 1) < kPoleTolerance) {
-    *Wy = w > 0 ? kHalfPi : -kHalfPi;
-    *Wz = 0;
-    *Wx = std::atan2((-h4 - h3) * c4 - s4 * c1 * s0, h5 * s3 + h8 * c3 - h1 * c1 * s0);
+    *wy = w > 0 ? kHalfPi : -kHalfPi;
+    *wz = 0;
+    *wx = std::atan2((-h4 - h3) * c4 - s4 * c1 * s0, h5 * s3 + h8 * c3 - h1 * c1 * s0);
     return;
   }
   const double u = s4 * s3 * c2 * s0 - s2 * c3 * s0 + h1 * c0;
@@ -136,7 +136,7 @@ void TWtsa_toWxWyWz(double tilt, double swing, double azimuth, double lon, doubl
   const double n = (h5 * c3 - h8 * s3 - c4 * c3 * c1 * s0) / std::cos(y);
   const double d =
       (-((h7 - h6 * c0) * s4 * c3) + (h4 * c0 + h2) * s3 - c4 * c3 * s1 * s0) / std::cos(y);
-  *Wx = x;
-  *Wy = y;
-  *Wz = std::atan2(-n, d);
+  *wx = x;
+  *wy = y;
+  *wz = std::atan2(-n, d);
 }
