@@ -4,7 +4,6 @@
 #include <cmath>
 #include <cstdint>
 #include <cstring>
-#include <regex>
 #include <string>
 #include <vector>
 
@@ -85,22 +84,24 @@ TEST(Convert, TownsOfBrittanyThroughTheNationalGrid) {
   const auto got = lines(r.out);
   ASSERT_EQ(given.size(), got.size());
   int compared = 0;
-  const std::regex position(R"((\d+):(\d+):([\d.]+)N (\d+):(\d+):([\d.]+)W (.*))");
   for (std::size_t i = 0; i < given.size(); ++i) {
-    std::smatch m;
-    if (!std::regex_match(given[i], m, position)) {
+    double d = 0, m = 0, sec = 0, e = 0, minutes = 0, t = 0;
+    int name = 0;
+    if (std::sscanf(given[i].c_str(), "%lf:%lf:%lfN %lf:%lf:%lfW %n", &d, &m, &sec, &e, &minutes,
+                    &t, &name) != 6) {
       EXPECT_EQ(given[i], got[i]);  // the comment is passed through
       continue;
     }
-    const double lat = degrees(std::stod(m[1]), std::stod(m[2]), std::stod(m[3]));
-    const double lon = -degrees(std::stod(m[4]), std::stod(m[5]), std::stod(m[6]));
+    const double lat = degrees(d, m, sec);
+    const double lon = -degrees(e, minutes, t);
     const CoordinateTriple expected = peer.forward({lon, lat, 0});
     const auto n = numbers(got[i]);
     ASSERT_EQ(n.size(), 2u) << got[i];
     EXPECT_NEAR(n[0], expected.x, 1e-3) << given[i];
     // 1 mm, and 0.9 mm by which the grid's own series of the arc is off the exact arc here
     EXPECT_NEAR(n[1], expected.y, 1.9e-3) << given[i];
-    EXPECT_NE(got[i].find(' ' + m[7].str()), std::string::npos);
+    EXPECT_NE(got[i].find(' ' + given[i].substr(static_cast<std::size_t>(name))),
+              std::string::npos);
     ++compared;
   }
   EXPECT_EQ(compared, 12);
