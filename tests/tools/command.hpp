@@ -7,6 +7,7 @@
 #include <fstream>
 #include <sstream>
 #include <string>
+#include <vector>
 
 #include "support/data.hpp"
 
@@ -35,6 +36,21 @@ inline Outcome shell(const std::string& line, const std::string& input = "") {
   const int status = std::system(command.c_str());
   return {contents(scratch.path() / "out"), contents(scratch.path() / "err"),
           WIFEXITED(status) ? WEXITSTATUS(status) : -1};
+}
+
+// The lines of a text, and the numbers that a line begins with.
+inline std::vector<std::string> lines(const std::string& text) {
+  std::vector<std::string> all;
+  std::istringstream stream(text);
+  for (std::string line; std::getline(stream, line);) all.push_back(line);
+  return all;
+}
+
+inline std::vector<double> numbers(const std::string& line) {
+  std::vector<double> all;
+  std::istringstream stream(line);
+  for (double value = 0; stream >> value;) all.push_back(value);
+  return all;
 }
 
 }  // namespace tidewater::test

@@ -222,6 +222,7 @@ int solve_lines(Options& options) {
   if (options.as != "text" && !options.wants_points()) {
     throw std::invalid_argument("--as " + options.as + " needs --points or --spacing");
   }
+  if (std::isnan(options.spacing)) throw std::invalid_argument("--spacing is not a number");
   if (options.precision >= 0) options.out.precision = options.precision;
   return LineSolving(options).run(options.files);
 }

@@ -51,10 +51,23 @@ class LineSolver {
     double back_azimuth = 0;
   };
   Reached along_geodesic(CoordinateTriple start, double azimuth, double distance) const;
+  Reached along_short(const CoordinateTriple& start, double azimuth, double distance) const;
   Reached along_meridian(CoordinateTriple start, bool north, double distance) const;
   Reached along_rhumb(const CoordinateTriple& start, double azimuth, double distance) const;
   Reached along(const CoordinateTriple& start, double azimuth, double distance) const;
 
+  struct Offset {
+    double north = 0;
+    double east = 0;
+  };
+  Offset offset(const SolvedLine& line, const Reached& reached) const;
+  double misclosure(const SolvedLine& line) const;
+  double loss_at_start(const CoordinateTriple& start, double azimuth) const;
+  bool is_short(const CoordinateTriple& start, double distance) const;
+
+  void improve(SolvedLine& line) const;
+  // False, with line as it was, where the line is not short.
+  bool solve_short(SolvedLine& line) const;
   void solve_geodesic(SolvedLine& line) const;
   void solve_rhumb(SolvedLine& line) const;
   double arc(double lat) const;
