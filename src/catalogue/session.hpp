@@ -74,7 +74,7 @@ inline TWstatus list_names(const char* table, const char* column, const TextFiel
 
 // The number of rows of a table; failed is the word where the store does not tell it.
 inline TWstatus count_rows(const char* table, Judge judge, TWstatus failed, int32_t* count) {
-  int32_t rows = *count;
+  int32_t rows = 0;
   if (!worked(OLB7R3_PF_inq_num_rows(table, &rows), judge)) return failed;
   *count = rows;
   return TW_SUCCESS;

@@ -3,36 +3,13 @@
 
 #include <cmath>
 
+#include "foundation/complex.hpp"
 #include "foundation/numeric.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater;
 
 namespace {
-
-struct Complex {
-  double re;
-  double im;
-};
-
-Complex operator+(Complex p, Complex q) { return {p.re + q.re, p.im + q.im}; }
-Complex operator-(Complex p, Complex q) { return {p.re - q.re, p.im - q.im}; }
-Complex operator*(Complex p, Complex q) {
-  return {p.re * q.re - p.im * q.im, p.re * q.im + p.im * q.re};
-}
-Complex operator*(double s, Complex p) { return {s * p.re, s * p.im}; }
-
-// R. L. Smith, Algorithm 116: Complex division, Communications of the ACM 5 (1962), p. 435.
-Complex operator/(Complex p, Complex q) {
-  if (std::fabs(q.re) >= std::fabs(q.im)) {
-    const double r = q.im / q.re;
-    const double e = r * q.im + q.re;
-    return {(p.im * r + p.re) / e, (p.im - p.re * r) / e};
-  }
-  const double r = q.re / q.im;
-  const double e = r * q.re + q.im;
-  return {(p.re * r + p.im) / e, (p.im * r - p.re) / e};
-}
 
 double squared_modulus(Complex p) { return square(p.re) + square(p.im); }
 

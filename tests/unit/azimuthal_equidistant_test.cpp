@@ -2,7 +2,7 @@
 
 #include <random>
 
-#include "support/numerical_scale.hpp"
+#include "support/numeric_scale.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
 #include "tidewater/conformal.h"
@@ -217,15 +217,15 @@ TEST(AzimuthalEquidistant, ScaleIsTheDerivativeAcrossTheRay) {
   const Equidistant p(0, 0.3, 0.4);
   for (const double lat : {-0.6, 0.1, 1.2}) {
     const auto expected =
-        numerical_scale(0, 0.3, lat, [&](CoordinateTriple q) { return p.forward(q); });
+        numeric_scale([&](CoordinateTriple q) { return p.forward(q); }, 0.3, lat, 0);
     const CoordinateTriple in = {0.3, lat, 0};
     CoordinateTriple out = kUntouchedPoint;
     TWstatus status = 0;
     TWaz_eq_s(0.3, 0.4, 2, 1, &in, &out, &status);
     EXPECT_EQ(status, TW_SUCCESS);
-    EXPECT_NEAR(out.x, 2 * expected.k, 1e-10);
+    EXPECT_NEAR(out.x, 2 * expected.x, 1e-10);
     EXPECT_EQ(out.y, 2);
-    EXPECT_NEAR(expected.h, 1, 1e-10);
+    EXPECT_NEAR(expected.y, 1, 1e-10);
     EXPECT_EQ(out.z, out.x * 2);
   }
   // Snyder 1987, p. 337: c = 148.97 degrees from 40 N 100 W to 20 S 100 E.

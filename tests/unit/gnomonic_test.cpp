@@ -2,7 +2,7 @@
 
 #include <random>
 
-#include "support/numerical_scale.hpp"
+#include "support/numeric_scale.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
 #include "tidewater/conformal.h"
@@ -138,13 +138,13 @@ TEST(Gnomonic, ScaleIsTheDerivativeAlongAndAcrossTheRay) {
   const Gnomonic g(0.4, 0.3);
   const CoordinateTriple in = {0.4, 0.8, 0};
   const auto expected =
-      numerical_scale(0, in.x, in.y, [&](CoordinateTriple p) { return g.forward(p); });
+      numeric_scale([&](CoordinateTriple p) { return g.forward(p); }, in.x, in.y, 0);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
   TWgnomon_s(g.lon0, 99, 2, g.cos_lat0, g.sin_lat0, 1, &in, &out, &status);
   EXPECT_EQ(status, TW_SUCCESS);
-  EXPECT_NEAR(out.x, 2 * expected.k, 1e-10);
-  EXPECT_NEAR(out.y, 2 * expected.h, 1e-9);
+  EXPECT_NEAR(out.x, 2 * expected.x, 1e-10);
+  EXPECT_NEAR(out.y, 2 * expected.y, 1e-9);
   EXPECT_EQ(out.z, out.x * out.y);
 }
 

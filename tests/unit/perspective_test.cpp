@@ -99,7 +99,8 @@ CoordinateTriple camera(const Perspective& v, const CoordinateTriple& in) {
 }
 
 TEST(Perspective, AsACameraWouldSeeIt) {
-  for (const Ellipsoid& ellipsoid : {Ellipsoid{6371e3, 0}, Ellipsoid::wgs84(), Ellipsoid{2, 0.12}}) {
+  for (const Ellipsoid& ellipsoid :
+       {Ellipsoid{6371e3, 0}, Ellipsoid::wgs84(), Ellipsoid{2, 0.12}}) {
     for (const double lat0 : {0.0, 0.7, -1.2}) {
       const double unit = ellipsoid.a;
       const Perspective v(ellipsoid, 0.3, lat0, 0.4 * unit, 0.01 * unit);

@@ -1,4 +1,5 @@
-// Double stereographic: the ellipsoid onto the Gauss sphere, that turned to its pole, that projected.
+// Double stereographic: the ellipsoid onto the Gauss sphere, that turned to its pole, that
+// projected.
 
 #include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"

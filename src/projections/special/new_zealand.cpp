@@ -3,6 +3,7 @@
 
 #include <cmath>
 
+#include "foundation/complex.hpp"
 #include "foundation/numeric.hpp"
 #include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
@@ -11,31 +12,6 @@
 using namespace tidewater;
 
 namespace {
-
-// Plain complex arithmetic: the grid needs neither the infinities nor the branches of std::complex.
-struct Complex {
-  double re, im;
-};
-
-constexpr Complex operator+(Complex a, Complex b) { return {a.re + b.re, a.im + b.im}; }
-constexpr Complex operator-(Complex a, Complex b) { return {a.re - b.re, a.im - b.im}; }
-constexpr Complex operator*(Complex a, Complex b) {
-  return {a.re * b.re - a.im * b.im, a.re * b.im + a.im * b.re};
-}
-constexpr Complex operator*(double a, Complex b) { return {a * b.re, a * b.im}; }
-
-// Numerator and denominator are divided by the larger part of the divisor, so that its square
-// cannot overflow (Smith 1962, Communications of the ACM 5, 435).
-Complex operator/(Complex a, Complex b) {
-  if (std::fabs(b.re) >= std::fabs(b.im)) {
-    const double ratio = b.im / b.re;
-    const double den = b.re + b.im * ratio;
-    return {(a.re + a.im * ratio) / den, (a.im - a.re * ratio) / den};
-  }
-  const double ratio = b.re / b.im;
-  const double den = b.re * ratio + b.im;
-  return {(a.re * ratio + a.im) / den, (a.im * ratio - a.re) / den};
-}
 
 double modulus(Complex z) { return std::sqrt(z.re * z.re + z.im * z.im); }
 
