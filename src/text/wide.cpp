@@ -2,8 +2,6 @@
 
 #include <algorithm>
 #include <climits>
-#include <cstdarg>
-#include <cstdio>
 #include <cstdlib>
 #include <cwchar>
 
@@ -74,20 +72,6 @@ void copy_whole(std::string_view text, char* out) {
 
 void copy_whole(std::u16string_view text, char16_t* out) {
   *std::copy(text.begin(), text.end(), out) = u'\0';
-}
-
-std::string formatted(const char* format, ...) {
-  std::va_list arguments;
-  va_start(arguments, format);
-  const int length = std::vsnprintf(nullptr, 0, format, arguments);
-  va_end(arguments);
-  if (length <= 0) return {};
-
-  std::string text(static_cast<std::size_t>(length), '\0');
-  va_start(arguments, format);
-  std::vsnprintf(text.data(), text.size() + 1, format, arguments);
-  va_end(arguments);
-  return text;
 }
 
 std::string decimal_text(double value, int precision) {

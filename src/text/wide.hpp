@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdio>
 #include <new>
 #include <string>
 #include <string_view>
@@ -30,7 +31,14 @@ void copy_whole(std::string_view text, char* out);
 void copy_whole(std::u16string_view text, char16_t* out);
 
 // The C library's formatted output, however long; empty where it cannot be formatted.
-[[gnu::format(printf, 1, 2)]] std::string formatted(const char* format, ...);
+template <class... Arguments>
+std::string formatted(const char* format, Arguments... arguments) {
+  const int length = std::snprintf(nullptr, 0, format, arguments...);
+  if (length <= 0) return {};
+  std::string text(static_cast<std::size_t>(length), '\0');
+  std::snprintf(text.data(), text.size() + 1, format, arguments...);
+  return text;
+}
 
 // The number with "%.*f".
 std::string decimal_text(double value, int precision);
