@@ -885,7 +885,8 @@ TW_API void TWeckertIV_c(double lat0, double* y0, TWstatus* status);
  * @param count   number of points
  * @param in      longitude, latitude
  * @param out     x, y
- * @param status  #TW_NOT_CONVERGED if the iteration reaches 50 passes: stop
+ * @param status  #TW_NOT_CONVERGED if the iteration reaches 50 passes, as it does for a latitude
+ *                that is not finite: stop
  */
 TW_API void TWeckertIV_f(double lon0, double y0, int32_t count, const CoordinateTriple* in,
                          CoordinateTriple* out, TWstatus* status);

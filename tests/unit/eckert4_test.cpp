@@ -94,10 +94,14 @@ TEST(EckertIV, ForwardStopsWhenItReachesFiftyPasses) {
     }
   }
   EXPECT_GT(stopped, 0);
-  in[1].y = kNaN;
-  Points out = untouched(3);
-  EXPECT_EQ(forward(in, out), TW_SUCCESS);
-  EXPECT_TRUE(std::isnan(out[1].y));
+  for (const double lat : {kNaN, static_cast<double>(kInfinity)}) {  // no step is ever small enough
+    in[1].y = lat;
+    Points out = untouched(3);
+    EXPECT_EQ(forward(in, out), TW_NOT_CONVERGED);
+    EXPECT_NE(out[0].x, kUntouched);
+    expect_untouched(out[1]);
+    expect_untouched(out[2]);
+  }
 }
 
 TEST(EckertIV, NearThePole) {

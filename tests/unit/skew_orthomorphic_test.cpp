@@ -211,6 +211,18 @@ TEST(SkewOrthomorphic, ScaleWhereTheCosineIsZero) {
   EXPECT_NE(out[0].x, kUntouched);
 }
 
+TEST(SkewOrthomorphic, ScaleAtThePole) {
+  // With C = 2 the arc tangent is a quarter turn to the last bit, and its cosine that of the
+  // latitude: k = A k0 sqrt(1 - e^2) / cos(d).
+  const double d = 0.3;
+  const Points in = {{-d, kPi / 2, 0}};
+  Points out = untouched(1);
+  TWstatus status = 0;
+  TWrso_s(0.1, 0.9, 0, 0, 0.2, 0, 1, 1, 2, 1, in.data(), out.data(), &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_NEAR(out[0].x, 0.9 * std::sqrt(1 - 0.01) / std::cos(d), 1e-14);
+}
+
 TEST(SkewOrthomorphic, EveryInputLeavesTheInverse) {
   Points in;
   for (const double v : {0.0, 0.5, -3.0, 600.0, kNaN}) {

@@ -52,8 +52,9 @@ void TWeckertIV_f(double lon0, double y0, int32_t count, const CoordinateTriple*
       step = newton_step(t, target);
       t += step;
       ++passes;
-    } while (std::fabs(step) > 1e-12 && passes < kMostPasses);
-    if (passes == kMostPasses) {  // Wanted: also where the last step was small enough
+    } while (!(std::fabs(step) <= 1e-12) && passes < kMostPasses);
+    // Wanted: also where the last step was small enough; and for a latitude that is not a number.
+    if (passes == kMostPasses) {
       *status = TW_NOT_CONVERGED;
       return;
     }
