@@ -396,8 +396,9 @@ TW_API int32_t TWnadcon_c(const char* directory, NadconControl* control, TWstatu
  * @param out      shifted longitude, in (-pi, pi], latitude; height copied; may be in
  * @param status   #TW_I_OUTSIDE_NADCON if any point lay outside all grids: copied with its
  *                 longitude brought into (-pi, pi], the others shifted; #TW_GRID_FILE_ERROR,
- *                 #TW_NO_MEMORY where a window could not be loaded: the point, and later ones up
- *                 to the next load, stay unwritten, and the next load clears the word
+ *                 #TW_NO_MEMORY where a window could not be loaded, or moved so far off a better
+ *                 grid that no cell of it serves the point: the point, and later ones up to the
+ *                 next load, stay unwritten, and the next load clears the word
  */
 TW_API void TWnadcon_f(int32_t count, const CoordinateTriple* in, const NadconControl* control,
                        CoordinateTriple* out, TWstatus* status);
@@ -431,8 +432,8 @@ TW_API void TWnadcon_i(int32_t count, const CoordinateTriple* in, const NadconCo
  * @param status     #TW_I_OUTSIDE_NADCON outside all grids, #TW_GRID_FILE_ERROR for a grid of
  *                   fewer than four rows or columns, or of impossible sizes, and for files that
  *                   cannot be opened: window untouched; #TW_NO_MEMORY, and #TW_GRID_FILE_ERROR
- *                   for files that are too short: window written, the tables that could not be
- *                   read untouched
+ *                   for files that are too short and for a window that was moved out of its own
+ *                   grid: window written, the tables that could not be read untouched
  */
 TW_API void TWloc_grids(double x, double y, double unused, const NadconControl* control,
                         NadconWindow* window, double* lon_table, double* lat_table,
@@ -621,7 +622,8 @@ TW_API void TWgeo90_i(int32_t count, const CoordinateTriple* in, const GeoidCont
  * @param height      ignored
  * @param control     of TWgeo90_c(); the bounds of its grid with the window's index are used
  * @param undulation  metres
- * @param status      #TW_I_OUTSIDE_GEOID, #TW_GEOID_READ_ERROR, #TW_NO_MEMORY; undulation
+ * @param status      as TWgeo90_local(); #TW_GEOID_READ_ERROR also where the window was moved so
+ *                    far off another grid that it lacks three nodes for the point; undulation
  *                    unwritten
  */
 TW_API void TWget_geo90(double lon, double lat, double height, const GeoidControl* control,
@@ -639,8 +641,8 @@ TW_API void TWget_geo90(double lon, double lat, double height, const GeoidContro
  * @param status      #TW_I_OUTSIDE_GEOID outside all grids, #TW_GEOID_READ_ERROR for a grid of
  *                    fewer than twelve rows or columns, or of impossible sizes, and for a file
  *                    that cannot be opened: window untouched; #TW_NO_MEMORY, and
- *                    #TW_GEOID_READ_ERROR for a file that is too short: window written, data
- *                    untouched
+ *                    #TW_GEOID_READ_ERROR for a file that is too short and for a window that was
+ *                    moved out of its own grid: window written, data untouched
  */
 TW_API void TWgeo90_local(double x, double y, double unused, const GeoidControl* control,
                           GeoidWindow* window, float* data, int32_t* grid_index, TWstatus* status);
