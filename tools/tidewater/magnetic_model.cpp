@@ -35,7 +35,7 @@ struct MagneticModel::Info {
     int32_t epoch_count = 0;
     TWmagmdl_info(store.c_str(), key.data(), &number, 1, table, &radius, &normalisation, publisher,
                   &first_date, &last_date, &interval, &epoch_count, &status);
-    require(status, name);
+    require(status, status == TW_PF_OPEN_ERROR ? store : name);
     // A set of coefficients and a set of rates are the least that makes a model.
     if (epoch_count < 2) require(TW_BAD_HARMONIC_MODEL, name);
     const auto count = static_cast<std::size_t>(epoch_count);
