@@ -364,12 +364,7 @@ TEST(Magnetic, ManyLinesInBoundedMemory) {
 }
 
 TEST(Magnetic, GarbageIsRefusedAndNothingElse) {
-  std::string garbage;
-  unsigned state = 1;
-  for (int i = 0; i < 200000; ++i) {
-    state = state * 1664525u + 1013904223u;
-    garbage += static_cast<char>(state >> 24);
-  }
+  const std::string garbage = garbage_text(200000);
   for (const char* options : {"", "--format dms --hemisphere behind", "--csv"}) {
     const Outcome r = magnetic(std::string("--date 2026 ") + options, garbage);
     EXPECT_EQ(r.status, 1) << options;
