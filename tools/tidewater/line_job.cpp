@@ -2,7 +2,6 @@
 
 #include <cstdio>
 #include <stdexcept>
-#include <utility>
 
 #include "commands.hpp"
 #include "line_reader.hpp"

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <limits>
 #include <optional>
+#include <utility>
 
 #include "ellipsoid.hpp"
 #include "status_name.hpp"
