@@ -53,4 +53,15 @@ inline std::vector<double> numbers(const std::string& line) {
   return all;
 }
 
+// Bytes of every value, the same on each call.
+inline std::string garbage_text(int count) {
+  std::string text;
+  unsigned state = 1;
+  for (int i = 0; i < count; ++i) {
+    state = state * 1664525u + 1013904223u;
+    text += static_cast<char>(state >> 24);
+  }
+  return text;
+}
+
 }  // namespace tidewater::test

@@ -342,12 +342,7 @@ TEST(Convert, ALineOfAMillionCharactersIsRefused) {
 }
 
 TEST(Convert, GarbageIsRefusedAndNothingElse) {
-  std::string garbage;
-  unsigned state = 1;
-  for (int i = 0; i < 200000; ++i) {
-    state = state * 1664525u + 1013904223u;
-    garbage += static_cast<char>(state >> 24);
-  }
+  const std::string garbage = garbage_text(200000);
   for (const char* options : {"", "--format dms --hemisphere behind", "--format packed"}) {
     const Outcome r = shell(std::string("tidewater convert ") + options, garbage);
     EXPECT_TRUE(r.status == 0 || r.status == 1) << r.status;

@@ -18,8 +18,6 @@ struct AngleFormat {
 
   // The record for the library's text functions.
   AngleUnit unit() const;
-  // Nonzero when the latitude stands first.
-  int16_t library_order() const { return order == "lat-lon" ? 1 : 0; }
   // The same for an angle that is neither latitude nor longitude.
   AngleFormat without_hemisphere() const;
 };

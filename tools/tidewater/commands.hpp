@@ -12,5 +12,6 @@ inline constexpr int kUsageError = 2;
 // Each registers its subcommand; exit_status is set when it has run.
 void add_convert(CLI::App& app, int& exit_status);
 void add_line(CLI::App& app, int& exit_status);
+void add_magnetic(CLI::App& app, int& exit_status);
 
 }  // namespace tidewater::command

@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "grid_folder.hpp"
+#include "status_name.hpp"
 #include "tidewater/datum.h"
 #include "tidewater/foundation.h"
 
@@ -23,7 +24,7 @@ class NadconShift : public DatumShift {
   NadconShift(const std::string& directory, bool inverse) : inverse_(inverse) {
     TWstatus status = TW_SUCCESS;
     TWnadcon_c(directory.c_str(), &control_, &status);
-    require_grids(status, directory);
+    require(status, directory);
   }
 
   TWstatus run(int32_t count, CoordinateTriple* points) override {
@@ -42,7 +43,7 @@ class NationalShift : public DatumShift {
   NationalShift(const std::string& directory, bool inverse) : inverse_(inverse) {
     TWstatus status = TW_SUCCESS;
     TWcnt_c(directory.c_str(), 0, &status);
-    require_grids(status, directory);
+    require(status, directory);
   }
 
   TWstatus run(int32_t count, CoordinateTriple* points) override {

@@ -1,6 +1,7 @@
 #include "geoid.hpp"
 
 #include "grid_folder.hpp"
+#include "status_name.hpp"
 
 namespace tidewater::command {
 
@@ -8,7 +9,7 @@ Geoid::Geoid(const std::string& folder) : control_(std::make_unique<GeoidControl
   const std::string directory = grid_directory(folder);
   TWstatus status = TW_SUCCESS;
   TWgeo90_c(directory.c_str(), control_.get(), &status);
-  require_grids(status, directory);
+  require(status, directory);
 }
 
 TWstatus Geoid::from_ellipsoid(int32_t count, CoordinateTriple* points) {

@@ -4,8 +4,6 @@
 #include <stdexcept>
 #include <string>
 
-#include "status_name.hpp"
-
 namespace tidewater::command {
 
 // The folder with its separator behind it.
@@ -16,13 +14,6 @@ inline std::string grid_directory(std::string folder) {
     throw std::runtime_error(folder + ": a folder of grids has at most 259 characters");
   }
   return folder;
-}
-
-inline void require_grids(TWstatus status, const std::string& directory) {
-  if (!TW_OK(status)) {
-    throw std::runtime_error(directory + ": " + status_meaning(status) + " (" +
-                             status_name(status) + ")");
-  }
 }
 
 }  // namespace tidewater::command

@@ -1,8 +1,6 @@
 // tidewater line: geodesic and rhumb lines between positions, and runs of points along them.
 
-#include <array>
 #include <cmath>
-#include <cstdio>
 #include <memory>
 #include <stdexcept>
 #include <string>
@@ -156,9 +154,9 @@ class LineSolving : public LineJob {
     int32_t point = 0;
     each_point(solved, count, [&](const CoordinateTriple& p) {
       out_ = std::to_string(number_) + ',' + std::to_string(++point) + ',';
-      append_number(p.x / kDegree, degree_decimals_);
+      append_number(out_, p.x / kDegree, degree_decimals_);
       out_ += ',';
-      append_number(p.y / kDegree, degree_decimals_);
+      append_number(out_, p.y / kDegree, degree_decimals_);
       out_ += '\n';
       write(out_);
     });
@@ -167,9 +165,9 @@ class LineSolving : public LineJob {
   void write_feature(const SolvedLine& solved, int32_t count, std::string_view rest) {
     out_ = features_++ > 0 ? ",\n" : "\n";
     out_ += R"({"type":"Feature","properties":{"azimuth":)";
-    append_number(solved.azimuth / kDegree, degree_decimals_);
+    append_number(out_, solved.azimuth / kDegree, degree_decimals_);
     out_ += ",\"distance\":";
-    append_number(solved.distance, kMetreDecimals);
+    append_number(out_, solved.distance, kMetreDecimals);
     out_ += ",\"text\":";
     const std::size_t first = rest.find_first_not_of(" \t,;");
     append_json_string(out_, first == std::string_view::npos ? "" : rest.substr(first));
@@ -181,9 +179,9 @@ class LineSolving : public LineJob {
       const double lon =
           is_first ? p.x / kDegree : before + std::remainder(p.x / kDegree - before, 360);
       out_ += is_first ? "[" : ",[";
-      append_number(lon, degree_decimals_);
+      append_number(out_, lon, degree_decimals_);
       out_ += ',';
-      append_number(p.y / kDegree, degree_decimals_);
+      append_number(out_, p.y / kDegree, degree_decimals_);
       out_ += ']';
       write(out_);
       out_.clear();
@@ -191,12 +189,6 @@ class LineSolving : public LineJob {
       before = lon;
     });
     write("]}}");
-  }
-
-  void append_number(double value, int decimals) {
-    std::array<char, 64> field;
-    std::snprintf(field.data(), field.size(), "%.*f", decimals, value);
-    out_ += field.data();
   }
 
   void end() override {

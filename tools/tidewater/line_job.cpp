@@ -2,7 +2,6 @@
 
 #include <cstdio>
 #include <stdexcept>
-#include <utility>
 
 #include "commands.hpp"
 #include "line_reader.hpp"
@@ -18,6 +17,16 @@ bool is_outside(const Line& line) {
          (line.status == TW_I_OUTSIDE_CNT && !line.reason);
 }
 
+Line make_line(const std::string& text, int64_t number, bool is_cut) {
+  Line line;
+  line.text = text;
+  line.number = number;
+  const std::size_t first = text.find_first_not_of(" \t");
+  line.is_data = first != std::string::npos && text[first] != '#';
+  if (is_cut) line.status = TW_BAD_TEXT;
+  return line;
+}
+
 }  // namespace
 
 int LineJob::run(std::vector<std::string> files) {
@@ -30,13 +39,7 @@ int LineJob::run(std::vector<std::string> files) {
     std::size_t in_batch = 0;
     std::string text;
     while (reader.next(text)) {
-      Line line;
-      line.text = text;
-      line.number = reader.number();
-      const std::size_t first = text.find_first_not_of(" \t");
-      line.is_data = first != std::string::npos && text[first] != '#';
-      if (reader.too_long()) line.status = TW_BAD_TEXT;
-      take(std::move(line));
+      take(make_line(text, reader.number(), reader.too_long()));
       if (++in_batch == kBatch) {
         end_batch();
         in_batch = 0;
@@ -45,6 +48,22 @@ int LineJob::run(std::vector<std::string> files) {
     }
     end_batch();
   }
+  return finish();
+}
+
+int LineJob::run_arguments(const std::vector<std::string>& arguments) {
+  const std::string source = "command line";
+  Progress none(0);
+  source_ = &source;
+  progress_ = &none;
+  std::string text;
+  for (const std::string& argument : arguments) text += (text.empty() ? "" : " ") + argument;
+  take(make_line(text, 1, false));
+  end_batch();
+  return finish();
+}
+
+int LineJob::finish() {
   end();
   if (std::fflush(stdout) != 0) throw std::runtime_error("standard output cannot be written");
   std::fprintf(stderr, "%s\n", summary(counts_).c_str());

@@ -36,6 +36,8 @@ class LineJob {
   // many lines were done and refused.  Gives the exit status.  Throws std::runtime_error where a
   // file cannot be read or standard output cannot be written.
   int run(std::vector<std::string> files);
+  // The same for a single line, the fields of which are arguments of the command.
+  int run_arguments(const std::vector<std::string>& arguments);
 
  protected:
   static constexpr std::size_t kBatch = 4096;
@@ -60,6 +62,8 @@ class LineJob {
   void complain(const Line& line);
 
  private:
+  int finish();
+
   const std::string* source_ = nullptr;
   Progress* progress_ = nullptr;
   Counts counts_;

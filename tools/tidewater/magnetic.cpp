@@ -1,224 +1,65 @@
-#include "magnetic.hpp"
+// tidewater magnetic: the field of a geomagnetic model at positions, and its yearly change.
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
-#include <charconv>
 #include <chrono>
 #include <cmath>
-#include <cstdint>
-#include <cstdlib>
+#include <cstdio>
 #include <filesystem>
-#include <fstream>
-#include <iostream>
-#include <iterator>
-#include <limits>
 #include <memory>
-#include <optional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
 
-#include "tidewater/tidewater.h"
+#include "angle_format.hpp"
+#include "commands.hpp"
+#include "line_job.hpp"
+#include "magnetic_model.hpp"
+#include "position_text.hpp"
 
-namespace tidewater::tools {
+namespace tidewater::command {
 
 namespace {
 
-constexpr double kDegreesPerRadian = 57.29577951308232;
-constexpr double kRadiansPerSecond = 1 / kDegreesPerRadian / 3600;
-// WGS 84, the ellipsoid of the positions.
-constexpr double kSemiMajor = 6378137;
-constexpr double kFlattening = 1 / 298.257223563;
-// A position that differs by less than this many metres keeps the sums of the one before it.
-constexpr double kSameParallel = 1e-6;
-// A value that no position and no date comes near.
-constexpr double kNowhere = 1e30;
-// Names in the store, each with room for its terminator.
-constexpr std::size_t kModelName = 41;
-constexpr std::size_t kTableName = 33;
-constexpr std::size_t kTextField = 64;
+constexpr double kDegree = 0.017453292519943295;
+// Of a position in CSV.
+constexpr int kDegreeDecimals = 9;
+constexpr int kMetreDecimals = 3;
 
-void require(TWstatus status, const std::string& what) {
-  if (TW_OK(status)) return;
-  std::string word;
-  for (int shift = 28; shift >= 0; shift -= 4) word += "0123456789ABCDEF"[(status >> shift) & 15];
-  throw std::runtime_error(what + " (status 0x" + word + ")");
-}
-
-class Triangle {
- public:
-  explicit Triangle(int32_t degree) {
-    const auto rows = static_cast<std::size_t>(degree) + 1;
-    block_.resize(rows * (rows + 1) / 2);
-    for (std::size_t n = 0; n < rows; ++n) rows_.push_back(block_.data() + n * (n + 1) / 2);
-  }
-  // A move takes the block along, and the rows keep pointing into it.
-  Triangle(Triangle&&) = default;
-  Triangle& operator=(Triangle&&) = default;
-
-  double** rows() { return rows_.data(); }
-
- private:
-  std::vector<double> block_;
-  std::vector<double*> rows_;
+struct Options {
+  std::vector<std::string> position;
+  std::vector<std::string> files;
+  AngleFormat in;
+  std::string model;
+  std::string date;
+  std::string store;
+  bool csv = false;
 };
 
-// The work arrays and remembered values of one series.
-struct Cache {
-  explicit Cache(int32_t degree) {
-    for (auto* sum : {&dC, &dS, &lC, &lS, &rC, &rS, &C, &S}) {
-      sum->resize(static_cast<std::size_t>(degree) + 1);
-    }
-  }
-  std::vector<double> dC, dS, lC, lS, rC, rS, C, S;
-  double last_colat = kNowhere, last_radius = kNowhere;
-  double tcos = 0, tsin = 0, scale_theta = 0, scale_lambda = 0, scale_r = 0;
+// A figure of the output.
+struct Column {
+  const char* symbol;
+  const char* name;  // in CSV
+  int decimals;
+  int width;
+  double (*value)(const MagneticField&);
 };
 
-// The row of a model.
-struct ModelInfo {
-  ModelInfo(const std::string& store, const std::string& model_name) : name(model_name) {
-    TWstatus status = TW_SUCCESS;
-    std::string key = name;
-    key.resize(kTextField);
-    int16_t number = 0;
-    char text[kTextField] = {}, table[kTextField] = {};
-    TWmagmdl_info(store.c_str(), key.data(), &number, 1, table, &radius, &normalisation, text,
-                  &first_date, &last_date, &interval, &epoch_count, &status);
-    if (status == TW_NO_SUCH_MODEL) throw std::runtime_error("no model " + name + " in " + store);
-    require(status, "the store " + store + " gives no model " + name);
-    if (epoch_count < 2) return;
-    const auto count = static_cast<std::size_t>(epoch_count);
-    degrees.resize(count);
-    epochs.resize(count);
-    table_names.resize(count * kTableName);
-    TWepoch_info(store.c_str(), table, degrees.data(), epochs.data(), table_names.data(), &status);
-    require(status, "the epochs of the model " + name + " cannot be read");
-  }
-
-  // A set of coefficients and a set of rates are the least that makes a model.
-  bool usable() const { return epoch_count >= 2; }
-  // The epoch of the newest coefficients; the last set holds their rates.
-  double newest_epoch() const { return *(epochs.end() - 2); }
-
-  std::string name;
-  double radius = 0;
-  int16_t normalisation = 0;
-  double first_date = 0, last_date = 0;  // what the model is published for
-  double interval = 0;                   // years between two epochs
-  int32_t epoch_count = 0;
-  std::vector<int32_t> degrees;
-  std::vector<double> epochs;
-  std::vector<char> table_names;
-};
-
-ModelInfo newest_model(const std::string& store) {
-  TWstatus status = TW_SUCCESS;
-  int32_t count = 0;
-  TWmag_mdl_cnt(store.c_str(), &count, &status);
-  if (status == TW_PF_OPEN_ERROR) throw std::runtime_error("cannot open the store " + store);
-  require(status, "the store " + store + " has no magnetic models");
-  std::vector<char> names(static_cast<std::size_t>(std::max(count, 0)) * kModelName + kTextField);
-  TWmagmdl_names(store.c_str(), names.data(), &status);
-  require(status, "the magnetic models of the store " + store + " cannot be listed");
-  std::optional<ModelInfo> newest;
-  for (int32_t i = 0; i < count; ++i) {
-    ModelInfo info(store, names.data() + static_cast<std::size_t>(i) * kModelName);
-    if (info.usable() && (!newest || info.newest_epoch() > newest->newest_epoch())) newest = info;
-  }
-  if (!newest) throw std::runtime_error("no magnetic model in " + store);
-  return *newest;
-}
-
-// Field, elements and their yearly change at a position.
-struct Answer {
-  CoordinateTriple position;
-  MagneticElements elements;
-  CoordinateTriple field;
-  MagneticElements rates;
-  CoordinateTriple field_rates;
-};
-
-// A model with its coefficients at a date.
-class Model {
- public:
-  Model(const std::string& store, const ModelInfo& info, double date)
-      : radius_(info.radius),
-        degree_(*std::max_element(info.degrees.begin(), info.degrees.end())),
-        C_(degree_),
-        S_(degree_),
-        Ct_(degree_),
-        St_(degree_),
-        rec_a_(degree_),
-        rec_b_(degree_),
-        main_(degree_),
-        secular_(degree_) {
-    if (info.epoch_count > 2 && info.interval <= 0) {
-      throw std::runtime_error("the model " + info.name + " has no interval between its epochs");
-    }
-    std::vector<Triangle> sets;
-    for (const int32_t degree : info.degrees) {
-      sets.emplace_back(degree);
-      sets.emplace_back(degree);
-    }
-    std::vector<double**> c_sets, s_sets;
-    for (std::size_t i = 0; i < sets.size(); i += 2) {
-      c_sets.push_back(sets[i].rows());
-      s_sets.push_back(sets[i + 1].rows());
-    }
-    TWstatus status = TW_SUCCESS;
-    TWmm_coef_info(store.c_str(), info.epoch_count, info.degrees.data(), info.table_names.data(),
-                   c_sets.data(), s_sets.data(), &status);
-    require(status, "the coefficients of the model " + info.name + " cannot be read");
-    if (info.normalisation == 1 || info.normalisation == 2) {
-      for (std::size_t i = 0; i < c_sets.size(); ++i) {
-        TWhar_normaliz(info.normalisation, info.degrees[i], c_sets[i], s_sets[i], &status);
-      }
-    }
-    double last_date = kNowhere;
-    TWhar_set_date(date, &last_date, 0, info.epoch_count, info.degrees.data(), info.epochs.data(),
-                   info.interval, c_sets.data(), s_sets.data(), &n_main_, &n_sec_, C_.rows(),
-                   S_.rows(), Ct_.rows(), St_.rows(), &status);
-    if (status == TW_BAD_DATE) {
-      throw std::runtime_error("the model " + info.name + " does not reach that date");
-    }
-    require(status, "no coefficients of the model " + info.name + " at that date");
-    if (n_sec_ < 2) throw std::runtime_error("the model " + info.name + " has too low a degree");
-    TWhar_recur_c(degree_, rec_a_.rows(), rec_b_.rows(), &status);
-  }
-
-  std::vector<Answer> at(const std::vector<CoordinateTriple>& points) {
-    const double e = std::sqrt(kFlattening * (2 - kFlattening));
-    std::vector<CoordinateTriple> field(points.size()), field_rates(points.size());
-    std::vector<MagneticElements> elements(points.size()), rates(points.size());
-    TWstatus status = TW_SUCCESS;
-    TWhar_mag_var(
-        n_main_, radius_, C_.rows(), S_.rows(), rec_a_.rows(), rec_b_.rows(), main_.dC.data(),
-        main_.dS.data(), main_.lC.data(), main_.lS.data(), main_.rC.data(), main_.rS.data(),
-        main_.C.data(), main_.S.data(), &main_.last_colat, &main_.last_radius, &last_lon_,
-        kSameParallel, &main_.tcos, &main_.tsin, &main_.scale_theta, &main_.scale_lambda,
-        &main_.scale_r, n_sec_, Ct_.rows(), St_.rows(), secular_.dC.data(), secular_.dS.data(),
-        secular_.lC.data(), secular_.lS.data(), secular_.rC.data(), secular_.rS.data(),
-        secular_.C.data(), secular_.S.data(), &secular_.last_colat, &secular_.last_radius,
-        &secular_.tcos, &secular_.tsin, &secular_.scale_theta, &secular_.scale_lambda,
-        &secular_.scale_r, kSemiMajor, e, static_cast<int32_t>(points.size()), points.data(),
-        field.data(), elements.data(), field_rates.data(), rates.data(), &status);
-    require(status, "the field cannot be computed");
-    std::vector<Answer> answers;
-    for (std::size_t i = 0; i < points.size(); ++i) {
-      answers.push_back({points[i], elements[i], field[i], rates[i], field_rates[i]});
-    }
-    return answers;
-  }
-
- private:
-  double radius_;
-  int32_t degree_;
-  int32_t n_main_ = 0, n_sec_ = 0;
-  Triangle C_, S_, Ct_, St_, rec_a_, rec_b_;
-  Cache main_, secular_;
-  double last_lon_ = kNowhere;
+constexpr Column kColumns[] = {
+    {"D", "declination", 3, 8, [](const auto& f) { return f.elements.declination / kDegree; }},
+    {"I", "inclination", 3, 7, [](const auto& f) { return f.elements.inclination / kDegree; }},
+    {"H", "horizontal", 1, 7, [](const auto& f) { return f.elements.horizontal; }},
+    {"F", "total", 1, 7, [](const auto& f) { return f.elements.total; }},
+    {"X", "north", 1, 8, [](const auto& f) { return f.vector.x; }},
+    {"Y", "east", 1, 8, [](const auto& f) { return f.vector.y; }},
+    {"Z", "down", 1, 8, [](const auto& f) { return f.vector.z; }},
+    {"dD", "declination_rate", 3, 6, [](const auto& f) { return f.rates.declination / kDegree; }},
+    {"dI", "inclination_rate", 3, 6, [](const auto& f) { return f.rates.inclination / kDegree; }},
+    {"dH", "horizontal_rate", 1, 6, [](const auto& f) { return f.rates.horizontal; }},
+    {"dF", "total_rate", 1, 6, [](const auto& f) { return f.rates.total; }},
+    {"dX", "north_rate", 1, 6, [](const auto& f) { return f.vector_rates.x; }},
+    {"dY", "east_rate", 1, 6, [](const auto& f) { return f.vector_rates.y; }},
+    {"dZ", "down_rate", 1, 6, [](const auto& f) { return f.vector_rates.z; }},
 };
 
 double decimal_year(std::chrono::year_month_day day) {
@@ -231,210 +72,161 @@ double decimal_year(std::chrono::year_month_day day) {
          static_cast<double>(passed.count()) / static_cast<double>(whole.count());
 }
 
-// A whole number of exactly so many digits.
-std::optional<int> read_digits(std::string_view text, std::size_t digits) {
-  int value = 0;
-  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
-  if (text.size() != digits || error != std::errc() || end != text.data() + digits || value < 0) {
-    return std::nullopt;
-  }
-  return value;
+// YYYY-MM-DD, though no such day may be.
+bool looks_like_a_day(std::string_view text) {
+  constexpr std::string_view kPattern = "0000-00-00";
+  return std::equal(text.begin(), text.end(), kPattern.begin(), kPattern.end(),
+                    [](char c, char p) { return p == '-' ? c == '-' : c >= '0' && c <= '9'; });
 }
 
-// A decimal year or a day as YYYY-MM-DD; an empty text is today.
+// A decimal year or a day; an empty text is today.
 double read_date(const std::string& text) {
   using namespace std::chrono;
   if (text.empty()) return decimal_year(floor<days>(system_clock::now()));
-  if (text.size() == 10 && text[4] == '-' && text[7] == '-') {
-    const std::string_view all = text;
-    const auto y = read_digits(all.substr(0, 4), 4);
-    const auto m = read_digits(all.substr(5, 2), 2);
-    const auto d = read_digits(all.substr(8, 2), 2);
-    if (y && m && d) {
-      const auto date = year(*y) / *m / *d;
-      if (date.ok()) return decimal_year(date);
-    }
-  } else if (text.find_first_not_of("0123456789.") == std::string::npos) {
+  if (looks_like_a_day(text)) {
+    const auto number = [&text](std::size_t from, std::size_t count) {
+      return std::stoi(text.substr(from, count));
+    };
+    const auto date = year(number(0, 4)) / number(5, 2) / number(8, 2);
+    if (date.ok()) return decimal_year(date);
+  } else {
     double value = 0;
-    const char* last = text.data() + text.size();
-    const auto [end, error] = std::from_chars(text.data(), last, value);
-    if (error == std::errc() && end == last) return value;
+    std::string_view rest = text;
+    if (take_number(rest, value) && rest.empty()) return value;
   }
-  throw std::runtime_error("not a date: " + text + " (a decimal year or YYYY-MM-DD)");
+  throw std::invalid_argument("not a date: " + text + " (a decimal year, or YYYY-MM-DD)");
 }
 
-constexpr std::string_view kDigits = "0123456789";
-constexpr std::string_view kBetween = " \t\r,;";
-
-std::vector<std::string> parts_of(const std::string& line) {
-  std::vector<std::string> parts;
-  for (std::size_t end = 0;;) {
-    const std::size_t start = line.find_first_not_of(kBetween, end);
-    if (start == std::string::npos) return parts;
-    end = std::min(line.find_first_of(kBetween, start), line.size());
-    parts.push_back(line.substr(start, end - start));
+class MagneticFields : public LineJob {
+ public:
+  explicit MagneticFields(const Options& options)
+      : options_(options),
+        in_unit_(options.in.unit()),
+        date_(read_date(options.date)),
+        model_(options.store, options.model, date_) {
+    if (date_ < model_.first_date() || date_ > model_.last_date()) {
+      std::fprintf(stderr, "tidewater: %s is made for %.1f to %.1f; %.3f is extrapolated\n",
+                   model_.name().c_str(), model_.first_date(), model_.last_date(), date_);
+    }
+    lines_.reserve(kBatch);
+    write_head();
   }
-}
 
-// Digits with one decimal point at most.
-bool is_number(std::string_view text) {
-  return text.find_first_of(kDigits) != std::string_view::npos &&
-         text.find_first_not_of("0123456789.") == std::string_view::npos &&
-         text.find('.') == text.rfind('.');
-}
+ private:
+  // A line of a batch.
+  struct Entry {
+    Line line;
+    CoordinateTriple point = {};
+  };
 
-std::string_view without_sign(std::string_view text) {
-  if (!text.empty() && (text[0] == '-' || text[0] == '+')) text.remove_prefix(1);
-  return text;
-}
-
-// Degrees, degrees:minutes or degrees:minutes:seconds, without a sign.
-bool is_angle(std::string_view text) {
-  for (int part = 0; part < 3; ++part) {
-    const std::size_t colon = text.find(':');
-    if (!is_number(text.substr(0, colon))) return false;
-    if (colon == std::string_view::npos) return true;
-    text.remove_prefix(colon + 1);
+  void take(Line line) override {
+    Entry entry;
+    if (line.is_data) {
+      PositionText text;
+      const TWstatus status = read_position(line.text, options_.in, in_unit_, text);
+      if (line.status == TW_SUCCESS) line.status = status;
+      line.rest = line.text.size() - text.rest.size();
+      entry.point = text.point;
+    }
+    entry.line = std::move(line);
+    lines_.push_back(std::move(entry));
   }
-  return false;
-}
 
-bool is_hemisphere(char c) {
-  return std::string_view("NSEWnsew").find(c) != std::string_view::npos;
-}
-
-// The library's hemisphere mode of an angle: 0 for a sign or none, 4 for a letter in front, 5 for
-// one behind; nothing where the text is no angle.
-std::optional<int16_t> hemisphere_mode(std::string_view text) {
-  if (is_angle(without_sign(text))) return int16_t{0};
-  if (text.size() < 2) return std::nullopt;
-  if (is_hemisphere(text.front()) && is_angle(text.substr(1))) return int16_t{4};
-  if (is_hemisphere(text.back()) && is_angle(text.substr(0, text.size() - 1))) return int16_t{5};
-  return std::nullopt;
-}
-
-// A position of two angles and an optional height, parted by blanks or commas.  The angles are
-// decimal degrees or degrees:minutes:seconds, signed or with a hemisphere letter.
-std::optional<CoordinateTriple> read_position(const std::string& line, bool lon_first) {
-  constexpr std::size_t kLongest = 100;  // the library's reader cuts at 150 characters
-  const std::vector<std::string> parts = parts_of(line);
-  if (parts.size() < 2 || parts.size() > 3 || line.size() > kLongest) return std::nullopt;
-  // That reader takes what it cannot scan for zero, so the form is checked here.
-  const auto mode = hemisphere_mode(parts[0]);
-  if (!mode || hemisphere_mode(parts[1]) != mode) return std::nullopt;
-  if (parts.size() == 3 && !is_number(without_sign(parts[2]))) return std::nullopt;
-  AngleUnit unit = {};
-  // Decimal degrees are the colon form without minutes.
-  std::string_view("d:m:s").copy(unit.format, sizeof unit.format - 1);
-  unit.hemisphere_mode = *mode;
-  unit.factor = kRadiansPerSecond;
-  std::string text = parts[0] + ", " + parts[1];
-  if (parts.size() == 3) text += ", " + parts[2];
-  CoordinateTriple point = {};
-  TWstatus status = TW_SUCCESS;
-  TWascii_to_llh(text.c_str(), unit, lon_first ? 0 : 1, 1, &point, &status);
-  if (status != TW_SUCCESS) return std::nullopt;
-  return point;
-}
-
-std::vector<std::string> lines_of(std::istream& in) {
-  std::vector<std::string> lines;
-  for (std::string line; std::getline(in, line);) lines.push_back(line);
-  return lines;
-}
-
-// A column of the output.
-struct Column {
-  const char* symbol;
-  const char* name;
-  const char* unit;
-  int decimals;
-  double (*value)(const Answer&);
-};
-
-constexpr double in_degrees(double radians) { return radians * kDegreesPerRadian; }
-
-const Column kColumns[] = {
-    {"lat", "latitude", "deg", 6, [](const Answer& p) { return in_degrees(p.position.y); }},
-    {"lon", "longitude", "deg", 6, [](const Answer& p) { return in_degrees(p.position.x); }},
-    {"height", "height", "m", 1, [](const Answer& p) { return p.position.z; }},
-    {"D", "declination", "deg", 3,
-     [](const Answer& p) { return in_degrees(p.elements.declination); }},
-    {"I", "inclination", "deg", 3,
-     [](const Answer& p) { return in_degrees(p.elements.inclination); }},
-    {"H", "horizontal", "nT", 1, [](const Answer& p) { return p.elements.horizontal; }},
-    {"F", "total", "nT", 1, [](const Answer& p) { return p.elements.total; }},
-    {"X", "north", "nT", 1, [](const Answer& p) { return p.field.x; }},
-    {"Y", "east", "nT", 1, [](const Answer& p) { return p.field.y; }},
-    {"Z", "down", "nT", 1, [](const Answer& p) { return p.field.z; }},
-    {"dD", "declination_rate", "deg/yr", 3,
-     [](const Answer& p) { return in_degrees(p.rates.declination); }},
-    {"dI", "inclination_rate", "deg/yr", 3,
-     [](const Answer& p) { return in_degrees(p.rates.inclination); }},
-    {"dH", "horizontal_rate", "nT/yr", 1, [](const Answer& p) { return p.rates.horizontal; }},
-    {"dF", "total_rate", "nT/yr", 1, [](const Answer& p) { return p.rates.total; }},
-    {"dX", "north_rate", "nT/yr", 1, [](const Answer& p) { return p.field_rates.x; }},
-    {"dY", "east_rate", "nT/yr", 1, [](const Answer& p) { return p.field_rates.y; }},
-    {"dZ", "down_rate", "nT/yr", 1, [](const Answer& p) { return p.field_rates.z; }},
-};
-
-// Written without the locale, so that a comma always parts and a point always marks decimals.
-std::string fixed(double value, int decimals) {
-  char text[400];
-  const auto [end, error] =
-      std::to_chars(text, text + sizeof text, value, std::chars_format::fixed, decimals);
-  return error == std::errc() ? std::string(text, end) : "?";
-}
-
-void print_csv(const std::vector<Answer>& answers) {
-  const char* separator = "";
-  for (const Column& column : kColumns) {
-    std::cout << separator << column.name;
-    separator = ",";
+  void end_batch() override {
+    std::vector<CoordinateTriple> points;
+    for (const Entry& entry : lines_) {
+      if (is_good(entry)) points.push_back(entry.point);
+    }
+    const std::vector<MagneticField> fields = model_.at(points);
+    auto field = fields.begin();
+    for (Entry& entry : lines_) {
+      if (!entry.line.is_data) {
+        if (!options_.csv) write(entry.line.text + '\n');
+      } else if (is_good(entry)) {
+        write_field(entry, *field++);
+      } else {
+        write_refused(entry.line);
+      }
+    }
+    lines_.clear();
   }
-  std::cout << '\n';
-  for (const Answer& answer : answers) {
-    separator = "";
+
+  static bool is_good(const Entry& entry) {
+    return entry.line.is_data && entry.line.status == TW_SUCCESS;
+  }
+
+  void write_head() {
+    out_ = options_.csv ? "latitude,longitude,height" : "";
     for (const Column& column : kColumns) {
-      std::cout << separator << fixed(column.value(answer), column.decimals);
-      separator = ",";
+      if (options_.csv) {
+        out_ += ',';
+        out_ += column.name;
+      } else {
+        out_ += out_.empty() ? '#' : ' ';
+        const std::string_view symbol = column.symbol;
+        out_.append(static_cast<std::size_t>(column.width) - symbol.size(), ' ');
+        out_ += symbol;
+      }
     }
-    std::cout << '\n';
+    out_ += '\n';
+    write(out_);
   }
-}
 
-void print_table(const std::vector<Answer>& answers) {
-  std::vector<std::vector<std::string>> rows(answers.size() + 2);
-  for (const Column& column : kColumns) {
-    rows[0].push_back(column.symbol);
-    rows[1].push_back(column.unit);
-    for (std::size_t i = 0; i < answers.size(); ++i) {
-      rows[i + 2].push_back(fixed(column.value(answers[i]), column.decimals));
+  void write_field(Entry& entry, const MagneticField& field) {
+    const bool finite = std::all_of(std::begin(kColumns), std::end(kColumns),
+                                    [&](const Column& c) { return std::isfinite(c.value(field)); });
+    if (!finite) {  // at the centre of the earth
+      entry.line.status = TW_RANGE_ERROR;
+      write_refused(entry.line);
+      return;
     }
-  }
-  std::vector<std::size_t> widths;
-  for (std::size_t j = 0; j < std::size(kColumns); ++j) {
-    std::size_t width = 0;
-    for (const auto& row : rows) width = std::max(width, row[j].size());
-    widths.push_back(width);
-  }
-  for (const auto& row : rows) {
-    for (std::size_t j = 0; j < row.size(); ++j) {
-      std::cout << std::string(widths[j] - row[j].size() + (j > 0 ? 2 : 0), ' ') << row[j];
+    out_.clear();
+    if (options_.csv) {
+      append_number(out_, entry.point.y / kDegree, kDegreeDecimals);
+      out_ += ',';
+      append_number(out_, entry.point.x / kDegree, kDegreeDecimals);
+      out_ += ',';
+      append_number(out_, entry.point.z, kMetreDecimals);
     }
-    std::cout << '\n';
+    for (const Column& column : kColumns) {
+      out_ += options_.csv ? ',' : ' ';
+      append_number(out_, column.value(field), column.decimals, options_.csv ? 0 : column.width);
+    }
+    if (!options_.csv) out_.append(entry.line.text, entry.line.rest);
+    out_ += '\n';
+    write(out_);
+    count_done();
   }
-}
 
-struct Options {
-  std::string model;
-  std::string date;
-  std::string store;
-  std::string file;
-  std::vector<std::string> positions;
-  bool lon_first = false;
-  bool csv = false;
+  void write_refused(const Line& line) {
+    complain(line);
+    if (options_.csv) return;
+    out_ = "*";
+    for (std::size_t i = 1; i < std::size(kColumns); ++i) out_ += " *";
+    out_.append(line.text, line.rest);
+    out_ += '\n';
+    write(out_);
+  }
+
+  std::string summary(const Counts& counts) const override {
+    std::string text = model_.name() + " at ";
+    append_number(text, date_, 3);
+    return text + ": " + std::to_string(counts.done) + " computed, " +
+           std::to_string(counts.refused) + " refused";
+  }
+
+  const Options& options_;
+  AngleUnit in_unit_;
+  double date_;
+  MagneticModel model_;
+  std::vector<Entry> lines_;
+  std::string out_;
 };
+
+int compute_fields(const Options& options) {
+  MagneticFields job(options);
+  return options.position.empty() ? job.run(options.files) : job.run_arguments(options.position);
+}
 
 // The store that is installed beside the command.
 std::string installed_store() {
@@ -445,97 +237,53 @@ std::string installed_store() {
       .string();
 }
 
-std::vector<std::string> position_lines(const Options& options) {
-  if (!options.positions.empty()) {
-    // One position may come as two or three arguments, several come as one each.
-    const bool single = std::none_of(
-        options.positions.begin(), options.positions.end(),
-        [](const std::string& p) { return p.find_first_of(" \t,;") != std::string::npos; });
-    if (!single) return options.positions;
-    std::string line;
-    for (const std::string& part : options.positions) line += part + ' ';
-    return {line};
-  }
-  if (options.file.empty() || options.file == "-") return lines_of(std::cin);
-  std::ifstream file(options.file);
-  if (!file) throw std::runtime_error("cannot open " + options.file);
-  return lines_of(file);
-}
-
-// True when every line was a position.
-bool run(const Options& options) {
-#ifndef _WIN32
-  // The library's reader takes the user's locale; positions have decimal points in any.
-  setenv("LC_ALL", "C", 1);
-#endif
-  const double date = read_date(options.date);
-  const ModelInfo info =
-      options.model.empty() ? newest_model(options.store) : ModelInfo(options.store, options.model);
-  if (!info.usable()) throw std::runtime_error("the model " + info.name + " has no rates");
-  Model model(options.store, info, date);
-  if (date < info.first_date || date > info.last_date) {
-    std::cerr << "tidewater magnetic: the model " << info.name << " is made for the years "
-              << fixed(info.first_date, 1) << " to " << fixed(info.last_date, 1)
-              << "; the field of " << fixed(date, 1) << " is extrapolated\n";
-  }
-
-  bool all_read = true;
-  std::vector<CoordinateTriple> points;
-  const std::vector<std::string> lines = position_lines(options);
-  for (std::size_t i = 0; i < lines.size(); ++i) {
-    const std::size_t start = lines[i].find_first_not_of(" \t\r");
-    if (start == std::string::npos || lines[i][start] == '#') continue;
-    if (const auto point = read_position(lines[i], options.lon_first)) {
-      points.push_back(*point);
-    } else {
-      std::cerr << "tidewater magnetic: line " << i + 1 << ": not a position: " << lines[i] << '\n';
-      all_read = false;
-    }
-  }
-  if (points.size() > static_cast<std::size_t>(std::numeric_limits<int32_t>::max())) {
-    throw std::runtime_error("too many positions");
-  }
-  const std::vector<Answer> answers = model.at(points);
-  if (options.csv) {
-    print_csv(answers);
-  } else if (!answers.empty()) {
-    std::cout << info.name << ", " << fixed(date, 3) << '\n';
-    print_table(answers);
-  }
-  return all_read;
-}
+const char* const kExamples = R"(Figures:
+  D declination and I inclination, degrees; H horizontal and F total intensity, X north, Y east and
+  Z down, nT; dD, dI, dH, dF, dX, dY, dZ: their change in a year.
+Examples:
+  # the field at Brest, 2026.5, by the newest model of the store
+  tidewater magnetic --date 2026.5 48.39 -4.49
+  # lines of positions with heights, in degrees, minutes and seconds with letters
+  echo "48:23:25.1N 4:29:10.7W 34.2 Brest" | tidewater magnetic --date 2026-07-01 --format dms --hemisphere behind
+  # the declination of the past, as CSV
+  echo "48.39 -4.49" | tidewater magnetic --model IGRF-13 --date 1950 --csv
+)";
 
 }  // namespace
 
 void add_magnetic(CLI::App& app, int& exit_status) {
-  const auto options = std::make_shared<Options>();
+  auto options = std::make_shared<Options>();
   options->store = installed_store();
   CLI::App* command = app.add_subcommand(
-      "magnetic", "Field of a geomagnetic model at geodetic positions, and its yearly change");
-  command->add_option("positions", options->positions,
-                      "LAT LON [HEIGHT] in degrees, or d:m:s, and metres on WGS 84; one position "
-                      "as it is, several in quotes each");
-  command->add_option("--file", options->file,
-                      "File of positions, one on a line; without one, standard input");
-  command->add_option("--model", options->model, "Model of the store (default: the newest)");
-  command->add_option("--date", options->date, "Decimal year or YYYY-MM-DD (default: today)");
-  command->add_option("--store", options->store, "Parameter store")
+      "magnetic",
+      "Computes the field of a geomagnetic model and its yearly change.\n"
+      "A line begins with two angles and, where a plain number follows, a height in metres, on WGS "
+      "84; written are the figures named below.  The rest of it is passed through, as are blank "
+      "lines and lines that begin with #.  A line that is no position is written with * in place "
+      "of the figures and told on standard error.");
+  CLI::Option* position = command->add_option("position", options->position,
+                                              "a single position; without one, files are read");
+  command
+      ->add_option("-f,--file", options->files,
+                   "file to read, may be given again; - or none: standard input")
+      ->allow_extra_args(false)
+      ->excludes(position);
+  add_angle_options(*command, options->in, "", "Input");
+  command->add_option("--model", options->model, "model of the store; the newest if not given")
+      ->group("Model");
+  command->add_option("--date", options->date, "decimal year, or YYYY-MM-DD; today if not given")
+      ->group("Model");
+  command->add_option("--store", options->store, "parameter store")
       ->envname("TIDEWATER_STORE")
-      ->capture_default_str();
-  command->add_flag("--lon-first", options->lon_first, "Positions are LON LAT [HEIGHT]");
-  command->add_flag("--csv", options->csv, "Comma-separated values with a line of names");
-  command->footer(
-      "D declination, I inclination, H horizontal and F total intensity; X north, Y east, Z down;\n"
-      "dD to dZ their change in a year.  A line that is no position is reported, and the exit\n"
-      "status is 1.");
-  command->callback([options, &exit_status] {
-    try {
-      if (!run(*options)) exit_status = 1;
-    } catch (const std::exception& error) {
-      std::cerr << "tidewater magnetic: " << error.what() << '\n';
-      exit_status = 1;
-    }
-  });
+      ->capture_default_str()
+      ->group("Model");
+  command
+      ->add_flag("--csv", options->csv,
+                 "comma-separated values with a line of names: latitude, longitude in degrees, "
+                 "height, and the figures")
+      ->group("Output");
+  command->footer(kExamples);
+  command->callback([options, &exit_status] { exit_status = compute_fields(*options); });
 }
 
-}  // namespace tidewater::tools
+}  // namespace tidewater::command

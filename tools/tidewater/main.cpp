@@ -4,7 +4,6 @@
 #include <cstdlib>
 
 #include "commands.hpp"
-#include "magnetic.hpp"
 
 int main(int argc, char** argv) {
   // The library's text functions follow the user's locale; a command that is used in scripts reads
@@ -17,7 +16,7 @@ int main(int argc, char** argv) {
   int exit_status = 0;
   tidewater::command::add_convert(app, exit_status);
   tidewater::command::add_line(app, exit_status);
-  tidewater::tools::add_magnetic(app, exit_status);
+  tidewater::command::add_magnetic(app, exit_status);
   try {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {

@@ -3,6 +3,7 @@
 #include <array>
 #include <charconv>
 #include <cmath>
+#include <cstdio>
 #include <cstring>
 
 #include "tidewater/foundation.h"
@@ -175,6 +176,12 @@ void append_metres(std::string& text, double value, int decimals) {
   TWstatus status = TW_SUCCESS;
   TWmet_to_ascii(value, static_cast<int16_t>(decimals), 1, field.data(), &status);
   if (!text.empty()) text += ' ';
+  text += field.data();
+}
+
+void append_number(std::string& text, double value, int decimals, int width) {
+  std::array<char, 400> field;  // holds the largest double
+  std::snprintf(field.data(), field.size(), "%*.*f", width, decimals, value);
   text += field.data();
 }
 

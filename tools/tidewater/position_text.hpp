@@ -40,4 +40,7 @@ void append_position(std::string& text, const CoordinateTriple& point, const Ang
 void append_azimuth(std::string& text, double azimuth, const AngleFormat& format);
 void append_metres(std::string& text, double value, int decimals);
 
+// Writes a number right behind text, at the right of a field of that width.
+void append_number(std::string& text, double value, int decimals, int width = 0);
+
 }  // namespace tidewater::command

@@ -1,5 +1,7 @@
 #include "status_name.hpp"
 
+#include <stdexcept>
+
 namespace tidewater::command {
 
 namespace {
@@ -72,6 +74,11 @@ const char* status_name(TWstatus status) {
 const char* status_meaning(TWstatus status) {
   const Word* word = find(status);
   return word ? word->meaning : "unknown status";
+}
+
+void require(TWstatus status, const std::string& what) {
+  if (TW_OK(status)) return;
+  throw std::runtime_error(what + ": " + status_meaning(status) + " (" + status_name(status) + ")");
 }
 
 }  // namespace tidewater::command

@@ -1,6 +1,8 @@
 // Names and meanings of status words, for messages.
 #pragma once
 
+#include <string>
+
 #include "tidewater/frame.h"
 
 namespace tidewater::command {
@@ -10,5 +12,8 @@ const char* status_name(TWstatus status);
 
 // What it means to somebody who converts a line.
 const char* status_meaning(TWstatus status);
+
+// Throws std::runtime_error, with the word and what it is told of, where the status is no success.
+void require(TWstatus status, const std::string& what);
 
 }  // namespace tidewater::command
