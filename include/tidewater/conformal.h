@@ -930,7 +930,7 @@ TW_API void TWlam_az_eq_c(double e, double lon0, double lat0, double* e2, double
  * @param count              number of points
  * @param e                  first eccentricity
  * @param lon0,lat0          origin
- * @param e2,q1,qp,rq,m1     constants of TWlam_az_eq_c(); e2, q1 and m1 are not read
+ * @param e2,q1,qp,rq,m1     constants of TWlam_az_eq_c(); q1 and m1 are not read
  * @param sin_b1,cos_b1      constants of TWlam_az_eq_c()
  * @param sin_lat0,cos_lat0  constants of TWlam_az_eq_c()
  * @param D                  constant of TWlam_az_eq_c()

@@ -3,7 +3,6 @@
 #include <cmath>
 
 #include "foundation/numeric.hpp"
-#include "projections/authalic.hpp"
 #include "projections/isometric_latitude.hpp"
 #include "projections/parallel_radius.hpp"
 #include "tidewater/conformal.h"
@@ -19,7 +18,19 @@ constexpr double kTightLimit = 1.000000000001;
 // Wanted: looser in the inverse on the ellipsoid.
 constexpr double kLooseLimit = 1.0005;
 
+// Where 1 and the cosine of the distance from the origin sum to less than this, nearly all their
+// digits cancel.
+constexpr double kNearAntipode = 1e-6;
+
 bool is_polar(double lat0) { return std::fabs(std::fabs(lat0) - kHalfPi) < kAspectMargin; }
+
+// q(p) = (1 - e^2) (sin p / (1 - e^2 sin^2 p) - ln((1 - e sin p) / (1 + e sin p)) / 2e)
+// (Snyder 1987, eq. 3-12).  Wanted: in this plain form, to the bit, and not by authalic_q.  Callers
+// hold its value at the pole, which may have been worked out elsewhere, and near the pole one more
+// or less in its last digit decides whether a point is held.
+double q_of(double e, double e2, double s) {
+  return (s / (1 - e2 * s * s) - std::log((1 - e * s) / (1 + e * s)) / (2 * e)) * (1 - e2);
+}
 
 // Holds a sine at 1 or -1.  False, with the word, when it lies beyond the limit.
 bool hold_sine(double limit, double& u, TWstatus* status) {
@@ -96,17 +107,25 @@ class LatitudeOfQ {
     return std::asin(sin_beta) + s2 * (p2_ + 2 * c2 * p4_ + (4 * c2 * c2 - 1) * p6_);
   }
 
-  // (q - q(lat)) w^2 / (2 (1 - e^2) cos lat), with both q taken off that of the nearer pole: so the
-  // difference keeps its digits where q hardly changes any more.
+  // (q - q(lat)) w^2 / (2 (1 - e^2) cos lat).  Near a pole both q are taken off that of the pole:
+  // so the difference keeps its digits where q hardly changes any more.
   double correction(double q, double lat) const {
-    const double side = lat < 0 ? -1 : 1;
-    const double s = side * std::sin(lat);
+    constexpr double kNearPole = 0.9;
+    const double sin_lat = std::sin(lat);
     const double c = std::cos(lat);
-    const double w = 1 - e2_ * (s * s);
-    const double u = c * c / (1 + s);  // 1 - sin
-    const double from_pole =
-        u * (1 + e2_ * s) / (w * (1 - e2_)) + std::atanh(e_ * u / (1 - e2_ * s)) / e_;
-    const double t = side * ((side * q - qp_) / (1 - e2_) + from_pole);
+    const double w = 1 - e2_ * (sin_lat * sin_lat);
+    double t = 0;
+    if (std::fabs(sin_lat) < kNearPole) {
+      t = std::log((1 - e_ * sin_lat) / (1 + e_ * sin_lat)) / (2 * e_) + q / (1 - e2_) -
+          sin_lat / w;
+    } else {
+      const double side = lat < 0 ? -1 : 1;
+      const double s = side * sin_lat;
+      const double u = c * c / (1 + s);  // 1 - sin
+      const double from_pole =
+          u * (1 + e2_ * s) / (w * (1 - e2_)) + std::atanh(e_ * u / (1 - e2_ * s)) / e_;
+      t = side * ((side * q - qp_) / (1 - e2_) + from_pole);
+    }
     return t * (w * w) / (2 * c);
   }
 
@@ -126,8 +145,8 @@ void TWlam_az_eq_c(double e, double /*lon0*/, double lat0, double* e2, double* q
   *sin_lat0 = sin_0;
   *cos_lat0 = cos_0;
   if (e == 0) return;
-  const double q_origin = authalic_q(e, sin_0);
-  const double q_pole = authalic_q(e, 1);
+  const double q_origin = q_of(e, e * e, sin_0);
+  const double q_pole = q_of(e, e * e, 1);
   const double radius = std::sqrt(q_pole / 2);
   *e2 = e * e;
   *q1 = q_origin;
@@ -144,13 +163,16 @@ void TWlam_az_eq_c(double e, double /*lon0*/, double lat0, double* e2, double* q
 }
 
 void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, double lon0, double lat0,
-                   double /*e2*/, double /*q1*/, double qp, double rq, double /*m1*/, double sin_b1,
+                   double e2, double /*q1*/, double qp, double rq, double /*m1*/, double sin_b1,
                    double cos_b1, double sin_lat0, double cos_lat0, double D, CoordinateTriple* out,
                    TWstatus* status) {
   *status = TW_SUCCESS;
   const bool sphere = e == 0;
   const bool polar = is_polar(lat0);
   const bool equatorial = std::fabs(lat0) < kAspectMargin;
+  // Sine and cosine of the latitude of the origin on the sphere.
+  const double s0 = equatorial ? 0 : sphere ? sin_lat0 : sin_b1;
+  const double c0 = equatorial ? 1 : sphere ? cos_lat0 : cos_b1;
   for (int32_t i = 0; i < count; ++i) {
     double d = in[i].x - lon0;
     double lat = in[i].y;
@@ -164,7 +186,7 @@ void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, double l
         const double w = kQuarterPi - lat / 2;
         r = 2 * (lat0 >= 0 ? std::sin(w) : std::cos(w));
       } else {
-        const double q = authalic_q(e, std::sin(lat));
+        const double q = q_of(e, e2, std::sin(lat));
         r = std::sqrt(lat0 >= 0 ? qp - q : qp + q);
       }
       out[i].x = r * sin_d;
@@ -178,22 +200,26 @@ void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, double l
     if (sphere) {
       c = std::cos(lat);
     } else {
-      s = authalic_q(e, s) / qp;
+      s = q_of(e, e2, s) / qp;
       if (!hold_sine(kTightLimit, s, status)) return;
       c = std::sqrt((1 - s) * (1 + s));
+      if (c * c0 * cos_d + s * s0 + 1 < kNearAntipode) {
+        // What is left of the sum hangs on the last bit of c, so the angle itself is taken.
+        const double beta = std::asin(s);
+        s = std::sin(beta);
+        c = std::cos(beta);
+      }
     }
+    const double b = std::sqrt(2 / (c * c0 * cos_d + s * s0 + 1));
     if (equatorial) {
-      const double b = std::sqrt(2 / (c * cos_d + 1));
       out[i].x = b * c * sin_d;
       out[i].y = sphere ? b * s : rq * rq * b * s;
     } else if (sphere) {
-      const double b = std::sqrt(2 / (c * cos_lat0 * cos_d + sin_lat0 * s + 1));
       out[i].x = b * c * sin_d;
-      out[i].y = (cos_lat0 * s - c * sin_lat0 * cos_d) * b;
+      out[i].y = (c0 * s - c * s0 * cos_d) * b;
     } else {
-      const double b = std::sqrt(2 / (c * cos_b1 * cos_d + s * sin_b1 + 1)) * rq;
-      out[i].x = c * D * sin_d * b;
-      out[i].y = (s * cos_b1 - c * cos_d * sin_b1) * b / D;
+      out[i].x = c * D * sin_d * (b * rq);
+      out[i].y = (s * c0 - c * cos_d * s0) * (b * rq) / D;
     }
   }
 }
@@ -286,7 +312,7 @@ void TWlam_az_eq_s(const CoordinateTriple* in, int32_t count, double lon0, doubl
       k = 1 / (lat0 >= 0 ? std::cos(w) : std::sin(w));
     } else {
       const double s = std::sin(lat);
-      const double q = authalic_q(e, s);
+      const double q = q_of(e, e2, s);
       k = std::sqrt(lat0 >= 0 ? qp - q : q + qp) / parallel_radius(e2, s, std::cos(lat));
     }
     const double h = 1 / k;
