@@ -245,6 +245,16 @@ TEST(Polyconic, ScaleOnTheEquator) {
   EXPECT_NEAR(out[0].y, 1 + 0.125 / (1 - e2), 1e-3);  // atan of (E - sin E) over cancelling terms
 }
 
+TEST(Polyconic, ScaleOnTheSphereHardByTheEquator) {
+  // The arc tangent is of 0 / 0; optimised builds must not make a number of it.
+  const Projection p(0, 0, 0.4);
+  Points out = untouched(1);
+  EXPECT_EQ(p.scale(1, {{0.6, 1e-12, 0}}, out), TW_SUCCESS);
+  EXPECT_EQ(out[0].x, 1);
+  EXPECT_TRUE(std::isnan(out[0].y));
+  EXPECT_TRUE(std::isnan(out[0].z));
+}
+
 TEST(Polyconic, ScaleAtThePoles) {
   const Projection p(0.0818, 0, 0.4);
   Points out = untouched(2);
