@@ -56,6 +56,20 @@ TEST(AzimuthalEquidistant, Constants) {
   EXPECT_NEAR(p.g, 0.3 / 0.8, 1e-15);
 }
 
+TEST(AzimuthalEquidistant, AQuarterTurnFromAnEquatorialOrigin) {
+  // Step by step, with the tangent of the rounded auxiliary latitude: the arc sine at 1 turns one
+  // last digit of its argument into 1e-8.
+  const double e = 0.0818191908426215;
+  const double lat = 0.6316844268433592;
+  const Equidistant p(e, 0, 0);
+  const double psi = std::atan(std::tan(lat) * (1 - e * e));
+  const double azimuth = std::atan2(1.0, std::tan(psi) - std::cos(kPi / 2) * 0);
+  const double s = std::asin(std::cos(psi) / std::sin(azimuth));
+  const double h2 = std::pow(std::cos(azimuth) * e / std::sqrt(1 - e * e), 2);
+  const double c = s * (1 - s * s * h2 * (1 - h2) / 6 + std::pow(s, 4) / 120 * (4 - 7 * h2) * h2);
+  expect_near(p.forward({kPi / 2, lat, 0}), std::sin(azimuth) * c, std::cos(azimuth) * c, 1e-14);
+}
+
 TEST(AzimuthalEquidistant, SnydersSphericalExample) {
   // Snyder 1987, p. 337: radius 3, origin 40 N 100 W, point 20 S 100 E.
   const Equidistant p(0, degrees(-100), degrees(40));

@@ -63,10 +63,10 @@ void TWaz_eq_f(double e, double lon0, double lat0, double n1, double g, int32_t 
     if (std::fabs(std::fabs(lat) - kHalfPi) < kEpsilon) {
       if (std::fabs(lat + kHalfPi) < kEpsilon) azimuth = -kPi;
     } else {
-      const double tan_psi =
-          sin_lat0 * e2 * n1 / (cos_lat * nu(e2, sin_lat)) + std::tan(lat) * (1 - e2);
-      psi = std::atan(tan_psi);
-      azimuth = std::atan2(sin_d, tan_psi * cos_lat0 - cos_d * sin_lat0);
+      psi = std::atan(sin_lat0 * e2 * n1 / (cos_lat * nu(e2, sin_lat)) + std::tan(lat) * (1 - e2));
+      // The tangent is that of the rounded psi, as its cosine is below: a quarter turn away, the
+      // arc sine of their quotient magnifies what they differ by.
+      azimuth = std::atan2(sin_d, std::tan(psi) * cos_lat0 - cos_d * sin_lat0);
     }
     double sin_az = std::sin(azimuth);
     double cos_az = std::cos(azimuth);
