@@ -543,9 +543,9 @@ TW_API void TWalbers_f(double e, double lon0, double n, double C, double rho0, i
  * Inverse (Snyder 1987, eq. 14-8 to 14-11, 14-19, 3-16), to 1e-13 radians away from the poles.
  * Newton's steps shrink only by half towards a pole; there they are extrapolated, and a latitude
  * that comes within 4e-5 radians may be held at the pole.  On the sphere (e of 1e-13 or less) one
- * within 4e-7 of a pole is the pole.  The longitude is not wrapped.  For an eccentricity above 1e-13
- * and below about 0.01, as no ellipsoid of the earth has, the logarithm of the formula loses digits
- * (1e-16 / e of them), in all four functions: pass 0 for a sphere.
+ * within 4e-7 of a pole is the pole.  The longitude is not wrapped.  For an eccentricity above
+ * 1e-13 and below about 0.01, as no ellipsoid of the earth has, the logarithm of the formula loses
+ * digits (1e-16 / e of them), in all four functions: pass 0 for a sphere.
  * @param e       first eccentricity
  * @param lon0    central meridian
  * @param n       constant of TWalbers_c()
