@@ -203,7 +203,10 @@ void TableStore::read_layouts() {
   }
   for (const auto& [table, layout] : tables_) {
     const std::string fault = fault_of(layout);
-    if (!fault.empty()) throw StoreError("layout of table \"" + table + "\": " + fault);
+    if (fault.empty()) continue;
+    std::string words = "layout of table \"";
+    words.append(table).append("\": ").append(fault);
+    throw StoreError(words);
   }
   std::erase_if(tables_, [&](const auto& entry) { return !ordinary.contains(entry.first); });
 }
