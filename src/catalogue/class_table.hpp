@@ -4,7 +4,7 @@
 
 #include "catalogue/session.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // One such table: its name, its key columns, and the word for a row that it does not hold.
 struct ClassTable {
@@ -57,4 +57,4 @@ struct ClassTable {
   }
 };
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

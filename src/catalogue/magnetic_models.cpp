@@ -3,7 +3,7 @@
 #include "catalogue/session.hpp"
 #include "tidewater/catalogue.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -62,7 +62,7 @@ void TWmag_mdl_cnt(const char* store, int32_t* count, TWstatus* status) {
 }
 
 void TWmagmdl_names(const char* store, char* names, TWstatus* status) {
-  // Wanted: the word of a failed search is another one than in all other lists.
+  // By contract: the word of a failed search is another one than in all other lists.
   in_store(store, Close::kIgnored, status, [&] {
     return list_names(kTable, "model name", magnetic_row::kName, names, TW_FAILURE);
   });
@@ -125,7 +125,8 @@ void TWmm_coef_info(const char* store, int32_t k, const int32_t* degrees, const 
       if (!TW_OK(begun)) return begun;
       for (int32_t n = 0; n <= degrees[i]; ++n) {
         for (int32_t m = 0; m <= n; ++m) {
-          // Wanted: the end-of-table word passes, a table that is too short repeats its last row.
+          // By contract: the end-of-table word passes, a table that is too short repeats its last
+          // row.
           if (!TW_OK(OLB7R3_PF_get_next_row(table, row.data()))) return TW_BAD_DATA;
           C[i][n][m] = row.number<double>(coefficient_row::kFirst);
           S[i][n][m] = row.number<double>(coefficient_row::kSecond);

@@ -8,7 +8,7 @@
 
 #include "tidewater/store.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // A text field: its first byte and its size with the terminator.
 struct TextField {
@@ -134,4 +134,4 @@ namespace coefficient_row {
 inline constexpr std::size_t kFirst = 8, kSecond = 16;
 }  // namespace coefficient_row
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

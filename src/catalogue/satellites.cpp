@@ -4,7 +4,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/catalogue.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -32,7 +32,7 @@ void unpack(const Row& row, SatelliteRecord& record) {
 }  // namespace
 
 void TWsomps_cnt(const char* store, int32_t* count, TWstatus* status) {
-  // Wanted: the one function that asks for the exact success word of the open.
+  // By contract: the one function that asks for the exact success word of the open.
   in_store(
       store, Close::kIgnored, status,
       [&] { return count_rows(kTable, Judge::kExact, TW_PF_TABLE_ERROR, count); }, Judge::kExact);
@@ -50,7 +50,7 @@ void TWsomps_get_all(const char* store, SatelliteRecord* records, TWstatus* stat
 
 void TWsomps_get_sat(const char* store, int16_t id, SatelliteRecord* record, TWstatus* status) {
   in_store(store, Close::kIgnored, status, [&] {
-    // Wanted: the one function that asks for the exact success word of the reset.
+    // By contract: the one function that asks for the exact success word of the reset.
     return look_up(
         kTable, "id", &id, TW_NO_SUCH_SATELLITE, [&](const Row& row) { unpack(row, *record); },
         Judge::kExact);

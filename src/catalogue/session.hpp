@@ -6,7 +6,7 @@
 #include "tidewater/frame.h"
 #include "tidewater/store.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // Whether the store's answer to the close enters the status.
 enum class Close { kIgnored, kTested };
@@ -54,8 +54,8 @@ inline TWstatus begin_walk(const char* table, const char* column,
   return TW_SUCCESS;
 }
 
-// Hands each row of a walk to visit().  Wanted: only the end-of-table word ends it, a row that the
-// store could not read counts with what the last one left.
+// Hands each row of a walk to visit().  By contract: only the end-of-table word ends it, a row that
+// the store could not read counts with what the last one left.
 template <class Visit>
 void walk(const char* table, Visit visit) {
   Row row;
@@ -80,4 +80,4 @@ inline TWstatus count_rows(const char* table, Judge judge, TWstatus failed, int3
   return TW_SUCCESS;
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

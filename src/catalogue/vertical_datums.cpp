@@ -3,7 +3,7 @@
 #include "catalogue/session.hpp"
 #include "tidewater/catalogue.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -12,7 +12,7 @@ constexpr const char* kTable = "vert_datum";
 }  // namespace
 
 void TWget_vd_cnt(const char* store, int32_t* count, TWstatus* status) {
-  // Wanted: the word of a failure and the judgement differ from those of TWget_undl_cnt.
+  // By contract: the word of a failure and the judgement differ from those of TWget_undl_cnt.
   in_store(store, Close::kIgnored, status,
            [&] { return count_rows(kTable, Judge::kLowBit, TW_FAILURE, count); });
 }

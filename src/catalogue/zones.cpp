@@ -3,7 +3,7 @@
 #include "catalogue/session.hpp"
 #include "tidewater/catalogue.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

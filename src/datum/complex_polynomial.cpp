@@ -7,7 +7,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/datum.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -93,11 +93,11 @@ void TWcomplexpol_i(int32_t order, double y0, double x0, double sy, double sx, c
   const Normalised plane = {y0, x0, sy, sx};
   const bool invertible = order >= 1 && squared_modulus(polynomial.coef(1)) > kTolerance;
   for (int32_t i = 0; i < count; ++i) {
-    // Wanted: each point sets the word anew, so that only the last one's is seen.
+    // By contract: each point sets the word anew, so that only the last one's is seen.
     *status = TW_SUCCESS;
     const Complex target = {in[i].y, in[i].x};
     Complex z = {0, 0};
-    // Wanted: the start keeps the real part of the linear solution alone.
+    // By contract: the start keeps the real part of the linear solution alone.
     if (invertible) z.re = ((target - polynomial.coef(0)) / polynomial.coef(1)).re;
     int passes = 0;
     for (; passes < kMostPasses; ++passes) {

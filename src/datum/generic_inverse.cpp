@@ -6,7 +6,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/datum.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

@@ -13,7 +13,7 @@
 #include "tidewater/datum.h"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -248,7 +248,7 @@ void TWget_geo90(double lon, double lat, double height, const GeoidControl* cont
     TWgeo90_local(x, y, height, control, &held.bounds, held.data, &held.grid, status);
   }
   if (*status != TW_SUCCESS) return;
-  // Wanted: bounds of the grid that has the window's index in this block, whichever it is.
+  // By contract: bounds of the grid that has the window's index in this block, whichever it is.
   const GeoidGrid& grid = control->grids[held.grid];
   const Stand column = stand_of(x, wide(grid.xmin), wide(w.xmin), wide(w.dx), w.nc);
   const Stand row = stand_of(y, wide(grid.ymin), wide(w.ymin), wide(w.dy), w.nr);

@@ -10,7 +10,7 @@
 #include <sys/types.h>
 #endif
 
-namespace tidewater {
+namespace tidewater::detail {
 
 namespace {
 
@@ -110,4 +110,4 @@ bool read_header(const char* directory, const char* name, const char* extension,
   return true;
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -9,7 +9,7 @@
 #include <cstdio>
 #include <memory>
 
-namespace tidewater {
+namespace tidewater::detail {
 
 struct CloseFile {
   void operator()(std::FILE* file) const { std::fclose(file); }
@@ -102,4 +102,4 @@ inline std::int64_t cut(double value) {
   return static_cast<std::int64_t>(std::copysign(kMost, value));
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -11,7 +11,7 @@
 
 #include "datum/grid_file.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // A grid holds no point of its edge.
 template <class Bounds>
@@ -74,7 +74,7 @@ void give_way(const std::array<std::int64_t, 4>& amounts, Window* w, std::int64_
               std::int64_t* iy) {
   std::array<std::pair<std::int64_t, Direction>, 4> moves = {
       {{amounts[0], kWest}, {amounts[1], kNorth}, {amounts[2], kEast}, {amounts[3], kSouth}}};
-  // Wanted: this plain exchange sort, which settles the order of equal amounts in its own way.
+  // By contract: this plain exchange sort, which settles the order of equal amounts in its own way.
   for (std::size_t i = 0; i < moves.size(); ++i) {
     for (std::size_t j = i + 1; j < moves.size(); ++j) {
       if (moves[i].first > moves[j].first) std::swap(moves[i], moves[j]);
@@ -102,4 +102,4 @@ void give_way(const std::array<std::int64_t, 4>& amounts, Window* w, std::int64_
   }
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -6,7 +6,7 @@
 #include "tidewater/datum.h"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -98,7 +98,7 @@ void TWmol_std_i(double a, double e, double da, double df, double dx, double dy,
       out[i] = datum.inverse_geocentric(p, status);
       continue;
     }
-    // Wanted: two passes, no test of convergence.
+    // By contract: two passes, no test of convergence.
     CoordinateTriple estimate = p;
     for (int pass = 0; pass < 2; ++pass) {
       const auto d = datum.shift(estimate);

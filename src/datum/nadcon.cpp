@@ -11,7 +11,7 @@
 #include "tidewater/datum.h"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -89,7 +89,7 @@ double interpolate(const double* table, std::int64_t ix, std::int64_t iy, double
   constexpr double kMarker = 180;  // what is larger marks a node without data
   const double* p = table + iy * kSide + ix;
   double p00 = p[0], p01 = p[kSide], p10 = p[1], p11 = p[kSide + 1];
-  // Wanted: no count of the markers; of several, the later ones enter the means.
+  // By contract: no count of the markers; of several, the later ones enter the means.
   if (std::fabs(p00) > kMarker) p00 = (p11 + p10 + p01) / 3;
   if (std::fabs(p01) > kMarker) p01 = (p11 + p10 + p00) / 3;
   if (std::fabs(p10) > kMarker) p10 = (p11 + p01 + p00) / 3;
@@ -118,7 +118,7 @@ int32_t TWnadcon_c(const char* directory, NadconControl* control, TWstatus* stat
     *status = read_grid(directory, name, &control->grids[count]);
     if (*status != TW_SUCCESS) return 1;
     more = ++count < kMostGrids && next_line(list.get(), line, kListLine);
-    // Wanted: a line without a name repeats the one above it, in a slot of its own.
+    // By contract: a line without a name repeats the one above it, in a slot of its own.
     if (more) first_token(line, name);
   }
   control->grid_count = count;
@@ -249,7 +249,7 @@ void TWnadcon_i(int32_t count, const CoordinateTriple* in, const NadconControl* 
       if (std::fabs(dlon) > kTolerance) estimate.x += dlon;
       if (std::fabs(dlat) > kTolerance) estimate.y += dlat;
       ++passes;
-      // Wanted: one difference within the tolerance is enough.
+      // By contract: one difference within the tolerance is enough.
     } while (passes < kMostPasses && std::fabs(dlon) > kTolerance && std::fabs(dlat) > kTolerance);
     if (*status == TW_SUCCESS) {
       out[i] = estimate;
@@ -257,7 +257,7 @@ void TWnadcon_i(int32_t count, const CoordinateTriple* in, const NadconControl* 
       out[i] = point;
       outside = true;
     }
-    // Wanted: also where a file failed and the caller's own longitude stands there.
+    // By contract: also where a file failed and the caller's own longitude stands there.
     out[i].x = wrap_turns_above_then_at_or_below(out[i].x);
   }
   if (outside) *status = TW_I_OUTSIDE_NADCON;

@@ -13,7 +13,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/datum.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -57,8 +57,8 @@ Node cnt_block[kSide][kSide] = {};
 CntSubGrid* cnt_subgrids = nullptr;
 TWstatus cnt_read_status = TW_SUCCESS;
 
-// Wanted: an earlier grid is neither closed nor freed when another is opened.  This list keeps what
-// it leaves behind in reach, so that a leak checker tells it from memory lost by mistake.
+// By contract: an earlier grid is neither closed nor freed when another is opened.  This list keeps
+// what it leaves behind in reach, so that a leak checker tells it from memory lost by mistake.
 struct OpenedGrid {
   std::FILE* file;
   CntSubGrid* subgrids;
@@ -153,7 +153,7 @@ void load_block(int32_t grid, int64_t node_row, int64_t node_col) {
   const int64_t row = std::max<int64_t>(std::min(node_row - 1, g.rows - kSide), 0);
   const int64_t col = std::max<int64_t>(std::min(node_col - 1, g.cols - kSide), 0);
   if (cnt_block_grid == grid && cnt_block_row == row && cnt_block_col == col) return;
-  // Wanted: the block counts as moved even where it cannot be read.
+  // By contract: the block counts as moved even where it cannot be read.
   cnt_block_grid = grid;
   cnt_block_row = row;
   cnt_block_col = col;
@@ -206,8 +206,9 @@ Shift interpolate(const Found& found, double x, double y) {
   const int64_t col = whole_spacings(u);
   const int64_t to_west = found.code == kInside || found.code == kNorthEdge ? 1 : 0;
   const int64_t to_north = found.code == kInside || found.code == kWestEdge ? 1 : 0;
-  // Wanted: at the corner the fourth node is still that of the cell, which has all the weight for a
-  // point that lies a hair before it.  Beyond the sub-grid there is none, and next to no weight.
+  // By contract: at the corner the fourth node is still that of the cell, which has all the weight
+  // for a point that lies a hair before it.  Beyond the sub-grid there is none, and next to no
+  // weight.
   const bool own_corner = found.code == kNorthWestCorner && row + 1 < g.rows && col + 1 < g.cols;
   const int64_t to_corner_row = own_corner ? 1 : to_north;
   const int64_t to_corner_col = own_corner ? 1 : to_west;
@@ -243,8 +244,8 @@ TWstatus shift_at(double lon, double lat, double* lon_shift, double* lat_shift) 
   lon = add_turns_while(lon, kTwoPi, [](double v) { return v <= 0; });
   lon = add_turns_while(lon, -kTwoPi, [](double v) { return v > kTwoPi; });
   lon = add_turns_while(lon, -kTwoPi, [](double v) { return v >= kPi; });
-  // Wanted: the sub-grids' longitudes, positive west, are compared with the magnitude alone, so
-  // that a point east of Greenwich takes the shift of its mirror image.
+  // By contract: the sub-grids' longitudes, positive west, are compared with the magnitude alone,
+  // so that a point east of Greenwich takes the shift of its mirror image.
   const double sign = lon >= 0 ? 1 : -1;
   const double x = std::fabs(lon) * kArcSecondsPerRadian;
   const double y = lat * kArcSecondsPerRadian;

@@ -129,8 +129,8 @@ void TWpoly2deg_f(double x0, double y0, double sx, double sy, double a0, double 
     out[i].x = (x - x0) / sx;
     out[i].y = (y - y0) / sy;
   }
-  // Wanted: the polynomial reads the input array, so that the normalisation takes effect only where
-  // the output is the same array.
+  // By contract: the polynomial reads the input array, so that the normalisation takes effect only
+  // where the output is the same array.
   TWnpoly2d_f(polynomial.coefs, polynomial.degree, count, in, out, status);
 }
 

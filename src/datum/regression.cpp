@@ -6,7 +6,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/datum.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -51,7 +51,7 @@ void TWmre(int32_t count, int16_t direction, int16_t lon_range, int32_t lon_coun
     double lon = p.x * kDegreesPerRadian;
     const double lat = p.y * kDegreesPerRadian;
     if (lon_range == 1) {
-      // Wanted: no upper bound.
+      // By contract: no upper bound.
       lon = add_turns_while(lon, 360, [](double v) { return v < 0; });
     } else {
       lon = add_turns_while(lon, 360, [](double v) { return v < -180; });

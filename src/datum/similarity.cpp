@@ -62,8 +62,9 @@ void TWmol_bdk_i(int32_t count, const CoordinateTriple* in, double s, const doub
   const double scale = 1 + s;
   for (int32_t i = 0; i < count; ++i) {
     auto r = rotate_back(rotation, {in[i].x - qx, in[i].y - qy, in[i].z - qz});
-    // Wanted: the guard is on the scale difference itself, unlike that of TWbw_i.  Without a scale
-    // change the coordinates are right and the word is a failure; a factor of zero is divided by.
+    // By contract: the guard is on the scale difference itself, unlike that of TWbw_i.  Without a
+    // scale change the coordinates are right and the word is a failure; a factor of zero is divided
+    // by.
     if (s == 0) {
       *status = TW_FAILURE;
     } else {

@@ -141,6 +141,6 @@ void TWtoler_to_cnt(TWtransform transform, TWcontext context, CoordinateTriple s
       }
     }
   }
-  // Wanted: the number of passes alone decides, also when the last one found the end.
+  // By contract: the number of passes alone decides, also when the last one found the end.
   *count = passes >= kMostPasses ? high / 2 : ((c0 > c1 ? c0 : c1) + 2) / 2;
 }

@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

@@ -4,7 +4,7 @@
 
 #include <cmath>
 
-namespace tidewater {
+namespace tidewater::detail {
 
 struct Complex {
   double re, im;
@@ -30,4 +30,4 @@ inline Complex operator/(Complex p, Complex q) {
   return {(p.re * r + p.im) / e, (p.im * r - p.re) / e};
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

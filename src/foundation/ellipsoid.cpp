@@ -6,7 +6,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/foundation.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 namespace {
 
 // How far beyond a pole the meridian functions hold a latitude instead of refusing it.
@@ -102,7 +102,7 @@ TWstatus MeridianArc::inverse(double distance, double* lat) const {
       p = start - tail(previous) / mean_;
       ++rounds;
     } while (!(std::fabs(p - previous) <= 1e-12) && rounds < kMostRounds);
-    // Wanted: the count alone decides, also when the last round did converge.
+    // By contract: the count alone decides, also when the last round did converge.
     if (rounds == kMostRounds) return TW_BAD_PARAMETER;
   }
   // Also for a not-a-number, with which the rounds would run into their limit.
@@ -111,9 +111,9 @@ TWstatus MeridianArc::inverse(double distance, double* lat) const {
   return TW_SUCCESS;
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 void TWRparal(double a, double e, double lat, double* radius, TWstatus* status) {
   *status = TW_SUCCESS;
@@ -175,7 +175,8 @@ void TWmerid_dist_i(double a, double e, double distance, double* lat, TWstatus* 
 
 void TWdM_dphi(double a, double e2, double lat, double* derivative, TWstatus* status) {
   *status = TW_SUCCESS;
-  // Wanted: a negative square is let through, unlike a negative eccentricity in the arc functions.
+  // By contract: a negative square is let through, unlike a negative eccentricity in the arc
+  // functions.
   if (e2 >= 1) {
     *status = TW_BAD_ECCENTRICITY;
     return;
@@ -240,7 +241,7 @@ void TWconflat_geod(double e, double conformal_lat, double* lat, TWstatus* statu
     p = 2 * std::atan(std::pow((1 + es) / (1 - es), e / 2) * t) - kHalfPi;
     ++rounds;
   } while (!(std::fabs(p - previous) <= 1e-12) && rounds < kMostRounds);
-  // Wanted: the count alone decides, and the word is that of a bad latitude.
+  // By contract: the count alone decides, and the word is that of a bad latitude.
   if (rounds == kMostRounds) {
     *status = TW_BAD_LATITUDE;
     return;

@@ -7,7 +7,7 @@
 
 #include "foundation/numeric.hpp"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 void TWllh_to_xyz(double a, double e, int32_t count, const CoordinateTriple* in,
                   CoordinateTriple* out, TWstatus* status) {

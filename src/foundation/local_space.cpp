@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -61,8 +61,8 @@ void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double 
     *status = TW_BAD_PARAMETER;
     return;
   }
-  // Wanted: the rows are not normalised afterwards, so a line that is not horizontal at the origin
-  // gives rows shorter than one.
+  // By contract: the rows are not normalised afterwards, so a line that is not horizontal at the
+  // origin gives rows shorter than one.
   m[3] = (m[7] * dz - m[8] * dy) / length;
   m[4] = (m[8] * dx - m[6] * dz) / length;
   m[5] = (m[6] * dy - m[7] * dx) / length;
@@ -138,7 +138,7 @@ void TWlsr_to_llh(double a, double e, double scale, double lon0, double lat0, do
                   int32_t count, CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   const EastNorthUp frame(a, e, lon0, lat0, h0, status);
   const double unit = a * scale;
-  // Wanted: the caller's input array is normalised in place and stays so.
+  // By contract: the caller's input array is normalised in place and stays so.
   for (int32_t i = 0; i < count; ++i) {
     in[i].x /= unit;
     in[i].y /= unit;

@@ -3,7 +3,7 @@
 
 #include "tidewater/frame.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // The series in the third flattening n = (a - b) / (a + b), carried to n^4 and summed over cos 2p:
 // arc = G (A p + T(p)).  Helmert, Die mathematischen und physikalischen Theorieen der hoeheren
@@ -28,4 +28,4 @@ class MeridianArc {
   double t0_ = 0, t1_ = 0, t2_ = 0, t3_ = 0;  // coefficients of T by rising power of cos 2p
 };
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

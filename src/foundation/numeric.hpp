@@ -4,7 +4,7 @@
 #include <cmath>
 #include <numbers>
 
-namespace tidewater {
+namespace tidewater::detail {
 
 inline constexpr double kPi = std::numbers::pi;
 inline constexpr double kHalfPi = kPi / 2;
@@ -71,4 +71,4 @@ inline double wrap_turns_above_then_at_or_below(double d) {
   return add_turns_while(d, kTwoPi, [](double v) { return v <= -kPi; });
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 void TWab_to_en(double s1, double s2, double false_easting, double false_northing, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {

@@ -19,7 +19,7 @@
 #include "tidewater/foundation.h"
 #include "tidewater/lines.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -65,7 +65,8 @@ class VertexExpansion {
     return to(x, k);
   }
 
-  // The point itself, or the vertex for a point beyond it.  Wanted: on the positive side alone.
+  // The point itself, or the vertex for a point beyond it.  By contract: on the positive side
+  // alone.
   static double pull_back(double x, double k) { return x >= k ? k - 1e-18 : x; }
 
   // As to(), with the point pulled back; and its two halves.
@@ -150,7 +151,7 @@ double into_half_turn(double angle) {
                     : add_turns_while(angle, kTwoPi, [](double v) { return v < -kPi; });
 }
 
-// Wanted: a longitude above pi by less than 1e-10 stays.
+// By contract: a longitude above pi by less than 1e-10 stays.
 double into_shifted_half_turn(double lon) {
   return lon >= 0 ? add_turns_while(lon, -kTwoPi, [](double v) { return v - 1e-10 >= kPi; })
                   : add_turns_while(lon, kTwoPi, [](double v) { return v - 1e-10 <= -kPi; });
@@ -196,7 +197,7 @@ void direct_on_sphere(CoordinateTriple start, double azimuth, double angle, Coor
   } else {
     lon2 = lon1 + std::atan2(sin_az * sin_t, cos1 * cos_t - sin1 * sin_t * cos_az);
   }
-  // Wanted: in the range of the arc tangent, not of a full turn.
+  // By contract: in the range of the arc tangent, not of a full turn.
   const double d = lon1 - lon2;
   *back_azimuth =
       std::atan2(std::sin(d) * cos1, sin1 * std::cos(lat2) - std::cos(d) * std::sin(lat2) * cos1);
@@ -225,7 +226,8 @@ constexpr int kMostInversePasses = 30;
 void inverse_on_meridian(double dl, double lat1, double lat2, double a, double e, double* azimuth,
                          double* back_azimuth, double* distance, TWstatus* status) {
   if (std::fabs(std::fabs(dl) - kPi) < 1e-14 && lat1 == -lat2) {
-    // Antipodal points.  Wanted: the line goes over the north pole, whichever latitudes they have.
+    // Antipodal points.  By contract: the line goes over the north pole, whichever latitudes they
+    // have.
     double quarter = 0;
     TWmerid_dist_f(a, e, kHalfPi, &quarter, status);
     *distance = 2 * quarter;
@@ -253,7 +255,7 @@ void inverse_on_meridian(double dl, double lat1, double lat2, double a, double e
 // Haversine formula: Snyder 1987, eq. 5-3a, 5-4b.
 void inverse_on_sphere(double dl, CoordinateTriple start, CoordinateTriple end, double a,
                        double* azimuth, double* back_azimuth, double* distance) {
-  // Wanted: no such step for a difference below -pi.
+  // By contract: no such step for a difference below -pi.
   dl = add_turns_while(dl, -kTwoPi, [](double v) { return v > kPi; });
   const double sin1 = std::sin(start.y);
   const double cos1 = std::cos(start.y);
@@ -363,7 +365,7 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
     arc = g2 * to2.arc + g1 * to1.arc;
     change = arc - previous;
     previous = arc;
-    // Wanted: the tolerance on the arc here is not scaled to the ellipsoid.
+    // By contract: the tolerance on the arc here is not scaled to the ellipsoid.
     if (count > 2 &&
         (std::fabs(change) <= 0.0001 || std::fabs(step) <= 1e-16 || count >= kMostInversePasses)) {
       break;
@@ -379,7 +381,7 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
     TWRparal(a, e, lat1, &radius, status);
     *distance = std::fabs(radius * dl);
   }
-  // Wanted: in all other cases the first estimate stays, with no word about it.
+  // By contract: in all other cases the first estimate stays, with no word about it.
 
   const double clairaut = std::sqrt(1 - k * k);
   double p1 = clairaut / c1 >= 1 ? -1 : -(clairaut / c1);
@@ -421,7 +423,7 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
     TWmerid_dist_f(a, e, lat1, &arc, status);
     TWmerid_dist_i(a, e, arc + northward, &end->y, status);
     end->x = lon1;
-    *back_azimuth = kPi;  // Wanted: also for a line that runs south.
+    *back_azimuth = kPi;  // By contract: also for a line that runs south.
     return;
   }
   if (e < kSphereLimit) {
@@ -468,7 +470,7 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
   if (before_vertex) arc = -arc;
 
   double w = k * std::cos(arc / b);
-  double lon = arc / b * m;  // Wanted: the product, and a limit in the unit of a, not scaled.
+  double lon = arc / b * m;  // By contract: the product, and a limit in the unit of a, not scaled.
   if (!(arc < 0.01)) {
     w = latitude_sine_at(expansion, arc, k, b, ep2);
     lon = expansion.pulled_back_longitude(w, k);
@@ -512,7 +514,7 @@ void TWgeodesic_inv(CoordinateTriple start, CoordinateTriple end, double a, doub
   } else {
     inverse_on_ellipsoid(dl, lat1, lat2, a, e, azimuth, back_azimuth, distance, status);
   }
-  // Wanted: the azimuths are brought up also where they are still the caller's own.
+  // By contract: the azimuths are brought up also where they are still the caller's own.
   if (*azimuth < -1e-12) *azimuth += kTwoPi;
   if (*back_azimuth < -1e-12) *back_azimuth += kTwoPi;
 }

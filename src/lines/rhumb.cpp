@@ -7,7 +7,7 @@
 #include "tidewater/foundation.h"
 #include "tidewater/lines.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -41,7 +41,7 @@ void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distance, dou
     TWmerc_c(e, lat1, &y1, status);
     end->x = lon1 + (y2 - y1) * std::tan(azimuth);
   } else {
-    // Wanted: a positive distance goes east for azimuth 3 pi / 2 too.
+    // By contract: a positive distance goes east for azimuth 3 pi / 2 too.
     end->x = lon1 + distance / parallel_radius(a, e, lat1);
     end->y = lat1;
   }
@@ -63,7 +63,7 @@ void TWrhmbline_inv(CoordinateTriple start, CoordinateTriple end, double a, doub
     double y2 = 0;
     TWmerc_c(e, lat2, &y2, status);
     TWmerc_c(e, lat1, &y1, status);
-    // Wanted: the longitude difference as it stands, not the short way round.
+    // By contract: the longitude difference as it stands, not the short way round.
     forward = std::atan2(end.x - start.x, y2 - y1);
     double m1 = 0;
     double m2 = 0;

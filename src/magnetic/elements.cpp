@@ -10,7 +10,7 @@
 #include "tidewater/foundation.h"
 #include "tidewater/magnetic.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -137,7 +137,7 @@ void TWhar_mag_var(int32_t N, double radius, double** C, double** S, double** re
     MagneticElements now = elements_of(field[i]);
     // Differences over one unit of time, not derivatives.
     const double horizontal = std::hypot(x + dx, y + dy);
-    // Wanted: the declination to come is formed however small its horizontal intensity is.
+    // By contract: the declination to come is formed however small its horizontal intensity is.
     const double turn = std::atan2(y + dy, x + dx) - now.declination;
     rates[i] = {wrap_at_or_below_then_above(turn), std::atan2(z + dz, horizontal) - now.inclination,
                 horizontal - now.horizontal, std::hypot(horizontal, z + dz) - now.total};

@@ -9,7 +9,7 @@
 #include "tidewater/foundation.h"
 #include "tidewater/magnetic.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

@@ -6,7 +6,7 @@
 #include "foundation/numeric.hpp"
 #include "projections/isometric_latitude.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // The logarithm of q loses digits below this eccentricity, which is far below that of any ellipsoid
 // of the earth.
@@ -23,11 +23,11 @@ inline double authalic_logarithm(double e, double sin_lat) {
 inline double authalic_q(double e, double sin_lat) {
   if (e == 0) return 2 * sin_lat;
   const double e2 = square(e);
-  // Wanted: the printed logarithm where it differs from -2 atanh(e sin p) by more than the last
-  // digits, so that the figures stay those of the formula.
+  // By contract: the printed logarithm where it differs from -2 atanh(e sin p) by more than the
+  // last digits, so that the figures stay those of the formula.
   const double logarithm = std::fabs(e) < kLogarithmEccentricity ? authalic_logarithm(e, sin_lat)
                                                                  : -eccentric_term(e, sin_lat) / e2;
   return (sin_lat / (1 - e2 * square(sin_lat)) - logarithm) * (1 - e2);
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -6,7 +6,7 @@
 
 #include "foundation/numeric.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // Up to this eccentricity, above that of every ellipsoid of the earth, series stand in for the
 // library's functions; they are exact to the last bit or two there.
@@ -78,4 +78,4 @@ inline double latitude_at_rest(double e, double t) {
   return kHalfPi - 2 * std::atan(tangent);
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -5,14 +5,14 @@
 
 #include "foundation/numeric.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
-// Wanted: a latitude hard by the south pole is set to just past the NORTH pole, so that its cosine
-// is negative and a scale comes out large and negative.
+// By contract: a latitude hard by the south pole is set to just past the NORTH pole, so that its
+// cosine is negative and a scale comes out large and negative.
 inline double hold_off_poles(double lat, double margin) {
   if (std::fabs(lat - kHalfPi) < margin) lat = kHalfPi - margin;
   if (std::fabs(lat + kHalfPi) < margin) lat = kHalfPi + margin;
   return lat;
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -5,7 +5,7 @@
 
 #include "tidewater/frame.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // Anticlockwise by an angle; z stays.
 inline void turn_points(double angle, int32_t count, CoordinateTriple* points) {
@@ -19,4 +19,4 @@ inline void turn_points(double angle, int32_t count, CoordinateTriple* points) {
   }
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

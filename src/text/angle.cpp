@@ -12,7 +12,7 @@
 #include "text/locale.hpp"
 #include "text/wide.hpp"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -88,7 +88,7 @@ Sexagesimal read_packed(std::u16string_view text) {
   Sexagesimal angle;
   const std::size_t stop = text.find(u'.');
   scan_number(text.substr(0, stop), &angle.deg);
-  // Wanted: -0.3000 is positive, the number is tested and not its text.
+  // By contract: -0.3000 is positive, the number is tested and not its text.
   angle.negative = angle.deg < 0;
   if (stop == text.npos) return angle;
 
@@ -96,7 +96,7 @@ Sexagesimal read_packed(std::u16string_view text) {
   scan_number(filled_to_two(digits.substr(0, 2)), &angle.min);
   if (digits.size() > 2) {
     std::u16string seconds = filled_to_two(digits.substr(2, 2));
-    // Wanted: a full stop also where the locale has another decimal point.
+    // By contract: a full stop also where the locale has another decimal point.
     if (digits.size() > 4) seconds += u"." + digits.substr(4);
     scan_number(seconds, &angle.sec);
   }
@@ -111,7 +111,7 @@ Sexagesimal read_colon(std::u16string_view text, std::u16string_view negative) {
     rest = scan_number(rest, part);
     if (rest == nullptr || *rest++ != ':') break;
   }
-  // Wanted: -0:30 is negative, and a blank in front of the sign hides it.
+  // By contract: -0:30 is negative, and a blank in front of the sign hides it.
   angle.negative = !text.empty() && negative.find(text.front()) != negative.npos;
   return angle;
 }
@@ -191,7 +191,7 @@ std::string angle_text(double value, const AngleUnit& unit, int16_t axis) {
 
 }  // namespace
 
-AngleUnit tidewater::with_wide_format(const AngleUnit& unit) {
+AngleUnit tidewater::detail::with_wide_format(const AngleUnit& unit) {
   const auto* end = std::find(std::begin(unit.format), std::end(unit.format), '\0');
   const std::u16string format = widen({unit.format, end}, std::size(unit.wide_format) - 1);
   AngleUnit wide = unit;
@@ -230,7 +230,7 @@ void TWascii_to_rad_wide(TWchar16* text, AngleUnit unit, int16_t axis, double* v
         *status = TW_BAD_TEXT;
         return;
       }
-      // Wanted: with a letter of the other axis the value is still read and written.
+      // By contract: with a letter of the other axis the value is still read and written.
       if (!replace_letter(text, given.size(), letter, axis, signs.negative)) *status = TW_BAD_TEXT;
     }
 

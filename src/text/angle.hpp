@@ -3,9 +3,9 @@
 
 #include "tidewater/text.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // The unit with its narrow format made wide, cut at the 15 characters that fit.
 AngleUnit with_wide_format(const AngleUnit& unit);
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

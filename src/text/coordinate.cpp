@@ -9,7 +9,7 @@
 #include "text/wide.hpp"
 #include "tidewater/text.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -107,7 +107,7 @@ void parse_xyz_wide(std::u16string_view text, double unit, CoordinateTriple* poi
                     TWstatus* status) {
   CoordinateTriple read = {0, 0, 0};
   *status = TW_SUCCESS;
-  // Wanted: neither a plus sign nor an exponent.
+  // By contract: neither a plus sign nor an exponent.
   if (text.find_first_not_of(u"0123456789,.- \n") != text.npos) {
     *status = TW_BAD_TEXT;
     return;

@@ -4,7 +4,7 @@
 #include <clocale>
 #include <string>
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // What the user's locale writes for the decimal separator and the signs.
 struct LocaleSigns {
@@ -19,4 +19,4 @@ inline bool adopt_user_locale() { return std::setlocale(LC_ALL, "") != nullptr; 
 // Adopts the user's locale and asks the platform for its signs.
 LocaleSigns adopt_user_locale_signs();
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

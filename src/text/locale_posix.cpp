@@ -3,7 +3,7 @@
 #include "text/locale.hpp"
 #include "text/wide.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 LocaleSigns adopt_user_locale_signs() {
   LocaleSigns signs;
@@ -15,4 +15,4 @@ LocaleSigns adopt_user_locale_signs() {
   return signs;
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

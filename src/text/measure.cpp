@@ -9,7 +9,7 @@
 #include "text/wide.hpp"
 #include "tidewater/text.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -56,7 +56,7 @@ void read_wide(const TWchar16* text, double unit, double* value, TWstatus* statu
   without_exceptions(status, [&] {
     adopt_user_locale();
     const std::u16string_view given = text;
-    // Wanted: no comma, also where it is the locale's decimal point.
+    // By contract: no comma, also where it is the locale's decimal point.
     if (given.find_first_not_of(u"0123456789.-+eE \n") != given.npos) {
       *status = TW_BAD_TEXT;
       return;
@@ -77,7 +77,8 @@ void read(const char* text, double unit, double* value, TWstatus* status) {
 
 }  // namespace
 
-std::string tidewater::length_text(double value, int16_t precision, double unit, TWstatus* status) {
+std::string tidewater::detail::length_text(double value, int16_t precision, double unit,
+                                           TWstatus* status) {
   *status = TW_SUCCESS;
   if (unit == 0) {
     *status = TW_RANGE_ERROR;
@@ -148,7 +149,7 @@ void TWscalr_to_asc(double value, int16_t precision, char* text, TWstatus* statu
     }
     *status = TW_SUCCESS;
     std::u16string number = widen(narrowed, narrowed.size());
-    // Wanted: zeros are cut also where there is no separator, so 100 at precision 0 becomes 1.
+    // By contract: zeros are cut also where there is no separator, so 100 at precision 0 becomes 1.
     while (number.size() > 1 && number.back() == u'0') number.pop_back();
     if (number.size() > separator.size()) {
       const std::size_t tail = number.size() - separator.size();

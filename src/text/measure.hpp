@@ -6,9 +6,9 @@
 
 #include "tidewater/frame.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // A length as text in the user's locale; a unit of exactly zero gives TW_RANGE_ERROR and no text.
 std::string length_text(double value, int16_t precision, double unit, TWstatus* status);
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

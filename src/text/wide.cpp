@@ -5,7 +5,7 @@
 #include <cstdlib>
 #include <cwchar>
 
-namespace tidewater {
+namespace tidewater::detail {
 
 std::u16string widen(std::string_view narrow, std::size_t limit) {
   std::u16string wide;
@@ -90,4 +90,4 @@ void scan_number(std::u16string_view text, double* number) {
   scan_number(narrow(text).c_str(), number);
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

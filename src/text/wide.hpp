@@ -9,7 +9,7 @@
 
 #include "tidewater/frame.h"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // Takes the place of a narrow character that has no 16-bit form; no reader admits it.
 inline constexpr char16_t kReplacement = u'\uFFFD';
@@ -58,4 +58,4 @@ void without_exceptions(TWstatus* status, Work work) {
   }
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -154,7 +154,7 @@ TEST_P(ClassTable, TextWithoutTerminatorIsCutAtItsField) {
 }
 
 TEST_P(ClassTable, ARowThatCannotBeReadStillCounts) {
-  // Wanted: a walk ends at the end-of-table word alone.
+  // By contract: a walk ends at the end-of-table word alone.
   add("a", "A", 1, 0, 1);
   add("b", "B", 2, 0, 1);
   store_.fail(StoreCall::kNext, FakeStore::kSomeFailure, 2);

@@ -634,7 +634,7 @@ TEST_F(Nadcon, InverseStopsWhenOneComponentIsNear) {
   double lon = -95.5;
   for (int pass = 0; pass < 2; ++pass) lon += -95.5 - (lon - shift(lon));
   EXPECT_NEAR(out.x, degrees(lon), 1e-14);
-  // Wanted: the true inverse is 6e-7 degrees away, far beyond the tolerance.
+  // By contract: the true inverse is 6e-7 degrees away, far beyond the tolerance.
   const double truth = (-95.5 + (10 + 1800) / 3600.0) / (1 - 0.005);
   EXPECT_GT(std::fabs(lon - truth), 1e-7);
   EXPECT_NEAR(out.y, degrees(23.5) - degrees(0, 0, 18), 1e-14);

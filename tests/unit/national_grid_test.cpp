@@ -591,7 +591,7 @@ TEST_F(NationalGrid, FileCutAtEachRecord) {
         4, length < second + 176 + 64 ? 0 : (length - second - 176 - 64) / 80 + 1);
     const double expected = rows_read >= 3 ? 3 : rows_read == 2 ? 2.5 : 2;
     EXPECT_NEAR(s.lat, expected, 1e-9) << length;
-    // Wanted: the block counts as loaded, and the word is not given again.
+    // By contract: the block counts as loaded, and the word is not given again.
     EXPECT_EQ(shift_at(west(104.75, 53.75)).status, TW_SUCCESS);
   }
 }

@@ -6,7 +6,7 @@
 #include "projections/pole_hold.hpp"
 #include "support/points.hpp"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 using test::kInfinity;
 using test::kNaN;
 

@@ -10,7 +10,7 @@
 #include "projections/parallel_radius.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -110,8 +110,8 @@ class AuthalicInverse {
     }
   }
 
-  // Wanted: after a step without bound, as the vanishing cosine of either pole makes it, the north
-  // pole is within the tolerance and is looked at first.
+  // By contract: after a step without bound, as the vanishing cosine of either pole makes it, the
+  // north pole is within the tolerance and is looked at first.
   bool held_near_pole() {
     const double tolerance = std::max(1.5 * std::fabs(delta_), 4e-05);
     if (std::fabs(lat_ - kHalfPi) < tolerance) {
@@ -274,7 +274,8 @@ void TWalbers_s(double e, double k0, double C, double n, int32_t count, const Co
     double k = 1.0;
     if (!(polar && std::fabs(rho) < 1e-5)) {
       const double m = parallel_radius(e2, s, std::cos(lat));
-      k = std::fabs(m) >= 1e-13 ? rho * n / m : -1.0;  // Wanted: -1 marks a pole without a scale
+      k = std::fabs(m) >= 1e-13 ? rho * n / m
+                                : -1.0;  // By contract: -1 marks a pole without a scale
     }
     const double h = k < 0 ? 0.0 : 1 / k;
     out[i] = {k * k0, h * k0, h * k * k0 * k0};

@@ -7,7 +7,7 @@
 #include "projections/parallel_radius.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -15,7 +15,7 @@ namespace {
 constexpr double kAspectMargin = 1e-12;
 // How far the sine of an authalic latitude may stand beyond 1 and still be held there.
 constexpr double kTightLimit = 1.000000000001;
-// Wanted: looser in the inverse on the ellipsoid.
+// By contract: looser in the inverse on the ellipsoid.
 constexpr double kLooseLimit = 1.0005;
 
 // Where 1 and the cosine of the distance from the origin sum to less than this, nearly all their
@@ -25,9 +25,9 @@ constexpr double kNearAntipode = 1e-6;
 bool is_polar(double lat0) { return std::fabs(std::fabs(lat0) - kHalfPi) < kAspectMargin; }
 
 // q(p) = (1 - e^2) (sin p / (1 - e^2 sin^2 p) - ln((1 - e sin p) / (1 + e sin p)) / 2e)
-// (Snyder 1987, eq. 3-12).  Wanted: in this plain form, to the bit, and not by authalic_q.  Callers
-// hold its value at the pole, which may have been worked out elsewhere, and near the pole one more
-// or less in its last digit decides whether a point is held.
+// (Snyder 1987, eq. 3-12).  By contract: in this plain form, to the bit, and not by authalic_q.
+// Callers hold its value at the pole, which may have been worked out elsewhere, and near the pole
+// one more or less in its last digit decides whether a point is held.
 double q_of(double e, double e2, double s) {
   return (s / (1 - e2 * s * s) - std::log((1 - e * s) / (1 + e * s)) / (2 * e)) * (1 - e2);
 }
@@ -256,7 +256,7 @@ void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double l
       double q = 0;
       if (polar) {
         const double rho = std::sqrt(x * x + y * y);
-        // Wanted: without its sign, so that a point past the equator comes out mirrored in it.
+        // By contract: without its sign, so that a point past the equator comes out mirrored in it.
         q = std::fabs(qp - rho * rho);
         if (lat0 < 0) q = -q;
         lon = std::atan2(x, lat0 < 0 ? y : -y) + lon0;
@@ -303,7 +303,7 @@ void TWlam_az_eq_s(const CoordinateTriple* in, int32_t count, double lon0, doubl
     const double lat = in[i].y;
     double k = 0;
     if (!polar) {
-      // Wanted: the form of the sphere, also on the ellipsoid.
+      // By contract: the form of the sphere, also on the ellipsoid.
       k = equatorial ? std::sqrt(2 / (std::cos(lat) * std::cos(d) + 1))
                      : std::sqrt(2 / (cos_lat0 * std::cos(d) * std::cos(lat) +
                                       sin_lat0 * std::sin(lat) + 1));

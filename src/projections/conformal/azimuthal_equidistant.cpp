@@ -7,7 +7,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -71,8 +71,8 @@ void TWaz_eq_f(double e, double lon0, double lat0, double n1, double g, int32_t 
     double sin_az = std::sin(azimuth);
     double cos_az = std::cos(azimuth);
     const bool on_meridian = std::fabs(sin_az) < kEpsilon;
-    // Wanted: the arc cosine is not held, and is not a number a hair beyond the antipode.  Below
-    // zero alone it can be more than a quarter turn.
+    // By contract: the arc cosine is not held, and is not a number a hair beyond the antipode.
+    // Below zero alone it can be more than a quarter turn.
     const double cc = cos_d * cos_lat * cos_lat0 + sin_lat * sin_lat0;
     const bool far_side = cc <= 0 && std::acos(cc) > kHalfPi;
 
@@ -185,7 +185,7 @@ void TWaz_eq_s(double lon0, double lat0, double k0, int32_t count, const Coordin
     } else if (lat0 < -kHalfPi + kNearPole) {
       k = (lat + kHalfPi) * k0 / std::cos(lat);
     } else {
-      // Wanted: at the origin this is 0/0, and stays so.
+      // By contract: at the origin this is 0/0, and stays so.
       const double c =
           std::acos(std::cos(lon - lon0) * std::cos(lat) * cos_lat0 + std::sin(lat) * sin_lat0);
       k = c * k0 / std::sin(c);

@@ -8,7 +8,7 @@
 #include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 void TWcassini_c(double e, double /*lon0*/, double lat0, double* c0, double* c2, double* c4,
                  double* c6, double* c8, double* m0, double* d2, double* d4, double* d6,

@@ -5,7 +5,7 @@
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 // Each inner call sets the caller's word anew; one that fails ends the chain with what stands.
 

@@ -8,7 +8,7 @@
 #include "projections/parallel_radius.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 void TWconic_c(double e, double lat0, double lat1, double lat2, double* n, double* G, double* rho0,
                double* C0, double* C2, double* C4, double* C6, double* C8, double* D2, double* D4,
@@ -83,7 +83,7 @@ void TWconic_s(double e, double k0, double n, double G, double C0, double C2, do
     const double c = std::cos(lat);
     const double arc = C0 * lat + series.sum(2 * c * s, square(c) - square(s));
     const double k = (G - arc) * n / parallel_radius(e2, s, c);
-    // Wanted: h is 1 and the product carries k0 once.
+    // By contract: h is 1 and the product carries k0 once.
     out[i] = {k * k0, k0, k * k0};
   }
 }

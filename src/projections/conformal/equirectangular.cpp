@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 void TWcyl_eqr_c(double lat1, double* cos_lat1, TWstatus* status) {
   *status = TW_SUCCESS;

@@ -7,11 +7,12 @@
 #include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
-// Beyond these the pole maps onto itself.  Wanted: forward and inverse draw the line differently.
+// Beyond these the pole maps onto itself.  By contract: forward and inverse draw the line
+// differently.
 constexpr double kForwardLatLimit = 1.5707963267938965;
 constexpr double kInverseLatLimit = 1.5707963267947966;
 

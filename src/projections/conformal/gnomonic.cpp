@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -90,7 +90,7 @@ void TWgnomon_i(double lon0, double lat0, double cos_lat0, double sin_lat0, int3
       }
       lat = std::asin(sin_c * y * cos_lat0 / rho + cos_c * sin_lat0);
     }
-    // Wanted: one of the two corrections only, both strict.
+    // By contract: one of the two corrections only, both strict.
     if (lon > kPi) {
       lon -= kTwoPi;
     } else if (lon < -kPi) {

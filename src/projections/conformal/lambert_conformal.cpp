@@ -9,7 +9,7 @@
 #include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -44,7 +44,7 @@ double latitude_of(double e, double w, TWstatus* status) {
     old = lat;
     lat = next_latitude(e, w, old);
     if (++passes == kMostPasses) {
-      // Wanted: a point that comes to rest in this very pass is told so too.
+      // By contract: a point that comes to rest in this very pass is told so too.
       *status = TW_I_LATITUDE_LIMITED;
       break;
     }

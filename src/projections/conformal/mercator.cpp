@@ -7,7 +7,7 @@
 #include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

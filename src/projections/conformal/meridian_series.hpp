@@ -1,14 +1,14 @@
 // Meridian arc of the ellipsoid of unit semi-major axis, and the latitude at an arc, by series.
 // Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), eq. 3-21, 3-26.
-// Wanted: the arc's terms in e^8 are not those of the full expansion.  On the earth's ellipsoids
-// that makes up to 1.5e-10, a millimetre.
+// By contract: the arc's terms in e^8 are not those of the full expansion.  On the earth's
+// ellipsoids that makes up to 1.5e-10, a millimetre.
 #pragma once
 
 #include <cmath>
 
 #include "foundation/numeric.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // arc(p) = a0 p - a2 sin 2p + a4 sin 4p - a6 sin 6p + a8 sin 8p.
 struct ArcSeries {
@@ -83,4 +83,4 @@ struct ArcConstants {
   }
 };
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

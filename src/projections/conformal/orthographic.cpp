@@ -7,7 +7,7 @@
 #include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -115,7 +115,7 @@ void TWortho_i(double /*a*/, double e, double lon0, double lat0, double x0, doub
       const CoordinateTriple geocentric = {x0 + r[0] * x + r[3] * y + r[6] * z,
                                            y0 + r[1] * x + r[4] * y + r[7] * z,
                                            z0 + r[2] * x + r[5] * y + r[8] * z};
-      // Wanted: the caller's word, so that one left by an earlier point does not survive.
+      // By contract: the caller's word, so that one left by an earlier point does not survive.
       TWxyz_to_llh(1.0, e, 1, &geocentric, &llh, status);
       const Offset d = origin.offset(llh.x, std::sin(llh.y), std::cos(llh.y));
       const double dz = d.along(r, 2) - z;
@@ -149,12 +149,13 @@ void TWortho_s(double lon0, double lat0, double /*k0*/, int32_t count, const Coo
     const double lon = in[i].x;
     double lat = in[i].y;
     if (lat > kHalfPi || lat < -kHalfPi) {
-      *status = TW_BAD_LATITUDE;  // Wanted: h stays that of the previous point, 0 at the first.
+      *status =
+          TW_BAD_LATITUDE;  // By contract: h stays that of the previous point, 0 at the first.
     } else {
       lat = hold_off_poles(lat, 1e-10);
       h = std::cos(lon - lon0) * std::cos(lat) * cos_lat0 + std::sin(lat) * sin_lat0;
     }
-    // Wanted: k0 has no part in it.
+    // By contract: k0 has no part in it.
     out[i] = {1.0, h, h};
   }
 }

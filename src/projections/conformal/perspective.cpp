@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -239,7 +239,7 @@ void TWpersp_f(double a, double e, double lon0, double lat0, double h0, double h
 void TWpersp_i(double a, double e, double lon0, double lat0, double h0, double h, double p,
                double phi_g, double tilt_a, double tilt_b, double rot, int32_t count,
                CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  // Wanted: the rotation is undone in the caller's input array.
+  // By contract: the rotation is undone in the caller's input array.
   if (turns(rot)) rotate(-(rot - kPi), count, in);
   const CoordinateTriple* upright = in;
   if (tilt_a != 0 || tilt_b != 0) {

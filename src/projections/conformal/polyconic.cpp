@@ -7,7 +7,7 @@
 #include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -118,7 +118,7 @@ void TWpolycon_i(double e, double lon0, double m0, int32_t count, const Coordina
       }
       lat = next;
     }
-    // Wanted: the longitude belongs to the latitude before the last step.
+    // By contract: the longitude belongs to the latitude before the last step.
     const bool at_pole = std::fabs(std::fabs(lat) - kHalfPi) < 1e-9;
     out[i].x = at_pole ? lon0 : std::asin(x * C) / s + lon0;  // not wrapped
     out[i].y = next;
@@ -137,7 +137,7 @@ void TWpolycon_s(double e, double lon0, double k0, int32_t count, const Coordina
     double lat = in[i].y;
     if (lat > kHalfPi || lat < -kHalfPi) {
       *status = TW_BAD_LATITUDE;
-      // Wanted: the point repeats the values of the last good one, zeros where there is none.
+      // By contract: the point repeats the values of the last good one, zeros where there is none.
       out[i] = {k0, h, product};
       continue;
     }

@@ -8,7 +8,7 @@
 #include "projections/conformal/state_plane_zones.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

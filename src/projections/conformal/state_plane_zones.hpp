@@ -7,7 +7,7 @@
 
 #include <cstdint>
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // What projects a zone, in the values that the zone functions hand out.
 enum ZoneType : int16_t { kOmerc = -1, kTm = 0, kLcc = 1 };
@@ -287,4 +287,4 @@ inline constexpr StatePlaneZone kZones1983[] = {
 
 // clang-format on
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

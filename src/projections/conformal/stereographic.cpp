@@ -9,7 +9,7 @@
 #include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -135,8 +135,8 @@ void oblique_inverse(double e, double lon0, double lat0, double m0, double chi0,
       *status = TW_BAD_LATITUDE;
       continue;
     }
-    // Wanted: the plain arctangent of the quotient, so that no result lies more than a quarter turn
-    // from lon0, and no wrap.
+    // By contract: the plain arctangent of the quotient, so that no result lies more than a quarter
+    // turn from lon0, and no wrap.
     out[i].x = std::atan(sin_ce * x / (cos_ce * rho * cos_chi0 - sin_ce * y * sin_chi0)) + lon0;
     out[i].y = lat;
   }
@@ -158,7 +158,7 @@ bool latitude_of_tangent(double e, double w, double& lat) {
     lat = next_latitude(e, w, previous);
     ++passes;
   } while (!(std::fabs(lat - previous) <= kEpsilon) && passes < kMostPasses);
-  // Wanted: the count alone decides, also when the last pass did converge.
+  // By contract: the count alone decides, also when the last pass did converge.
   return passes < kMostPasses;
 }
 
@@ -175,8 +175,8 @@ double polar_inverse(double e, double lon0, double lat0, double C, int32_t count
       continue;
     }
     if (C < 0) {
-      // Wanted: the one lon0 of the whole call is negated anew at each point of the south, so that
-      // its sign alternates along the array.
+      // By contract: the one lon0 of the whole call is negated anew at each point of the south, so
+      // that its sign alternates along the array.
       lon0 = -lon0;
       x = -x;
       y = -y;
@@ -230,7 +230,7 @@ void TWstereo_i(double e, double lon0, double lat0, double C, double m0, double 
   } else {
     lon0 = polar_inverse(e, lon0, lat0, C, count, in, out, status);
   }
-  // Wanted: points that were skipped are looked at too, with what the output held.
+  // By contract: points that were skipped are looked at too, with what the output held.
   for (int32_t i = 0; i < count; ++i) {
     if (std::fabs(std::fabs(out[i].y) - kHalfPi) < 2e-12) out[i].x = lon0;
   }
@@ -334,7 +334,7 @@ void TWstereo_sTlat(double e, double lon0, double lat0, double C, double m0, dou
       f_root = excess(root);
       ++passes;
     } while (!(std::fabs(d) <= 1e-9 || f_root == 0) && passes < kMostPasses);
-    // Wanted: the count alone decides, and the result is written all the same.
+    // By contract: the count alone decides, and the result is written all the same.
     if (passes == kMostPasses || std::fabs(root) > kHalfPi) *status = TW_RANGE_ERROR;
   }
   *lat_ts = C == 0 ? std::fabs(root - lat0) : root;

@@ -9,7 +9,7 @@
 #include "projections/conformal/meridian_series.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -216,7 +216,7 @@ void TWt_merc_f(double e, double lon0, double A0, double A2, double A4, double A
   for (int32_t i = 0; i < count; ++i) {
     double lon = in[i].x;
     double lat = in[i].y;
-    // Wanted: it is the longitude itself that is snapped, not its difference from lon0.
+    // By contract: it is the longitude itself that is snapped, not its difference from lon0.
     if (std::fabs(lon) < 1e-12) lon = 0;
     if (std::fabs(lat) < 1e-12) lat = 0;
     const LatitudeTerms p(ep2, lat);
@@ -266,7 +266,7 @@ void TWt_merc_s(double e, double k0, double lon0, int32_t count, const Coordinat
   const double ep2 = e2 / (1 - e2);
   for (int32_t i = 0; i < count; ++i) {
     const double lat = in[i].y;
-    const double d = in[i].x - lon0;  // Wanted: not wrapped
+    const double d = in[i].x - lon0;  // By contract: not wrapped
     double k = k0;
     if (!near_pole(lat)) {
       k = k0 * series_scale(ep2, LatitudeTerms(ep2, lat), d);
@@ -291,7 +291,7 @@ void TWt_merc_xyk(double e, double lon0, double A0, double A2, double A4, double
     Plane plane = {0, m};
     if (!near_pole(lat)) {
       const double d = in[i].x - lon0;
-      k = k0 * series_scale(ep2, p, d);  // Wanted: on the difference before the wrap
+      k = k0 * series_scale(ep2, p, d);  // By contract: on the difference before the wrap
       plane = series_forward(e2, p, m, wrap_above_then_at_or_below(d));
     }
     out[i] = {plane.x, plane.y, out[i].z * k};

@@ -3,7 +3,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 void TWrslv_utmzone(int16_t zone, double* lon0, TWstatus* status) {
   *status = TW_SUCCESS;

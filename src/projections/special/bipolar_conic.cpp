@@ -6,7 +6,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -76,7 +76,7 @@ void TWbipocc_c(double lon_a, double lat_a, double lat_b, double ab, double z1, 
   const double size = std::sin(z1) / (cone * t1);
   *n = cone;
   *f = size;
-  // Wanted: the two angles are fixed, whatever the arguments.
+  // By contract: the two angles are fixed, whatever the arguments.
   *k = 2 / (1 + std::sin(z1) * tan_power(26 * kDegree, cone) / (std::sin(52 * kDegree) * t1));
   const double cos_d = std::cos(*lon_b - lon_a);
   const double at_a = std::acos((sin_b * cos_a - cos_d * sin_a * cos_b) / sin_ab);

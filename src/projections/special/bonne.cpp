@@ -7,7 +7,7 @@
 #include "projections/special/turns_about.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -115,13 +115,14 @@ void TWbonne_i(double lon0, double lat1, double e, double e2, double c1, double 
 void TWbonne_s(double k0, double lat1, double lon0, double e2, double r0, int32_t count,
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   *status = TW_SUCCESS;
-  // Wanted: on the ellipsoid, too, the scale is that of the sphere, and the argument is discarded.
+  // By contract: on the ellipsoid, too, the scale is that of the sphere, and the argument is
+  // discarded.
   if (e2 != 0) r0 = 1 / std::tan(lat1) + lat1;
   for (int32_t i = 0; i < count; ++i) {
     const double lat = in[i].y;
     const double d = wrap_turns_below_then_above(in[i].x - lon0);
     double h = 1;
-    // Wanted: a latitude is tested only off the central meridian and the standard parallel.
+    // By contract: a latitude is tested only off the central meridian and the standard parallel.
     if (std::fabs(d) > kNearZero && std::fabs(lat - lat1) > kNearZero) {
       if (std::fabs(lat) - kHalfPi > kNearZero) {
         *status = TW_BAD_LATITUDE;

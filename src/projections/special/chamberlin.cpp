@@ -9,7 +9,7 @@
 #include "tidewater/lines.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

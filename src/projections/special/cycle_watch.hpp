@@ -4,7 +4,7 @@
 #include <cstdint>
 #include <limits>
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // Brent, An improved Monte Carlo factorization algorithm, BIT 20 (1980): a value is kept for twice
 // as many passes each time, so that a cycle of any length is seen, and one that converges is not.
@@ -26,4 +26,4 @@ class CycleWatch {
   uint64_t span_ = 1;
 };
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -6,7 +6,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -32,7 +32,7 @@ void TWeckertIV_c(double lat0, double* y0, TWstatus* status) {
   do {
     step = newton_step(t, target);
     t += step;
-  } while (step > 1e-12);  // Wanted: a negative step of any size ends the loop
+  } while (step > 1e-12);  // By contract: a negative step of any size ends the loop
   *y0 = std::sin(t) * std::sqrt(kYSquare) * 2;
 }
 
@@ -53,7 +53,8 @@ void TWeckertIV_f(double lon0, double y0, int32_t count, const CoordinateTriple*
       t += step;
       ++passes;
     } while (!(std::fabs(step) <= 1e-12) && passes < kMostPasses);
-    // Wanted: also where the last step was small enough; and for a latitude that is not a number.
+    // By contract: also where the last step was small enough; and for a latitude that is not a
+    // number.
     if (passes == kMostPasses) {
       *status = TW_NOT_CONVERGED;
       return;

@@ -7,7 +7,7 @@
 #include "tidewater/frame.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -67,7 +67,7 @@ void TWind_phed_i(double a, double lon0, double lat0, double c1, double c2, doub
   for (int32_t i = 0; i < count; ++i) {
     const double x = in[i].x;
     const double y = in[i].y;
-    // Wanted: the origin's angles are taken off plane values for the start.
+    // By contract: the origin's angles are taken off plane values for the start.
     double d = (x - lon0) * w;
     double p = (y - lat0) * w;
     double r = 1e10;

@@ -6,7 +6,7 @@
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -103,7 +103,7 @@ void TWJ_to_slopes(int32_t count, const double* jacobians, CoordinateTriple* out
   *status = TW_SUCCESS;
   for (int32_t i = 0; i < count; ++i, jacobians += kRecord) {
     const double t2 = north_slope(jacobians);
-    // Wanted: element 3 and not element 1, the slope of the east-going axis.
+    // By contract: element 3 and not element 1, the slope of the east-going axis.
     const double t1 = std::atan2(jacobians[3], jacobians[0]);
     out[i] = {t1, t2, t2 - t1};
   }

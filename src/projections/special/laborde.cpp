@@ -7,7 +7,7 @@
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -73,7 +73,7 @@ void TWlabor_i(int16_t mode, double A, double B, double C, double D, int32_t cou
     const double w = 5 * y * x2 * x2 - 10 * x2 * y2 * y + y2 * y2 * y;
     const double z = x2 * x2 * x - 10 * y2 * x2 * x + 5 * x * y2 * y2;
     double X = x - A * u - B * v + D * w + C * z;
-    double Y = B * u + y - A * v - D * z + D * w;  // Wanted: D in the last term, not C
+    double Y = B * u + y - A * v - D * z + D * w;  // By contract: D in the last term, not C
     if (mode == 1) {
       int passes = 0;
       double old_x = 0;
@@ -87,7 +87,7 @@ void TWlabor_i(int16_t mode, double A, double B, double C, double D, int32_t cou
         ++passes;
       } while (!(std::fabs(X - old_x) <= 1e-14 && std::fabs(Y - old_y) <= 1e-14) &&
                passes < kMostPasses);
-      // Wanted: the count alone decides, also where the last pass did converge.
+      // By contract: the count alone decides, also where the last pass did converge.
       if (passes == kMostPasses) *status = TW_NOT_CONVERGED;
     }
     out[i].x = X;
@@ -103,7 +103,8 @@ void TWlabor_s(double k0, double A, double B, int32_t count, const CoordinateTri
     const double q = in[i].x;
     const double r = p * p - q * q;
     const double s = 2 * p * q;
-    // Wanted: the constant of the cubic is B + i A here, while the forward formula has A + i B.
+    // By contract: the constant of the cubic is B + i A here, while the forward formula has A + i
+    // B.
     const double g = modulus(3 * (B * r - A * s) + 1, 3 * (A * r + B * s));
     const double k = out[i].z * g * k0;
     out[i] = {k, k, k * k};
@@ -147,7 +148,7 @@ void TWlaborde_s(double e, double lon0, double c, double t, double R, double A0,
                  double A4, double A6, double A8, double M0, double A, double B, double k0,
                  int32_t count, CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   TWg_schreiber(e, lon0, c, t, R, A0, A2, A4, A6, A8, M0, k0, count, in, out, status);
-  // Wanted: whatever the word.
+  // By contract: whatever the word.
   for (int32_t i = 0; i < count; ++i) {
     out[i].x *= R;
     out[i].y *= R;

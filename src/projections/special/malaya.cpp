@@ -6,7 +6,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -82,7 +82,7 @@ void TWmalaya_i(const double* table, double lon0, double lat0, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   *status = TW_SUCCESS;
   for (int32_t i = 0; i < count; ++i) {
-    // Wanted: metres, not units of the semi-major axis.
+    // By contract: metres, not units of the semi-major axis.
     const double x = in[i].x / kMetresPerChain;
     const double y = in[i].y / kMetresPerChain;
     const double X = 0.8 * y - 0.6 * x + 24000.0;

@@ -7,7 +7,7 @@
 #include "projections/special/cycle_watch.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 

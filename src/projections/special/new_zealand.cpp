@@ -9,7 +9,7 @@
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -67,7 +67,8 @@ void TWn_zeal_c(double e, double lat0, double* y0, TWstatus* status) {
 void TWn_zeal_f(double e, double lon0, double /*unused*/, double y0, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   TWmerc_f(e, lon0, y0, count, in, out, status);
-  // Wanted: a point that was skipped is taken through the polynomial with what its output holds.
+  // By contract: a point that was skipped is taken through the polynomial with what its output
+  // holds.
   for (int32_t i = 0; i < count; ++i) {
     const Complex w = polynomial({out[i].y, out[i].x});
     out[i].x = w.im;
@@ -79,7 +80,8 @@ void TWn_zeal_i(double e, double lon0, double /*unused*/, double y0, int32_t cou
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   for (int32_t i = 0; i < count; ++i) {
     Complex z = {};
-    // Wanted: an iteration that ran out is not told, since the Mercator inverse sets the word anew.
+    // By contract: an iteration that ran out is not told, since the Mercator inverse sets the word
+    // anew.
     solve({in[i].y, in[i].x}, z);
     out[i].x = z.im;
     out[i].y = z.re;
@@ -105,7 +107,7 @@ void TWn_zeal_s(double e, double lon0, double /*unused*/, double y0, double k0, 
       TWmerc_f(e, lon0, y0, 1, &mercator, &mercator, &word);
       if (!TW_OK(word)) *status = word;
       const double g = modulus(gradient({mercator.y, lon - lon0}));
-      // Wanted: k0 does not enter here.
+      // By contract: k0 does not enter here.
       k = std::sqrt(1 - e2 * square(std::sin(lat))) * g / std::cos(lat);
     }
     out[i] = {k, k, k * k};

@@ -9,7 +9,7 @@
 #include "tidewater/lines.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -154,7 +154,7 @@ void TWo_lam_i(double e, double lon0, double lat_r, double C, double n_cone, dou
                double s_lon, double s_lat, double turn, double offset, double g_c, double g_t,
                int32_t count, CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   *status = TW_SUCCESS;
-  turn_points(turn, count, in);  // Wanted: in the caller's input array.
+  turn_points(turn, count, in);  // By contract: in the caller's input array.
   TWstatus word = TW_SUCCESS;
   TWlam_i(0, lon0, C, n_cone, rho0, count, out, in, &word);
   if (!carry(word, status)) return;
@@ -174,7 +174,8 @@ void TWo_lam_s(double e, double k0, double lon0, double lat_r, double C, double 
                double s_lon, double s_lat, double offset, double g_c, double g_t, int32_t count,
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   *status = TW_SUCCESS;
-  // Wanted: the longitudes on the sphere stay relative to lon0, unlike in the forward function.
+  // By contract: the longitudes on the sphere stay relative to lon0, unlike in the forward
+  // function.
   const CoordinateTriple* points =
       to_turned_sphere(e, lon0, 0, lat_r, s_lon, s_lat, offset, g_c, g_t, count, in, out, status);
   if (!points) return;

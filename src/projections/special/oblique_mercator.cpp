@@ -7,7 +7,7 @@
 #include "projections/special/cycle_watch.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -78,7 +78,8 @@ bool solve_two_points(double e, double lon1, double lat1, double lon2, double la
   const double J = (k.E * k.E - L * H) / (k.E * k.E + L * H);
   if (L + H == 0) return false;
   const double P = (L - H) / (L + H);
-  // Wanted: the mean is of the longitudes as they came, also where their difference was wrapped.
+  // By contract: the mean is of the longitudes as they came, also where their difference was
+  // wrapped.
   k.lon0 = (lon1 + lon2) / 2 - std::atan(std::tan(k.B * dl / 2) * J / P) / k.B;
   const double d = wrap_above_then_below(lon1 - k.lon0);
   k.gamma0 = std::atan(std::sin(k.B * d) / G);
@@ -137,11 +138,11 @@ void TWo_merc_uv_k(double e, double /*alpha*/, double gamma0, double lon0, doubl
       const double V = std::sin(B * dl);
       const double U = (sin_g * S - cos_g * V) / T;
       if (std::fabs(std::fabs(U) - 1) < kUnitMargin) {
-        *status = TW_RANGE_ERROR;  // Wanted: u and v of the point before are written
+        *status = TW_RANGE_ERROR;  // By contract: u and v of the point before are written
       } else {
         v = std::log((1 - U) / (1 + U)) * A / 2 / B;
         const double c = std::cos(B * dl);
-        // Wanted: the second form multiplies by B.
+        // By contract: the second form multiplies by B.
         u = std::fabs(c) >= 1e-10 ? std::atan2(cos_g * S + sin_g * V, c) * A / B : dl * A * B;
       }
     } else {
@@ -175,7 +176,7 @@ void TWo_merc_f(double e, double alpha, double gamma0, double lon0, double E, do
                 int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                 TWstatus* status) {
   TWo_merc_uv_k(e, alpha, gamma0, lon0, E, B, A, 0, count, in, out, status);
-  // Wanted: one failing point leaves the whole array in skew coordinates.
+  // By contract: one failing point leaves the whole array in skew coordinates.
   if (*status == TW_SUCCESS) TWo_merc_rot(alpha, count, out, out, status);
 }
 

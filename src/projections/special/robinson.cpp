@@ -7,7 +7,7 @@
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -95,7 +95,8 @@ void TWrobin_i(const double* knots, const double* y_coef, const double* x_coef, 
     uint32_t flag = 0;
     double lat = TWrobin_csinv(std::fabs(distance), knots, y_coef, kKnots, &flag);
     if (flag == 2) {
-      // Wanted: a distance beyond the table fails also where it gives a latitude short of the pole.
+      // By contract: a distance beyond the table fails also where it gives a latitude short of the
+      // pole.
       if (!(kHalfPi < lat && lat < kHalfPi + kPoleMargin)) {
         *status = TW_BAD_LATITUDE;
         return;
@@ -137,7 +138,7 @@ void TWrobin_s(const double* knots, const double* y_coef, const double* x_coef, 
     const double k = f / parallel * length;
     const double d = turns_about(lon0, in[i].x) - lon0;
     const double h = f / meridian * std::sqrt(d * d * dx * dx + dy * dy * 2.5389738922523355);
-    // Wanted: k0 does not enter the areal scale.
+    // By contract: k0 does not enter the areal scale.
     const double areal = square(radius) * 1.147724155061458 / meridian / parallel * dy * length;
     out[i] = {k, h, areal};
   }

@@ -5,7 +5,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -28,7 +28,7 @@ void TWrotgrat_f(double lon0, double /*lat0*/, double pole_lon, double pole_lat,
                  TWstatus* status) {
   *status = TW_SUCCESS;
   if (std::fabs(pole_lat - kHalfPi) < kPoleMargin) {
-    // Wanted: nothing moves, and the offset is not applied either.
+    // By contract: nothing moves, and the offset is not applied either.
     for (int32_t i = 0; i < count; ++i) {
       const double lon = in[i].x;
       const double lat = in[i].y;
@@ -67,7 +67,7 @@ void TWrotgrat_f(double lon0, double /*lat0*/, double pole_lon, double pole_lat,
   }
 }
 
-// Wanted: no shortcut for a pole that stands at pi/2, unlike the forward function.
+// By contract: no shortcut for a pole that stands at pi/2, unlike the forward function.
 void TWrotgrat_i(double lon0, double /*lat0*/, double pole_lon, double pole_lat, double offset,
                  int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                  TWstatus* status) {

@@ -8,7 +8,7 @@
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -99,7 +99,7 @@ void TWsinusoidal_s(double k0, double lon0, double e2, int32_t count, const Coor
     } else {
       h = std::sqrt(d * d * sin_lat * sin_lat + 1);
     }
-    // Wanted: the scale along the parallel is k0 everywhere.
+    // By contract: the scale along the parallel is k0 everywhere.
     out[i] = {k0, k0 * h, k0 * k0 * areal};
   }
 }

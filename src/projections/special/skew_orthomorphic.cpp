@@ -6,7 +6,7 @@
 #include "projections/isometric_latitude.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -30,7 +30,7 @@ void TWrso_c(double e, double lon_c, double lat_c, double skew, double* A, doubl
   *A = std::sqrt(nu * rho) * *B;
   const double psi = isometric_latitude(e, lat_c);
   const double r = *A / nu / c;
-  // Wanted: r below 1, near the equator, is not tested for.
+  // By contract: r below 1, near the equator, is not tested for.
   *C = std::log(std::sqrt(r * r - 1) + r) - *B * psi;
   const double W = *B * psi + *C;
   if (std::fabs(W) > kHyperbolicLimit) {

@@ -9,7 +9,7 @@
 #include "foundation/numeric.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -255,7 +255,8 @@ void TWsom_f(int16_t orbit, int16_t side, int16_t n_terms, double lon_n, double 
     for (int passes = 0; std::fabs(previous - L) > 1e-10;) {
       previous = L;
       if (++passes > 50) {
-        *status = TW_I_LATITUDE_LIMITED;  // Wanted: the point is completed from the last values
+        *status =
+            TW_I_LATITUDE_LIMITED;  // By contract: the point is completed from the last values
         break;
       }
       E = series.orbit.eccentric_anomaly(L);
@@ -303,7 +304,8 @@ void TWsom_i(int16_t n_terms, double lon_n, double e, double inc, double P, doub
   for (int32_t i = 0; i < count; ++i) {
     double X = axes == 1 ? in[i].x : -in[i].y;
     double Y = axes == 1 ? in[i].y : in[i].x;
-    if (std::fabs(a0) < kSteady) {  // Wanted: strict here, and not where the branch is taken below
+    if (std::fabs(a0) <
+        kSteady) {  // By contract: strict here, and not where the branch is taken below
       const double x = X;
       X = (m_sin * x - m_cos * Y) / D;
       Y = (m_sin * Y + m_cos * x) / D;
@@ -315,7 +317,8 @@ void TWsom_i(int16_t n_terms, double lon_n, double e, double inc, double P, doub
     for (int passes = 0; std::fabs(previous - L) > 1e-10;) {
       previous = L;
       if (++passes > 50) {
-        *status = TW_I_LATITUDE_LIMITED;  // Wanted: the point is completed from the last values
+        *status =
+            TW_I_LATITUDE_LIMITED;  // By contract: the point is completed from the last values
         break;
       }
       if (passes > 1) t = series.at(L, series.orbit.rate(series.orbit.eccentric_anomaly(L)));

@@ -5,7 +5,7 @@
 
 #include "foundation/numeric.hpp"
 
-namespace tidewater {
+namespace tidewater::detail {
 
 // Adds whole turns to lon until lon - lon0 lies in [-pi, pi]; a difference of exactly pi or -pi
 // stays.  Differences too large to be worked off in steps are brought near by a remainder.
@@ -21,4 +21,4 @@ inline double turns_about(double lon0, double lon) {
   return add_turns_while(lon, -kTwoPi, [lon0](double v) { return v - lon0 > kPi; });
 }
 
-}  // namespace tidewater
+}  // namespace tidewater::detail

@@ -6,7 +6,7 @@
 #include "projections/special/cycle_watch.hpp"
 #include "tidewater/special.h"
 
-using namespace tidewater;
+using namespace tidewater::detail;
 
 namespace {
 
@@ -50,7 +50,7 @@ double latitude_of(double X, double Y, TWstatus* status) {
     p -= F / D;
     if (watch.seen(p)) break;
   }
-  return previous;  // Wanted: the last step is not applied
+  return previous;  // By contract: the last step is not applied
 }
 
 struct Partials {
