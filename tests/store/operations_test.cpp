@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <cmath>
 #include <fstream>
 #include <iterator>
@@ -247,6 +248,22 @@ TEST_F(StoreOperations, AnOpenStoreStaysAsItWasRead) {
   OLB7R3_PF_reset_table("t");
   std::filesystem::resize_file(path, 100);
   EXPECT_EQ(names().size(), 5u);
+}
+
+TEST_F(StoreOperations, AStoreMayBeReplacedWhileItIsOpened) {
+  const std::string path = sources_.build();
+  std::atomic<bool> done = false;
+  std::thread builder([&] {
+    while (!done) sources_.build();
+  });
+  for (int i = 0; i < 300; ++i) {
+    const OpenStore open(path);
+    EXPECT_EQ(open.word, TW_STORE_SUCCESS);
+    OLB7R3_PF_reset_table("t");
+    EXPECT_EQ(names().size(), 5u);
+  }
+  done = true;
+  builder.join();
 }
 
 TEST_F(StoreOperations, ManyThreadsShareAStore) {
