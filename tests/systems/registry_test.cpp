@@ -757,7 +757,7 @@ TEST_F(RegistryStores, CutShortAreRefused) {
   std::ifstream in(TIDEWATER_STORE, std::ios::binary);
   const std::string whole{std::istreambuf_iterator<char>(in), {}};
   for (std::size_t tenths = 0; tenths < 10; ++tenths) {
-    for (const std::size_t more : {0, 1, 4095}) {
+    for (const std::size_t more : {0U, 1U, 4095U}) {
       folder_.write("cut", whole.substr(0, whole.size() / 10 * tenths + more));
       EXPECT_NE(refused(path("cut")).find("cut"), std::string::npos) << tenths;
     }
