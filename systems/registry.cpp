@@ -133,7 +133,10 @@ struct Key {
   std::string key;
   bool later;
   int code;
-  auto operator<=>(const Key&) const = default;
+
+  bool operator<(const Key& other) const {
+    return std::tie(key, later, code) < std::tie(other.key, other.later, other.code);
+  }
 };
 
 // What a search goes through.
@@ -826,7 +829,11 @@ std::vector<Found> Registry::search(std::string_view words, std::size_t limit) c
     bool alias;
     bool other_kind;
     int code;
-    auto operator<=>(const Rank&) const = default;
+
+    bool operator<(const Rank& other) const {
+      return std::tie(match, alias, other_kind, code) <
+             std::tie(other.match, other.alias, other.other_kind, other.code);
+    }
   };
   std::vector<Rank> ranks;
   for (const Entry& entry : tables_->names().entries) {
