@@ -3,14 +3,14 @@
 // pp. 118-120.
 #pragma once
 
-#include "formulas/number.hpp"
+#include "points/elementary.hpp"
 
 namespace tidewater::points {
 
 // c[0] + c[1] x + ... + c[N - 1] x^(N - 1)
 template <int N, class V>
 TW_INLINE V polynomial(const double (&c)[N], V x) {
-  V sum = x * 0.0 + c[N - 1];
+  V sum = c[N - 1];
   for (int k = N - 2; k >= 0; --k) sum = sum * x + c[k];
   return sum;
 }
@@ -25,8 +25,8 @@ TW_INLINE SinCos<V> twice(SinCos<V> at) {
 template <int N, class C, class V>
 TW_INLINE V sine_series(const C (&c)[N], SinCos<V> x) {
   const V step = 2.0 * x.cos;
-  V next = x.cos * 0.0;
-  V sum = next + c[N - 1];
+  V next = 0.0;
+  V sum = c[N - 1];
   for (int k = N - 2; k >= 0; --k) {
     const V before = step * sum - next + c[k];
     next = sum;
@@ -39,8 +39,8 @@ TW_INLINE V sine_series(const C (&c)[N], SinCos<V> x) {
 template <int N, class C, class V>
 TW_INLINE V cosine_series(const C (&c)[N], SinCos<V> x) {
   const V step = 2.0 * x.cos;
-  V next = x.cos * 0.0;
-  V sum = next + c[N - 1];
+  V next = 0.0;
+  V sum = c[N - 1];
   for (int k = N - 2; k >= 0; --k) {
     const V before = step * sum - next + c[k];
     next = sum;
@@ -66,11 +66,11 @@ template <bool Slope, int N, class V>
 TW_INLINE ComplexSums<V> complex_sine_series(const double (&c)[N], ComplexOf<V> sin,
                                              ComplexOf<V> cos) {
   const ComplexOf<V> step = {2.0 * cos.re, 2.0 * cos.im};
-  const V zero = cos.re * 0.0;
+  const V zero = 0.0;
   ComplexOf<V> next = {zero, zero};
-  ComplexOf<V> sum = {zero + c[N - 1], zero};
+  ComplexOf<V> sum = {V(c[N - 1]), zero};
   ComplexOf<V> slope_next = {zero, zero};
-  ComplexOf<V> slope_sum = {zero + N * c[N - 1], zero};
+  ComplexOf<V> slope_sum = {V(N * c[N - 1]), zero};
   for (int k = N - 2; k >= 0; --k) {
     const ComplexOf<V> before = {step.re * sum.re - step.im * sum.im - next.re + c[k],
                                  step.re * sum.im + step.im * sum.re - next.im};
