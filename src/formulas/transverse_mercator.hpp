@@ -6,53 +6,10 @@
 // each other, at complex arguments).
 #pragma once
 
-<<<<<<< HEAD
-#include <cmath>
-
-=======
->>>>>>> exact
 #include "formulas/latitudes.hpp"
 
 namespace tidewater::points {
 
-<<<<<<< HEAD
-template <class V>
-struct PlanePoint {
-  V x, y;
-};
-
-// Scale relative to that on the central meridian and convergence: the bearing of grid north,
-// clockwise from true north, in radians.
-template <class V>
-struct ScaleAndConvergence {
-  V scale, convergence;
-};
-
-struct TransverseMercator {
-  // Farther from the central meridian than this, on the transverse sphere in radians, the series
-  // lose their digits: 3,900 km are 0.6113.
-  static constexpr double kLargestEasting = 0.6125;
-  static constexpr double kLargestFlattening = 0.01;
-
-  double radius;         // of the rectifying sphere times the scale on the central meridian
-  double central_scale;  // k0 radius of the sphere through the equator's curvature
-  double e2;
-  double sinh_limit;
-  double eccentric[9];  // e artanh(e s) = s sum of eccentric[j] s^(2 j)
-  double alpha[8], beta[8];
-  LatitudeSeries to_geodetic;
-  double a_k0;
-
-  TransverseMercator(double a, double f, double k0)
-      : radius(k0 * rectifying_radius(a, f)),
-        central_scale(k0),
-        e2(f * (2 - f)),
-        sinh_limit(std::sinh(kLargestEasting)),
-        to_geodetic(kGeodeticFromConformal, third_flattening(f)),
-        a_k0(a * k0) {
-    const LatitudeSeries forward(kRectifyingFromConformal, third_flattening(f));
-    const LatitudeSeries inverse(kConformalFromRectifying, third_flattening(f));
-=======
 struct TransverseMercator {
   // As far from the central meridian as the series keep their digits, in rectifying radii: 3,900 km
   // on the earth.
@@ -75,55 +32,15 @@ struct TransverseMercator {
         alpha(kRectifyingFromConformal, third_flattening(f)),
         beta(kConformalFromRectifying, third_flattening(f)),
         to_geodetic(kGeodeticFromConformal, third_flattening(f)) {
->>>>>>> exact
     double power = 1;
     for (int j = 0; j < 9; ++j) {
       power *= e2;
       eccentric[j] = power / (2 * j + 1);
     }
-<<<<<<< HEAD
-    for (int j = 0; j < 8; ++j) {
-      alpha[j] = forward.c[j];
-      beta[j] = inverse.c[j];
-    }
-=======
->>>>>>> exact
   }
 
   template <class V>
   struct Forward {
-<<<<<<< HEAD
-    PlanePoint<V> point;
-    ScaleAndConvergence<V> distortion;  // left at zero unless asked for
-    decltype(V() < V()) plain;          // within the series' reach
-  };
-
-  // lon from the central meridian.  y counts from the equator.
-  template <bool Distortion, class V>
-  TW_INLINE Forward<V> forward(V lon, V lat) const {
-    const auto phi = sincos(lat);
-    const auto lambda = sincos(lon);
-    // The conformal latitude's sine and cosine times one factor: its sine is p, its cosine cos phi,
-    // before both are divided by their hypotenuse.
-    const V small = phi.sin * polynomial(eccentric, phi.sin * phi.sin);
-    const V small2 = small * small;
-    const V sigma = small * (1.0 + small2 * (1.0 / 6) * (1.0 + small2 * (1.0 / 20)));
-    const V root = sqrt(1.0 + sigma * sigma);
-    const V p = phi.sin * root - sigma;
-    const V q = phi.cos * lambda.cos;
-    const V r = phi.cos * lambda.sin;
-    // xi' = atan2(p, q), eta' = arsinh(r / h)
-    const V h2 = p * p + q * q;
-    const V whole2 = h2 + r * r;
-    const auto plain = abs(r) <= sinh_limit * sqrt(h2);
-    const V safe2 = select(plain, h2, whole2 * 0.0 + 1.0);
-    const V h = sqrt(safe2);
-    const V whole = sqrt(whole2);
-    const V by = 1.0 / safe2;
-    const V xi = atan2(p, q);
-    const V sinh = select(plain, r, r * 0.0) / h;
-    const V eta = asinh(sinh);
-=======
     V x, y;
     Mask<V> plain;         // within the series' reach
     V scale, convergence;  // of the plane; only where they are asked for
@@ -151,27 +68,10 @@ struct TransverseMercator {
     const V h = sqrt(h2);
     const V xi = atan2(p, q);
     const V eta = asinh(select(near, r * h * by, 0.0));
->>>>>>> exact
     const V sin2 = 2.0 * (p * q) * by;
     const V cos2 = (q - p) * (q + p) * by;
     const V sinh2 = 2.0 * (r * whole) * by;
     const V cosh2 = 1.0 + 2.0 * (r * r) * by;
-<<<<<<< HEAD
-    const ComplexOf<V> sine = {sin2 * cosh2, cos2 * sinh2};
-    const ComplexOf<V> cosine = {cos2 * cosh2, -sin2 * sinh2};
-    const auto sums = complex_sine_series<Distortion>(alpha, sine, cosine);
-    Forward<V> out = {};
-    out.point = {radius * (eta + sums.sine.im), radius * (xi + sums.sine.re)};
-    out.plain = plain;
-    if constexpr (Distortion) {
-      const V re = 1.0 + 2.0 * sums.slope.re;
-      const V im = 2.0 * sums.slope.im;
-      // The conformal sphere's own: tan gamma' = tan lambda sin chi, and on the ellipsoid's sphere
-      // k' = 1 / cosh eta' cos chi.
-      const V cos_chi_by = whole / (phi.cos * phi.cos + p * p);
-      out.distortion = distortion(p * lambda.sin, lambda.cos * whole, re, im, phi, whole, h);
-      (void)cos_chi_by;
-=======
     const auto sums =
         complex_sine_series<Distortion>(alpha.c, ComplexOf<V>{sin2 * cosh2, cos2 * sinh2},
                                         ComplexOf<V>{cos2 * cosh2, -(sin2 * sinh2)});
@@ -187,15 +87,11 @@ struct TransverseMercator {
       const V along = lambda.cos * whole;
       out.convergence = atan2(across * re - along * im, along * re + across * im);
       out.scale = scale_factor * sqrt((re * re + im * im) * (1.0 - e2 * (phi.sin * phi.sin)) * by);
->>>>>>> exact
     }
     return out;
   }
 
   template <class V>
-<<<<<<< HEAD
-  TW_INLINE ScaleAndConvergence<V> distortion(V, V, V, V, SinCos<V>, V, V) const;
-=======
   struct Inverse {
     V lon, lat;
     Mask<V> plain;
@@ -246,7 +142,6 @@ struct TransverseMercator {
         atan2(moved.sin, across) + to_geodetic.correction(SinCos<V>{moved.sin * by, across * by});
     return out;
   }
->>>>>>> exact
 };
 
 }  // namespace tidewater::points
