@@ -89,7 +89,13 @@ std::span<const T> values_of(TIFF* tiff, std::uint32_t tag, TIFFDataType type) {
   return {static_cast<const T*>(data), count};
 }
 
+// Other users of libtiff in the process may have told it of the tag, with no count beside it.
 std::string text_of(TIFF* tiff, std::uint32_t tag) {
+  const TIFFField* const field = TIFFFindField(tiff, tag, TIFF_ANY);
+  if (field && TIFFFieldDataType(field) == TIFF_ASCII && !TIFFFieldPassCount(field)) {
+    const char* text = nullptr;
+    return TIFFGetField(tiff, tag, &text) && text ? text : "";
+  }
   const auto text = values_of<char>(tiff, tag, TIFF_ASCII);
   return {text.begin(), std::find(text.begin(), text.end(), '\0')};
 }
