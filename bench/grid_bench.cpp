@@ -10,6 +10,7 @@
 #include "harness.hpp"
 #include "support/grids.hpp"
 #include "tidewater/datum.h"
+#include "tidewater/grids.hpp"
 
 using namespace tidewater::bench;
 namespace fs = std::filesystem;
@@ -145,10 +146,61 @@ void add_geoid() {
   }
 }
 
+// The systems layer's objects, which take degrees, on the same points.
+template <class Grid, class Call>
+Kernel object_kernel(std::shared_ptr<Grid> grid, std::vector<CoordinateTriple> points, Call call) {
+  for (CoordinateTriple& p : points) p = {p.x / kDegree, p.y / kDegree, p.z};
+  return [grid, points, out = points, call]() mutable {
+    call(*grid, tidewater::Coordinates<const double>{&points[0].x, &points[0].y, &points[0].z, 3},
+         tidewater::Coordinates<double>{&out[0].x, &out[0].y, &out[0].z, 3});
+    keep(out.back().x);
+  };
+}
+
+void add_objects() {
+  const fs::path proj = "/usr/share/proj";
+  if (fs::exists(proj / "ntf_r93.gsb")) {
+    const auto grid = std::make_shared<tidewater::ShiftGrid>((proj / "ntf_r93.gsb").string());
+    const auto points = box(-4.5, 43, 8, 50, kCall);
+    const char* definition = "+proj=hgridshift +grids=ntf_r93.gsb";
+    const auto forward = [](const auto& g, auto in, auto out) { g.forward(kCall, in, out); };
+    const auto inverse = [](const auto& g, auto in, auto out) { g.inverse(kCall, in, out); };
+    add({"ShiftGrid NTv2 forward, scattered",
+         "PROJ",
+         object_kernel(grid, points, forward),
+         proj_kernel(definition, true, points),
+         {},
+         kCall});
+    add({"ShiftGrid NTv2 inverse, scattered",
+         "PROJ",
+         object_kernel(grid, points, inverse),
+         proj_kernel(definition, false, points),
+         {},
+         kCall});
+  }
+  if (fs::exists(proj / "egm96_15.gtx")) {
+    const auto points = box(-180, -90, 180, 90, kCall);
+    const auto forward = [](const auto& g, auto in, auto out) { g.forward(kCall, in, out); };
+    for (const bool quadratic : {false, true}) {
+      const auto grid = std::make_shared<tidewater::GeoidGrid>(
+          (proj / "egm96_15.gtx").string(), std::vector<std::string>{},
+          quadratic ? tidewater::GeoidGrid::Interpolation::biquadratic
+                    : tidewater::GeoidGrid::Interpolation::bilinear);
+      add({quadratic ? "GeoidGrid biquadratic, scattered" : "GeoidGrid bilinear, scattered",
+           "PROJ (bilinear)",
+           object_kernel(grid, points, forward),
+           proj_kernel("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1", true, points),
+           {},
+           kCall});
+    }
+  }
+}
+
 const Suite suite([] {
   add_nadcon();
   add_national();
   add_geoid();
+  add_objects();
 });
 
 }  // namespace
