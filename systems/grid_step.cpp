@@ -30,6 +30,16 @@ std::string found(const std::string& name, const std::vector<std::string>& folde
   return "";
 }
 
+// "fr_ign_ntf_r93.tif" was "ntf_r93.gsb" before PROJ's grids became GeoTIFF files.
+std::string older_name(const std::string& name) {
+  const auto country = name.find('_');
+  const auto agency = name.find('_', country + 1);
+  if (country == std::string::npos || agency == std::string::npos || !name.ends_with(".tif")) {
+    return "";
+  }
+  return name.substr(agency + 1, name.size() - agency - 5) + ".gsb";
+}
+
 // The registry's grid, or PROJ's form of it, which may hold the shifts the other way.
 struct GridFile {
   std::string path;
@@ -38,8 +48,10 @@ struct GridFile {
 GridFile grid_of(const OperationRecord& operation, const std::vector<std::string>& folders) {
   for (const GridName& grid : operation.grids) {
     if (auto path = found(grid.name, folders); !path.empty()) return {std::move(path)};
-    if (auto path = found(grid.proj_name, folders); !path.empty()) {
-      return {std::move(path), grid.proj_reversed};
+    for (const std::string& name : {grid.proj_name, older_name(grid.proj_name)}) {
+      if (auto path = found(name, folders); !path.empty()) {
+        return {std::move(path), grid.proj_reversed};
+      }
     }
   }
   return {};

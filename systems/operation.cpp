@@ -13,6 +13,7 @@ namespace tidewater::detail {
 namespace {
 
 constexpr int kWgs84 = 4326;
+constexpr int kGreenwich = 8901;
 constexpr int kLongitudeRotation = 9601;
 
 // --- areas --------------------------------------------------------------------------------------
@@ -233,12 +234,51 @@ bool usable(const std::vector<Way>& list, const Area& wanted) {
   });
 }
 
+// The rotation that turns a system's datum to the same one on Greenwich, if there is one.
+std::optional<OperationRecord> rotation_from(int system) {
+  const int datum = datum_of(system);
+  const auto record = Registry::shared().datum(datum);
+  if (!record || record->meridian == kGreenwich || record->meridian == 0) return std::nullopt;
+  for (OperationRecord& operation : Registry::shared().operations(system)) {
+    if (operation.method == kLongitudeRotation && datum_of(operation.source) == datum) {
+      return std::move(operation);
+    }
+  }
+  return std::nullopt;
+}
+
+// By one operation, also from and to the same datum on Greenwich.
+std::vector<Way> turned_ways(int source, int target, const TransformationOptions& options) {
+  std::vector<Way> list = direct_ways(source, target, options);
+  const auto first = rotation_from(source);
+  const auto last = rotation_from(target);
+  const auto append = [&](int from, int to) {
+    for (Way& way : direct_ways(from, to, options)) {
+      if (first && from != source) way = joined(*way_of(*first, false, options), way);
+      if (last && to != target) way = joined(way, *way_of(*last, true, options));
+      list.push_back(std::move(way));
+    }
+  };
+  if (first && datum_of(first->target) == datum_of(target)) {
+    list.push_back(*way_of(*first, false, options));
+  } else if (first) {
+    append(first->target, target);
+  }
+  if (last && datum_of(last->target) == datum_of(source)) {
+    list.push_back(*way_of(*last, true, options));
+  } else if (last) {
+    append(source, last->target);
+  }
+  if (first && last) append(first->target, last->target);
+  return list;
+}
+
 // Ways over a system in between.
 void add_ways_over(int source, int hub, int target, const Area& wanted,
                    const TransformationOptions& options, std::vector<Way>& list) {
-  auto first = direct_ways(source, hub, options);
+  auto first = turned_ways(source, hub, options);
   if (first.empty()) return;
-  auto second = direct_ways(hub, target, options);
+  auto second = turned_ways(hub, target, options);
   if (second.empty()) return;
   rank(first, wanted);
   rank(second, wanted);
@@ -251,32 +291,18 @@ void add_ways_over(int source, int hub, int target, const Area& wanted,
   }
 }
 
-// The system on Greenwich that a system of another prime meridian is turned to, 0 where none is.
-std::optional<Link> rotation_from(int system) {
-  const int datum = datum_of(system);
-  const auto record = Registry::shared().datum(datum);
-  if (!record || record->meridian == 8901 || record->meridian == 0) return std::nullopt;
-  for (const OperationRecord& operation : Registry::shared().operations(system)) {
-    if (operation.method == kLongitudeRotation && datum_of(operation.source) == datum) {
-      return Link{operation, false};
-    }
-  }
-  return std::nullopt;
-}
-
 std::vector<Way> ways_between(int source, int target, const Area& wanted,
                               const TransformationOptions& options) {
-  std::vector<Way> list = direct_ways(source, target, options);
+  std::vector<Way> list = turned_ways(source, target, options);
   if (usable(list, wanted)) return list;
-  if (datum_of(source) != datum_of(kWgs84) && datum_of(target) != datum_of(kWgs84)) {
-    add_ways_over(source, kWgs84, target, wanted, options, list);
-  }
+  const int pivot = datum_of(kWgs84);
+  const bool to_pivot = datum_of(source) == pivot || datum_of(target) == pivot;
+  if (!to_pivot) add_ways_over(source, kWgs84, target, wanted, options, list);
   if (usable(list, wanted)) return list;
   // Any other datum in between.
   const Registry& registry = Registry::shared();
-  std::vector<int> seen = {datum_of(source), datum_of(target), datum_of(kWgs84)};
-  const bool from_source = datum_of(source) != datum_of(kWgs84);
-  const int near = from_source ? source : target;
+  std::vector<int> seen = {datum_of(source), datum_of(target), pivot};
+  const int near = datum_of(source) == pivot ? target : source;
   for (const OperationRecord& operation : registry.operations(near)) {
     const int hub =
         datum_of(operation.source) == datum_of(near) ? operation.target : operation.source;
@@ -284,19 +310,6 @@ std::vector<Way> ways_between(int source, int target, const Area& wanted,
     if (datum == 0 || std::find(seen.begin(), seen.end(), datum) != seen.end()) continue;
     seen.push_back(datum);
     add_ways_over(source, hub, target, wanted, options, list);
-  }
-  if (usable(list, wanted)) return list;
-  // By way of the same datum on Greenwich.
-  if (const auto turn = rotation_from(source)) {
-    const Way first = *way_of(turn->operation, false, options);
-    for (const Way& rest : ways_between(turn->operation.target, target, wanted, options)) {
-      list.push_back(joined(first, rest));
-    }
-  } else if (const auto back = rotation_from(target)) {
-    const Way last = *way_of(back->operation, true, options);
-    for (const Way& rest : ways_between(source, back->operation.target, wanted, options)) {
-      list.push_back(joined(rest, last));
-    }
   }
   return list;
 }
