@@ -17,19 +17,13 @@
 
 namespace tidewater::detail {
 
-// Where a line starts or ends.  `azimuth` is the line's direction there, clockwise from north.
-template <Number V>
-struct LineEnd {
-  SinCos<V> lat;
-  SinCos<V> azimuth;
-};
-
 // The course of a line: what was computed of it.
 template <Number V>
 struct GeodesicArc {
   V length;
   SinCos<V> azimuth1, azimuth2;
-  V area;  // between the line and the equator, counterclockwise positive; if asked for
+  V area;  // between the line and the equator, positive for eastward lines in the north; if asked
+           // for
   Mask<V> plain;
 };
 
@@ -70,6 +64,7 @@ struct Geodesics {
   struct Harmonics {
     V c[6];
 
+    Harmonics() = default;
     TW_INLINE Harmonics(const double (&table)[6][3], V eps) {
       const V eps2 = eps * eps;
       V power = eps;
@@ -160,7 +155,7 @@ struct Geodesics {
   template <Number V>
   struct Line {
     SinCos<V> alpha0, sigma1, omega1, tau1, alpha1;
-    V eps, k2, scale, b11;
+    V eps, scale, b11;
     Harmonics<V> reverted;
   };
 
@@ -183,7 +178,6 @@ struct Geodesics {
             turned(sigma1, b11),
             azimuth1,
             eps,
-            k2,
             b * mean(kGeodesicA1, eps) / (1.0 - eps),
             b11,
             Harmonics<V>(kGeodesicC1Reverted, eps)};
@@ -408,14 +402,14 @@ struct Geodesics {
     const auto first = spherical_start(beta1, beta2, given.lambda12);
     const V sine = plain_hypot(first.sin, first.cos);
     const V cosine = beta1.sin * beta2.sin + beta1.cos * beta2.cos * given.lambda12.cos;
-    auto plain = (given.lambda12.sin > 1e-9) & (beta1.cos > 1e-9) & (beta1.sin < -1e-6) &
-                 (sine > 1e-7) & ((cosine > -0.99) | (sine > 0.1));
+    Mask<V> plain = (given.lambda12.sin > 1e-9) & (beta1.cos > 1e-9) & (beta1.sin < -1e-6) &
+                    (sine > 1e-7) & ((cosine > -0.99) | (sine > 0.1));
     const V harmless = select(plain, sine, 1.0);
     const V distance = atan2(harmless, select(plain, cosine, 0.0));
     const V lag = f * beta1.cos * (first.sin / harmless) * distance;
     const auto start = spherical_start(beta1, beta2, turned(given.lambda12, lag));
     auto alpha1 = unit(select(plain, start.sin, 1.0), select(plain, start.cos, 0.0));
-    auto moving = plain;
+    Mask<V> moving = plain;
     for (int i = 0; i < 6; ++i) {
       const auto at = arc(beta1, beta2, alpha1);
       const auto over = excess(beta1, beta2, given.lambda12, at);
