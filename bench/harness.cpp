@@ -31,7 +31,7 @@ class Collector : public benchmark::ConsoleReporter {
   void ReportRuns(const std::vector<Run>& runs) override {
     for (const Run& run : runs) {
       if (run.run_type == Run::RT_Aggregate && run.aggregate_name == "median") {
-        medians[run.run_name.function_name] = run.GetAdjustedRealTime() / kPoints;
+        medians[run.run_name.function_name] = run.GetAdjustedRealTime();
         std::fputc('.', stderr);
       }
     }
@@ -47,7 +47,7 @@ void print_table(const std::map<std::string, double>& medians) {
   for (const Row& row : rows()) {
     const auto side = [&](int i) {
       const auto found = medians.find(row.operation + "/" + kSides[i]);
-      return found == medians.end() ? 0.0 : found->second;
+      return found == medians.end() ? 0.0 : found->second / row.points;
     };
     const double ours = side(0), peer = side(1), floor = side(2);
     if (ours == 0) continue;
@@ -70,13 +70,14 @@ void print_table(const std::map<std::string, double>& medians) {
 
 void add(Row row) { rows().push_back(std::move(row)); }
 
-std::vector<CoordinateTriple> box(double west, double south, double east, double north) {
+std::vector<CoordinateTriple> box(double west, double south, double east, double north,
+                                  int32_t count) {
   constexpr double kDegree = 3.14159265358979323846 / 180;
   std::mt19937 random(20);
   std::uniform_real_distribution<double> lon(west * kDegree, east * kDegree);
   std::uniform_real_distribution<double> lat(south * kDegree, north * kDegree);
   std::uniform_real_distribution<double> height(0, 1000);
-  std::vector<CoordinateTriple> points(kPoints);
+  std::vector<CoordinateTriple> points(static_cast<std::size_t>(count));
   for (CoordinateTriple& p : points) p = {lon(random), lat(random), height(random)};
   return points;
 }

@@ -14,7 +14,7 @@ namespace tidewater::bench {
 
 inline constexpr int32_t kPoints = 4096;
 
-// Works once through kPoints points.
+// Works once through a row's points.
 using Kernel = std::function<void()>;
 
 struct Row {
@@ -23,6 +23,7 @@ struct Row {
   Kernel ours;
   Kernel peer;   // may be empty
   Kernel floor;  // the bare libm calls of the formula; may be empty
+  int32_t points = kPoints;
 };
 
 // Adds a row to the table.  Rows are added while the program starts, in Suite objects.
@@ -34,7 +35,8 @@ struct Suite {
 };
 
 // Points spread at random over a box of longitudes and latitudes in degrees, heights up to 1000 m.
-std::vector<CoordinateTriple> box(double west, double south, double east, double north);
+std::vector<CoordinateTriple> box(double west, double south, double east, double north,
+                                  int32_t count = kPoints);
 
 // A PROJ operation over an array of our points, in place as proj_trans_generic works.  Forward
 // takes radians.  An empty kernel where PROJ is not installed or does not know the operation.

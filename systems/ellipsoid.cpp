@@ -6,6 +6,7 @@
 #include <span>
 
 #include "registry.hpp"
+#include "registry_names.hpp"
 #include "words.hpp"
 
 namespace tidewater {

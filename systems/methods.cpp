@@ -7,7 +7,7 @@
 #include <string>
 
 #include "makers.hpp"
-#include "registry.hpp"
+#include "registry_names.hpp"
 
 namespace tidewater::detail {
 

@@ -6,6 +6,7 @@
 
 #include "makers.hpp"
 #include "registry.hpp"
+#include "registry_names.hpp"
 #include "system_impl.hpp"
 #include "text_forms.hpp"
 #include "tidewater/conformal.h"

@@ -5,7 +5,7 @@
 
 #include "makers.hpp"
 #include "projection_impl.hpp"
-#include "registry.hpp"
+#include "registry_names.hpp"
 
 namespace tidewater {
 

@@ -22,24 +22,7 @@ T need(std::optional<T> record, const char* what, int code, const std::string& o
   return *std::move(record);
 }
 
-// DDD.MMSSsss, the digits of degrees, minutes and seconds.
-double sexagesimal(double value) {
-  const double size = std::fabs(value);
-  // Rounded where the digits end, so that 0.1 of a minute is not 59.9999 seconds.
-  const double digits = std::round(size * 1e10);
-  const double degrees = std::floor(digits / 1e10);
-  const double minutes = std::floor((digits - degrees * 1e10) / 1e8);
-  const double seconds = (digits - degrees * 1e10 - minutes * 1e8) / 1e6;
-  return std::copysign((degrees + minutes / 60 + seconds / 3600) * (kPi / 180), value);
-}
-
 }  // namespace
-
-double in_base_units(const Registry& registry, const Parameter& parameter, const std::string& of) {
-  if (parameter.unit == kSexagesimalUnit) return sexagesimal(parameter.value);
-  if (parameter.unit == 0) return parameter.value;
-  return parameter.value * need(registry.unit(parameter.unit), "unit", parameter.unit, of).factor;
-}
 
 EllipsoidDefinition ellipsoid_from_registry(int code) {
   const auto record = need(Registry::shared().ellipsoid(code), "ellipsoid", code, "the definition");
@@ -63,8 +46,15 @@ Definition definition_from_registry(int code) {
   const Registry& registry = Registry::shared();
   const auto system = registry.system(code);
   if (!system) {
-    throw Error("There is no coordinate system EPSG:" + std::to_string(code) +
-                " in the registry; systems that it has withdrawn are not carried.");
+    std::string sentence =
+        "There is no coordinate system EPSG:" + std::to_string(code) + " in the registry";
+    if (const auto withdrawn = registry.deprecated(code)) {
+      sentence = "The registry has withdrawn EPSG:" + std::to_string(code) + ", " + withdrawn->name;
+      if (withdrawn->replaced_by != 0) {
+        sentence += "; EPSG:" + std::to_string(withdrawn->replaced_by) + " takes its place";
+      }
+    }
+    throw Error(sentence + ".");
   }
   const std::string of = system->name;
   Definition result;
@@ -99,8 +89,7 @@ Definition definition_from_registry(int code) {
       result.method = conversion.method;
       result.conversion = conversion.name;
       for (const auto& parameter : conversion.parameters) {
-        result.parameters.push_back(
-            {parameter.code, in_base_units(registry, parameter, conversion.name)});
+        result.parameters.push_back({parameter.code, registry.base_value(parameter)});
       }
       result.base_code = system->base;
       if (const auto base = registry.system(system->base)) result.base = base->name;

@@ -27,11 +27,6 @@ struct Where {
 };
 Definition definition_from_text(std::string_view text, const std::optional<Where>& where);
 
-class Registry;
-struct Parameter;
-// A parameter's value in radians, metres or one.
-double in_base_units(const Registry& registry, const Parameter& parameter, const std::string& of);
-
 DatumDefinition datum_from_registry(int code);
 EllipsoidDefinition ellipsoid_from_registry(int code);
 
