@@ -5,12 +5,10 @@
 #include <memory>
 #include <string>
 
+#include "formulas/constants.hpp"
 #include "methods.hpp"
 
 namespace tidewater::detail {
-
-inline constexpr double kPi = 3.14159265358979323846;
-inline constexpr double kHalfPi = kPi / 2;
 
 // Registry codes of parameters.
 enum ParameterCode : int {

@@ -15,20 +15,18 @@ namespace {
 
 #define TW_BLOCK int count, const CoordinateTriple *in, CoordinateTriple *out, TWstatus *status
 
-using points::Latitude;
-using points::MeridianArc;
 
 // The authalic latitude, whose series serve the ellipsoids of the Earth and others up to e = 0.2.
 struct Authalic {
   double radius;  // of the authalic sphere
-  points::LatitudeSeries to_authalic, to_geodetic;
+  LatitudeSeries to_authalic, to_geodetic;
 
   explicit Authalic(const MethodArguments& given)
-      : radius(std::sqrt(points::authalic_radius_squared(given.a, given.f))),
+      : radius(std::sqrt(authalic_radius_squared(given.a, given.f))),
         to_authalic(latitude_series(Latitude::geodetic, Latitude::authalic,
-                                    points::third_flattening(given.f))),
+                                    third_flattening(given.f))),
         to_geodetic(latitude_series(Latitude::authalic, Latitude::geodetic,
-                                    points::third_flattening(given.f))) {}
+                                    third_flattening(given.f))) {}
 };
 
 double transverse_radius(const MethodArguments& given, double lat) {
@@ -169,7 +167,7 @@ Made make_azimuthal_equal_area(const MethodArguments& given) {
 
 // On an ellipsoid the sphere is the one of equal area.
 Made make_azimuthal_equal_area_spherical(const MethodArguments& given) {
-  const double radius = std::sqrt(points::authalic_radius_squared(given.a, given.f));
+  const double radius = std::sqrt(authalic_radius_squared(given.a, given.f));
   return azimuthal_equal_area(given, natural_plane(given, radius / given.a), 0);
 }
 

@@ -183,7 +183,7 @@ def main():
     print("// Written by scripts/series/geodesics.py: the series of geodesics, worked out with rational")
     print("// numbers from their integrals.")
     print("#pragma once\n")
-    print("namespace tidewater::points {")
+    print("namespace tidewater::detail {")
     mean, lengths = length_series(Fraction(1, 2))
     print_mean("kGeodesicA1", "The mean of I1 times (1 - eps): powers of eps^2", mean)
     print_series("kGeodesicC1", "I1 over its mean: row l - 1 belongs to sin(2 l sigma), from eps^l on "
@@ -209,7 +209,7 @@ def main():
             sines[l - 1] = add2(sines[l - 1], c, Fraction(-1, 4))
     rows = [{e: v / (2 * l + 1) for e, v in sines[l].items()} for l in range(ORDER)]
     print_double("kGeodesicI4", "I4: row l of cos((2 l + 1) sigma); [eps][n]", rows)
-    print("\n}  // namespace tidewater::points")
+    print("\n}  // namespace tidewater::detail")
 
 
 main()

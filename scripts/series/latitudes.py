@@ -169,7 +169,7 @@ def main():
     print("// Written by scripts/series/latitudes.py: coefficients of the series between latitudes, worked")
     print("// out from the latitudes' definitions with rational numbers.")
     print("#pragma once\n")
-    print("namespace tidewater::points {\n")
+    print("namespace tidewater::detail {\n")
     print("// Row k - 1 holds the polynomial of sin(2 k latitude), from n^k to n^8.")
     print("struct LatitudeCoefficients {")
     print(f"  double row[{ORDER}][{ORDER}];")
@@ -185,7 +185,7 @@ def main():
     xi_of_chi = composed(reverted(latitudes["Conformal"]), latitudes["Authalic"])
     table("kRhumbArea", "The integral of (sin xi - sin chi) / cos chi: of cos(2 k chi)",
           rhumb_area(xi_of_chi))
-    print("\n}  // namespace tidewater::points")
+    print("\n}  // namespace tidewater::detail")
 
 
 main()

@@ -2,18 +2,16 @@
 // turns are taken off exactly.
 #pragma once
 
+#include "formulas/constants.hpp"
 #include "points/elementary.hpp"
 
-namespace tidewater::points {
-
-inline constexpr double kDegree = 0.017453292519943295;
-inline constexpr double kPerDegree = 57.29577951308232;
+namespace tidewater::detail {
 
 // Sine and cosine of degrees up to 1e15, exact at multiples of 90.
-template <class V>
+template <Number V>
 TW_INLINE SinCos<V> sincos_degrees(V x) {
   const V quarters = nearest_whole(x * (1.0 / 90));
-  const auto at = sincos((x - 90.0 * quarters) * kDegree);
+  const auto at = sincos((x - 90.0 * quarters) * kRadiansPerDegree);
   const V q = quarters - 4.0 * nearest_whole(quarters * 0.25);  // from -2 to 2
   const auto odd = abs(q) == 1.0;
   const V s = select(odd, at.cos, at.sin);
@@ -25,19 +23,19 @@ TW_INLINE SinCos<V> sincos_degrees(V x) {
 }
 
 // The angle of a direction in degrees, from -180 to 180.
-template <class V>
+template <Number V>
 TW_INLINE V atan2_degrees(V y, V x) {
-  return atan2(y, x) * kPerDegree;
+  return atan2(y, x) * kDegreesPerRadian;
 }
 
 // A value and what was lost in rounding it.
-template <class V>
+template <Number V>
 struct Exact {
   V value, rest;
 };
 
 // b - a in degrees, brought within half a turn.
-template <class V>
+template <Number V>
 TW_INLINE Exact<V> degrees_between(V a, V b) {
   const V near_a = a - 360.0 * nearest_whole(a * (1.0 / 360));
   const V near_b = b - 360.0 * nearest_whole(b * (1.0 / 360));
@@ -50,9 +48,9 @@ TW_INLINE Exact<V> degrees_between(V a, V b) {
 }
 
 // A longitude within half a turn.
-template <class V>
+template <Number V>
 TW_INLINE V wrap_degrees(V lon) {
   return lon - 360.0 * nearest_whole(lon * (1.0 / 360));
 }
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

@@ -15,21 +15,15 @@
 #include "formulas/geodesic_coefficients.hpp"
 #include "formulas/latitudes.hpp"
 
-namespace tidewater::points {
-
-// Where a line starts or ends.  `azimuth` is the line's direction there, clockwise from north.
-template <class V>
-struct LineEnd {
-  SinCos<V> lat;
-  SinCos<V> azimuth;
-};
+namespace tidewater::detail {
 
 // The course of a line: what was computed of it.
-template <class V>
+template <Number V>
 struct GeodesicArc {
   V length;
   SinCos<V> azimuth1, azimuth2;
-  V area;  // between the line and the equator, counterclockwise positive; if asked for
+  V area;  // between the line and the equator, positive for eastward lines in the north; if asked
+           // for
   Mask<V> plain;
 };
 
@@ -60,16 +54,17 @@ struct Geodesics {
 
   // --- series ----------------------------------------------------------------------------------
 
-  template <class V>
+  template <Number V>
   TW_INLINE static V mean(const double (&table)[4], V eps) {
     return polynomial(table, eps * eps);
   }
 
   // c[l - 1] = eps^l times the polynomial of eps^2 in row l - 1
-  template <class V>
+  template <Number V>
   struct Harmonics {
     V c[6];
 
+    Harmonics() = default;
     TW_INLINE Harmonics(const double (&table)[6][3], V eps) {
       const V eps2 = eps * eps;
       V power = eps;
@@ -86,7 +81,7 @@ struct Geodesics {
 
   // I3 without its linear term between two arcs, and the mean that belongs to the linear one
   // (eq. 23-25).
-  template <class V>
+  template <Number V>
   TW_INLINE V longitude_lag(V eps, V sigma12, SinCos<V> sigma1, SinCos<V> sigma2) const {
     V c[5];
     V power = eps;
@@ -101,7 +96,7 @@ struct Geodesics {
   }
 
   // I4 between two arcs (eq. 62-63).
-  template <class V>
+  template <Number V>
   TW_INLINE V area_between(V eps, SinCos<V> sigma1, SinCos<V> sigma2) const {
     V c[6];
     V power = 1.0;
@@ -115,7 +110,7 @@ struct Geodesics {
   }
 
   // The sum of c[l] cos((2 l + 1) x) by Clenshaw's recursion.
-  template <class V>
+  template <Number V>
   TW_INLINE static V odd_cosines(const V (&c)[6], SinCos<V> x) {
     const V step = 2.0 * (x.cos - x.sin) * (x.cos + x.sin);
     V next = 0.0;
@@ -129,27 +124,27 @@ struct Geodesics {
   }
 
   // eps of k^2 (eq. 16)
-  template <class V>
+  template <Number V>
   TW_INLINE static V expansion(V k2) {
     return k2 / (2.0 * (1.0 + sqrt(1.0 + k2)) + k2);
   }
 
   // --- directions ------------------------------------------------------------------------------
 
-  template <class V>
+  template <Number V>
   TW_INLINE static SinCos<V> unit(V sin, V cos) {
     const V by = 1.0 / sqrt(sin * sin + cos * cos);
     return {sin * by, cos * by};
   }
 
   // The reduced latitude (eq. 6), never quite at a pole.
-  template <class V>
+  template <Number V>
   TW_INLINE SinCos<V> reduced(SinCos<V> lat) const {
     const auto beta = unit(f1 * lat.sin, lat.cos);
     return {beta.sin, greater(beta.cos, V(kTiny))};
   }
 
-  template <class V>
+  template <Number V>
   TW_INLINE static SinCos<V> difference(SinCos<V> from, SinCos<V> to) {
     return {to.sin * from.cos - to.cos * from.sin, to.cos * from.cos + to.sin * from.sin};
   }
@@ -157,14 +152,14 @@ struct Geodesics {
   // --- direct ----------------------------------------------------------------------------------
 
   // A line from a point on: what does not depend on the length.
-  template <class V>
+  template <Number V>
   struct Line {
     SinCos<V> alpha0, sigma1, omega1, tau1, alpha1;
-    V eps, k2, scale, b11;
+    V eps, scale, b11;
     Harmonics<V> reverted;
   };
 
-  template <class V>
+  template <Number V>
   TW_INLINE Line<V> line(SinCos<V> lat1, SinCos<V> azimuth1) const {
     const auto beta = reduced(lat1);
     // eq. 5, 10 and the figures 1-2; the equator at right angles is sigma = 0
@@ -183,13 +178,12 @@ struct Geodesics {
             turned(sigma1, b11),
             azimuth1,
             eps,
-            k2,
             b * mean(kGeodesicA1, eps) / (1.0 - eps),
             b11,
             Harmonics<V>(kGeodesicC1Reverted, eps)};
   }
 
-  template <class V>
+  template <Number V>
   struct Position {
     V lat_sin, lat_cos;  // not of one length; their quotient is the tangent
     V lon;               // from the start, radians, within half a turn
@@ -197,7 +191,7 @@ struct Geodesics {
     V area;
   };
 
-  template <bool Area = false, class V>
+  template <bool Area = false, Number V>
   TW_INLINE Position<V> position(const Line<V>& line, V length) const {
     const V tau12 = length / line.scale;
     const auto turn = sincos(tau12);
@@ -220,7 +214,7 @@ struct Geodesics {
       // alpha2 - alpha1 without cancellation
       const auto sigma = difference(line.sigma1, sigma2);
       const V s = select(
-          line.sigma1.cos <= 0.0, line.sigma1.cos * (1.0 - sigma.cos) + sigma.sin * line.sigma1.sin,
+          sigma.cos <= 0.0, line.sigma1.cos * (1.0 - sigma.cos) + sigma.sin * line.sigma1.sin,
           sigma.sin * (line.sigma1.cos * sigma.sin / (1.0 + sigma.cos) + line.sigma1.sin));
       const auto ordinary = (line.alpha0.sin != 0.0) & (line.alpha0.cos != 0.0);
       const V calp2 = line.alpha0.cos * sigma2.cos;
@@ -240,13 +234,13 @@ struct Geodesics {
   // --- inverse ---------------------------------------------------------------------------------
 
   // The arc that leaves beta1 at alpha1 and meets the latitude beta2.
-  template <class V>
+  template <Number V>
   struct Arc {
     SinCos<V> alpha2, sigma1, sigma2, omega12;
     V salp0, calp0, sigma12, k2, eps;
   };
 
-  template <class V>
+  template <Number V>
   TW_INLINE Arc<V> arc(SinCos<V> beta1, SinCos<V> beta2, SinCos<V> alpha1) const {
     Arc<V> out;
     out.salp0 = alpha1.sin * beta1.cos;
@@ -275,12 +269,12 @@ struct Geodesics {
 
   // The longitude that an arc reaches beyond the wanted one (eq. 8 and 24), and its growth with
   // alpha1 (eq. 46).
-  template <class V>
+  template <Number V>
   struct Excess {
     V lon, slope;
   };
 
-  template <class V>
+  template <Number V>
   TW_INLINE Excess<V> excess(SinCos<V> beta1, SinCos<V> beta2, SinCos<V> lambda12,
                              const Arc<V>& at) const {
     const auto over = difference(lambda12, at.omega12);
@@ -296,7 +290,7 @@ struct Geodesics {
   }
 
   // m12 / b (eq. 38)
-  template <class V>
+  template <Number V>
   TW_INLINE V reduced_length(SinCos<V> beta1, SinCos<V> beta2, const Arc<V>& at) const {
     const V a1 = mean(kGeodesicA1, at.eps) / (1.0 - at.eps);
     const V a2 = mean(kGeodesicA2, at.eps) * (1.0 - at.eps);
@@ -311,7 +305,7 @@ struct Geodesics {
   }
 
   // The arc's length (eq. 7)
-  template <class V>
+  template <Number V>
   TW_INLINE V length(const Arc<V>& at) const {
     const Harmonics<V> c1(kGeodesicC1, at.eps);
     const V scale = b * mean(kGeodesicA1, at.eps) / (1.0 - at.eps);
@@ -319,7 +313,7 @@ struct Geodesics {
   }
 
   // The area below an arc (eq. 59 and 64).
-  template <class V>
+  template <Number V>
   TW_INLINE V area(SinCos<V> beta1, SinCos<V> beta2, SinCos<V> alpha1, const Arc<V>& at) const {
     const auto turned_azimuth = difference(alpha1, at.alpha2);
     // By the longitudes where that keeps more digits: eq. 64.
@@ -337,7 +331,7 @@ struct Geodesics {
 
   // The canonical form of a pair (eq. 44): beta1 not above the equator, |beta2| no greater than
   // |beta1|, the longitude difference not negative.
-  template <class V>
+  template <Number V>
   struct Ends {
     SinCos<V> beta1, beta2, lambda12;
     V lambda;
@@ -345,16 +339,16 @@ struct Geodesics {
     V lon_sign, lat_sign;
   };
 
-  template <class V>
+  template <Number V>
   TW_INLINE Ends<V> ends(V lat1, V lon1, V lat2, V lon2) const {
     Ends<V> out;
     const auto between = degrees_between(lon1, lon2);
     out.lon_sign = select(between.value < 0.0, V(-1.0), V(1.0));
     const V d = abs(between.value);
-    const V rest = between.rest * out.lon_sign * kDegree;
+    const V rest = between.rest * out.lon_sign * kRadiansPerDegree;
     const auto at = sincos_degrees(d);
     out.lambda12 = {at.sin + rest * at.cos, at.cos - rest * at.sin};
-    out.lambda = d * kDegree + rest;
+    out.lambda = d * kRadiansPerDegree + rest;
     out.swapped = abs(lat1) < abs(lat2);
     const V greater_lat = select(out.swapped, lat2, lat1);
     const V other_lat = select(out.swapped, lat1, lat2);
@@ -365,7 +359,7 @@ struct Geodesics {
   }
 
   // From the canonical form back.
-  template <class V>
+  template <Number V>
   TW_INLINE GeodesicArc<V> restored(const Ends<V>& given, V distance, SinCos<V> alpha1,
                                     SinCos<V> alpha2, V area12) const {
     const V swap_sign = select(given.swapped, V(-1.0), V(1.0));
@@ -384,7 +378,7 @@ struct Geodesics {
   }
 
   // The azimuths of the great circle (eq. 49-50).
-  template <class V>
+  template <Number V>
   TW_INLINE static SinCos<V> spherical_start(SinCos<V> beta1, SinCos<V> beta2, SinCos<V> omega12) {
     const V s = beta2.cos * omega12.sin;
     const V apart = beta2.sin * beta1.cos - beta2.cos * beta1.sin;  // sin(beta2 - beta1)
@@ -399,7 +393,7 @@ struct Geodesics {
   // The inverse problem for the many lines: latitudes and longitudes in degrees.  Lines near the
   // antipode, along the equator or a meridian and of a few centimetres are not plain: any_line()
   // has them.
-  template <bool Area = false, class V>
+  template <bool Area = false, Number V>
   TW_INLINE GeodesicArc<V> many_lines(V lat1, V lon1, V lat2, V lon2) const {
     const auto given = ends(lat1, lon1, lat2, lon2);
     const auto& beta1 = given.beta1;
@@ -408,14 +402,14 @@ struct Geodesics {
     const auto first = spherical_start(beta1, beta2, given.lambda12);
     const V sine = plain_hypot(first.sin, first.cos);
     const V cosine = beta1.sin * beta2.sin + beta1.cos * beta2.cos * given.lambda12.cos;
-    auto plain = (given.lambda12.sin > 1e-9) & (beta1.cos > 1e-9) & (beta1.sin < -1e-6) &
-                 (sine > 1e-7) & ((cosine > -0.99) | (sine > 0.1));
+    Mask<V> plain = (given.lambda12.sin > 1e-9) & (beta1.cos > 1e-9) & (beta1.sin < -1e-6) &
+                    (sine > 1e-7) & ((cosine > -0.99) | (sine > 0.1));
     const V harmless = select(plain, sine, 1.0);
     const V distance = atan2(harmless, select(plain, cosine, 0.0));
     const V lag = f * beta1.cos * (first.sin / harmless) * distance;
     const auto start = spherical_start(beta1, beta2, turned(given.lambda12, lag));
     auto alpha1 = unit(select(plain, start.sin, 1.0), select(plain, start.cos, 0.0));
-    auto moving = plain;
+    Mask<V> moving = plain;
     for (int i = 0; i < 6; ++i) {
       const auto at = arc(beta1, beta2, alpha1);
       const auto over = excess(beta1, beta2, given.lambda12, at);
@@ -457,7 +451,7 @@ struct Geodesics {
         return restored(given, length(at), lambda12, at.alpha2, below);
       }
     }
-    if (beta1.sin == 0 && (f <= 0 || given.lambda <= f1 * kHalfTurn)) {
+    if (beta1.sin == 0 && (f <= 0 || given.lambda <= f1 * kPi)) {
       return restored(given, a * given.lambda, {1.0, 0.0}, {1.0, 0.0}, 0.0);
     }
     // The equator itself is never met at right angles from here on.
@@ -467,7 +461,7 @@ struct Geodesics {
     const double cosine = beta1.sin * beta2.sin + beta1.cos * beta2.cos * lambda12.cos;
     if (sine < kShort && cosine > 0) return short_line<Area>(given);
     const double n = std::fabs(third_flattening(f));
-    if (cosine < 0 && sine < 6 * n * kHalfTurn * beta1.cos * beta1.cos) {
+    if (cosine < 0 && sine < 6 * n * kPi * beta1.cos * beta1.cos) {
       alpha1 = antipodal_start(given, alpha1);
     }
     alpha1 = alpha1.sin > 0 ? unit(alpha1.sin, alpha1.cos) : SinCos<double>{1.0, 0.0};
@@ -479,7 +473,6 @@ struct Geodesics {
   }
 
  private:
-  static constexpr double kHalfTurn = 3.141592653589793;
   // Below this arc the sphere of the middle latitude has the line to rounding.
   static constexpr double kShort = 2e-8;
 
@@ -578,7 +571,7 @@ struct Geodesics {
     double lon_scale = 0;
     if (f >= 0) {
       const double eps = expansion(beta1.sin * beta1.sin * ep2);
-      lon_scale = f * beta1.cos * polynomial(i3[0], eps) * kHalfTurn;
+      lon_scale = f * beta1.cos * polynomial(i3[0], eps) * kPi;
       x = lon / lon_scale;
       y = lat / (lon_scale * beta1.cos);
     } else {
@@ -587,8 +580,8 @@ struct Geodesics {
       const double m = reduced_length(beta1, beta2, at);
       const double a1 = mean(kGeodesicA1, at.eps) / (1 - at.eps);
       const double a2 = mean(kGeodesicA2, at.eps) * (1 - at.eps);
-      x = -1 + m / (beta1.cos * beta2.cos * (a1 - a2) * kHalfTurn);
-      const double lat_scale = x < -0.01 ? lat / x : -f * beta1.cos * beta1.cos * kHalfTurn;
+      x = -1 + m / (beta1.cos * beta2.cos * (a1 - a2) * kPi);
+      const double lat_scale = x < -0.01 ? lat / x : -f * beta1.cos * beta1.cos * kPi;
       lon_scale = lat_scale / beta1.cos;
       y = lon / lon_scale;
     }
@@ -625,4 +618,4 @@ struct Geodesics {
   }
 };
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

@@ -2,7 +2,7 @@
 // numbers from their integrals.
 #pragma once
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 // The mean of I1 times (1 - eps): powers of eps^2
 inline constexpr double kGeodesicA1[4] = {1., 1. / 4, 1. / 64, 1. / 256};
@@ -144,4 +144,4 @@ inline constexpr double kGeodesicI4[6][6][6] = {
     },
 };
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

@@ -2,7 +2,7 @@
 // out from the latitudes' definitions with rational numbers.
 #pragma once
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 // Row k - 1 holds the polynomial of sin(2 k latitude), from n^k to n^8.
 struct LatitudeCoefficients {
@@ -306,4 +306,4 @@ inline constexpr LatitudeCoefficients kRhumbArea = {{
     {-673429061. / 1929727800},
 }};
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

@@ -13,7 +13,7 @@
 #include "formulas/latitude_coefficients.hpp"
 #include "formulas/series.hpp"
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 enum class Latitude { geodetic, reduced, rectifying, conformal, authalic };
 
@@ -37,12 +37,12 @@ struct LatitudeSeries {
   }
 
   // What is to be added to the latitude of this sine and cosine.
-  template <class V>
+  template <Number V>
   TW_INLINE V correction(SinCos<V> at) const {
     return sine_series(c, twice(at));
   }
 
-  template <class V>
+  template <Number V>
   TW_INLINE V operator()(V lat) const {
     return lat + correction(sincos(lat));
   }
@@ -107,11 +107,11 @@ struct MeridianArc {
         to_rectifying(kRectifyingFromGeodetic, third_flattening(f)),
         to_geodetic(kGeodeticFromRectifying, third_flattening(f)) {}
 
-  template <class V>
+  template <Number V>
   TW_INLINE V arc(V lat) const {
     return radius * to_rectifying(lat);
   }
-  template <class V>
+  template <Number V>
   TW_INLINE V latitude(V arc) const {
     return to_geodetic(arc * (1 / radius));
   }
@@ -184,14 +184,13 @@ inline double from_geodetic(Latitude to, double f, double lat) {
 
 // By secants that stay within a shrinking bracket, one side of the equator at a time.
 inline double to_geodetic(Latitude from, double f, double lat) {
-  const double half_pi = 1.5707963267948966;
-  if (from == Latitude::geodetic || !(std::fabs(lat) < half_pi)) return lat;
+  if (from == Latitude::geodetic || !(std::fabs(lat) < kHalfPi)) return lat;
   if (from == Latitude::reduced) return std::atan2(std::sin(lat), (1 - f) * std::cos(lat));
   const double wanted = std::fabs(lat);
   double low = 0;
-  double high = half_pi;
+  double high = kHalfPi;
   double below = -wanted;
-  double above = half_pi - wanted;
+  double above = kHalfPi - wanted;
   int side = 0;
   // The Illinois variant: an end that stays twice counts half.
   for (int i = 0; i < 200 && high - low > 4e-16 * high; ++i) {
@@ -222,4 +221,4 @@ inline double exact_latitude(Latitude from, Latitude to, double f, double lat) {
   return from == to ? lat : exact::from_geodetic(to, f, exact::to_geodetic(from, f, lat));
 }
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

@@ -3,12 +3,13 @@
 // pp. 118-120.
 #pragma once
 
+#include "formulas/constants.hpp"
 #include "points/elementary.hpp"
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 // c[0] + c[1] x + ... + c[N - 1] x^(N - 1)
-template <int N, class V>
+template <int N, Number V>
 TW_INLINE V polynomial(const double (&c)[N], V x) {
   V sum = c[N - 1];
   for (int k = N - 2; k >= 0; --k) sum = sum * x + c[k];
@@ -16,13 +17,13 @@ TW_INLINE V polynomial(const double (&c)[N], V x) {
 }
 
 // Sine and cosine of twice an angle.
-template <class V>
+template <Number V>
 TW_INLINE SinCos<V> twice(SinCos<V> at) {
   return {2.0 * at.sin * at.cos, (at.cos - at.sin) * (at.cos + at.sin)};
 }
 
 // The sum of c[k - 1] sin(k x) for k from 1 to N, c numbers or several points' numbers.
-template <int N, class C, class V>
+template <int N, class C, Number V>
 TW_INLINE V sine_series(const C (&c)[N], SinCos<V> x) {
   const V step = 2.0 * x.cos;
   V next = 0.0;
@@ -36,7 +37,7 @@ TW_INLINE V sine_series(const C (&c)[N], SinCos<V> x) {
 }
 
 // The sum of c[k - 1] cos(k x) for k from 1 to N.
-template <int N, class C, class V>
+template <int N, class C, Number V>
 TW_INLINE V cosine_series(const C (&c)[N], SinCos<V> x) {
   const V step = 2.0 * x.cos;
   V next = 0.0;
@@ -50,19 +51,19 @@ TW_INLINE V cosine_series(const C (&c)[N], SinCos<V> x) {
 }
 
 // A complex number of several points.
-template <class V>
+template <Number V>
 struct ComplexOf {
   V re, im;
 };
 
-template <class V>
+template <Number V>
 struct ComplexSums {
   ComplexOf<V> sine, slope;
 };
 
 // At a complex angle z, given the sine and cosine of it: the sum of c[k - 1] sin(k z), and with
 // `Slope` that of k c[k - 1] cos(k z) as well, k from 1 to N.
-template <bool Slope, int N, class V>
+template <bool Slope, int N, Number V>
 TW_INLINE ComplexSums<V> complex_sine_series(const double (&c)[N], ComplexOf<V> sin,
                                              ComplexOf<V> cos) {
   const ComplexOf<V> step = {2.0 * cos.re, 2.0 * cos.im};
@@ -92,7 +93,7 @@ TW_INLINE ComplexSums<V> complex_sine_series(const double (&c)[N], ComplexOf<V> 
 }
 
 // Sine and cosine of an angle that a small one moves: |small| below 0.07, to rounding.
-template <class V>
+template <Number V>
 TW_INLINE SinCos<V> turned(SinCos<V> at, V small) {
   const V q = small * small;
   const V sine = small * (1.0 - q * (1.0 / 6) * (1.0 - q * (1.0 / 20) * (1.0 - q * (1.0 / 42))));
@@ -101,4 +102,4 @@ TW_INLINE SinCos<V> turned(SinCos<V> at, V small) {
   return {at.sin + (at.cos * sine - at.sin * versine), at.cos - (at.sin * sine + at.cos * versine)};
 }
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

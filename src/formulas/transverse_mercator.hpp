@@ -8,7 +8,7 @@
 
 #include "formulas/latitudes.hpp"
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 struct TransverseMercator {
   // As far from the central meridian as the series keep their digits, in rectifying radii: 3,900 km
@@ -39,7 +39,7 @@ struct TransverseMercator {
     }
   }
 
-  template <class V>
+  template <Number V>
   struct Forward {
     V x, y;
     Mask<V> plain;         // within the series' reach
@@ -48,7 +48,7 @@ struct TransverseMercator {
 
   // The longitude counts from the central meridian, y from the equator.  The convergence is the
   // bearing of the grid's north, clockwise from true north.
-  template <bool Distortion = false, class V>
+  template <bool Distortion = false, Number V>
   TW_INLINE Forward<V> forward(V lon, V lat) const {
     const auto phi = sincos(lat);
     const auto lambda = sincos(lon);
@@ -91,19 +91,19 @@ struct TransverseMercator {
     return out;
   }
 
-  template <class V>
+  template <Number V>
   struct Inverse {
     V lon, lat;
     Mask<V> plain;
   };
 
   // y within the meridian's length: up to a quarter of it beyond a pole.
-  template <class V>
+  template <Number V>
   TW_INLINE Inverse<V> inverse(V x, V y) const {
     const V eta = x * (1 / radius);
     const V xi = y * (1 / radius);
     Inverse<V> out;
-    out.plain = (abs(eta) <= kLargestEasting) & (abs(xi) <= 3.1415926535897936);
+    out.plain = (abs(eta) <= kLargestEasting) & (abs(xi) <= kPi);
     const V u = select(out.plain, eta, 0.0);
     const auto at = sincos(select(out.plain, xi, 0.0));
     // sinh and cosh to rounding below 0.66, the former relatively.
@@ -144,4 +144,4 @@ struct TransverseMercator {
   }
 };
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

@@ -6,7 +6,7 @@
 
 #include "formulas/reference.hpp"
 
-namespace tidewater::points {
+namespace tidewater::detail {
 namespace {
 
 using test::kLatitudes;
@@ -81,4 +81,4 @@ TEST(Latitudes, SphereOfEqualAreaHasTheEllipsoidsArea) {
 }
 
 }  // namespace
-}  // namespace tidewater::points
+}  // namespace tidewater::detail
