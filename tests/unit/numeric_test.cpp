@@ -7,8 +7,8 @@
 #include "support/points.hpp"
 
 using namespace tidewater::detail;
-using test::kInfinity;
-using test::kNaN;
+using tidewater::test::kInfinity;
+using tidewater::test::kNaN;
 
 namespace {
 

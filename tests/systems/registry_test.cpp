@@ -1,0 +1,3 @@
+#include "registry.hpp"
+
+#include <gtest/gtest.h>
