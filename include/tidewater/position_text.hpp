@@ -28,7 +28,7 @@ enum class Axis {
 struct ParsedAngle {
   double degrees = std::numeric_limits<double>::quiet_NaN(); /**< east and north positive */
   Axis axis = Axis::unknown; /**< by its letter, else as it was asked for */
-  std::string reason;        /**< a sentence; empty when the angle was read */
+  std::string reason = {};   /**< a sentence; empty when the angle was read */
 
   explicit operator bool() const { return reason.empty(); }
 };
@@ -70,7 +70,7 @@ struct ParsedPosition {
   double longitude = std::numeric_limits<double>::quiet_NaN(); /**< degrees, east positive */
   double latitude = std::numeric_limits<double>::quiet_NaN();  /**< degrees, north positive */
   double height = std::numeric_limits<double>::quiet_NaN(); /**< metres; not-a-number without one */
-  std::string reason; /**< a sentence; empty when the position was read */
+  std::string reason = {}; /**< a sentence; empty when the position was read */
 
   explicit operator bool() const { return reason.empty(); }
 };
@@ -132,6 +132,74 @@ inline constexpr std::size_t kAngleTextSize = 64;
 TW_SYSTEMS_API std::size_t format_angle(double degrees, const AngleFormat& format, char* out);
 /** The same as a string. */
 TW_SYSTEMS_API std::string format_angle(double degrees, const AngleFormat& format = {});
+
+/**
+ * Coordinates on the universal grids of WGS 84: transverse Mercator in zones, polar stereographic
+ * at the poles.
+ */
+struct GridPosition {
+  int zone = -1;     /**< 1 to 60; 0: polar stereographic */
+  bool north = true; /**< false: false northings of the southern hemisphere, or the south pole */
+  double easting = std::numeric_limits<double>::quiet_NaN();  /**< metres */
+  double northing = std::numeric_limits<double>::quiet_NaN(); /**< metres */
+  /** Side of the square that a reference names, in metres, of which easting and northing are the
+   * south-western corner; 0 for a point. */
+  double square = 0;
+  std::string reason = {}; /**< a sentence; empty when there is a position */
+
+  explicit operator bool() const { return reason.empty(); }
+};
+
+/**
+ * The universal zone of a point: 1 to 60 with the wider zones of Norway and Svalbard, 0 (polar)
+ * from 84 degrees north and south of 80 degrees south.
+ * @param longitude,latitude  degrees
+ * @return -1 where the latitude is beyond a pole or a figure is not finite
+ */
+TW_SYSTEMS_API int utm_zone(double longitude, double latitude);
+
+/**
+ * Universal grid coordinates of a point (transverse Mercator: to 1e-8 m; polar: to 1e-8 m).
+ * @param longitude,latitude  degrees on WGS 84
+ * @param zone  -1: that of utm_zone(); else the zone to use, 0 polar
+ */
+TW_SYSTEMS_API GridPosition grid_position(double longitude, double latitude, int zone = -1);
+
+/**
+ * The point of grid coordinates: the centre where they name a square.
+ * @return longitude and latitude in degrees on WGS 84, no height; or the reason why there is none
+ */
+TW_SYSTEMS_API ParsedPosition position_of(const GridPosition& grid);
+
+/**
+ * Reads a reference of the military grid (MGRS, USNG): 31UDQ4825111932, 31U DQ 48251 11932, and at
+ * the poles YUB1798816324.
+ *
+ * None to eleven digits each of easting and northing tell the square: 100 km to a micrometre.
+ * Letters in either case, blanks between the groups.  Source: The Universal Grids and the
+ * Transverse Mercator and Polar Stereographic Map Projections, NGA.SIG.0012_2.0.0_UTMUPS (2014),
+ * chapter 11 and appendices A and B.
+ *
+ * Refused, with the reason: letters I and O; a band that does not exist; a column or row that does
+ * not occur in the zone; a square that lies outside its band (27XAA), or more than 50 km outside
+ * its zone; an odd number of digits or groups of unequal length.
+ */
+TW_SYSTEMS_API GridPosition parse_mgrs(std::string_view text);
+
+/**
+ * The reference of the square that holds a point; nothing is rounded.
+ * @param grid    zone, hemisphere, easting and northing; a square's corner is its point
+ * @param digits  0 to 11, digits each of easting and northing
+ * @param blanks  "31U DQ 48251 11932" instead of "31UDQ4825111932"
+ * @return the text; empty if the point has none
+ */
+TW_SYSTEMS_API std::string format_mgrs(const GridPosition& grid, int digits = 5,
+                                       bool blanks = false);
+/**
+ * The same for a point of longitude and latitude in degrees on WGS 84.
+ */
+TW_SYSTEMS_API std::string format_mgrs(double longitude, double latitude, int digits = 5,
+                                       bool blanks = false);
 
 }  // namespace tidewater
 
