@@ -9,7 +9,7 @@
 
 #include "datum/grid_file.hpp"
 #include "datum/grid_window.hpp"
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/datum.h"
 #include "tidewater/foundation.h"
 

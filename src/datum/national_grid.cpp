@@ -10,7 +10,7 @@
 #include <new>
 
 #include "datum/grid_file.hpp"
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;
