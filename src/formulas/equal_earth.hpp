@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "formulas/number.hpp"
+#include "points/elementary.hpp"
 
 namespace tidewater::points {
 
