@@ -1,6 +1,6 @@
 // Conformal methods.
-#include "formulas/krovak.hpp"
 #include <optional>
+#include "formulas/krovak.hpp"
 
 #include "makers.hpp"
 #include "tidewater/conformal.h"
@@ -79,8 +79,7 @@ Made oblique_mercator(const MethodArguments& given, Plane plane, int16_t mode, d
   double alpha = azimuth;
   double B, A, E, crossing, gamma0;
   TWstatus made;
-  TWo_merc_c(mode, e, lon1, lat1, lon2, lat2, &lat0, &alpha, &B, &A, &E, &crossing, &gamma0,
-             &made);
+  TWo_merc_c(mode, e, lon1, lat1, lon2, lat2, &lat0, &alpha, &B, &A, &E, &crossing, &gamma0, &made);
   require(made, given);
   const double turn = rotation.value_or(alpha);
   if (from_centre) {

@@ -125,9 +125,13 @@ const AnyRow* find(const std::vector<AnyRow>& rows, int code) {
   return found != rows.end() && found->code == code ? &*found : nullptr;
 }
 
-// A name's key with the code it stands for.
+// The registry has given codes below this to its later entries.
+constexpr int kFirstOfTheOlder = 2000;
+
+// A name's key with the code it stands for; the older entry goes before the later one.
 struct Key {
   std::string key;
+  bool later;
   int code;
   auto operator<=>(const Key&) const = default;
 };
@@ -440,7 +444,8 @@ struct Registry::Tables {
       row.accuracy = accuracy();
       row.replaced_by = reader.integer();
       row.values = static_cast<uint32_t>(values.size());
-      read_values(reader, values.emplace_back().value, values.back().unit);
+      Values& given = values.emplace_back();
+      read_values(reader, given.value, given.unit);
       return row;
     });
     read(reader, "transformations continued", more_values, [&] {
@@ -511,7 +516,7 @@ struct Registry::Tables {
 
   template <class AnyRow>
   static void add_key(const Tables& tables, std::vector<Key>& keys, const AnyRow& row) {
-    keys.push_back({name_key(tables.view(row.name)), row.code});
+    keys.push_back({name_key(tables.view(row.name)), row.code < kFirstOfTheOlder, row.code});
   }
 
   template <class AnyRow>
@@ -547,7 +552,7 @@ struct Registry::Tables {
               std::string_view name) const {
     const std::string wanted = name_key(name);
     if (wanted.empty()) return 0;
-    auto key = std::lower_bound(keys.begin(), keys.end(), Key{wanted, 0});
+    auto key = std::lower_bound(keys.begin(), keys.end(), Key{wanted, false, 0});
     int first = 0;
     for (; key != keys.end() && key->key == wanted; ++key) {
       const AnyRow* row = find(rows, key->code);

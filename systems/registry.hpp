@@ -152,7 +152,7 @@ class Registry {
   double base_value(const Parameter& parameter) const;
 
   // By name or other name, without regard to case, accents, blanks and punctuation; of several the
-  // smallest code.
+  // oldest entry.
   std::optional<SystemRecord> system(std::string_view name) const;
   std::optional<DatumRecord> datum(std::string_view name) const;
   std::optional<EllipsoidRecord> ellipsoid(std::string_view name) const;

@@ -6,6 +6,12 @@
 
 namespace tidewater::detail {
 
+namespace {
+
+constexpr int32_t kMostRows = 1000000;
+
+}  // namespace
+
 StoreReader::StoreReader(const std::string& path) : path_(path) {
   if (OLB7R3_PF_open(path.c_str()) != TW_STORE_SUCCESS) {
     throw Error("\"" + path + "\" is no parameter store that can be read.");
@@ -27,6 +33,11 @@ void StoreReader::begin(const char* table) {
       OLB7R3_PF_reset_table(table) != TW_STORE_SUCCESS) {
     throw Error("The parameter store \"" + path_ + "\" has no registry: its table \"" + table +
                 "\" is missing or cannot be read.");
+  }
+  // No registry has as many rows; a store that lies must not keep us for hours.
+  if (rows > kMostRows) {
+    throw Error("The registry in \"" + path_ + "\" cannot be used: table \"" + table + "\" has " +
+                std::to_string(rows) + " rows.");
   }
   rows_ = static_cast<std::size_t>(rows);
 }

@@ -91,7 +91,7 @@ TW_INLINE ComplexSums<V> complex_sine_series(const double (&c)[N], ComplexOf<V> 
   return sums;
 }
 
-// Sine and cosine of an angle that a small one moves: |small| below 0.02, to rounding.
+// Sine and cosine of an angle that a small one moves: |small| below 0.07, to rounding.
 template <class V>
 TW_INLINE SinCos<V> turned(SinCos<V> at, V small) {
   const V q = small * small;
