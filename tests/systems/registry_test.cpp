@@ -14,6 +14,7 @@
 #include <limits>
 #include <map>
 #include <numbers>
+#include <random>
 #include <set>
 #include <thread>
 
@@ -615,6 +616,8 @@ TEST(RegistryNames, ByName) {
   EXPECT_EQ(registry().meridian("PARIS")->code, 8903);
   EXPECT_EQ(registry().unit("US survey foot")->code, 9003);
   EXPECT_EQ(registry().unit("Clarkes foot")->code, 9005);
+  EXPECT_EQ(registry().unit("Foot_US")->code, 9003);
+  EXPECT_EQ(registry().unit("Meter")->code, 9001);
   EXPECT_FALSE(registry().unit("cubit"));
 }
 
@@ -756,7 +759,7 @@ TEST_F(RegistryStores, CutShortAreRefused) {
   std::ifstream in(TIDEWATER_STORE, std::ios::binary);
   const std::string whole{std::istreambuf_iterator<char>(in), {}};
   for (std::size_t tenths = 0; tenths < 10; ++tenths) {
-    for (const std::size_t more : {0, 1, 4095}) {
+    for (const std::size_t more : {0U, 1U, 4095U}) {
       folder_.write("cut", whole.substr(0, whole.size() / 10 * tenths + more));
       EXPECT_NE(refused(path("cut")).find("cut"), std::string::npos) << tenths;
     }
@@ -787,6 +790,31 @@ TEST_F(RegistryStores, ThatLieAreRefused) {
     const std::string words = refused(altered(sql));
     EXPECT_NE(words.find("cannot be used"), std::string::npos) << sql << ": " << words;
     EXPECT_NE(words.find(word), std::string::npos) << sql << ": " << words;
+  }
+}
+
+TEST_F(RegistryStores, DamagedAnywhereAreRefusedOrAnswer) {
+  std::ifstream in(TIDEWATER_STORE, std::ios::binary);
+  const std::string whole{std::istreambuf_iterator<char>(in), {}};
+  std::mt19937 random(20260831);
+  for (int round = 0; round < 60; ++round) {
+    std::string damaged = whole;
+    // From a single byte anywhere to many; in every third round in the schema too.
+    for (int byte = 0; byte <= round / 2; ++byte) {
+      const std::size_t reach = round % 3 == 0 && byte % 4 == 3 ? 20480 : damaged.size();
+      damaged[random() % reach] = static_cast<char>(random());
+    }
+    folder_.write("damaged", damaged);
+    try {
+      const Registry opened(path("damaged"));
+      for (const int code : opened.systems()) opened.system(code);
+      for (const int code : opened.operations()) opened.operation(code);
+      opened.operations(4275, 4326);
+      opened.search("lambert 93");
+      opened.suggest("lambret");
+    } catch (const Error& error) {
+      EXPECT_NE(std::string(error.what()).find("damaged"), std::string::npos) << error.what();
+    }
   }
 }
 
