@@ -412,7 +412,6 @@ Definition read_geographic(const WktNode& node) {
   definition.name = node.text(0);
   definition.code = registry_code(node);
   read_datum(node, first_version, definition);
-  definition.axes = read_axes(node);
   const WktNode* unit = any_unit(node);
   if (unit == nullptr) {
     // Version 2 may have it at the axes.
@@ -426,8 +425,9 @@ Definition read_geographic(const WktNode& node) {
     definition.unit = unit != nullptr ? read_unit(*unit) : UnitDefinition{"metre", 9001, 1};
     definition.axes = "XYZ";
   } else {
-    const bool height =
-        (kind != nullptr && kind->figure(1, 2) == 3) || node.find("LINUNIT") != nullptr;
+    definition.axes = read_axes(node);
+    const bool height = (kind != nullptr && kind->figure(1, 2) == 3) ||
+                        definition.axes.size() == 3 || node.find("LINUNIT") != nullptr;
     definition.kind = height ? SystemKind::geographic3d : SystemKind::geographic2d;
     definition.unit =
         unit != nullptr ? read_unit(*unit) : UnitDefinition{"degree", 9102, kDegreeInRadians};
