@@ -1,7 +1,7 @@
 // Satellites of the space oblique Mercator projection in the parameter store.
 
 #include "catalogue/session.hpp"
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "tidewater/catalogue.h"
 
 using namespace tidewater::detail;

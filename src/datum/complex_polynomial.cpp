@@ -3,8 +3,8 @@
 
 #include <cmath>
 
+#include "formulas/constants.hpp"
 #include "foundation/complex.hpp"
-#include "foundation/numeric.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;

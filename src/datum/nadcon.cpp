@@ -10,8 +10,8 @@
 
 #include "datum/grid_file.hpp"
 #include "datum/grid_window.hpp"
-#include "foundation/interpolation.hpp"
-#include "foundation/numeric.hpp"
+#include "formulas/interpolation.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;

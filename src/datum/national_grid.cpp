@@ -11,7 +11,7 @@
 #include <utility>
 
 #include "datum/grid_file.hpp"
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;

@@ -3,7 +3,7 @@
 #include <array>
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;

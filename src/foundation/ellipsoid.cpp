@@ -2,8 +2,8 @@
 
 #include <cmath>
 
+#include "formulas/constants.hpp"
 #include "foundation/meridian_arc.hpp"
-#include "foundation/numeric.hpp"
 #include "tidewater/foundation.h"
 
 namespace tidewater::detail {

@@ -5,7 +5,7 @@
 #include <cmath>
 #include <iterator>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 
 using namespace tidewater::detail;
 

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::detail;

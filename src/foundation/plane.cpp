@@ -2,8 +2,8 @@
 
 #include <cmath>
 
-#include "foundation/interpolation.hpp"
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
+#include "formulas/interpolation.hpp"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::detail;

@@ -15,7 +15,7 @@
 #include <cmath>
 #include <cstdint>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/lines.h"
 

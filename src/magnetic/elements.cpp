@@ -6,7 +6,7 @@
 #include <memory>
 #include <new>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/magnetic.h"
 

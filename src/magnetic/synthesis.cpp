@@ -5,7 +5,7 @@
 #include <cstring>
 #include <initializer_list>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/magnetic.h"
 

@@ -3,7 +3,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "projections/isometric_latitude.hpp"
 
 namespace tidewater::detail {

@@ -4,39 +4,9 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/isometric_latitude.hpp"
 
 namespace tidewater::detail {
-
-// Up to this eccentricity, above that of every ellipsoid of the earth, series stand in for the
-// library's functions; they are exact to the last bit or two there.
-inline constexpr double kSeriesEccentricity = 0.1;
-
-// e atanh(e sin p): how the ellipsoid's isometric latitude falls short of the sphere's.
-inline double eccentric_term(double e, double sin_lat) {
-  const double x = e * sin_lat;
-  if (std::fabs(e) <= kSeriesEccentricity) {
-    const double q = x * x;
-    const double high = (1.0 / 9 + q * (1.0 / 11)) + (q * q) * (1.0 / 13 + q * (1.0 / 15));
-    return e * x * ((1 + q * (1.0 / 3)) + (q * q) * ((1.0 / 5 + q * (1.0 / 7)) + (q * q) * high));
-  }
-  return e * std::atanh(x);
-}
-
-// exp(-d) for d = eccentric_term(e, ...).
-inline double eccentric_decay(double e, double d) {
-  if (std::fabs(e) <= kSeriesEccentricity) {  // then d is at most 0.0101
-    const double d2 = d * d;
-    return (1 - d) + d2 * ((1.0 / 2 - d * (1.0 / 6)) +
-                           d2 * ((1.0 / 24 - d * (1.0 / 120)) + d2 * (1.0 / 720)));
-  }
-  return std::exp(-d);
-}
-
-// ((1 - e sin p) / (1 + e sin p))^(e/2) = exp(-e atanh(e sin p)).
-inline double eccentric_factor(double e, double sin_lat) {
-  return eccentric_decay(e, eccentric_term(e, sin_lat));
-}
 
 // ln(tan(p/2 + pi/4) ((1 - e sin p) / (1 + e sin p))^(e/2)), the Mercator ordinate of latitude p.
 inline double isometric_latitude(double e, double lat) {

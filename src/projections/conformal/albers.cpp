@@ -4,10 +4,10 @@
 #include <algorithm>
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/radii.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/authalic.hpp"
 #include "projections/conformal/meridian_series.hpp"
-#include "projections/parallel_radius.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;

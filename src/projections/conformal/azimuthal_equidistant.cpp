@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <cmath>
 
+#include "formulas/constants.hpp"
 #include "foundation/meridian_arc.hpp"
-#include "foundation/numeric.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;

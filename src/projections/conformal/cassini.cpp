@@ -3,9 +3,9 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/pole_hold.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/conformal/meridian_series.hpp"
-#include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;

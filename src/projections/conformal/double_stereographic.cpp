@@ -1,7 +1,7 @@
 // Double stereographic: the ellipsoid onto the Gauss sphere, that turned to its pole, that
 // projected.
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 

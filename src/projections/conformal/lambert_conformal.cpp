@@ -3,10 +3,10 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/pole_hold.hpp"
+#include "formulas/radii.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/isometric_latitude.hpp"
-#include "projections/parallel_radius.hpp"
-#include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
@@ -83,7 +83,7 @@ void TWlam_c(double e, double /*lon0*/, double lat0, double lat1, double lat2, d
 
   if (one_parallel && std::fabs(lat1) > kPolarParallel) {
     // The cone has opened into the plane of the polar stereographic.
-    const double value = 2 * eccentric_factor(e, 1) / std::sqrt(1 - square(e));
+    const double value = 2 * eccentric_factor(e, 1.0) / std::sqrt(1 - square(e));
     *C = *n < 0 ? -value : value;
   } else {
     const double w = std::pow(t1, *n);

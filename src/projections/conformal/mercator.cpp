@@ -1,20 +1,12 @@
-// Mercator projection of the ellipsoid onto a plane of unit semi-major axis.
+// Mercator projection: what the contract says of the points that the formulas do not cover, and the
+// exported functions.
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
-#include "projections/isometric_latitude.hpp"
-#include "projections/pole_hold.hpp"
+#include "projections/conformal/mercator_points.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
-
-namespace {
-
-// The forward formula loses the ordinate this close to a pole.
-constexpr double kForwardLatLimit = kHalfPi - 1e-14;
-
-}  // namespace
 
 void TWmerc_c(double e, double lat0, double* y0, TWstatus* status) {
   *status = TW_SUCCESS;
@@ -22,48 +14,31 @@ void TWmerc_c(double e, double lat0, double* y0, TWstatus* status) {
     *status = TW_BAD_LATITUDE;
     return;
   }
-  *y0 = isometric_latitude(e, lat0);
+  *y0 = isometric_latitude(e, sincos(lat0));
+}
+
+Next MercatorForward::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_BAD_LATITUDE;
+  return Next::point;  // the failing point stays unwritten, the others are computed
 }
 
 void TWmerc_f(double e, double lon0, double y0, int32_t count, const CoordinateTriple* in,
               CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    const double lat = in[i].y;
-    if (std::fabs(lat) > kForwardLatLimit) {
-      *status = TW_BAD_LATITUDE;
-      continue;  // the failing point stays unwritten, the others are computed
-    }
-    out[i].x = wrap_above_then_below(lon - lon0);
-    out[i].y = isometric_latitude(e, lat) - y0;
-  }
+  *status = over_points(MercatorForward{e, lon0, y0}, count, in, out);
 }
 
 void TWmerc_i(double e, double lon0, double y0, int32_t count, const CoordinateTriple* in,
               CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    out[i].x = wrap_at_or_below_then_above(x + lon0);
-    out[i].y = latitude_at_rest(e, std::exp(-(y + y0)));
-  }
+  *status = over_points(MercatorInverse{lon0, y0, ConformalInverse(e)}, count, in, out);
+}
+
+Next MercatorScale::other(const CoordinateTriple&, CoordinateTriple* out, TWstatus* status) const {
+  *status = TW_BAD_LATITUDE;
+  *out = {k0, k0, k0 * k0};  // filled with the caller's scale
+  return Next::point;
 }
 
 void TWmerc_s(double e, double k0, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
               TWstatus* status) {
-  *status = TW_SUCCESS;
-  const double e2 = e * e;
-  for (int32_t i = 0; i < count; ++i) {
-    double lat = in[i].y;
-    double k = k0;
-    if (lat > kHalfPi || lat < -kHalfPi) {
-      *status = TW_BAD_LATITUDE;  // the point is filled with the caller's scale
-    } else {
-      lat = hold_off_poles(lat, 1e-10);
-      k = std::sqrt(1 - e2 * square(std::sin(lat))) * k0 / std::cos(lat);
-    }
-    out[i] = {k, k, k * k};
-  }
+  *status = over_points(MercatorScale{e * e, k0}, count, in, out);
 }

@@ -6,7 +6,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 
 namespace tidewater::detail {
 

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;

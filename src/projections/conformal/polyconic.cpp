@@ -3,8 +3,8 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
-#include "projections/pole_hold.hpp"
+#include "formulas/pole_hold.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;

@@ -4,7 +4,7 @@
 #include <cstdlib>
 #include <span>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "projections/conformal/state_plane_zones.hpp"
 #include "tidewater/conformal.h"
 

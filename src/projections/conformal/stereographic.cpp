@@ -3,9 +3,9 @@
 #include <cmath>
 #include <utility>
 
-#include "foundation/numeric.hpp"
+#include "formulas/radii.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/isometric_latitude.hpp"
-#include "projections/parallel_radius.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 

@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/conformal/meridian_series.hpp"
 #include "tidewater/conformal.h"
 

@@ -1,6 +1,6 @@
 // Parameters of the universal grids and of the British national grid.
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;

@@ -3,7 +3,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;

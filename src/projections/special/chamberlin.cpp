@@ -3,7 +3,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "projections/turn_points.hpp"
 #include "tidewater/datum.h"
 #include "tidewater/lines.h"

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;

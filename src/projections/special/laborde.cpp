@@ -3,7 +3,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 

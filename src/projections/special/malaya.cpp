@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <iterator>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;

@@ -3,7 +3,7 @@
 #include <cmath>
 #include <numbers>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "projections/special/cycle_watch.hpp"
 #include "tidewater/special.h"
 

@@ -3,9 +3,9 @@
 
 #include <cmath>
 
+#include "formulas/constants.hpp"
+#include "formulas/pole_hold.hpp"
 #include "foundation/complex.hpp"
-#include "foundation/numeric.hpp"
-#include "projections/pole_hold.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 

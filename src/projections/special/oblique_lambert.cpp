@@ -3,7 +3,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/turn_points.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/lines.h"

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/special/turns_about.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"

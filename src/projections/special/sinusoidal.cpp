@@ -2,8 +2,8 @@
 
 #include <cmath>
 
+#include "formulas/wraps.hpp"
 #include "foundation/meridian_arc.hpp"
-#include "foundation/numeric.hpp"
 #include "projections/special/turns_about.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/constants.hpp"
 #include "projections/isometric_latitude.hpp"
 #include "tidewater/special.h"
 

@@ -3,7 +3,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 
 namespace tidewater::detail {
 
@@ -17,8 +17,10 @@ inline double turns_about(double lon0, double lon) {
     const double near = wrap_turns_below_then_above(d);
     return near == d ? lon : lon0 + near;
   }
-  lon = add_turns_while(lon, kTwoPi, [lon0](double v) { return v - lon0 < -kPi; });
-  return add_turns_while(lon, -kTwoPi, [lon0](double v) { return v - lon0 > kPi; });
+  lon = add_turns_while(
+      lon, kTwoPi, [lon0](double v) { return v - lon0 < -kPi; }, lon0);
+  return add_turns_while(
+      lon, -kTwoPi, [lon0](double v) { return v - lon0 > kPi; }, lon0);
 }
 
 }  // namespace tidewater::detail

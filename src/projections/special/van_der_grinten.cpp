@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "foundation/numeric.hpp"
+#include "formulas/wraps.hpp"
 #include "projections/special/cycle_watch.hpp"
 #include "tidewater/special.h"
 
