@@ -222,7 +222,7 @@ void Call::shift(int32_t count, const CoordinateTriple* in, const NadconControl&
     x = add_turns_while(x, -360, [](double v) { return v > 0; });
     x = add_turns_while(x, 360, [](double v) { return v <= -360; });
     const NadconWindow& w = held.bounds;
-    if (!holds(w, x, y)) {
+    if (!holds_at_once(w, x, y)) {
       if (!files_) files_.emplace();
       *status = locate(x, y, control, &held.bounds, held.lon, held.lat, &*files_, &nodes_);
     }
