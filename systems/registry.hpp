@@ -23,8 +23,9 @@ struct Parameter {
 
 struct GridName {
   int parameter;
-  std::string name;       // the registry's file name
-  std::string proj_name;  // PROJ's name of its own form of the grid, empty where it has none
+  std::string name;            // the registry's file name
+  std::string proj_name;       // PROJ's name of its own form of the grid, empty where it has none
+  bool proj_reversed = false;  // PROJ's form holds the shifts the other way
 };
 
 struct SystemRecord {
@@ -96,9 +97,17 @@ struct OperationRecord {
   int interpolation;  // the system in which a grid is read, 0 where it is the source
   int area;
   double accuracy;  // metres, NaN unknown
+  int replaced_by;  // a later operation between the same two systems, 0 where there is none
   std::vector<Parameter> parameters;
   std::vector<GridName> grids;
   std::vector<int> steps;  // of a concatenated operation, in order; a step may have to be inverted
+};
+
+// A system that the registry has withdrawn.
+struct DeprecatedSystem {
+  int code;
+  std::string name;
+  int replaced_by;  // 0 where nothing takes its place
 };
 
 // A system that a search has found, the best first.
@@ -108,12 +117,14 @@ struct Found {
   SystemKind kind;
 };
 
-// Everything is read into memory once, when the registry is first asked; after that no call reads
-// the store, and any number of threads may call at once.
+// The constructor reads everything into memory.  After it no call reads the store, and any number
+// of threads may call at once.  The reading opens a store of its own on the calling thread and
+// closes it: a walk that the thread has open through the store operations ends.
 class Registry {
  public:
   // The registry of the store that the environment variable TIDEWATER_STORE names, else of the one
-  // beside the library.  Throws an Error where there is none; the next call tries again.
+  // beside the library; read at the first call.  Throws an Error where there is none; the next call
+  // tries again.
   static const Registry& shared();
 
   // The registry of a store.  Throws an Error where the store cannot be read or has no registry.
@@ -131,11 +142,18 @@ class Registry {
   std::optional<AreaRecord> area(int code) const;
   std::optional<ConversionRecord> conversion(int code) const;
   std::optional<OperationRecord> operation(int code) const;
+  // The other records are of what the registry has not withdrawn.
+  std::optional<DeprecatedSystem> deprecated(int code) const;
   // The registry's names of methods and parameters; empty where it has none.
   std::string method_name(int code) const;
   std::string parameter_name(int code) const;
 
-  // By name, without regard to case, accents and punctuation; of several the smallest code.
+  // A parameter's value in radians, metres, one, decimal years, or these per second.  Throws an
+  // Error where the unit is none that numbers have.
+  double base_value(const Parameter& parameter) const;
+
+  // By name or other name, without regard to case, accents, blanks and punctuation; of several the
+  // oldest entry.
   std::optional<SystemRecord> system(std::string_view name) const;
   std::optional<DatumRecord> datum(std::string_view name) const;
   std::optional<EllipsoidRecord> ellipsoid(std::string_view name) const;
@@ -165,8 +183,5 @@ class Registry {
   struct Tables;
   std::unique_ptr<const Tables> tables_;
 };
-
-// A text without case, accents and punctuation: small letters and digits, words apart by one blank.
-std::string folded(std::string_view text);
 
 }  // namespace tidewater::detail
