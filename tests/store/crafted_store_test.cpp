@@ -288,7 +288,7 @@ TEST_F(CraftedStore, CoefficientTablesHoldTheirDegree) {
       {12, 90, "table \"e\": row 1: degree 12 needs 91 coefficients, table \"c\" has 90"},
       {12, 3, "degree 12 needs 91 coefficients"},
       {32767, 91, "degree 32767 needs 536887296 coefficients"},
-      {1, 3, "row 1: degree 1, 2 at least are needed"}};
+      {1, 3, nullptr}};
   for (const auto& [degree, rows, words] : kModels) {
     SCOPED_TRACE(degree);
     SourceFolder sources;
