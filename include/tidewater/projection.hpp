@@ -25,7 +25,7 @@ struct Factors {
   double meridional;  /**< scale along the meridian, h */
   double parallel;    /**< scale along the parallel, k */
   double areal;       /**< scale of areas */
-  double convergence; /**< degrees, from grid north to the meridian's image, clockwise positive */
+  double convergence; /**< bearing of grid north from true north, degrees, clockwise positive */
   double angular;     /**< largest angular distortion, degrees */
 };
 
