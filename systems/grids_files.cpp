@@ -369,7 +369,7 @@ std::string find_grid(const std::string& name, const std::vector<std::string>& f
   }
   std::string looked;
   for (const std::string& folder : folders) {
-    const std::string path = (fs::path(folder) / name).string();
+    std::string path = (fs::path(folder) / name).string();
     if (is_grid(path)) return path;
     looked += (looked.empty() ? "" : ", ") + folder;
   }
