@@ -1,5 +1,6 @@
-// Shift grids and geoid on a track, whose points follow one another, and scattered at random. A
-// scattered point nearly always makes a new window be read from the files.
+// Shift grids and geoid on a track, whose points follow one another, and scattered at random, in
+// calls of 10,000.  A scattered point nearly always makes a new window be loaded.
+#include <algorithm>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -7,6 +8,7 @@
 #include <string>
 
 #include "harness.hpp"
+#include "support/grids.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::bench;
@@ -18,9 +20,9 @@ constexpr double kDegree = 3.14159265358979323846 / 180;
 
 // A line of some 200 km, a point every 50 m.
 std::vector<CoordinateTriple> track(double west, double south, double east, double north) {
-  std::vector<CoordinateTriple> points(kPoints);
-  for (int32_t i = 0; i < kPoints; ++i) {
-    const double t = static_cast<double>(i) / kPoints;
+  std::vector<CoordinateTriple> points(static_cast<std::size_t>(tidewater::bench::points()));
+  for (int32_t i = 0; i < tidewater::bench::points(); ++i) {
+    const double t = static_cast<double>(i) / tidewater::bench::points();
     points[static_cast<std::size_t>(i)] = {(west + t * (east - west)) * kDegree,
                                            (south + t * (north - south)) * kDegree, 100};
   }
@@ -33,23 +35,46 @@ fs::path data() {
   return named ? named : TIDEWATER_SHARED_DATA;
 }
 
+// The peer reads no .las and .los files: it is given the same nodes as an NTv2 file, whose
+// longitudes run the other way.
+std::string as_national(const NadconGrid& g, const fs::path& las, const fs::path& los) {
+  const std::string lat = tidewater::test::file_bytes(las), lon = tidewater::test::file_bytes(los);
+  const auto value = [&g](const std::string& bytes, int row, int col) {
+    const auto index = (row + 1) * (g.nc + 1) + 1 + (g.nc - 1 - col);
+    return tidewater::test::f32_at(bytes, 4 * static_cast<std::size_t>(index));
+  };
+  constexpr double kSeconds = 3600;
+  const tidewater::test::SubGrid grid{.name = "NADCON",
+                                      .parent = "NONE",
+                                      .s_lat = g.ymin * kSeconds,
+                                      .n_lat = g.ymax * kSeconds,
+                                      .e_long = -g.xmax * kSeconds,
+                                      .w_long = -g.xmin * kSeconds,
+                                      .inc = g.dy * kSeconds,
+                                      .lat = [&](int row, int col) { return value(lat, row, col); },
+                                      .lon = [&](int row, int col) { return value(lon, row, col); },
+                                      .long_inc = g.dx * kSeconds};
+  const fs::path path = fs::temp_directory_path() / "tidewater-bench-nadcon.gsb";
+  std::ofstream(path, std::ios::binary) << tidewater::test::GsbFile{{grid}}.bytes();
+  return path.string();
+}
+
 void add_nadcon() {
   const auto control = std::make_shared<NadconControl>();
-  TWstatus status = 0;
-  TWnadcon_c((data() / "nadcon/").string().c_str(), control.get(), &status);
-  if (!TW_OK(status)) return;
+  TWstatus word = 0;
+  TWnadcon_c((data() / "nadcon/").string().c_str(), control.get(), &word);
+  if (!TW_OK(word)) return;
+  const fs::path folder = data() / "nadcon";
+  const auto* const conus =
+      std::ranges::find(control->grids, std::string("conus"), &NadconGrid::name);
+  const std::string peer_grid = as_national(*conus, folder / "conus.las", folder / "conus.los");
   for (const auto& [name, points] :
        {std::pair{"track", track(-100, 38, -98, 39)}, {"scattered", box(-120, 30, -75, 45)}}) {
-    const auto forward = [control, points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWnadcon_f(kPoints, points.data(), control.get(), out.data(), &word);
-      keep(out.back().y);
-    };
     add({std::string("NADCON forward, ") + name,
-         "PROJ",
-         forward,
-         proj_kernel("+proj=hgridshift +grids=conus", true, points),
-         {}});
+         ours(points, TW_CALL(TWnadcon_f(n, in, control.get(), out, &status))),
+         {"PROJ, as NTv2"},
+         {proj("+proj=hgridshift +grids=" + peer_grid, true, points)},
+         ground_apart});
   }
 }
 
@@ -61,51 +86,37 @@ void add_national() {
   fs::create_directories(folder);
   fs::copy_file(grid, folder / "ntf_r93.gsb", fs::copy_options::overwrite_existing);
   std::ofstream(folder / "area.par") << "ntf_r93\n";
-  TWstatus status = 0;
-  TWcnt_c((folder.string() + "/").c_str(), 0, &status);
-  if (!TW_OK(status)) return;
+  TWstatus word = 0;
+  TWcnt_c((folder.string() + "/").c_str(), 0, &word);
+  if (!TW_OK(word)) return;
   for (const auto& [name, points] :
        {std::pair{"track", track(-2, 46, -0.5, 47.5)}, {"scattered", box(-4.5, 43, -0.1, 50)}}) {
     const char* definition = "+proj=hgridshift +grids=ntf_r93.gsb";
-    const auto forward = [points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWcnt_f(kPoints, points.data(), 0, out.data(), &word);
-      keep(out.back().y);
-    };
-    const auto inverse = [points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWcnt_i(kPoints, points.data(), 0, out.data(), &word);
-      keep(out.back().y);
-    };
     add({std::string("NTv2 forward, ") + name,
-         "PROJ",
-         forward,
-         proj_kernel(definition, true, points),
-         {}});
+         ours(points, TW_CALL(TWcnt_f(n, in, 0, out, &status))),
+         {"PROJ"},
+         {proj(definition, true, points)},
+         ground_apart});
     add({std::string("NTv2 inverse, ") + name,
-         "PROJ",
-         inverse,
-         proj_kernel(definition, false, points),
-         {}});
+         ours(points, TW_CALL(TWcnt_i(n, in, 0, out, &status))),
+         {"PROJ"},
+         {proj(definition, false, points)},
+         ground_apart});
   }
 }
 
 void add_geoid() {
   const auto control = std::make_shared<GeoidControl>();
-  TWstatus status = 0;
-  TWgeo90_c((data() / "geoid/").string().c_str(), control.get(), &status);
-  if (!TW_OK(status)) return;
+  TWstatus word = 0;
+  TWgeo90_c((data() / "geoid/").string().c_str(), control.get(), &word);
+  if (!TW_OK(word)) return;
   for (const auto& [name, points] :
        {std::pair{"track", track(-100, 38, -98, 39)}, {"scattered", box(-125, 25, -75, 50)}}) {
-    const auto forward = [control, points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWgeo90_f(kPoints, points.data(), control.get(), out.data(), &word);
-      keep(out.back().z);
-    };
+    // Another model and another interpolation: not compared.
     add({std::string("Geoid height, ") + name,
-         "PROJ (bilinear)",
-         forward,
-         proj_kernel("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1", true, points),
+         ours(points, TW_CALL(TWgeo90_f(n, in, control.get(), out, &status))),
+         {"PROJ, bilinear"},
+         {proj("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1", true, points)},
          {}});
   }
 }
