@@ -3,6 +3,7 @@
 #include "formulas/krovak.hpp"
 
 #include "makers.hpp"
+#include "projection_points.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
@@ -13,18 +14,20 @@ namespace {
 // Mercator, transverse Mercator and the rest take these arguments last.
 #define TW_BLOCK int count, const CoordinateTriple *in, CoordinateTriple *out, TWstatus *status
 
-struct TransverseMercator {
-  double e, lat0;
-  double A0, A2, A4, A6, A8, M0, B2, B4, B6;
+// By series: within 5 nm to 3,900 km from the central meridian, a refusal beyond.
+struct TransverseMercatorMap {
+  TransverseMercatorForward to_plane;
+  TransverseMercatorInverse to_ellipsoid;
 
-  TransverseMercator(double eccentricity, double lat_origin) : e(eccentricity), lat0(lat_origin) {
-    TWstatus made;
-    TWt_merc_c(e, 0, lat0, &A0, &A2, &A4, &A6, &A8, &M0, &B2, &B4, &B6, &made);
+  TransverseMercatorMap(const MethodArguments& given, double scale)
+      : to_plane{TransverseMercator(given.a, given.f, scale), 0}, to_ellipsoid{to_plane.map, 0} {
+    require(given.f <= TransverseMercator::kLargestFlattening, given,
+            "the series do not reach a flattening above 1/150");
+    to_plane.y0 = to_plane.map.forward(0.0, given(kLat0)).y;
+    to_ellipsoid.y0 = to_plane.y0;
   }
-  void forward(TW_BLOCK) const { TWt_merc_f(e, 0, A0, A2, A4, A6, A8, M0, count, in, out, status); }
-  void inverse(TW_BLOCK) const {
-    TWt_merc_i(e, 0, lat0, A0, M0, B2, B4, B6, count, in, out, status);
-  }
+  void forward(TW_BLOCK) const { *status = over_points(to_plane, count, in, out); }
+  void inverse(TW_BLOCK) const { *status = over_points(to_ellipsoid, count, in, out); }
 };
 
 // The block functions of a value that has forward() and inverse().
@@ -33,12 +36,6 @@ Made block_formula(const Plane& plane, const T& map) {
   return formula(
       plane, [map](TW_BLOCK) { map.forward(count, in, out, status); },
       [map](TW_BLOCK) { map.inverse(count, in, out, status); });
-}
-
-Plane mirrored(Plane plane) {
-  plane.sx = -plane.sx;
-  plane.sy = -plane.sy;
-  return plane;
 }
 
 Made lambert(const MethodArguments& given, const Plane& plane, double lat0, double lat1,
@@ -118,8 +115,8 @@ double polar_scale(double e, double lat) {
 
 Made krovak(const MethodArguments& given, bool modified, double sign) {
   // Southing and westing are the second and first axis of the registry's grid.
-  const points::Krovak map(given.a, given.e, given(kLatC), given(kColatitude),
-                           given(kPseudoParallel), given(kPseudoScale, 1), modified);
+  const Krovak map(given.a, given.e, given(kLatC), given(kColatitude), given(kPseudoParallel),
+                   given(kPseudoScale, 1), modified);
   const Plane plane = {given(kLonOrigin), sign, sign, sign * given(kX0), sign * given(kY0)};
   require(std::isfinite(map.r0) && std::isfinite(map.t0), given, "its constants are not finite");
   return pointwise(
@@ -136,23 +133,34 @@ Made krovak(const MethodArguments& given, bool modified, double sign) {
 
 }  // namespace
 
+Next TransverseMercatorForward::other(const CoordinateTriple&, CoordinateTriple*,
+                                      TWstatus* status) const {
+  *status = TW_RANGE_ERROR;  // too far from the central meridian
+  return Next::point;
+}
+
+Next TransverseMercatorInverse::other(const CoordinateTriple&, CoordinateTriple*,
+                                      TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
 Made make_transverse_mercator(const MethodArguments& given) {
-  return block_formula(natural_plane(given, given(kK0, 1)),
-                       TransverseMercator(given.e, given(kLat0)));
+  return block_formula(Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
+                       TransverseMercatorMap(given, given(kK0, 1)));
 }
 
 Made make_transverse_mercator_south(const MethodArguments& given) {
-  return block_formula(mirrored(natural_plane(given, given(kK0, 1))),
-                       TransverseMercator(given.e, given(kLat0)));
+  return block_formula(Plane{given(kLon0), -1, -1, given(kX0), given(kY0)},
+                       TransverseMercatorMap(given, given(kK0, 1)));
 }
 
 // Each zone's million is put before its easting.
 Made make_zoned_transverse_mercator(const MethodArguments& given) {
-  const TransverseMercator map(given.e, given(kLat0));
+  const TransverseMercatorMap map(given, given(kK0, 1));
   const double first = given(kInitialLon);
   const double width = given(kZoneWidth);
   require(width > 0, given, "the zone width must be above zero");
-  const double scale = given.a * given(kK0, 1);
   const double x0 = given(kX0);
   const double y0 = given(kY0);
   const auto centre = [=](double zone) { return first + (zone - 0.5) * width; };
@@ -165,8 +173,8 @@ Made make_zoned_transverse_mercator(const MethodArguments& given) {
           const double zone = 1 + std::floor(from / width);
           CoordinateTriple point = {std::remainder(in[i].x - centre(zone), 2 * kPi), in[i].y, 0};
           map.forward(1, &point, &point, status);
-          out[i].x = zone * 1e6 + x0 + scale * point.x;
-          out[i].y = y0 + scale * point.y;
+          out[i].x = zone * 1e6 + x0 + point.x;
+          out[i].y = y0 + point.y;
         }
       },
       [=](TW_BLOCK) {
@@ -177,7 +185,7 @@ Made make_zoned_transverse_mercator(const MethodArguments& given) {
             *status = TW_BAD_ZONE;
             continue;
           }
-          CoordinateTriple point = {(in[i].x - zone * 1e6 - x0) / scale, (in[i].y - y0) / scale, 0};
+          CoordinateTriple point = {in[i].x - zone * 1e6 - x0, in[i].y - y0, 0};
           map.inverse(1, &point, &point, status);
           out[i].x = point.x + centre(zone);
           out[i].y = point.y;

@@ -15,7 +15,6 @@ namespace {
 
 #define TW_BLOCK int count, const CoordinateTriple *in, CoordinateTriple *out, TWstatus *status
 
-
 // The authalic latitude, whose series serve the ellipsoids of the Earth and others up to e = 0.2.
 struct Authalic {
   double radius;  // of the authalic sphere
@@ -23,10 +22,10 @@ struct Authalic {
 
   explicit Authalic(const MethodArguments& given)
       : radius(std::sqrt(authalic_radius_squared(given.a, given.f))),
-        to_authalic(latitude_series(Latitude::geodetic, Latitude::authalic,
-                                    third_flattening(given.f))),
-        to_geodetic(latitude_series(Latitude::authalic, Latitude::geodetic,
-                                    third_flattening(given.f))) {}
+        to_authalic(
+            latitude_series(Latitude::geodetic, Latitude::authalic, third_flattening(given.f))),
+        to_geodetic(
+            latitude_series(Latitude::authalic, Latitude::geodetic, third_flattening(given.f))) {}
 };
 
 double transverse_radius(const MethodArguments& given, double lat) {
@@ -211,13 +210,13 @@ Made make_equal_earth(const MethodArguments& given) {
       plane,
       [=](double lon, double lat) {
         Pair answer{};
-        points::EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
+        EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
         answer.plain = true;
         return answer;
       },
       [=](double x, double y) {
         Pair answer{};
-        answer.plain = points::EqualEarth::inverse(x, y, &answer.x, &answer.y);
+        answer.plain = EqualEarth::inverse(x, y, &answer.x, &answer.y);
         answer.y = sphere.to_geodetic(answer.y);
         return answer;
       });
@@ -386,7 +385,7 @@ Made make_guam(const MethodArguments& given) {
 }
 
 Made make_colombia_urban(const MethodArguments& given) {
-  const points::ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
+  const ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](double lon, double lat) {
