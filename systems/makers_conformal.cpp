@@ -1,6 +1,7 @@
 // Conformal methods.
 #include <optional>
 #include "formulas/krovak.hpp"
+#include "formulas/oblique_mercator.hpp"
 
 #include "makers.hpp"
 #include "projection_points.hpp"
@@ -64,32 +65,6 @@ Made mercator(const MethodArguments& given, const Plane& plane, double e, double
 double parallel_radius(double e2, double lat) {
   const double s = std::sin(lat);
   return std::cos(lat) / std::sqrt(1 - e2 * s * s);
-}
-
-// Hotine's oblique Mercator about the crossing of its line with the aposphere's equator; `centre`
-// moves the origin to a point.
-Made oblique_mercator(const MethodArguments& given, Plane plane, int16_t mode, double lon1,
-                      double lat1, double lon2, double lat2, double azimuth,
-                      std::optional<double> rotation, bool from_centre) {
-  const double e = given.e;
-  double lat0 = given(kLatC);
-  double alpha = azimuth;
-  double B, A, E, crossing, gamma0;
-  TWstatus made;
-  TWo_merc_c(mode, e, lon1, lat1, lon2, lat2, &lat0, &alpha, &B, &A, &E, &crossing, &gamma0, &made);
-  require(made, given);
-  const double turn = rotation.value_or(alpha);
-  if (from_centre) {
-    CoordinateTriple centre = {lon1, lat1, 0};
-    TWo_merc_f(e, turn, gamma0, crossing, E, B, A, 1, &centre, &centre, &made);
-    require(made, given);
-    plane.x0 -= plane.sx * centre.x;
-    plane.y0 -= plane.sy * centre.y;
-  }
-  return formula(
-      plane,
-      [=](TW_BLOCK) { TWo_merc_f(e, turn, gamma0, crossing, E, B, A, count, in, out, status); },
-      [=](TW_BLOCK) { TWo_merc_i(e, turn, gamma0, crossing, E, B, A, count, in, out, status); });
 }
 
 Made polar_stereographic(const MethodArguments& given, const Plane& plane, double pole) {
@@ -248,33 +223,66 @@ Made make_pseudo_mercator(const MethodArguments& given) {
   return mercator(given, natural_plane(given, 1), 0, 0);
 }
 
-Made make_oblique_mercator_a(const MethodArguments& given) {
+namespace {
+
+// The skew coordinates turned to the grid; from the line's crossing or from the centre.
+Made hotine(const MethodArguments& given, double x0, double y0, double azimuth, double turn,
+            bool from_centre) {
+  const double lat = given(kLatC);
+  require(std::fabs(lat) < kHalfPi - 1e-10, given, "its centre lies at a pole");
+  const ObliqueMercator map(given.e, lat, azimuth);
   const double scale = given.a * given(kLineScale, 1);
+  const double c = std::cos(turn);
+  const double s = std::sin(turn);
+  const double u0 = from_centre ? map.centre_u : 0;
+  return pointwise(
+      Plane{given(kLonC), scale, scale, x0, y0},
+      [=](double lon, double lat_of_point) {
+        double u, v;
+        const bool plain = map.forward(lon, lat_of_point, &u, &v);
+        u -= u0;
+        return Pair{v * c + u * s, u * c - v * s, plain};
+      },
+      [=](double x, double y) {
+        Pair answer{};
+        map.inverse(y * c + x * s + u0, x * c - y * s, &answer.x, &answer.y);
+        answer.plain = std::isfinite(answer.x) && std::isfinite(answer.y);
+        return answer;
+      });
+}
+
+}  // namespace
+
+Made make_oblique_mercator_a(const MethodArguments& given) {
   const double azimuth = given(kAzimuth);
-  return oblique_mercator(given, {given(kLonC), scale, scale, given(kX0), given(kY0)}, 1, 0,
-                          given(kLatC), 0, 0, azimuth, given(kRectifiedAngle, azimuth), false);
+  return hotine(given, given(kX0), given(kY0), azimuth, given(kRectifiedAngle, azimuth), false);
 }
 
 Made make_oblique_mercator_b(const MethodArguments& given) {
-  const double scale = given.a * given(kLineScale, 1);
   const double azimuth = given(kAzimuth);
-  return oblique_mercator(given, {given(kLonC), scale, scale, given(kXC), given(kYC)}, 1, 0,
-                          given(kLatC), 0, 0, azimuth, given(kRectifiedAngle, azimuth), true);
+  return hotine(given, given(kXC), given(kYC), azimuth, given(kRectifiedAngle, azimuth), true);
 }
 
 Made make_swiss_oblique(const MethodArguments& given) {
-  const double scale = given.a * given(kLineScale, 1);
-  return oblique_mercator(given, {given(kLonC), scale, scale, given(kXC), given(kYC)}, 1, 0,
-                          given(kLatC), 0, 0, kHalfPi, kHalfPi, true);
+  return hotine(given, given(kXC), given(kYC), kHalfPi, kHalfPi, true);
 }
 
 Made make_two_point_oblique(const MethodArguments& given) {
-  const double scale = given.a * given(kLineScale, 1);
+  const double e = given.e;
   const double lon1 = given(kLongitudeOfFirstPoint);
-  return oblique_mercator(given, {lon1, scale, scale, given(kX0), given(kY0)}, 2, 0,
-                          given(kLatitudeOfFirstPoint),
-                          std::remainder(given(kLongitudeOfSecondPoint) - lon1, 2 * kPi),
-                          given(kLatitudeOfSecondPoint), 0, std::nullopt, false);
+  double lat0 = given(kLatC);
+  double alpha = 0;
+  double B, A, E, crossing, gamma0;
+  TWstatus made;
+  TWo_merc_c(2, e, 0, given(kLatitudeOfFirstPoint),
+             std::remainder(given(kLongitudeOfSecondPoint) - lon1, 2 * kPi),
+             given(kLatitudeOfSecondPoint), &lat0, &alpha, &B, &A, &E, &crossing, &gamma0, &made);
+  require(made, given);
+  const double scale = given.a * given(kLineScale, 1);
+  return formula(
+      Plane{lon1, scale, scale, given(kX0), given(kY0)},
+      [=](TW_BLOCK) { TWo_merc_f(e, alpha, gamma0, crossing, E, B, A, count, in, out, status); },
+      [=](TW_BLOCK) { TWo_merc_i(e, alpha, gamma0, crossing, E, B, A, count, in, out, status); });
 }
 
 Made make_laborde(const MethodArguments& given) {

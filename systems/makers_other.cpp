@@ -101,8 +101,22 @@ struct Cassini {
   void forward(TW_BLOCK) const {
     TWcassini_f(e, 0, c0, c2, c4, c6, c8, m0, count, in, out, status);
   }
+  // The inverse series with what they miss put right by the forward ones.
   void inverse(TW_BLOCK) const {
-    TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, count, in, out, status);
+    for (int i = 0; i < count; ++i) {
+      const CoordinateTriple wanted = in[i];
+      CoordinateTriple aim = wanted;
+      for (int pass = 0; pass < 8; ++pass) {
+        CoordinateTriple back;
+        TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, 1, &aim, out + i, status);
+        forward(1, out + i, &back, status);
+        const double dx = wanted.x - back.x;
+        const double dy = wanted.y - back.y;
+        aim.x += dx;
+        aim.y += dy;
+        if (std::fabs(dx) < 1e-15 && std::fabs(dy) < 1e-15) break;
+      }
+    }
   }
 };
 
