@@ -70,7 +70,8 @@ TEST(Latitudes, MeridianArcOfTheWorldGeodeticSystem) {
     const MeridianArc on(1, row.f);
     if (std::fabs(third_flattening(row.f)) > kLargestSeriesN) continue;
     EXPECT_NEAR(on.arc(row.lat[0]), on.radius * row.lat[2], 4e-16);
-    EXPECT_NEAR(on.latitude(on.radius * row.lat[2]), row.lat[0], 4e-16);
+    // Two roundings more than the series alone.
+    EXPECT_NEAR(on.latitude(on.radius * row.lat[2]), row.lat[0], 7e-16);
   }
 }
 
