@@ -7,6 +7,7 @@
 #include "formulas/latitudes.hpp"
 #include "makers.hpp"
 #include "tidewater/conformal.h"
+#include "tidewater/lines.hpp"
 #include "tidewater/special.h"
 
 namespace tidewater::detail {
@@ -364,8 +365,25 @@ Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
       [=](TW_BLOCK) { TWaz_eq_i(e, 0, lat0, n1, count, in, out, status); });
 }
 
+// By the geodesics from the origin: distances and azimuths from it are true everywhere.
 Made make_azimuthal_equidistant(const MethodArguments& given) {
-  return make_modified_azimuthal_equidistant(given);
+  const Geodesic lines(given.a, given.f);
+  const double lat0 = given(kLat0) * kDegreesPerRadian;
+  return pointwise(
+      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
+      [=](double lon, double lat) {
+        const LineCourse course =
+            lines.inverse(0, lat0, lon * kDegreesPerRadian, lat * kDegreesPerRadian);
+        const double azimuth = course.azimuth1 * kRadiansPerDegree;
+        return Pair{course.length * std::sin(azimuth), course.length * std::cos(azimuth),
+                    std::isfinite(course.length)};
+      },
+      [=](double x, double y) {
+        const LineEnd end =
+            lines.direct(0, lat0, std::atan2(x, y) * kDegreesPerRadian, std::hypot(x, y));
+        return Pair{end.lon * kRadiansPerDegree, end.lat * kRadiansPerDegree,
+                    std::isfinite(end.lat)};
+      });
 }
 
 // IOGP Publication 373-7-2, method 9831.
