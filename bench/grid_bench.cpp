@@ -17,14 +17,13 @@ namespace fs = std::filesystem;
 
 namespace {
 
-constexpr int32_t kCall = 10000;
 constexpr double kDegree = 3.14159265358979323846 / 180;
 
 // A line of some 200 km, a point every 50 m.
 std::vector<CoordinateTriple> track(double west, double south, double east, double north) {
-  std::vector<CoordinateTriple> points(kCall);
-  for (int32_t i = 0; i < kCall; ++i) {
-    const double t = static_cast<double>(i) / kCall;
+  std::vector<CoordinateTriple> points(static_cast<std::size_t>(tidewater::bench::points()));
+  for (int32_t i = 0; i < tidewater::bench::points(); ++i) {
+    const double t = static_cast<double>(i) / tidewater::bench::points();
     points[static_cast<std::size_t>(i)] = {(west + t * (east - west)) * kDegree,
                                            (south + t * (north - south)) * kDegree, 100};
   }
@@ -63,26 +62,20 @@ std::string as_national(const NadconGrid& g, const fs::path& las, const fs::path
 
 void add_nadcon() {
   const auto control = std::make_shared<NadconControl>();
-  TWstatus status = 0;
-  TWnadcon_c((data() / "nadcon/").string().c_str(), control.get(), &status);
-  if (!TW_OK(status)) return;
+  TWstatus word = 0;
+  TWnadcon_c((data() / "nadcon/").string().c_str(), control.get(), &word);
+  if (!TW_OK(word)) return;
   const fs::path folder = data() / "nadcon";
   const auto* const conus =
       std::ranges::find(control->grids, std::string("conus"), &NadconGrid::name);
   const std::string peer_grid = as_national(*conus, folder / "conus.las", folder / "conus.los");
-  for (const auto& [name, points] : {std::pair{"track", track(-100, 38, -98, 39)},
-                                     {"scattered", box(-120, 30, -75, 45, kCall)}}) {
-    const auto forward = [control, points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWnadcon_f(kCall, points.data(), control.get(), out.data(), &word);
-      keep(out.back().y);
-    };
+  for (const auto& [name, points] :
+       {std::pair{"track", track(-100, 38, -98, 39)}, {"scattered", box(-120, 30, -75, 45)}}) {
     add({std::string("NADCON forward, ") + name,
-         "PROJ (NTv2)",
-         forward,
-         proj_kernel("+proj=hgridshift +grids=" + peer_grid, true, points),
-         {},
-         kCall});
+         ours(points, TW_CALL(TWnadcon_f(n, in, control.get(), out, &status))),
+         {"PROJ, as NTv2"},
+         {proj("+proj=hgridshift +grids=" + peer_grid, true, points)},
+         ground_apart});
   }
 }
 
@@ -94,105 +87,88 @@ void add_national() {
   fs::create_directories(folder);
   fs::copy_file(grid, folder / "ntf_r93.gsb", fs::copy_options::overwrite_existing);
   std::ofstream(folder / "area.par") << "ntf_r93\n";
-  TWstatus status = 0;
-  TWcnt_c((folder.string() + "/").c_str(), 0, &status);
-  if (!TW_OK(status)) return;
-  for (const auto& [name, points] : {std::pair{"track", track(-2, 46, -0.5, 47.5)},
-                                     {"scattered", box(-4.5, 43, -0.1, 50, kCall)}}) {
+  TWstatus word = 0;
+  TWcnt_c((folder.string() + "/").c_str(), 0, &word);
+  if (!TW_OK(word)) return;
+  for (const auto& [name, points] :
+       {std::pair{"track", track(-2, 46, -0.5, 47.5)}, {"scattered", box(-4.5, 43, -0.1, 50)}}) {
     const char* definition = "+proj=hgridshift +grids=ntf_r93.gsb";
-    const auto forward = [points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWcnt_f(kCall, points.data(), 0, out.data(), &word);
-      keep(out.back().y);
-    };
-    const auto inverse = [points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWcnt_i(kCall, points.data(), 0, out.data(), &word);
-      keep(out.back().y);
-    };
     add({std::string("NTv2 forward, ") + name,
-         "PROJ",
-         forward,
-         proj_kernel(definition, true, points),
-         {},
-         kCall});
+         ours(points, TW_CALL(TWcnt_f(n, in, 0, out, &status))),
+         {"PROJ"},
+         {proj(definition, true, points)},
+         ground_apart});
     add({std::string("NTv2 inverse, ") + name,
-         "PROJ",
-         inverse,
-         proj_kernel(definition, false, points),
-         {},
-         kCall});
+         ours(points, TW_CALL(TWcnt_i(n, in, 0, out, &status))),
+         {"PROJ"},
+         {proj(definition, false, points)},
+         ground_apart});
   }
 }
 
 void add_geoid() {
   const auto control = std::make_shared<GeoidControl>();
-  TWstatus status = 0;
-  TWgeo90_c((data() / "geoid/").string().c_str(), control.get(), &status);
-  if (!TW_OK(status)) return;
-  for (const auto& [name, points] : {std::pair{"track", track(-100, 38, -98, 39)},
-                                     {"scattered", box(-125, 25, -75, 50, kCall)}}) {
-    const auto forward = [control, points = points, out = points]() mutable {
-      TWstatus word = 0;
-      TWgeo90_f(kCall, points.data(), control.get(), out.data(), &word);
-      keep(out.back().z);
-    };
+  TWstatus word = 0;
+  TWgeo90_c((data() / "geoid/").string().c_str(), control.get(), &word);
+  if (!TW_OK(word)) return;
+  for (const auto& [name, points] :
+       {std::pair{"track", track(-100, 38, -98, 39)}, {"scattered", box(-125, 25, -75, 50)}}) {
+    // Another model and another interpolation: not compared.
     add({std::string("Geoid height, ") + name,
-         "PROJ (bilinear)",
-         forward,
-         proj_kernel("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1", true, points),
-         {},
-         kCall});
+         ours(points, TW_CALL(TWgeo90_f(n, in, control.get(), out, &status))),
+         {"PROJ, bilinear"},
+         {proj("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1", true, points)},
+         {}});
   }
 }
 
 // The systems layer's objects, which take degrees, on the same points.
-template <class Grid, class Call>
-Kernel object_kernel(std::shared_ptr<Grid> grid, std::vector<CoordinateTriple> points, Call call) {
+template <class Grid, class Work>
+void add_object(const std::string& name, const Grid& grid, const std::string& peer_name,
+                const std::shared_ptr<Side>& peer, const std::vector<CoordinateTriple>& in,
+                Work work) {
+  std::vector<CoordinateTriple> points = in;
   for (CoordinateTriple& p : points) p = {p.x / kDegree, p.y / kDegree, p.z};
-  return [grid, points, out = points, call]() mutable {
-    call(*grid, tidewater::Coordinates<const double>{&points[0].x, &points[0].y, &points[0].z, 3},
-         tidewater::Coordinates<double>{&out[0].x, &out[0].y, &out[0].z, 3});
-    keep(out.back().x);
+  const auto out = std::make_shared<std::vector<CoordinateTriple>>(points);
+  const auto run = [grid, points, out, work] {
+    const auto* from = points.data();
+    auto* to = out->data();
+    work(grid, points.size(), tidewater::Coordinates<const double>{&from->x, &from->y, &from->z, 3},
+         tidewater::Coordinates<double>{&to->x, &to->y, &to->z, 3});
   };
+  const auto result = [out](std::size_t i) {
+    const CoordinateTriple& p = (*out)[i];
+    return CoordinateTriple{p.x * kDegree, p.y * kDegree, p.z};
+  };
+  add({name, side(run, result), {peer_name}, {peer}, ground_apart});
 }
 
 void add_objects() {
-  const fs::path proj = "/usr/share/proj";
-  if (fs::exists(proj / "ntf_r93.gsb")) {
-    const auto grid = std::make_shared<tidewater::ShiftGrid>((proj / "ntf_r93.gsb").string());
-    const auto points = box(-4.5, 43, 8, 50, kCall);
+  const fs::path folder = "/usr/share/proj";
+  const auto forward = [](const auto& grid, std::size_t n, auto in, auto out) {
+    grid.forward(n, in, out);
+  };
+  const auto inverse = [](const auto& grid, std::size_t n, auto in, auto out) {
+    grid.inverse(n, in, out);
+  };
+  if (fs::exists(folder / "ntf_r93.gsb")) {
+    const tidewater::ShiftGrid grid("ntf_r93.gsb", {folder.string()});
+    const auto points = box(-4.5, 43, 8, 50);
     const char* definition = "+proj=hgridshift +grids=ntf_r93.gsb";
-    const auto forward = [](const auto& g, auto in, auto out) { g.forward(kCall, in, out); };
-    const auto inverse = [](const auto& g, auto in, auto out) { g.inverse(kCall, in, out); };
-    add({"ShiftGrid NTv2 forward, scattered",
-         "PROJ",
-         object_kernel(grid, points, forward),
-         proj_kernel(definition, true, points),
-         {},
-         kCall});
-    add({"ShiftGrid NTv2 inverse, scattered",
-         "PROJ",
-         object_kernel(grid, points, inverse),
-         proj_kernel(definition, false, points),
-         {},
-         kCall});
+    add_object("ShiftGrid NTv2 forward, scattered", grid, "PROJ", proj(definition, true, points),
+               points, forward);
+    add_object("ShiftGrid NTv2 inverse, scattered", grid, "PROJ", proj(definition, false, points),
+               points, inverse);
   }
-  if (fs::exists(proj / "egm96_15.gtx")) {
-    const auto points = box(-180, -90, 180, 90, kCall);
-    const auto forward = [](const auto& g, auto in, auto out) { g.forward(kCall, in, out); };
-    for (const bool quadratic : {false, true}) {
-      const auto grid = std::make_shared<tidewater::GeoidGrid>(
-          (proj / "egm96_15.gtx").string(), std::vector<std::string>{},
-          quadratic ? tidewater::GeoidGrid::Interpolation::biquadratic
-                    : tidewater::GeoidGrid::Interpolation::bilinear);
-      add({quadratic ? "GeoidGrid biquadratic, scattered" : "GeoidGrid bilinear, scattered",
-           "PROJ (bilinear)",
-           object_kernel(grid, points, forward),
-           proj_kernel("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1", true, points),
-           {},
-           kCall});
-    }
+  if (fs::exists(folder / "egm96_15.gtx")) {
+    const auto points = box(-180, -90, 180, 90);
+    using Geoid = tidewater::GeoidGrid;
+    const char* definition = "+proj=vgridshift +grids=egm96_15.gtx +multiplier=1";
+    add_object("GeoidGrid bilinear, scattered", Geoid("egm96_15.gtx", {folder.string()}), "PROJ",
+               proj(definition, true, points), points, forward);
+    add_object("GeoidGrid biquadratic, scattered",
+               Geoid("egm96_15.gtx", {folder.string()}, Geoid::Interpolation::biquadratic),
+               "PROJ, bilinear", proj(definition, true, points), points, forward);
   }
 }
 

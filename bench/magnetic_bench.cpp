@@ -76,28 +76,29 @@ void add_rows(int32_t degree, const std::string& where, double tolerance, const 
   synthesis->tolerance = tolerance;
   // Constants of its own: the synthesis keeps its sines among them.
   const auto constants = std::make_shared<Synthesis>(degree, kRadius);
-  add({"Harmonic field of degree " + std::to_string(degree) + ", " + where, "direct Legendre",
-       [=, out = points]() mutable {
-         synthesis->sum(0, *coefficients, kPoints, points.data(), out.data());
-         keep(out.back().x);
-       },
-       [=, out = points]() mutable {
-         const DirectLegendre direct(*coefficients, *constants);
-         for (std::size_t i = 0; i < points.size(); ++i) out[i] = direct.gradient(points[i]);
-         keep(out.back().x);
-       },
-       floor_kernel(points, [](const CoordinateTriple& p) {
-         return std::acos(p.z / kRadius) + std::atan2(p.y, p.x) + std::sin(p.x / kRadius) +
-                std::cos(p.x / kRadius);
-       })});
+  const auto legendre = std::make_shared<Points>(points);
+  add({"Harmonic field of degree " + std::to_string(degree) + ", " + where,
+       ours(points, [=](int32_t n, const CoordinateTriple* in,
+                        CoordinateTriple* out) { synthesis->sum(0, *coefficients, n, in, out); }),
+       {"direct Legendre"},
+       {side(
+           [=] {
+             const DirectLegendre direct(*coefficients, *constants);
+             for (std::size_t i = 0; i < points.size(); ++i) {
+               (*legendre)[i] = direct.gradient(points[i]);
+             }
+           },
+           [legendre](std::size_t i) { return (*legendre)[i]; })},
+       space_apart,
+       "nT"});
 }
 
 const Suite suite([] {
   std::mt19937 random(8);
   std::uniform_real_distribution<double> colat(0.05, kPi - 0.05), lon(-kPi, kPi);
   Points parallel, meridian, scattered;
-  for (int32_t i = 0; i < kPoints; ++i) {
-    const double step = (i + 0.5) / kPoints;
+  for (int32_t i = 0; i < points(); ++i) {
+    const double step = (i + 0.5) / points();
     parallel.push_back(geocentric(0.7, kPi * (2 * step - 1)));
     meridian.push_back(geocentric(0.05 + (kPi - 0.1) * step, 0.3));
     scattered.push_back(geocentric(colat(random), lon(random)));

@@ -1,11 +1,22 @@
 #include "builder.hpp"
 
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
 #include <charconv>
 #include <cmath>
-#include <limits>
+#include <cstring>
 #include <map>
+#include <memory>
+#include <new>
+#include <random>
+#include <utility>
 
 #include "csv.hpp"
+#include "database.hpp"
+#include "layout.hpp"
 #include "table_store.hpp"
 
 namespace fs = std::filesystem;
@@ -114,16 +125,17 @@ void bind_cell(Statement& s, int parameter, const Field& field, const CsvFile& f
   }
 }
 
+struct FreeBytes {
+  void operator()(unsigned char* bytes) const { sqlite3_free(bytes); }
+};
+struct Bytes {
+  std::unique_ptr<unsigned char, FreeBytes> data;
+  std::size_t size;
+};
+
 class Builder {
  public:
-  explicit Builder(const fs::path& path) {
-    sqlite3* opened = nullptr;
-    const int code = sqlite3_open_v2(path.string().c_str(), &opened,
-                                     SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE, nullptr);
-    database_.reset(opened);
-    if (code != SQLITE_OK) throw SourceError(path.string() + ": cannot be written");
-    run("PRAGMA journal_mode = OFF");
-    run("PRAGMA synchronous = OFF");  // an unfinished file is thrown away
+  Builder() : database_(open_in_memory()) {
     run("BEGIN");
     run("CREATE TABLE " + identifier(kLayoutTable) +
         " (\"table\" TEXT NOT NULL, \"column\" TEXT NOT NULL, \"type\" TEXT NOT NULL, "
@@ -158,13 +170,17 @@ class Builder {
     }
   }
 
-  void finish() { run("COMMIT"); }
+  // The bytes of the store's file.
+  Bytes finish() {
+    run("COMMIT");
+    sqlite3_int64 size = 0;
+    unsigned char* bytes = sqlite3_serialize(database_.get(), "main", &size, 0);
+    if (!bytes) throw std::bad_alloc();
+    return {std::unique_ptr<unsigned char, FreeBytes>(bytes), static_cast<std::size_t>(size)};
+  }
 
  private:
-  void run(const std::string& sql) {
-    Statement s(database_.get(), sql);
-    s.step();
-  }
+  void run(const std::string& sql) { tabdll::run(database_.get(), sql); }
 
   void add_layout(const std::string& table, const Layout& layout) {
     Statement insert(database_.get(),
@@ -183,53 +199,115 @@ class Builder {
   Database database_;
 };
 
-// A file that is removed again unless it is put in its place.
+[[noreturn]] void refuse(const fs::path& path, const std::string& what) {
+  throw SourceError(path.string() + ": " + what);
+}
+
+// The file that a store's path stands for.  A link is followed, so that it stays what it is; what
+// is there and is no file, or must not be written, is refused.
+fs::path target_of(const fs::path& store) {
+  std::error_code error;
+  fs::path target = store;
+  if (fs::is_symlink(fs::symlink_status(store, error))) {
+    target = fs::canonical(store, error);
+    if (error) refuse(store, "a link to nothing");
+  }
+  const fs::file_status status = fs::status(target, error);
+  if (!fs::exists(status)) return target;
+  if (!fs::is_regular_file(status)) refuse(store, "there, and no regular file");
+  if (::access(target.c_str(), W_OK) != 0) refuse(store, "cannot be written");
+  return target;
+}
+
+// A new file beside its target, under a name that nothing else has, that takes the target's place
+// when it is whole.  Until then the target is as it was, and a failure removes this file alone.
 class Draft {
  public:
-  explicit Draft(const fs::path& target) : target_(target), path_(target.string() + ".new") {
-    fs::remove(path_);
+  explicit Draft(const fs::path& target) : target_(target) {
+    std::random_device random;
+    for (int attempt = 0; attempt < 100 && file_ < 0; ++attempt) {
+      path_ = target.parent_path() /
+              ("." + target.filename().string() + "." + std::to_string(random()));
+      file_ = ::open(path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0666);
+      if (file_ < 0 && errno != EEXIST) break;
+    }
+    if (file_ < 0) refuse(target, std::string("cannot be written: ") + std::strerror(errno));
   }
   ~Draft() {
-    std::error_code ignored;
-    fs::remove(path_, ignored);
+    if (file_ >= 0) ::close(file_);
+    if (!in_place_) ::unlink(path_.c_str());
   }
   Draft(const Draft&) = delete;
   Draft& operator=(const Draft&) = delete;
 
-  const fs::path& path() const { return path_; }
-  void put_in_place() { fs::rename(path_, target_); }
+  void write(const Bytes& bytes) {
+    keep_permissions();
+    for (std::size_t done = 0; done < bytes.size;) {
+      const ssize_t n = ::write(file_, bytes.data.get() + done, bytes.size - done);
+      if (n < 0 && errno == EINTR) continue;
+      require(n > 0);
+      done += static_cast<std::size_t>(n);
+    }
+    require(::fsync(file_) == 0);
+    const int file = std::exchange(file_, -1);
+    require(::close(file) == 0);
+  }
+
+  void put_in_place() {
+    require(::rename(path_.c_str(), target_.c_str()) == 0);
+    in_place_ = true;
+  }
 
  private:
+  void require(bool worked) const {
+    if (!worked) refuse(target_, std::string("cannot be written: ") + std::strerror(errno));
+  }
+
+  // Those of the file that is replaced, before there is anything to read.  Its owner and group too,
+  // where we may give files away; where not, the group has no more rights than all others.
+  void keep_permissions() const {
+    struct stat old;
+    if (::stat(target_.c_str(), &old) != 0) return;
+    mode_t mode = old.st_mode & 0777;
+    if (::fchown(file_, old.st_uid, old.st_gid) != 0 &&
+        ::fchown(file_, uid_t(-1), old.st_gid) != 0) {
+      mode &= ~mode_t{070} | ((mode & 07) << 3);
+    }
+    require(::fchmod(file_, mode) == 0);
+  }
+
   fs::path target_;
   fs::path path_;
+  int file_ = -1;
+  bool in_place_ = false;
 };
 
 }  // namespace
 
 void build_store(const fs::path& store, const fs::path& folder) {
+  const fs::path target = target_of(store);
   const Layouts layouts = read_layouts(folder / "layouts.csv");
   const CsvFile tables = read_csv(folder / "tables.csv");
   const std::size_t table = tables.column("table");
   const std::size_t layout = tables.column("layout");
   const std::size_t file = tables.column("file");
-  Draft draft(store);
-  {
-    Builder builder(draft.path());
-    for (const CsvRecord& r : tables.records) {
-      const auto found = layouts.find(r.cells[layout]);
-      if (found == layouts.end()) {
-        throw SourceError(tables.path, r.line,
-                          "column layout: no layout \"" + r.cells[layout] + "\"");
-      }
-      const CsvFile rows = read_csv(folder / r.cells[file]);
-      try {
-        builder.add(r.cells[table], found->second, rows);
-      } catch (const StoreError& e) {  // a table that stands twice, a disk that is full
-        throw SourceError(tables.path, r.line, "table " + r.cells[table] + ": " + e.what());
-      }
+  Builder builder;
+  for (const CsvRecord& r : tables.records) {
+    const auto found = layouts.find(r.cells[layout]);
+    if (found == layouts.end()) {
+      throw SourceError(tables.path, r.line,
+                        "column layout: no layout \"" + r.cells[layout] + "\"");
     }
-    builder.finish();
+    const CsvFile rows = read_csv(folder / r.cells[file]);
+    try {
+      builder.add(r.cells[table], found->second, rows);
+    } catch (const StoreError& e) {  // a table that stands twice
+      throw SourceError(tables.path, r.line, "table " + r.cells[table] + ": " + e.what());
+    }
   }
+  const Bytes bytes = builder.finish();
+  Draft draft(target);
+  draft.write(bytes);
   draft.put_in_place();
 }
 

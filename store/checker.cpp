@@ -1,10 +1,9 @@
 #include "checker.hpp"
 
 #include <algorithm>
-#include <array>
 #include <cstring>
 
-#include "tidewater/store.h"
+#include "harmonic_degrees.hpp"
 
 namespace tabdll {
 
@@ -25,7 +24,63 @@ struct ExpectedTable {
   std::size_t row_size;  // 0: any that holds the fields
   std::vector<Expected> fields;
   std::size_t name_only_flag = 0;  // where not 0, a 16-bit zero there makes a row a name alone
+  // What is wrong with the values of a row, or of all rows together; empty where all is well.
+  std::string (*fault_of_row)(const TableStore& store, const char* row) = nullptr;
+  std::string (*fault_of_table)(const Table& table) = nullptr;
 };
+
+template <class Number>
+Number number_at(const char* at) {
+  Number value;
+  std::memcpy(&value, at, sizeof value);
+  return value;
+}
+
+// Powers of a regression term are places in tables of ten powers.
+std::string fault_of_term(const TableStore&, const char* row) {
+  for (const int offset : {8, 10}) {
+    const auto power = number_at<int16_t>(row + offset);
+    if (power < 0 || power > 9) return "a power of " + std::to_string(power) + ", none of 0 to 9";
+  }
+  return {};
+}
+
+// The limits that TWmagmdl_info() holds a model to, and the epochs that TWhar_set_date() needs.
+std::string fault_of_model(const TableStore& store, const char* row) {
+  const auto lower = number_at<double>(row + 112);
+  const auto upper = number_at<double>(row + 120);
+  if (!(number_at<double>(row + 72) > 0)) return "a radius that is not above 0";
+  const auto normalisation = number_at<int16_t>(row + 80);
+  if (normalisation < 0 || normalisation > 3) return "a normalisation that is none of 0 to 3";
+  if (!(lower >= 0 && lower <= upper && upper > 0))
+    return "bounds that do not rise from 0 or above";
+  if (!(number_at<double>(row + 128) >= 0)) return "an interval below 0";
+  const auto epochs = store.tables().find(std::string_view(row + 44));
+  if (epochs != store.tables().end() && epochs->second.size() < 2) return "fewer than two epochs";
+  return {};
+}
+
+// The synthesis writes the rows of degrees 1 and 2 whatever the degree.
+std::string fault_of_epoch(const TableStore& store, const char* row) {
+  const auto degree = number_at<int16_t>(row + 8);
+  if (degree < 2) return "a degree of " + std::to_string(degree) + ", 2 at least are needed";
+  const auto coefficients = store.tables().find(std::string_view(row + 10));
+  const std::size_t needed = rows_of_degree(static_cast<std::size_t>(degree));
+  if (coefficients == store.tables().end() || coefficients->second.size() == needed) return {};
+  return "degree " + std::to_string(degree) + " has " + std::to_string(needed) +
+         " coefficients, table \"" + coefficients->first + "\" " +
+         std::to_string(coefficients->second.size());
+}
+
+std::string fault_of_dates(const Table& epochs) {
+  Walk walk(epochs, "Epoch date");
+  const char* last = walk.next();
+  while (const char* row = walk.next()) {
+    if (number_at<double>(row) == number_at<double>(last)) return "two epochs of one date";
+    last = row;
+  }
+  return {};
+}
 
 constexpr FieldType kText = FieldType::kText;
 constexpr FieldType kInt16 = FieldType::kInt16;
@@ -96,7 +151,8 @@ const std::vector<ExpectedTable>& library_tables() {
         {nullptr, kFloat64, 112, 8},
         {nullptr, kFloat64, 120, 8},
         {nullptr, kFloat64, 128, 8}},
-       42}};
+       42,
+       fault_of_model}};
   return tables;
 }
 
@@ -105,13 +161,18 @@ const std::vector<ExpectedTable>& named_tables() {
   static const std::vector<ExpectedTable> tables = {
       {"regression terms",
        16,
-       {{nullptr, kFloat64, 0, 8}, {nullptr, kInt16, 8, 2}, {nullptr, kInt16, 10, 2}}},
+       {{nullptr, kFloat64, 0, 8}, {nullptr, kInt16, 8, 2}, {nullptr, kInt16, 10, 2}},
+       0,
+       fault_of_term},
       {"coefficients", 24, {{nullptr, kFloat64, 8, 8}, {nullptr, kFloat64, 16, 8}}},
       {"epochs",
        0,
        {{"Epoch date", kFloat64, 0, 8},
         {nullptr, kInt16, 8, 2},
-        {nullptr, kText, 10, 33, "coefficients"}}}};
+        {nullptr, kText, 10, 33, "coefficients"}},
+       0,
+       fault_of_epoch,
+       fault_of_dates}};
   return tables;
 }
 
@@ -134,14 +195,14 @@ class Checker {
     checked_.push_back(name);
     const auto found = store_.tables().find(name);
     if (found == store_.tables().end()) return fault(name, "missing");
-    const Layout& layout = found->second;
+    const Layout& layout = found->second.layout();
     if (expected.row_size != 0 && layout.row_size() != expected.row_size) {
       fault(name, "rows of " + std::to_string(layout.row_size()) + " bytes, expected " +
                       std::to_string(expected.row_size));
     }
     bool fits = true;
     for (const Expected& e : expected.fields) fits = check_field(name, layout, e) && fits;
-    if (fits) check_rows(name, expected);
+    if (fits) check_rows(name, found->second, expected);
   }
 
   bool check_field(const std::string& name, const Layout& layout, const Expected& e) {
@@ -158,35 +219,34 @@ class Checker {
     return there;
   }
 
-  void check_rows(const std::string& name, const ExpectedTable& expected) {
-    Walk walk = store_.walk(name, nullptr);
-    std::array<char, TW_STORE_ROW_LIMIT> row;
-    for (int number = 1;; ++number) {
-      try {
-        if (!walk.next(row.data())) return;
-      } catch (const StoreError& e) {
-        fault(name, "row " + std::to_string(number) + ": " + e.what());
-        continue;
-      }
-      if (is_name_only(expected, row.data())) continue;
+  void check_rows(const std::string& name, const Table& table, const ExpectedTable& expected) {
+    for (std::size_t i = 0; i < table.size(); ++i) {
+      const char* row = table.row(i);
+      if (is_name_only(expected, row)) continue;
+      const auto row_fault = [&](const std::string& what) {
+        fault(name, "row " + std::to_string(i + 1) + ": " + what);
+      };
       for (const Expected& e : expected.fields) {
-        if (e.names) check_named(name, number, row.data() + e.offset, e.names);
+        if (e.names) check_named(row + e.offset, e.names, row_fault);
       }
+      if (expected.fault_of_row) {
+        const std::string words = expected.fault_of_row(store_, row);
+        if (!words.empty()) row_fault(words);
+      }
+    }
+    if (expected.fault_of_table) {
+      const std::string words = expected.fault_of_table(table);
+      if (!words.empty()) fault(name, words);
     }
   }
 
   static bool is_name_only(const ExpectedTable& expected, const char* row) {
-    if (expected.name_only_flag == 0) return false;
-    int16_t flag = 0;
-    std::memcpy(&flag, row + expected.name_only_flag, sizeof flag);
-    return flag == 0;
+    return expected.name_only_flag != 0 && number_at<int16_t>(row + expected.name_only_flag) == 0;
   }
 
-  void check_named(const std::string& name, int number, const std::string& named,
-                   std::string_view kind) {
-    if (!store_.tables().contains(named)) {
-      return fault(name, "row " + std::to_string(number) + ": no table \"" + named + "\"");
-    }
+  template <class RowFault>
+  void check_named(const std::string& named, std::string_view kind, RowFault row_fault) {
+    if (!store_.tables().contains(named)) return row_fault("no table \"" + named + "\"");
     const auto expected = std::find_if(named_tables().begin(), named_tables().end(),
                                        [kind](const ExpectedTable& t) { return t.name == kind; });
     check(named, *expected);

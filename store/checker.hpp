@@ -8,8 +8,9 @@
 
 namespace tabdll {
 
-// What is wrong with a store, one line each: a table that is missing or packed otherwise, a row
-// that does not pack, a row that names a table that is not there.  Empty where all is well.
+// What is wrong with a store that opens, one line each: a table that is missing or packed
+// otherwise, a row that names a table that is not there, values that the library refuses or its
+// users stumble over.  Empty where all is well.
 std::vector<std::string> faults_of(const TableStore& store);
 
 }  // namespace tabdll

@@ -81,8 +81,11 @@ std::size_t CsvFile::column(const std::string& name) const {
 }
 
 CsvFile read_csv(const std::filesystem::path& path) {
-  std::ifstream in(path, std::ios::binary);
-  if (!in) throw SourceError(path.string() + ": cannot be opened");
+  // Neither a device without an end nor a pipe that nobody writes.
+  std::error_code ignored;
+  std::ifstream in;
+  if (std::filesystem::is_regular_file(path, ignored)) in.open(path, std::ios::binary);
+  if (!in.is_open()) throw SourceError(path.string() + ": cannot be opened");
   std::string text{std::istreambuf_iterator<char>(in), {}};
   if (in.bad()) throw SourceError(path.string() + ": cannot be read");
   Reader reader(path, std::move(text));

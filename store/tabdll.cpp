@@ -1,11 +1,12 @@
 // The seven store operations on a store file, with a current store for each thread.
 
-#include <limits>
+#include <cstring>
 #include <map>
 #include <memory>
 #include <string>
+#include <utility>
 
-#include "table_store.hpp"
+#include "store_cache.hpp"
 #include "tidewater/store.h"
 
 namespace {
@@ -14,8 +15,7 @@ constexpr TWstoreword kFailure = UINT32_C(0x09608012);
 constexpr TWstoreword kNoSuchRow = UINT32_C(0x09608022);
 
 struct Session {
-  explicit Session(const char* path) : store(path) {}
-  tabdll::TableStore store;
+  std::shared_ptr<const tabdll::TableStore> store;
   std::map<std::string, tabdll::Walk, std::less<>> walks;
 };
 
@@ -39,7 +39,11 @@ TWstoreword on_current(Operation operation) noexcept {
 }
 
 void begin_walk(Session& session, const char* table, const char* column) {
-  session.walks.insert_or_assign(table, session.store.walk(table, column));
+  session.walks.insert_or_assign(table, tabdll::Walk(session.store->table(table), column));
+}
+
+void copy_row(const tabdll::Table& table, const char* row, void* out) {
+  std::memcpy(out, row, table.layout().row_size());
 }
 
 }  // namespace
@@ -47,7 +51,7 @@ void begin_walk(Session& session, const char* table, const char* column) {
 TWstoreword OLB7R3_PF_open(const char* path) {
   current.reset();
   return answer([&] {
-    current = std::make_unique<Session>(path);
+    current = std::make_unique<Session>(Session{tabdll::open_store(path), {}});
     return TW_STORE_SUCCESS;
   });
 }
@@ -70,21 +74,28 @@ TWstoreword OLB7R3_PF_get_next_row(const char* table, void* row) {
   return on_current([&](Session& session) {
     const auto walk = session.walks.find(table);
     if (walk == session.walks.end()) return kFailure;
-    return walk->second.next(row) ? TW_STORE_SUCCESS : TW_STORE_END_OF_TABLE;
+    const char* next = walk->second.next();
+    if (!next) return TW_STORE_END_OF_TABLE;
+    copy_row(walk->second.table(), next, row);
+    return TW_STORE_SUCCESS;
   });
 }
 
 TWstoreword OLB7R3_PF_get_row_by_value(const char* table, int32_t /*mode*/, const char* column,
                                        const void* key, void* row) {
   return on_current([&](Session& session) {
-    return session.store.find(table, column, key, row) ? TW_STORE_SUCCESS : kNoSuchRow;
+    const tabdll::Table& rows = session.store->table(table);
+    const char* found = rows.find(column, key);
+    if (!found) return kNoSuchRow;
+    copy_row(rows, found, row);
+    return TW_STORE_SUCCESS;
   });
 }
 
 TWstoreword OLB7R3_PF_inq_num_rows(const char* table, int32_t* count) {
   return on_current([&](Session& session) {
-    const int64_t rows = session.store.count_rows(table);
-    if (rows > std::numeric_limits<int32_t>::max()) return kFailure;
+    const std::size_t rows = session.store->table(table).size();
+    if (!std::in_range<int32_t>(rows)) return kFailure;
     *count = static_cast<int32_t>(rows);
     return TW_STORE_SUCCESS;
   });

@@ -1,18 +1,67 @@
 #include "table_store.hpp"
 
+#include <algorithm>
 #include <array>
+#include <cmath>
 #include <cstring>
 #include <limits>
-#include <set>
+#include <numeric>
+#include <utility>
 
+#include "harmonic_degrees.hpp"
+#include "store_file.hpp"
 #include "tidewater/store.h"
 
 namespace tabdll {
 
 namespace {
 
-std::string message(sqlite3* database, const char* otherwise) {
-  return database ? sqlite3_errmsg(database) : otherwise;
+using Layouts = std::map<std::string, Layout, std::less<>>;
+
+// The longest text that is read from a file, a table's definition included: one of as many columns
+// as a row has bytes fits with names of a hundred letters.
+constexpr int kLongestText = 100'000;
+
+// Packed rows in memory.  A sound file of the longest allowed length stays far below; one with
+// layouts much longer than its cells need not.
+constexpr std::size_t kMostPackedBytes = std::size_t{512} << 20;
+
+// Steps of SQLite's machine that reading a file may take.  A sound one takes a few for each of its
+// bytes; one whose pages are shared or lie in a circle would go on for ever.
+constexpr int kStepsPerTick = 1000;
+std::int64_t ticks_for(std::size_t file_size) {
+  return 1000 + static_cast<std::int64_t>(file_size) * 40 / kStepsPerTick;
+}
+
+template <class Number>
+Number number_at(const void* at) {
+  Number value;
+  std::memcpy(&value, at, sizeof value);
+  return value;
+}
+
+template <class Number>
+int compare_numbers(const void* a, const void* b) {
+  const auto first = number_at<Number>(a);
+  const auto second = number_at<Number>(b);
+  return first < second ? -1 : first == second ? 0 : 1;
+}
+
+// Both in the packed form of the type, which for a text ends with its terminator.
+int compare(FieldType type, const void* a, const void* b) {
+  switch (type) {
+    case FieldType::kText:
+      return std::strcmp(static_cast<const char*>(a), static_cast<const char*>(b));
+    case FieldType::kInt16:
+      return compare_numbers<std::int16_t>(a, b);
+    case FieldType::kInt32:
+      return compare_numbers<std::int32_t>(a, b);
+    case FieldType::kFloat64:
+      return compare_numbers<double>(a, b);
+    case FieldType::kPad:
+      break;
+  }
+  return 0;
 }
 
 template <class Number>
@@ -22,7 +71,7 @@ void put(char* at, Number value) {
 
 template <class Number>
 void put_integer(const Statement& s, int column, char* at) {
-  const int64_t value = s.integer(column);
+  const std::int64_t value = s.integer(column);
   if (s.type(column) != SQLITE_INTEGER || value < std::numeric_limits<Number>::min() ||
       value > std::numeric_limits<Number>::max()) {
     throw StoreError("a cell is no integer of the field's range");
@@ -30,6 +79,7 @@ void put_integer(const Statement& s, int column, char* at) {
   put(at, static_cast<Number>(value));
 }
 
+// The cell of a row at its place in a field of zeros.
 void put_field(const Statement& s, int column, const Field& field, char* at) {
   switch (field.type) {
     case FieldType::kText: {
@@ -43,204 +93,276 @@ void put_field(const Statement& s, int column, const Field& field, char* at) {
       return;
     }
     case FieldType::kInt16:
-      return put_integer<int16_t>(s, column, at);
+      return put_integer<std::int16_t>(s, column, at);
     case FieldType::kInt32:
-      return put_integer<int32_t>(s, column, at);
-    case FieldType::kFloat64:
-      if (s.type(column) != SQLITE_FLOAT && s.type(column) != SQLITE_INTEGER) {
-        throw StoreError("a cell is no number");
+      return put_integer<std::int32_t>(s, column, at);
+    case FieldType::kFloat64: {
+      const int type = s.type(column);
+      const double value = s.real(column);
+      if ((type != SQLITE_FLOAT && type != SQLITE_INTEGER) || !std::isfinite(value)) {
+        throw StoreError("a cell is no finite number");
       }
-      return put(at, s.real(column));
+      return put(at, value);
+    }
     case FieldType::kPad:
       return;
   }
 }
 
-// Packs the statement's row; the buffer is written only when every cell fits.
-void pack(const Statement& s, const Layout& layout, void* row) {
-  std::array<char, TW_STORE_ROW_LIMIT> packed = {};
-  int column = 0;
-  for (const Field& f : layout.fields) {
-    if (f.type == FieldType::kPad) continue;
-    put_field(s, column++, f, packed.data() + f.offset);
+// Whether a definition is CREATE TABLE NAME (COLUMNS) and no more: no constraint, default or
+// generated column with an expression, nothing behind the columns.  Comments are not plain either,
+// as a quote in one would hide what follows it.
+bool is_plain(std::string_view sql) {
+  constexpr std::string_view kBegin = "CREATE TABLE";
+  if (sqlite3_strnicmp(std::string(sql).c_str(), kBegin.data(), static_cast<int>(kBegin.size())) !=
+      0) {
+    return false;
   }
-  std::memcpy(row, packed.data(), layout.row_size());
+  int parentheses = 0;  // two at the end: one opened, one closed
+  bool quoted = false;
+  for (const char c : sql.substr(kBegin.size())) {
+    if (c == '"') {
+      quoted = !quoted;  // a doubled quote closes and opens again
+    } else if (!quoted) {
+      const auto byte = static_cast<unsigned char>(c);
+      const bool word = (c >= '0' && c <= '9') || (c >= 'A' && c <= 'Z') ||
+                        (c >= 'a' && c <= 'z') || c == '_' || byte >= 0x80;
+      const bool space = c == ' ' || c == '\t' || c == '\n' || c == '\r';
+      if (parentheses == 2 && !space) return false;
+      if ((c == '(' && parentheses == 0) || (c == ')' && parentheses == 1)) {
+        ++parentheses;
+      } else if (!word && !space && c != ',') {
+        return false;
+      }
+    }
+  }
+  return parentheses == 2 && !quoted;
 }
 
-// The columns of a layout in its order, as pack() expects them.
-std::string select_from(std::string_view table, const Layout& layout) {
-  std::string columns;
-  for (const Field& f : layout.fields) {
-    if (f.type == FieldType::kPad) continue;
-    columns += (columns.empty() ? "" : ", ") + identifier(f.column);
-  }
-  return "SELECT " + columns + " FROM " + identifier(table);
+// What is wrong with one table, told with its name.
+[[noreturn]] void refuse(std::string_view table, const std::string& what) {
+  std::string words = "table \"";
+  words.append(table).append("\": ").append(what);
+  throw StoreError(words);
 }
 
-template <class Number>
-Number number_at(const void* key) {
-  Number value;
-  std::memcpy(&value, key, sizeof value);
-  return value;
-}
-
-void bind_key(Statement& s, FieldType type, const void* key) {
-  switch (type) {
-    case FieldType::kText:
-      return s.bind(1, static_cast<const char*>(key));
-    case FieldType::kInt16:
-      return s.bind(1, int64_t{number_at<int16_t>(key)});
-    case FieldType::kInt32:
-      return s.bind(1, int64_t{number_at<int32_t>(key)});
-    case FieldType::kFloat64:
-      return s.bind(1, number_at<double>(key));
-    case FieldType::kPad:
-      return;  // no key: a pad has no column
+// Reads a file's tables once, and checks what SQLite itself does not need to know.
+class Loader {
+ public:
+  explicit Loader(std::vector<unsigned char>& file)
+      : database_(open_in_memory()), ticks_(ticks_for(file.size())) {
+    harden();
+    const auto size = static_cast<sqlite3_int64>(file.size());
+    if (sqlite3_deserialize(database_.get(), "main", file.data(), size, size,
+                            SQLITE_DESERIALIZE_READONLY) != SQLITE_OK) {
+      throw StoreError(sqlite3_errmsg(database_.get()));
+    }
   }
-}
 
-const Field& field_of(const Layout& layout, std::string_view table, std::string_view column) {
-  const Field* field = layout.find(column);
-  if (!field) {
-    throw StoreError("table \"" + std::string(table) + "\" has no column \"" + std::string(column) +
-                     "\"");
+  std::map<std::string, Table, std::less<>> load() {
+    try {
+      return load_tables();
+    } catch (const StoreError&) {
+      if (ticks_ < 0) {
+        throw StoreError("reading it does not end: its pages are shared or lie in a circle");
+      }
+      throw;
+    }
   }
-  return *field;
-}
+
+ private:
+  // Nothing of the file is executed, and nothing of it grows beyond its bytes.
+  void harden() {
+    sqlite3* const d = database_.get();
+    for (const auto& [option, value] : {std::pair(SQLITE_DBCONFIG_DEFENSIVE, 1),
+                                        {SQLITE_DBCONFIG_TRUSTED_SCHEMA, 0},
+                                        {SQLITE_DBCONFIG_ENABLE_TRIGGER, 0},
+                                        {SQLITE_DBCONFIG_ENABLE_VIEW, 0},
+                                        {SQLITE_DBCONFIG_ENABLE_LOAD_EXTENSION, 0},
+                                        {SQLITE_DBCONFIG_DQS_DML, 0},
+                                        {SQLITE_DBCONFIG_DQS_DDL, 0}}) {
+      if (sqlite3_db_config(d, option, value, nullptr) != SQLITE_OK) {
+        throw StoreError("SQLite cannot be made safe");
+      }
+    }
+    for (const auto& [limit, value] : {std::pair(SQLITE_LIMIT_LENGTH, kLongestText),
+                                       {SQLITE_LIMIT_SQL_LENGTH, kLongestText},
+                                       {SQLITE_LIMIT_COLUMN, TW_STORE_ROW_LIMIT},
+                                       {SQLITE_LIMIT_EXPR_DEPTH, 10},
+                                       {SQLITE_LIMIT_COMPOUND_SELECT, 2},
+                                       {SQLITE_LIMIT_VDBE_OP, 100'000},
+                                       {SQLITE_LIMIT_FUNCTION_ARG, 8},
+                                       {SQLITE_LIMIT_ATTACHED, 0},
+                                       {SQLITE_LIMIT_LIKE_PATTERN_LENGTH, 50},
+                                       {SQLITE_LIMIT_VARIABLE_NUMBER, 1},
+                                       {SQLITE_LIMIT_TRIGGER_DEPTH, 1},
+                                       {SQLITE_LIMIT_WORKER_THREADS, 0}}) {
+      sqlite3_limit(d, limit, value);
+    }
+    sqlite3_progress_handler(
+        d, kStepsPerTick,
+        [](void* ticks) { return --*static_cast<std::int64_t*>(ticks) < 0 ? 1 : 0; }, &ticks_);
+  }
+
+  std::map<std::string, Table, std::less<>> load_tables() {
+    const std::vector<std::string> names = read_names();
+    Layouts layouts = read_layouts();
+    std::map<std::string, Table, std::less<>> tables;
+    for (const std::string& name : names) {
+      if (name == kLayoutTable) continue;
+      const auto layout = layouts.find(name);
+      if (layout == layouts.end()) refuse(name, "no layout");
+      tables.emplace(name, read_table(name, layout->second));
+      layouts.erase(layout);
+    }
+    if (!layouts.empty()) refuse(layouts.begin()->first, "a layout and no table");
+    // Behind the reading, which follows no chain of pages deeper than a sound tree has; the check
+    // itself would.
+    check_integrity();
+    return tables;
+  }
+
+  std::vector<std::string> read_names() {
+    std::vector<std::string> names;
+    Statement schema(database_.get(), "SELECT type, name, rootpage, sql FROM sqlite_master");
+    while (schema.step()) {
+      const std::string name(schema.text(1));
+      // Virtual tables have no root page.
+      if (schema.text(0) != "table" || schema.integer(2) < 1 || !is_plain(schema.text(3))) {
+        throw StoreError("\"" + name + "\" is no plain table");
+      }
+      names.push_back(name);
+    }
+    if (std::find(names.begin(), names.end(), kLayoutTable) == names.end()) {
+      throw StoreError("the file has no table of layouts");
+    }
+    return names;
+  }
+
+  Layouts read_layouts() {
+    Layouts layouts;
+    // Without an order of its own a plain table comes in that of insertion.
+    Statement rows(database_.get(),
+                   "SELECT \"table\", \"column\", \"type\", \"offset\", \"size\" FROM " +
+                       identifier(kLayoutTable));
+    while (rows.step()) {
+      const std::string table(rows.text(0));
+      const auto type = field_type(rows.text(2));
+      if (!type || rows.type(3) != SQLITE_INTEGER || rows.type(4) != SQLITE_INTEGER) {
+        refuse(table, "a field of the layout has no known type or place");
+      }
+      Layout& layout = layouts[table];
+      if (layout.fields.size() == TW_STORE_ROW_LIMIT) refuse(table, "more fields than bytes");
+      layout.fields.push_back({std::string(rows.text(1)), *type, rows.integer(3), rows.integer(4)});
+    }
+    for (const auto& [table, layout] : layouts) {
+      const std::string fault = fault_of(layout);
+      if (!fault.empty()) refuse(table, "layout: " + fault);
+    }
+    return layouts;
+  }
+
+  Table read_table(const std::string& name, const Layout& layout) {
+    Statement s(database_.get(), "SELECT * FROM " + identifier(name));
+    const std::vector<std::pair<const Field*, int>> places = match(name, layout, s);
+    const std::size_t size = layout.row_size();
+    std::vector<char> rows;
+    for (std::size_t number = 1; s.step(); ++number) {
+      packed_ += size;
+      if (packed_ > kMostPackedBytes) refuse(name, "more rows than a store may have");
+      rows.resize(rows.size() + size);
+      char* row = rows.data() + rows.size() - size;
+      try {
+        for (const auto& [field, column] : places)
+          put_field(s, column, *field, row + field->offset);
+      } catch (const StoreError& e) {
+        refuse(name, "row " + std::to_string(number) + ": " + e.what());
+      }
+    }
+    rows.shrink_to_fit();
+    return {layout, std::move(rows)};
+  }
+
+  // The column of every field; a table has these columns and no others.
+  static std::vector<std::pair<const Field*, int>> match(const std::string& name,
+                                                         const Layout& layout, const Statement& s) {
+    std::map<std::string_view, int> columns;
+    for (int i = 0; i < s.columns(); ++i) columns.emplace(s.name(i), i);
+    std::vector<std::pair<const Field*, int>> places;
+    for (const Field& f : layout.fields) {
+      if (f.type == FieldType::kPad) continue;
+      const auto column = columns.find(f.column);
+      if (column == columns.end()) refuse(name, "no column \"" + f.column + "\"");
+      places.emplace_back(&f, column->second);
+    }
+    if (places.size() != static_cast<std::size_t>(s.columns())) {
+      refuse(name, "columns that the layout does not have");
+    }
+    return places;
+  }
+
+  void check_integrity() {
+    Statement check(database_.get(), "PRAGMA integrity_check(1)");
+    if (!check.step()) throw StoreError("its integrity cannot be checked");
+    const std::string words(check.text(0));
+    if (words != "ok") throw StoreError("damaged: " + words);
+  }
+
+  Database database_;
+  std::int64_t ticks_;  // left; below 0 once the reading was broken off
+  std::size_t packed_ = 0;
+};
 
 }  // namespace
 
-std::string identifier(std::string_view name) {
-  std::string out = "\"";
-  for (const char c : name) {
-    if (c == '"') out += '"';
-    out += c;
-  }
-  return out + '"';
+Table::Table(Layout layout, std::vector<char> rows)
+    : layout_(std::move(layout)),
+      rows_(std::move(rows)),
+      size_(rows_.size() / layout_.row_size()),
+      orders_(std::make_unique<Order[]>(layout_.fields.size())) {}
+
+const Field& Table::field(std::string_view column) const {
+  const Field* found = layout_.find(column);
+  if (!found) throw StoreError("no column \"" + std::string(column) + "\"");
+  return *found;
 }
 
-Statement::Statement(sqlite3* database, const std::string& sql) : database_(database) {
-  sqlite3_stmt* statement = nullptr;
-  const int code = sqlite3_prepare_v2(database, sql.c_str(), -1, &statement, nullptr);
-  statement_.reset(statement);
-  require(code);
+const std::vector<std::uint32_t>& Table::order(std::string_view column) const {
+  const Field& f = field(column);
+  Order& order = orders_[static_cast<std::size_t>(&f - layout_.fields.data())];
+  std::call_once(order.made, [&] {
+    std::vector<std::uint32_t> numbers(size_);
+    std::iota(numbers.begin(), numbers.end(), 0u);
+    std::stable_sort(numbers.begin(), numbers.end(), [&](std::uint32_t a, std::uint32_t b) {
+      return compare(f.type, row(a) + f.offset, row(b) + f.offset) < 0;
+    });
+    order.rows = std::move(numbers);
+  });
+  return order.rows;
 }
 
-void Statement::require(int code) const {
-  if (code != SQLITE_OK) throw StoreError(message(database_, "out of memory"));
+const char* Table::find(std::string_view column, const void* key) const {
+  const Field& f = field(column);
+  const std::vector<std::uint32_t>& rows = order(column);
+  const auto found =
+      std::lower_bound(rows.begin(), rows.end(), key, [&](std::uint32_t number, const void* value) {
+        return compare(f.type, row(number) + f.offset, value) < 0;
+      });
+  if (found == rows.end() || compare(f.type, row(*found) + f.offset, key) != 0) return nullptr;
+  return row(*found);
 }
 
-bool Statement::step() {
-  const int code = sqlite3_step(statement_.get());
-  if (code == SQLITE_ROW) return true;
-  if (code != SQLITE_DONE) throw StoreError(message(database_, "out of memory"));
-  return false;
+TableStore::TableStore(const char* path) : TableStore(read_file(path).bytes) {}
+
+TableStore::TableStore(std::vector<unsigned char> file) : tables_(Loader(file).load()) {
+  const std::string fault = fault_of_harmonic_degrees(*this);
+  if (!fault.empty()) throw StoreError(fault);
 }
 
-void Statement::reset() { require(sqlite3_reset(statement_.get())); }
-
-void Statement::bind(int parameter, std::string_view text) {
-  require(sqlite3_bind_text64(statement_.get(), parameter, text.data(), text.size(), SQLITE_STATIC,
-                              SQLITE_UTF8));
-}
-
-void Statement::bind(int parameter, int64_t number) {
-  require(sqlite3_bind_int64(statement_.get(), parameter, number));
-}
-
-void Statement::bind(int parameter, double number) {
-  require(sqlite3_bind_double(statement_.get(), parameter, number));
-}
-
-std::string_view Statement::text(int column) const {
-  const auto* bytes = reinterpret_cast<const char*>(sqlite3_column_text(statement_.get(), column));
-  if (!bytes) return {};
-  return {bytes, static_cast<std::size_t>(sqlite3_column_bytes(statement_.get(), column))};
-}
-
-bool Walk::next(void* row) {
-  if (ended_) return false;
-  ended_ = true;  // also when the step throws: a broken file must not be walked for ever
-  if (!statement_.step()) return false;
-  ended_ = false;
-  pack(statement_, *layout_, row);
-  return true;
-}
-
-TableStore::TableStore(const char* path) {
-  sqlite3* opened = nullptr;
-  const int code =
-      sqlite3_open_v2(path, &opened, SQLITE_OPEN_READONLY | SQLITE_OPEN_NOMUTEX, nullptr);
-  database_.reset(opened);
-  if (code != SQLITE_OK) throw StoreError(message(opened, "out of memory"));
-  // The file may come from anywhere: nothing of it is executed, and a column that is not there is
-  // not read as a text.
-  sqlite3_db_config(opened, SQLITE_DBCONFIG_DEFENSIVE, 1, nullptr);
-  sqlite3_db_config(opened, SQLITE_DBCONFIG_TRUSTED_SCHEMA, 0, nullptr);
-  sqlite3_db_config(opened, SQLITE_DBCONFIG_DQS_DML, 0, nullptr);
-  read_layouts();
-}
-
-void TableStore::read_layouts() {
-  // Views and virtual tables have no root page; a walk of one need not end.
-  std::set<std::string, std::less<>> ordinary;
-  Statement schema(database_.get(),
-                   "SELECT name FROM sqlite_master WHERE type = 'table' AND rootpage > 0");
-  while (schema.step()) ordinary.emplace(schema.text(0));
-  if (!ordinary.contains(kLayoutTable)) throw StoreError("the file has no table of layouts");
-
-  Statement rows(database_.get(),
-                 "SELECT \"table\", \"column\", \"type\", \"offset\", \"size\" FROM " +
-                     identifier(kLayoutTable) + " ORDER BY rowid");
-  while (rows.step()) {
-    const std::string table(rows.text(0));
-    const auto type = field_type(rows.text(2));
-    if (!type || rows.type(3) != SQLITE_INTEGER || rows.type(4) != SQLITE_INTEGER) {
-      throw StoreError("table \"" + table + "\": a field of the layout has no known type or place");
-    }
-    tables_[table].fields.push_back(
-        {std::string(rows.text(1)), *type, rows.integer(3), rows.integer(4)});
-  }
-  for (const auto& [table, layout] : tables_) {
-    const std::string fault = fault_of(layout);
-    if (fault.empty()) continue;
-    std::string words = "layout of table \"";
-    words.append(table).append("\": ").append(fault);
-    throw StoreError(words);
-  }
-  std::erase_if(tables_, [&](const auto& entry) { return !ordinary.contains(entry.first); });
-}
-
-const Layout& TableStore::layout(std::string_view table) const {
-  const auto found = tables_.find(table);
-  if (found == tables_.end()) throw StoreError("no table \"" + std::string(table) + "\"");
+const Table& TableStore::table(std::string_view name) const {
+  const auto found = tables_.find(name);
+  if (found == tables_.end()) throw StoreError("no table \"" + std::string(name) + "\"");
   return found->second;
-}
-
-int64_t TableStore::count_rows(std::string_view table) const {
-  layout(table);
-  Statement s(database_.get(), "SELECT count(*) FROM " + identifier(table));
-  s.step();
-  return s.integer(0);
-}
-
-Walk TableStore::walk(std::string_view table, const char* column) const {
-  const Layout& l = layout(table);
-  std::string sql = select_from(table, l) + " ORDER BY ";
-  if (column) sql += identifier(field_of(l, table, column).column) + " COLLATE BINARY, ";
-  return {Statement(database_.get(), sql + "rowid"), l};
-}
-
-bool TableStore::find(std::string_view table, std::string_view column, const void* key,
-                      void* row) const {
-  const Layout& l = layout(table);
-  const Field& field = field_of(l, table, column);
-  Statement s(database_.get(), select_from(table, l) + " WHERE " + identifier(column) +
-                                   " = ?1 COLLATE BINARY ORDER BY rowid LIMIT 1");
-  bind_key(s, field.type, key);
-  if (!s.step()) return false;
-  pack(s, l, row);
-  return true;
 }
 
 }  // namespace tabdll

@@ -1,15 +1,15 @@
-// A store file: named tables with typed columns in an SQLite file, and the layouts by which their
-// rows are packed.  Opened for reading only.
+// A store file's tables in memory: packed rows under the layouts that came with them.
 #pragma once
 
-#include <sqlite3.h>
-
+#include <cstdint>
 #include <map>
 #include <memory>
-#include <stdexcept>
+#include <mutex>
 #include <string>
 #include <string_view>
+#include <vector>
 
+#include "database.hpp"
 #include "layout.hpp"
 
 namespace tabdll {
@@ -17,83 +17,74 @@ namespace tabdll {
 // The table of layouts in every store file.
 inline constexpr std::string_view kLayoutTable = "tidewater_layout";
 
-// A file that is no store, a table or a column that is not there, a cell that does not pack.
-class StoreError : public std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
-
-// A name as it stands in a statement, whatever characters it has.
-std::string identifier(std::string_view name);
-
-struct CloseDatabase {
-  void operator()(sqlite3* database) const { sqlite3_close_v2(database); }
-};
-using Database = std::unique_ptr<sqlite3, CloseDatabase>;
-
-// A prepared statement.  Columns count from 0, parameters from 1.
-class Statement {
+// The rows of one table.  Counting, walking and searching are views of the same rows, and safe from
+// any number of threads.
+class Table {
  public:
-  Statement(sqlite3* database, const std::string& sql);
+  // The rows stand one behind the other, layout.row_size() bytes each.
+  Table(Layout layout, std::vector<char> rows);
 
-  bool step();  // true while there is a row
-  void reset();
+  const Layout& layout() const { return layout_; }
+  std::size_t size() const { return size_; }
+  const char* row(std::size_t number) const { return rows_.data() + number * layout_.row_size(); }
 
-  void bind(int parameter, std::string_view text);  // the text stays the caller's
-  void bind(int parameter, int64_t number);
-  void bind(int parameter, double number);
+  // The numbers of the rows in the order of a column (byte order for text), equal ones in the order
+  // of insertion.  Made when it is first asked for.
+  const std::vector<std::uint32_t>& order(std::string_view column) const;
 
-  int type(int column) const { return sqlite3_column_type(statement_.get(), column); }
-  int64_t integer(int column) const { return sqlite3_column_int64(statement_.get(), column); }
-  double real(int column) const { return sqlite3_column_double(statement_.get(), column); }
-  std::string_view text(int column) const;
+  // The first row whose column equals the key (see OLB7R3_PF_get_row_by_value); null where there is
+  // none.
+  const char* find(std::string_view column, const void* key) const;
 
  private:
-  struct Finalize {
-    void operator()(sqlite3_stmt* statement) const { sqlite3_finalize(statement); }
+  struct Order {
+    std::once_flag made;
+    std::vector<std::uint32_t> rows;
   };
-  void require(int code) const;
 
-  sqlite3* database_;
-  std::unique_ptr<sqlite3_stmt, Finalize> statement_;
+  const Field& field(std::string_view column) const;
+
+  Layout layout_;
+  std::vector<char> rows_;
+  std::size_t size_;
+  std::unique_ptr<Order[]> orders_;  // one for each field
 };
 
 // One pass over the rows of a table.
 class Walk {
  public:
-  Walk(Statement statement, const Layout& layout)
-      : statement_(std::move(statement)), layout_(&layout) {}
+  // In the order of a column, of insertion for a null column.
+  Walk(const Table& table, const char* column)
+      : table_(&table), order_(column ? &table.order(column) : nullptr) {}
 
-  // Packs the next row into a buffer of layout.row_size() bytes; false at the end.  A row that does
-  // not pack throws, leaves the buffer alone, and is passed over by the next call.  When the file
-  // itself cannot be read, the call throws and the walk is at its end.
-  bool next(void* row);
+  const Table& table() const { return *table_; }
+
+  // The next row; null at the end, for ever after.
+  const char* next() {
+    if (next_ == table_->size()) return nullptr;
+    const std::size_t place = next_++;
+    return table_->row(order_ ? (*order_)[place] : place);
+  }
 
  private:
-  Statement statement_;
-  const Layout* layout_;
-  bool ended_ = false;
+  const Table* table_;
+  const std::vector<std::uint32_t>* order_;
+  std::size_t next_ = 0;
 };
 
+// A store file comes from anywhere.  It opens whole or not at all: an SQLite database whose pages
+// are sound, that holds nothing but plain tables, each with a layout that all its cells fit.
 class TableStore {
  public:
   explicit TableStore(const char* path);
+  // From the bytes of a file.
+  explicit TableStore(std::vector<unsigned char> file);
 
-  // The tables that have a layout.
-  const std::map<std::string, Layout, std::less<>>& tables() const { return tables_; }
-  const Layout& layout(std::string_view table) const;
-
-  int64_t count_rows(std::string_view table) const;
-  // In the order of a column (byte order for text), of insertion for a null column.
-  Walk walk(std::string_view table, const char* column) const;
-  // The first row whose column equals the key (see OLB7R3_PF_get_row_by_value); false where there
-  // is none.
-  bool find(std::string_view table, std::string_view column, const void* key, void* row) const;
+  const std::map<std::string, Table, std::less<>>& tables() const { return tables_; }
+  const Table& table(std::string_view name) const;
 
  private:
-  void read_layouts();
-
-  Database database_;
-  std::map<std::string, Layout, std::less<>> tables_;
+  std::map<std::string, Table, std::less<>> tables_;
 };
 
 }  // namespace tabdll

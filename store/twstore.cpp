@@ -5,6 +5,7 @@
 #include <charconv>
 #include <cstring>
 #include <exception>
+#include <functional>
 #include <iostream>
 #include <string>
 
@@ -12,7 +13,6 @@
 #include "checker.hpp"
 #include "csv.hpp"
 #include "table_store.hpp"
-#include "tidewater/store.h"
 
 namespace {
 
@@ -56,20 +56,18 @@ void print_row(const Layout& layout, const std::function<std::string(const Field
 
 int list_tables(const TableStore& store) {
   std::cout << "table,rows,row size\n";
-  for (const auto& [name, layout] : store.tables()) {
-    std::cout << csv_cell(name) << ',' << store.count_rows(name) << ',' << layout.row_size()
-              << '\n';
+  for (const auto& [name, rows] : store.tables()) {
+    std::cout << csv_cell(name) << ',' << rows.size() << ',' << rows.layout().row_size() << '\n';
   }
   return 0;
 }
 
 int list_rows(const TableStore& store, const std::string& table) {
-  const Layout& layout = store.layout(table);
-  print_row(layout, [](const Field& f) { return csv_cell(f.column); });
-  Walk walk = store.walk(table, nullptr);
-  std::array<char, TW_STORE_ROW_LIMIT> row;
-  while (walk.next(row.data())) {
-    print_row(layout, [&](const Field& f) { return cell(f, row.data()); });
+  const Table& rows = store.table(table);
+  print_row(rows.layout(), [](const Field& f) { return csv_cell(f.column); });
+  Walk walk(rows, nullptr);
+  while (const char* row = walk.next()) {
+    print_row(rows.layout(), [&](const Field& f) { return cell(f, row); });
   }
   return 0;
 }
@@ -118,7 +116,10 @@ int run(int argc, char** argv) {
 
 int main(int argc, char** argv) {
   try {
-    return run(argc, argv);
+    const int code = run(argc, argv);
+    if (std::cout.flush()) return code;
+    std::cerr << "twstore: the output cannot be written\n";
+    return 1;
   } catch (const std::exception& e) {
     std::cerr << "twstore: " << e.what() << '\n';
     return 1;

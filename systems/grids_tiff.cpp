@@ -68,6 +68,7 @@ Tiff open_tiff(Source* source) {
                                                                              TIFFOpenOptionsFree);
   if (!options) return nullptr;
   TIFFOpenOptionsSetErrorHandlerExtR(options.get(), silent, nullptr);
+  TIFFOpenOptionsSetMaxSingleMemAlloc(options.get(), tmsize_t{1} << 28);
   TIFFOpenOptionsSetWarningHandlerExtR(options.get(), silent, nullptr);
   return Tiff(TIFFClientOpenExt("grid", "rm", source, read_source, write_source, seek_source,
                                 close_source, size_source, nullptr, nullptr, options.get()));
@@ -275,7 +276,7 @@ double unit_of(const std::string& name, GridKind kind, const std::string& path) 
   refuse(path, "has shifts in the unit " + name + ", not in arc-seconds, degrees or radians");
 }
 
-void read_image(TIFF* tiff, std::int64_t most_nodes, bool first, GridContent* content) {
+void read_image(TIFF* tiff, std::int64_t file_size, bool first, GridContent* content) {
   const std::string& path = content->path;
   const Image image = read_layout(tiff, path);
   const Metadata metadata = parse_metadata(text_of(tiff, kMetadata));
@@ -316,7 +317,11 @@ void read_image(TIFF* tiff, std::int64_t most_nodes, bool first, GridContent* co
   if (first && g.parent.empty()) g.parent = "NONE";
   g.unit = unit_of(item(metadata, bands[0], "unittype"), content->kind, path);
   const bool from_south = place(tiff, image, path, &g);
-  set_size(path, image.width, image.height, band_count, most_nodes, &g);
+  // No compression makes more than so many bytes of one; a damaged header must not ask for more.
+  constexpr std::int64_t kMostExpansion = 1100;
+  const auto node_bytes = static_cast<std::int64_t>(image.sample_bytes()) * band_count;
+  set_size(path, image.width, image.height, band_count, file_size * kMostExpansion / node_bytes,
+           &g);
   for (int k = 0; k < band_count; ++k) {
     const int band = bands[k];
     if (unit_of(item(metadata, band, "unittype"), content->kind, path) != g.unit) {
@@ -348,20 +353,16 @@ void read_image(TIFF* tiff, std::int64_t most_nodes, bool first, GridContent* co
 
 void read_tiff(std::span<const unsigned char> file, GridContent* content) {
   constexpr int kMostImages = 1000;
-  // No compression makes more than so many nodes of a byte; a damaged header must not ask for more.
-  constexpr std::int64_t kMostNodesPerByte = 400;
   Source source{file};
   const Tiff tiff = open_tiff(&source);
   if (!tiff) refuse(content->path, "is damaged: its TIFF header cannot be read");
-  std::int64_t most_nodes = static_cast<std::int64_t>(file.size()) * kMostNodesPerByte;
   int images = 0;
   do {
     if (++images > kMostImages) refuse(content->path, "has images past counting");
     std::uint32_t kind = 0;
     TIFFGetField(tiff.get(), TIFFTAG_SUBFILETYPE, &kind);
     if ((kind & (FILETYPE_REDUCEDIMAGE | FILETYPE_MASK)) != 0) continue;  // an overview
-    read_image(tiff.get(), most_nodes, images == 1, content);
-    most_nodes -= content->lattices.back().columns * content->lattices.back().rows;
+    read_image(tiff.get(), static_cast<std::int64_t>(file.size()), images == 1, content);
   } while (TIFFReadDirectory(tiff.get()) == 1);
   if (content->lattices.empty()) refuse(content->path, "has no image at full size");
 }

@@ -15,7 +15,6 @@ namespace {
 
 #define TW_BLOCK int count, const CoordinateTriple *in, CoordinateTriple *out, TWstatus *status
 
-
 // The authalic latitude, whose series serve the ellipsoids of the Earth and others up to e = 0.2.
 struct Authalic {
   double radius;  // of the authalic sphere
@@ -23,10 +22,10 @@ struct Authalic {
 
   explicit Authalic(const MethodArguments& given)
       : radius(std::sqrt(authalic_radius_squared(given.a, given.f))),
-        to_authalic(latitude_series(Latitude::geodetic, Latitude::authalic,
-                                    third_flattening(given.f))),
-        to_geodetic(latitude_series(Latitude::authalic, Latitude::geodetic,
-                                    third_flattening(given.f))) {}
+        to_authalic(
+            latitude_series(Latitude::geodetic, Latitude::authalic, third_flattening(given.f))),
+        to_geodetic(
+            latitude_series(Latitude::authalic, Latitude::geodetic, third_flattening(given.f))) {}
 };
 
 double transverse_radius(const MethodArguments& given, double lat) {
@@ -102,8 +101,22 @@ struct Cassini {
   void forward(TW_BLOCK) const {
     TWcassini_f(e, 0, c0, c2, c4, c6, c8, m0, count, in, out, status);
   }
+  // The inverse series with what they miss put right by the forward ones.
   void inverse(TW_BLOCK) const {
-    TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, count, in, out, status);
+    for (int i = 0; i < count; ++i) {
+      const CoordinateTriple wanted = in[i];
+      CoordinateTriple aim = wanted;
+      for (int pass = 0; pass < 8; ++pass) {
+        CoordinateTriple back;
+        TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, 1, &aim, out + i, status);
+        forward(1, out + i, &back, status);
+        const double dx = wanted.x - back.x;
+        const double dy = wanted.y - back.y;
+        aim.x += dx;
+        aim.y += dy;
+        if (std::fabs(dx) < 1e-15 && std::fabs(dy) < 1e-15) break;
+      }
+    }
   }
 };
 
@@ -211,13 +224,13 @@ Made make_equal_earth(const MethodArguments& given) {
       plane,
       [=](double lon, double lat) {
         Pair answer{};
-        points::EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
+        EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
         answer.plain = true;
         return answer;
       },
       [=](double x, double y) {
         Pair answer{};
-        answer.plain = points::EqualEarth::inverse(x, y, &answer.x, &answer.y);
+        answer.plain = EqualEarth::inverse(x, y, &answer.x, &answer.y);
         answer.y = sphere.to_geodetic(answer.y);
         return answer;
       });
@@ -386,7 +399,7 @@ Made make_guam(const MethodArguments& given) {
 }
 
 Made make_colombia_urban(const MethodArguments& given) {
-  const points::ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
+  const ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](double lon, double lat) {

@@ -111,7 +111,7 @@ struct AliasRow : Row {
   int kind;
 };
 
-enum AliasKind : int { kSystemAlias, kDatumAlias, kEllipsoidAlias };
+enum AliasKind : int { kSystemAlias, kDatumAlias, kEllipsoidAlias, kUnitAlias, kNoAlias };
 
 struct DeprecatedRow : Row {
   int replaced_by;
@@ -133,7 +133,10 @@ struct Key {
   std::string key;
   bool later;
   int code;
-  auto operator<=>(const Key&) const = default;
+
+  bool operator<(const Key& other) const {
+    return std::tie(key, later, code) < std::tie(other.key, other.later, other.code);
+  }
 };
 
 // What a search goes through.
@@ -141,6 +144,11 @@ struct Entry {
   std::string folded;
   int code;
   bool alias;
+};
+
+struct Names {
+  std::vector<Entry> entries;
+  std::vector<Key> systems, datums, ellipsoids, meridians, units;
 };
 
 constexpr std::array<std::pair<std::string_view, UnitRecord::Kind>, 4> kUnitKinds = {
@@ -188,8 +196,7 @@ struct Registry::Tables {
 
   // Made when names are first asked for.
   mutable std::once_flag names_made;
-  mutable std::vector<Entry> entries;
-  mutable std::vector<Key> system_keys, datum_keys, ellipsoid_keys, meridian_keys, unit_keys;
+  mutable Names names_once_made;
 
   explicit Tables(const std::string& store) : path(store) {
     StoreReader reader(store);
@@ -515,35 +522,40 @@ struct Registry::Tables {
   // Names
 
   template <class AnyRow>
-  static void add_key(const Tables& tables, std::vector<Key>& keys, const AnyRow& row) {
-    keys.push_back({name_key(tables.view(row.name)), row.code < kFirstOfTheOlder, row.code});
-  }
-
-  template <class AnyRow>
-  void make_keys(std::vector<Key>& keys, const std::vector<AnyRow>& rows, int alias_kind) const {
-    for (const AnyRow& row : rows) add_key(*this, keys, row);
+  std::vector<Key> keys_of(const std::vector<AnyRow>& rows, int alias_kind) const {
+    std::vector<Key> keys;
+    const auto add = [&](const Row& row) {
+      keys.push_back({name_key(view(row.name)), row.code < kFirstOfTheOlder, row.code});
+    };
+    for (const AnyRow& row : rows) add(row);
     for (const AliasRow& row : aliases) {
-      if (row.kind == alias_kind && find(rows, row.code)) add_key(*this, keys, row);
+      if (row.kind == alias_kind && find(rows, row.code)) add(row);
     }
     std::sort(keys.begin(), keys.end());
+    return keys;
   }
 
-  void make_names() const {
+  std::vector<Entry> entries() const {
+    std::vector<Entry> out;
+    for (const SystemRow& row : systems) out.push_back({folded(view(row.name)), row.code, false});
+    for (const AliasRow& row : aliases) {
+      if (row.kind == kSystemAlias && find(systems, row.code)) {
+        out.push_back({folded(view(row.name)), row.code, true});
+      }
+    }
+    return out;
+  }
+
+  const Names& names() const {
     std::call_once(names_made, [this] {
-      for (const SystemRow& row : systems) {
-        entries.push_back({folded(view(row.name)), row.code, false});
-      }
-      for (const AliasRow& row : aliases) {
-        if (row.kind == kSystemAlias && find(systems, row.code)) {
-          entries.push_back({folded(view(row.name)), row.code, true});
-        }
-      }
-      make_keys(system_keys, systems, kSystemAlias);
-      make_keys(datum_keys, datums, kDatumAlias);
-      make_keys(ellipsoid_keys, ellipsoids, kEllipsoidAlias);
-      make_keys(meridian_keys, meridians, -1);
-      make_keys(unit_keys, units, -1);
+      names_once_made = {entries(),
+                         keys_of(systems, kSystemAlias),
+                         keys_of(datums, kDatumAlias),
+                         keys_of(ellipsoids, kEllipsoidAlias),
+                         keys_of(meridians, kNoAlias),
+                         keys_of(units, kUnitAlias)};
     });
+    return names_once_made;
   }
 
   // A row by the name itself before one by another name.
@@ -757,28 +769,23 @@ double Registry::base_value(const Parameter& parameter) const {
 }
 
 std::optional<SystemRecord> Registry::system(std::string_view name) const {
-  tables_->make_names();
-  return system(tables_->code_of(tables_->system_keys, tables_->systems, name));
+  return system(tables_->code_of(tables_->names().systems, tables_->systems, name));
 }
 
 std::optional<DatumRecord> Registry::datum(std::string_view name) const {
-  tables_->make_names();
-  return datum(tables_->code_of(tables_->datum_keys, tables_->datums, name));
+  return datum(tables_->code_of(tables_->names().datums, tables_->datums, name));
 }
 
 std::optional<EllipsoidRecord> Registry::ellipsoid(std::string_view name) const {
-  tables_->make_names();
-  return ellipsoid(tables_->code_of(tables_->ellipsoid_keys, tables_->ellipsoids, name));
+  return ellipsoid(tables_->code_of(tables_->names().ellipsoids, tables_->ellipsoids, name));
 }
 
 std::optional<MeridianRecord> Registry::meridian(std::string_view name) const {
-  tables_->make_names();
-  return meridian(tables_->code_of(tables_->meridian_keys, tables_->meridians, name));
+  return meridian(tables_->code_of(tables_->names().meridians, tables_->meridians, name));
 }
 
 std::optional<UnitRecord> Registry::unit(std::string_view name) const {
-  tables_->make_names();
-  return unit(tables_->code_of(tables_->unit_keys, tables_->units, name));
+  return unit(tables_->code_of(tables_->names().units, tables_->units, name));
 }
 
 std::vector<int> Registry::systems() const {
@@ -809,7 +816,6 @@ std::vector<OperationRecord> Registry::operations(int system) const {
 }
 
 std::vector<Found> Registry::search(std::string_view words, std::size_t limit) const {
-  tables_->make_names();
   const std::string query = folded(words);
   std::vector<std::string_view> parts = split_words(query);
   if (parts.size() > 1 && parts[0] == "epsg") parts.erase(parts.begin());
@@ -823,10 +829,14 @@ std::vector<Found> Registry::search(std::string_view words, std::size_t limit) c
     bool alias;
     bool other_kind;
     int code;
-    auto operator<=>(const Rank&) const = default;
+
+    bool operator<(const Rank& other) const {
+      return std::tie(match, alias, other_kind, code) <
+             std::tie(other.match, other.alias, other.other_kind, other.code);
+    }
   };
   std::vector<Rank> ranks;
-  for (const Entry& entry : tables_->entries) {
+  for (const Entry& entry : tables_->names().entries) {
     const Match match = match_of(entry.folded, parts, query);
     const bool is_code = entry.code == code;
     if (match == Match::none && !is_code) continue;
@@ -849,7 +859,6 @@ std::vector<Found> Registry::search(std::string_view words, std::size_t limit) c
 }
 
 std::vector<std::string> Registry::suggest(std::string_view name, std::size_t limit) const {
-  tables_->make_names();
   const std::string wanted = name_key(name);
   if (wanted.empty()) return {};
   const std::size_t most = std::max<std::size_t>(2, wanted.size() / 3);

@@ -123,7 +123,8 @@ struct Found {
 class Registry {
  public:
   // The registry of the store that the environment variable TIDEWATER_STORE names, else of the one
-  // beside the library.  Throws an Error where there is none; the next call tries again.
+  // beside the library; read at the first call.  Throws an Error where there is none; the next call
+  // tries again.
   static const Registry& shared();
 
   // The registry of a store.  Throws an Error where the store cannot be read or has no registry.

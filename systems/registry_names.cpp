@@ -58,8 +58,6 @@ std::string folded(std::string_view text) {
     if (c >= 'A' && c <= 'Z') {
       const char small = static_cast<char>(c - 'A' + 'a');
       put({&small, 1});
-    } else if ((c >= 'a' && c <= 'z') || (c >= '0' && c <= '9')) {
-      put(text.substr(i, 1));
     } else if (c == '\'') {
       // "Clarke's" is one word.
     } else if (c >= 0xC3 && c <= 0xC5 && next >= 0x80 && next <= 0xBF) {
@@ -79,7 +77,7 @@ std::string folded(std::string_view text) {
       const char third = i + 2 < text.size() ? text[i + 2] : '\0';
       if (third != '\x99') apart = true;  // dashes and quotes, but for an apostrophe
       i += 2;
-    } else if (c >= 0xC6) {
+    } else if ((c >= 'a' && c <= 'z') || (c >= '0' && c <= '9') || c >= 0xC6) {
       put(text.substr(i, 1));  // other scripts stand as they are
     } else if (c >= 0x80) {
       out += text[i];

@@ -123,8 +123,9 @@ TW_API void TWhar_intp_Cnm(int16_t last_interval, double interval, double dt, do
  * @param n_sec          degree of the rates, out
  * @param cnm,snm        coefficients, out
  * @param ctnm,stnm      rates, out
- * @param status         #TW_BAD_DATE before the first epoch or more than 5 beyond the last; nothing
- *                       written, last_date included
+ * @param status         #TW_BAD_DATE before the first epoch or more than 5 beyond the last,
+ *                       #TW_BAD_INPUT with fewer than two epochs; nothing written, last_date
+ *                       included
  */
 TW_API void TWhar_set_date(double date, double* last_date, double tolerance, int32_t epoch_count,
                            const int32_t* degrees, const double* epochs, double interval,

@@ -10,6 +10,11 @@
  * until it sees the end-of-table word.
  *
  * There is one current store, from an open to the next close; in libtabdll one for each thread.
+ *
+ * In libtabdll counts, walks and searches are views of the same rows, which are read and checked as a
+ * whole when a file is first opened.  They are kept for later openings, from any thread, while the
+ * file's device, inode, size and times are those that were read; an open store stays as it was read
+ * whatever becomes of the file.
  */
 #ifndef TIDEWATER_STORE_H
 #define TIDEWATER_STORE_H

@@ -11,8 +11,8 @@
 
 #include "datum/grid_file.hpp"
 #include "datum/grid_window.hpp"
+#include "formulas/interpolation.hpp"
 #include "formulas/wraps.hpp"
-#include "foundation/interpolation.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;
@@ -112,10 +112,10 @@ std::optional<WindowPlace> place_in_file(const GeoidGrid& grid, const GeoidWindo
   return WindowPlace{column, row, record, first_record * record, w.nr * record};
 }
 
-void decode_nodes(const unsigned char* first, std::int64_t record, const GeoidWindow& w,
+void decode_nodes(const unsigned char* first, std::int64_t record, int32_t nr, int32_t nc,
                   float* data) {
-  for (int32_t r = 0; r < w.nr; ++r) {
-    for (int32_t c = 0; c < w.nc; ++c) {
+  for (int32_t r = 0; r < nr; ++r) {
+    for (int32_t c = 0; c < nc; ++c) {
       data[r * kSide + c] = decode_f32(first + r * record + std::ptrdiff_t{4} * c);
     }
   }
@@ -129,7 +129,7 @@ TWstatus read_window(std::FILE* file, const WindowPlace& place, const GeoidWindo
   if (!seek_to(file, place.offset) || !read_exactly(file, buffer.get(), size)) {
     return TW_GEOID_READ_ERROR;
   }
-  decode_nodes(buffer.get() + place.first_byte(), place.record, w, data);
+  decode_nodes(buffer.get() + place.first_byte(), place.record, w.nr, w.nc, data);
   return TW_SUCCESS;
 }
 
@@ -138,9 +138,10 @@ TWstatus read_window(std::FILE* file, const WindowPlace& place, const GeoidWindo
 struct NodesInMemory {
   const unsigned char* first = nullptr;
   std::int64_t record = 0;
+  int32_t nr = 0, nc = 0;
 
-  void settle(const GeoidWindow& w, float* data) {
-    if (first) decode_nodes(first, record, w, data);
+  void settle(float* data) {
+    if (first) decode_nodes(first, record, nr, nc, data);
     first = nullptr;
   }
 };
@@ -170,7 +171,7 @@ class Call {
   Call() = default;
   Call(const Call&) = delete;
   Call& operator=(const Call&) = delete;
-  ~Call() { nodes_.settle(held.bounds, held.data); }
+  ~Call() { nodes_.settle(held.data); }
 
   // Finds the grid of a point and places the window, whose nodes are then in its data, or in memory
   // where the call has the file there.
@@ -215,7 +216,6 @@ TWstatus Call::locate(double x, double y, const GeoidControl& control, GeoidWind
   };
   ix = held_inside(ix, grid.nc);
   iy = held_inside(iy, grid.nr);
-  const GeoidWindow before = *window;
   GeoidWindow& w = *window;
   w.nc = kSide;
   w.nr = kSide;
@@ -236,13 +236,13 @@ TWstatus Call::locate(double x, double y, const GeoidControl& control, GeoidWind
     placed_ = true;
     const unsigned char* const bytes = image.at(place->offset, place->size);
     // Nodes of a smaller window leave those of the one before it standing around them.
-    if (nodes_.first && (w.nc < before.nc || w.nr < before.nr)) nodes_.settle(before, data);
+    if (w.nc < nodes_.nc || w.nr < nodes_.nr) nodes_.settle(data);
     if (bytes) {
-      nodes_ = {bytes + place->first_byte(), place->record};
+      nodes_ = {bytes + place->first_byte(), place->record, w.nr, w.nc};
       return TW_SUCCESS;
     }
   }
-  nodes_.settle(before, data);
+  nodes_.settle(data);
   if (!place || !open()) return TW_GEOID_READ_ERROR;
   const TWstatus word = read_window(files_->file(0), *place, w, data);
   files_->count_load();
@@ -255,11 +255,13 @@ TWstatus Call::undulation(double lon, double lat, const GeoidControl& control, d
   x = add_turns_while(x, -360, [](double v) { return v > 0; });
   x = add_turns_while(x, 360, [](double v) { return v <= -360; });
   const GeoidWindow& w = held.bounds;
+  // All four comparisons at once: which of them a scattered point fails cannot be foreseen.
   const auto inside = [](double value, float spacing, float min, float max) {
     // The outer cell all round is not used.
-    return value - wide(spacing) > wide(min) && value + wide(spacing) < wide(max);
+    return static_cast<int>(value - wide(spacing) > wide(min)) &
+           static_cast<int>(value + wide(spacing) < wide(max));
   };
-  if (!inside(x, w.dx, w.xmin, w.xmax) || !inside(y, w.dy, w.ymin, w.ymax)) {
+  if ((inside(x, w.dx, w.xmin, w.xmax) & inside(y, w.dy, w.ymin, w.ymax)) == 0) {
     const TWstatus word = locate(x, y, control, &held.bounds, held.data, &held.grid);
     if (word != TW_SUCCESS) return word;
   }

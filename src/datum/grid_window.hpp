@@ -20,6 +20,14 @@ bool holds(const Bounds& g, double x, double y) {
   return g.xmin < x && x < g.xmax && g.ymin < y && y < g.ymax;
 }
 
+// The same without branches, for a window: which of the comparisons a scattered point fails cannot
+// be foreseen.
+template <class Bounds>
+bool holds_at_once(const Bounds& w, double x, double y) {
+  return (static_cast<int>(w.xmin < x) & static_cast<int>(x < w.xmax) &
+          static_cast<int>(w.ymin < y) & static_cast<int>(y < w.ymax)) != 0;
+}
+
 // Grids of the caller's block; a count that no block can hold is cut.
 template <class Control>
 int32_t grids_of(const Control& control) {

@@ -10,8 +10,8 @@
 
 #include "datum/grid_file.hpp"
 #include "datum/grid_window.hpp"
+#include "formulas/interpolation.hpp"
 #include "formulas/wraps.hpp"
-#include "foundation/interpolation.hpp"
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;
@@ -222,7 +222,7 @@ void Call::shift(int32_t count, const CoordinateTriple* in, const NadconControl&
     x = add_turns_while(x, -360, [](double v) { return v > 0; });
     x = add_turns_while(x, 360, [](double v) { return v <= -360; });
     const NadconWindow& w = held.bounds;
-    if (!holds(w, x, y)) {
+    if (!holds_at_once(w, x, y)) {
       if (!files_) files_.emplace();
       *status = locate(x, y, control, &held.bounds, held.lon, held.lat, &*files_, &nodes_);
     }

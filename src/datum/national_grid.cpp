@@ -251,9 +251,12 @@ struct Shift {
   double lon, lat;
 };
 
+// Without branches: which of the comparisons a scattered point fails cannot be foreseen.
 bool in_block(int64_t row, int64_t col) {
-  return row >= cnt_block_row && row < cnt_block_row + kSide && col >= cnt_block_col &&
-         col < cnt_block_col + kSide;
+  const auto within = [](int64_t offset) {
+    return static_cast<int>(static_cast<uint64_t>(offset) < uint64_t{kSide});
+  };
+  return (within(row - cnt_block_row) & within(col - cnt_block_col)) != 0;
 }
 
 Shift interpolate(const Found& found, double x, double y, Call* call) {
@@ -271,8 +274,10 @@ Shift interpolate(const Found& found, double x, double y, Call* call) {
   const bool own_corner = found.code == kNorthWestCorner && row + 1 < g.rows && col + 1 < g.cols;
   const int64_t to_corner_row = own_corner ? 1 : to_north;
   const int64_t to_corner_col = own_corner ? 1 : to_west;
-  if (cnt_block_grid != found.grid || !in_block(row, col) ||
-      !in_block(row + to_corner_row, col + to_corner_col)) {
+  const int held_already = static_cast<int>(cnt_block_grid == found.grid) &
+                           static_cast<int>(in_block(row, col)) &
+                           static_cast<int>(in_block(row + to_corner_row, col + to_corner_col));
+  if (held_already == 0) {
     load_block(found.grid, row, col, call);
   }
 

@@ -3,7 +3,7 @@
 #include <cmath>
 
 #include "formulas/constants.hpp"
-#include "foundation/interpolation.hpp"
+#include "formulas/interpolation.hpp"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::detail;

@@ -21,14 +21,17 @@ constexpr std::ptrdiff_t row_count(int32_t degree) {
   return std::max<std::ptrdiff_t>(std::ptrdiff_t{degree} + 1, 0);
 }
 
-// The rows of a triangular array in a block, from the C allocator; null where that fails.
-double** make_row_table(int32_t degree, double* block) {
+// The rows of a triangular array that begins so many doubles into a block, from the C allocator;
+// null where that fails.  The block is not read: the rows of a null one are null.
+double** make_row_table(int32_t degree, double* block, std::ptrdiff_t first = 0) {
   const std::ptrdiff_t rows = row_count(degree);
   // Room for one pointer at least, so that null means a failure and nothing else.
   const auto places = static_cast<std::size_t>(std::max<std::ptrdiff_t>(rows, 1));
   auto** table = static_cast<double**>(std::malloc(places * sizeof(double*)));
   if (!table) return nullptr;
-  for (std::ptrdiff_t n = 0; n < rows; ++n) table[n] = block + row_offset(n);
+  for (std::ptrdiff_t n = 0; n < rows; ++n) {
+    table[n] = block ? block + first + row_offset(n) : nullptr;
+  }
   return table;
 }
 
@@ -57,8 +60,8 @@ void TWhar_alocCtnm(int32_t k, const int32_t* degrees, double* c_block, double* 
   *status = TW_SUCCESS;
   std::ptrdiff_t offset = 0;
   for (int32_t i = 0; i < k; ++i) {
-    c_sets[i] = make_row_table(degrees[i], c_block + offset);
-    s_sets[i] = make_row_table(degrees[i], s_block + offset);
+    c_sets[i] = make_row_table(degrees[i], c_block, offset);
+    s_sets[i] = make_row_table(degrees[i], s_block, offset);
     if (!c_sets[i] || !s_sets[i]) {
       *status = TW_NO_MEMORY;
       for (int32_t made = 0; made <= i; ++made) {
@@ -170,12 +173,20 @@ void TWhar_set_date(double date, double* last_date, double tolerance, int32_t ep
                     double*** s_sets, int32_t* n_main, int32_t* n_sec, double** cnm, double** snm,
                     double** ctnm, double** stnm, TWstatus* status) {
   *status = TW_SUCCESS;
+  if (epoch_count < 1) {
+    *status = TW_BAD_INPUT;
+    return;
+  }
   if (date < epochs[0] || date > epochs[epoch_count - 1] + kExtrapolation) {
     *status = TW_BAD_DATE;
     return;
   }
   // By contract: truncated first, so that less than one whole unit never leads to new coefficients.
   if (std::fabs(std::trunc(date - *last_date)) <= tolerance) return;
+  if (epoch_count < 2) {  // a set without rates: there is nothing to interpolate
+    *status = TW_BAD_INPUT;
+    return;
+  }
   *last_date = date;
   int32_t i = epoch_count - 2;  // the last set of all is never the base
   while (epochs[i] > date) --i;

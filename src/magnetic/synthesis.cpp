@@ -1,40 +1,19 @@
-// Spherical-harmonic synthesis by Clenshaw's method in two stages: sums over degree for each order,
-// then a sum over order.  No Legendre function is formed.
+// The synthesis with the caller's caches: what of the last point serves the next, and what a caller
+// finds in its arrays afterwards.
 
+#include <algorithm>
 #include <cmath>
-#include <cstring>
 #include <initializer_list>
 
-#include "formulas/constants.hpp"
+#include "magnetic/synthesis_points.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/magnetic.h"
 
-using namespace tidewater::detail;
+namespace tidewater::detail {
 
 namespace {
 
-// A point this close to the axis is held off it, on the meridian of Greenwich.
-constexpr double kAxisLimit = 1e-12;
-
-enum Mode : int16_t { kGradient = 0, kAlongTheta = 1, kAlongLambda = 2, kRadial = 3, kGravity = 4 };
-
-// The components that a mode gives.
-template <Mode kMode>
-constexpr bool kNorth = kMode == kGradient || kMode == kAlongTheta;
-template <Mode kMode>
-constexpr bool kEast = kMode == kGradient || kMode == kAlongLambda;
-template <Mode kMode>
-constexpr bool kDown = kMode == kGradient || kMode == kRadial;
-
-struct Series {
-  int32_t N;
-  double* const* C;
-  double* const* S;
-  double* const* rec_a;
-  double* const* rec_b;
-};
-
-// The work arrays: one value for each order.
+// The caller's work arrays: one value for each order.
 struct Sums {
   double* dC;
   double* dS;
@@ -44,97 +23,6 @@ struct Sums {
   double* rS;
   double* C;
   double* S;
-};
-
-// What the recurrences need of a point, with q = radius / r: q cos(theta), q sin(theta), q^2.
-struct Argument {
-  double tcos;
-  double tsin;
-  double q2;
-};
-
-// Two neighbouring orders side by side; arithmetic goes element by element.
-using Pair = double __attribute__((vector_size(2 * sizeof(double))));
-
-template <class Value>
-Value load(const double* place) {
-  Value value;
-  std::memcpy(&value, place, sizeof value);
-  return value;
-}
-
-// The sum y and its derivative d by theta, at the last degree done and at the one above it.
-template <class Value>
-struct Chain {
-  Value y = {};
-  Value y_above = {};
-  Value d = {};
-  Value d_above = {};
-
-  void descend(Value a_cos, Value b_q2, Value term) {
-    const Value next = a_cos * y + b_q2 * y_above + term;
-    y_above = y;
-    y = next;
-  }
-
-  // Comes before descend(): it needs y of the degree above.
-  void descend_slope(Value a_cos, Value a_sin, Value b_q2) {
-    const Value next = a_cos * d + b_q2 * d_above - a_sin * y;
-    d_above = d;
-    d = next;
-  }
-};
-
-Chain<double> lane(const Chain<Pair>& chain, int j) {
-  return {chain.y[j], chain.y_above[j], chain.d[j], chain.d_above[j]};
-}
-
-// The sums over degree of one order, or of a pair.  One pass serves all terms of a mode, so that
-// constants and coefficients are read once.
-template <Mode kMode, class Value>
-struct DegreeSums {
-  // At the degree of the series, above which y and d are zero.
-  DegreeSums(const Series& series, int32_t m) {
-    const int32_t n = series.N;
-    c.y = load<Value>(series.C[n] + m);
-    s.y = load<Value>(series.S[n] + m);
-    radial_c.y = (n + 1.0) * c.y;
-    radial_s.y = (n + 1.0) * s.y;
-  }
-
-  // One order of a pair.
-  DegreeSums(const DegreeSums<kMode, Pair>& pair, int j)
-      : c(lane(pair.c, j)),
-        s(lane(pair.s, j)),
-        radial_c(lane(pair.radial_c, j)),
-        radial_s(lane(pair.radial_s, j)) {}
-
-  // Goes down to degree n from n + 1.
-  void step(const Series& series, const Argument& at, int32_t m, int32_t n) {
-    static constexpr double kNone[2] = {};
-    const auto a = load<Value>(series.rec_a[n + 1] + m);
-    const auto b = load<Value>(n + 2 <= series.N ? series.rec_b[n + 2] + m : kNone);
-    const auto C = load<Value>(series.C[n] + m);
-    const auto S = load<Value>(series.S[n] + m);
-    const Value a_cos = a * at.tcos;
-    const Value a_sin = a * at.tsin;
-    const Value b_q2 = b * at.q2;
-    if constexpr (kNorth<kMode>) {
-      c.descend_slope(a_cos, a_sin, b_q2);
-      s.descend_slope(a_cos, a_sin, b_q2);
-    }
-    if constexpr (kMode != kRadial) {
-      c.descend(a_cos, b_q2, C);
-      s.descend(a_cos, b_q2, S);
-    }
-    if constexpr (kDown<kMode>) {
-      radial_c.descend(a_cos, b_q2, (n + 1.0) * C);
-      radial_s.descend(a_cos, b_q2, (n + 1.0) * S);
-    }
-  }
-
-  Chain<Value> c, s;                // of the terms C and S
-  Chain<Value> radial_c, radial_s;  // of the terms (n + 1) C and (n + 1) S
 };
 
 template <Mode kMode>
@@ -154,12 +42,13 @@ void store(const DegreeSums<kMode, double>& of, int32_t m, const Sums& sums) {
 }
 
 template <Mode kMode>
-void sum_degrees(const Series& series, const Argument& at, const Sums& sums) {
+void sum_degrees(const Series& series, const Argument<double>& at, const Sums& sums) {
   const int32_t N = series.N;
+  const Argument<Orders> both_at = {at.tcos, at.tsin, at.q2};
   int32_t m = 0;
   for (; m < N; m += 2) {
-    DegreeSums<kMode, Pair> both(series, m);
-    for (int32_t n = N - 1; n > m; --n) both.step(series, at, m, n);
+    DegreeSums<kMode, Orders> both(series, m);
+    for (int32_t n = N - 1; n > m; --n) both.step(series, both_at, m, n);
     store(DegreeSums<kMode, double>(both, 1), m + 1, sums);
     DegreeSums<kMode, double> first(both, 0);
     first.step(series, at, m, m);  // the degree that only the first order of the pair has
@@ -168,13 +57,30 @@ void sum_degrees(const Series& series, const Argument& at, const Sums& sums) {
   if (m == N) store(DegreeSums<kMode, double>(series, m), m, sums);
 }
 
+void sum_degrees(int16_t mode, const Series& series, const Argument<double>& at, const Sums& sums) {
+  switch (mode) {
+    case kGradient:
+      return sum_degrees<kGradient>(series, at, sums);
+    case kAlongTheta:
+      return sum_degrees<kAlongTheta>(series, at, sums);
+    case kAlongLambda:
+      return sum_degrees<kAlongLambda>(series, at, sums);
+    case kRadial:
+      return sum_degrees<kRadial>(series, at, sums);
+    case kGravity:
+      return sum_degrees<kGravity>(series, at, sums);
+    default:
+      return;  // By contract: another mode keeps the cache and the sines up to date alone.
+  }
+}
+
 // Cosines and sines of the multiples of a longitude, in the two places of each row of rec_b that
 // hold no constant: [m][m] and [m][m - 1].
 void tabulate_multiples(double lon, int32_t N, double* const* rec_b) {
-  const double c = std::cos(lon);
+  const auto [s, c] = sincos(lon);
   rec_b[0][0] = 1;
   rec_b[1][1] = c;
-  rec_b[1][0] = std::sin(lon);
+  rec_b[1][0] = s;
   rec_b[2][2] = 2 * c * rec_b[1][1] - rec_b[0][0];
   rec_b[2][1] = 2 * c * rec_b[1][0];
   for (int32_t m = 3; m <= N; ++m) {
@@ -183,40 +89,266 @@ void tabulate_multiples(double lon, int32_t N, double* const* rec_b) {
   }
 }
 
-// The four sums over order, without their scales.
-struct OrderSums {
-  double A = 0;
-  double B = 0;
-  double L = 0;
-  double R = 0;
-};
-
 template <Mode kMode>
-OrderSums sum_orders(const Series& series, const Argument& at, const Sums& sums) {
-  double zA = 0, zB = 0, zL = 0, zR = 0, e = 0;
-  double a_sin = 0, a_cos = 0;  // of order m + 1; nothing stands above order N
+OrderSums<double> sum_orders(const Series& series, const Argument<double>& at, const Sums& sums) {
+  OrderChain<kMode, double> chain;
   for (int32_t m = series.N; m >= 0; --m) {
     const double cos_m = series.rec_b[m][m];
     const double sin_m = m > 0 ? series.rec_b[m][m - 1] : 0;
-    if constexpr (kNorth<kMode>) {
-      e = a_sin * e + a_cos * zB;
-      zB = a_sin * zB + (sums.S[m] * sin_m + sums.C[m] * cos_m);
-    }
+    Weights<double> w;
+    if constexpr (kNorth<kMode>) w.B = sums.S[m] * sin_m + sums.C[m] * cos_m;
     if constexpr (kNorth<kMode> || kMode == kGravity) {
-      zA = a_sin * zA + (sums.dC[m] * cos_m + sums.dS[m] * sin_m);
+      w.A = sums.dC[m] * cos_m + sums.dS[m] * sin_m;
     }
-    if constexpr (kEast<kMode>) {
-      zL = a_sin * zL + (sums.lS[m] * sin_m + sums.lC[m] * cos_m) * m;
-    }
-    if constexpr (kDown<kMode>) zR = a_sin * zR + (sums.rS[m] * sin_m + sums.rC[m] * cos_m);
-    a_sin = series.rec_a[m][m] * at.tsin;
-    a_cos = series.rec_a[m][m] * at.tcos;
+    if constexpr (kEast<kMode>) w.L = (sums.lS[m] * sin_m + sums.lC[m] * cos_m) * m;
+    if constexpr (kDown<kMode>) w.R = sums.rS[m] * sin_m + sums.rC[m] * cos_m;
+    chain.descend(w, series.rec_a[m][m], at);
   }
-  const double first = series.rec_a[0][0];
-  return {zA * first, e * first, zL * first, zR * first};
+  return chain.sums(series.rec_a[0][0]);
 }
 
+// The synthesis of one call, on the caller's caches.
+class Synthesis {
+ public:
+  Synthesis(int16_t mode, const Series& series, double radius, double tolerance, const Sums& sums,
+            double* last_colat, double* last_radius, double* last_lon, double* saved_tcos,
+            double* saved_tsin, double* saved_scale_theta, double* saved_scale_lambda,
+            double* saved_scale_r)
+      : mode_(mode),
+        series_(series),
+        radius_(radius),
+        tolerance_(tolerance),
+        sums_(sums),
+        last_colat_(last_colat),
+        last_radius_(last_radius),
+        last_lon_(last_lon),
+        saved_tcos_(saved_tcos),
+        saved_tsin_(saved_tsin),
+        saved_scale_theta_(saved_scale_theta),
+        saved_scale_lambda_(saved_scale_lambda),
+        saved_scale_r_(saved_scale_r),
+        at_{*saved_tcos, *saved_tsin, 0},
+        scale_theta_(*saved_scale_theta),
+        scale_lambda_(*saved_scale_lambda),
+        scale_r_(*saved_scale_r) {}
+
+  // What only the series over normal gravity needs.
+  void set_gravity(double a, double e, double gm, double gamma_equator, double gamma_pole) {
+    a_ = a;
+    e_ = e;
+    gm_ = gm;
+    gamma_equator_ = gamma_equator;
+    gamma_pole_ = gamma_pole;
+  }
+
+  // Point by point, each on what the last one left.
+  void in_turn(int32_t count, const CoordinateTriple* in, CoordinateTriple* out) {
+    for (int32_t i = 0; i < count; ++i) next(in[i], out[i]);
+  }
+
+  // Several points at once, with the figures that in_turn() gives.
+  template <Mode kMode>
+  void at_once(int32_t count, const CoordinateTriple* in, CoordinateTriple* out) {
+    constexpr int32_t kChunk = 64;
+    const HarmonicSums<kMode> sums = {series_, radius_};
+    CoordinateTriple places[kChunk], results[kChunk];
+    // By contract: until a point leaves the last call's place and meridian, that call's sums and
+    // sines stand, whatever the coefficients are now.
+    bool own_sums = false, own_sines = false;
+    for (int32_t start = 0; start < count;) {
+      const int32_t n = std::min(kChunk, count - start);
+      over_points(SphericalPlace(), n, in + start, places);
+      own_sums = own_sums || (same_place(places[0].x, places[0].z) ? fresh_sums<kMode>() : true);
+      own_sines = own_sines || (has_turned(places[0].y) || fresh_sines());
+      if (!own_sums || !own_sines) {
+        const Steps steps = next(in[start], out[start]);
+        own_sums |= steps.moved;
+        own_sines |= steps.turned;
+        ++start;
+        continue;
+      }
+      double colat = *last_colat_, r = *last_radius_, lon = *last_lon_;
+      int32_t moves = 0, turns = 0;
+      for (int32_t i = 0; i < n; ++i) {
+        // A point that has not left its predecessor's place or meridian is computed there.
+        if (same_place(places[i].x, places[i].z)) {
+          places[i].x = *last_colat_;
+          places[i].z = *last_radius_;
+        } else {
+          *last_colat_ = places[i].x;
+          *last_radius_ = places[i].z;
+          ++moves;
+        }
+        if (has_turned(places[i].y)) {
+          *last_lon_ = places[i].y;
+          ++turns;
+        } else {
+          places[i].y = *last_lon_;
+        }
+      }
+      if (level() < Level::avx2 && 2 * moves < n) {
+        // Narrow registers gain less than the sums over degree that these points share.
+        *last_colat_ = colat;
+        *last_radius_ = r;
+        *last_lon_ = lon;
+        in_turn(n, in + start, out + start);
+        start += n;
+        continue;
+      }
+      over_points(sums, n, places, results);
+      for (int32_t i = 0; i < n; ++i) {
+        out[start + i].x = results[i].x;
+        if constexpr (kMode == kGradient) out[start + i] = results[i];
+      }
+      start += n;
+      // The caches are left as the last point leaves them, where one may look at them.
+      const bool looked_at = start >= count || level() < Level::avx2;
+      moved_ |= moves > 0;
+      turned_ |= turns > 0;
+      if (looked_at && moved_) move_to(*last_colat_, *last_radius_, {});
+      if (looked_at && turned_) turn_to(*last_lon_);
+    }
+  }
+
+ private:
+  struct Steps {
+    bool moved, turned;
+  };
+
+  Steps next(const CoordinateTriple& in, CoordinateTriple& out) {
+    const CoordinateTriple point = in;
+    const auto place = SphericalPlace()(point.x, point.y, point.z);
+    const Steps steps = {!same_place(place.x, place.z), has_turned(place.y)};
+    if (steps.moved) move_to(place.x, place.z, point);
+    if (steps.turned) turn_to(place.y);
+    write(out);
+    return steps;
+  }
+
+  bool same_place(double colat, double r) const {
+    return radius_ * std::fabs(colat - *last_colat_) <= tolerance_ &&
+           std::fabs(r - *last_radius_) <= tolerance_;
+  }
+  bool has_turned(double lon) const { return radius_ * std::fabs(lon - *last_lon_) > tolerance_; }
+
+  // Whether the caller's sums are those that this call would make at the last place.
+  template <Mode kMode>
+  bool fresh_sums() const {
+    constexpr int32_t kOrders = HarmonicSums<kMode>::kMostDegree + 1;
+    double made[8][kOrders];
+    const Sums own = {made[0], made[1], made[2], made[3], made[4], made[5], made[6], made[7]};
+    const double q = radius_ / *last_radius_;
+    const auto [sin_colat, cos_colat] = sincos(*last_colat_);
+    const Argument<double> at = {q * cos_colat, q * sin_colat, q * q};
+    sum_degrees<kMode>(series_, at, own);
+    const auto agree = [&](const double* given, const double* fresh, int32_t first) {
+      return std::equal(given + first, given + series_.N + 1, fresh + first);
+    };
+    bool same = at.tcos == *saved_tcos_ && at.tsin == *saved_tsin_;
+    if constexpr (kNorth<kMode>) {
+      same = same && agree(sums_.dC, own.dC, 0) && agree(sums_.dS, own.dS, 1) &&
+             agree(sums_.C, own.C, 0) && agree(sums_.S, own.S, 1);
+    }
+    if constexpr (kEast<kMode>)
+      same = same && agree(sums_.lC, own.lC, 1) && agree(sums_.lS, own.lS, 1);
+    if constexpr (kDown<kMode>)
+      same = same && agree(sums_.rC, own.rC, 0) && agree(sums_.rS, own.rS, 1);
+    return same && scale_theta_ == at.q2 && scale_lambda_ == at.q2 / sin_colat &&
+           scale_r_ == -at.q2;
+  }
+
+  // Whether the table of multiples is that of the last longitude.
+  bool fresh_sines() const {
+    const auto [s, c] = sincos(*last_lon_);
+    double* const* const table = series_.rec_b;
+    double cos_below = 1, sin_below = 0, cos_m = c, sin_m = s;
+    if (table[0][0] != 1) return false;
+    for (int32_t m = 1; m <= series_.N; ++m) {
+      if (table[m][m] != cos_m || table[m][m - 1] != sin_m) return false;
+      const double cos_next = 2 * c * cos_m - cos_below;
+      const double sin_next = m == 1 ? 2 * c * sin_m : 2 * c * sin_m - sin_below;
+      cos_below = cos_m;
+      sin_below = sin_m;
+      cos_m = cos_next;
+      sin_m = sin_next;
+    }
+    return true;
+  }
+
+  void move_to(double colat, double r, const CoordinateTriple& position) {
+    *last_colat_ = colat;
+    *last_radius_ = r;
+    const double q = radius_ / r;
+    const auto [sin_colat, cos_colat] = sincos(colat);
+    at_ = {q * cos_colat, q * sin_colat, q * q};
+    scale_theta_ = at_.q2;
+    scale_lambda_ = at_.q2 / sin_colat;
+    scale_r_ = -at_.q2;
+    if (mode_ == kGravity) {
+      CoordinateTriple place = {};
+      double gamma = 0;
+      TWstatus word = TW_SUCCESS;  // neither call can fail
+      TWxyz_to_llh(a_, e_, 1, &position, &place, &word);
+      TWnormal_grav(a_, e_, gamma_equator_, gamma_pole_, place.y, place.z, &gamma, &word);
+      scale_theta_ = gm_ / (r * gamma);
+    }
+    *saved_tcos_ = at_.tcos;
+    *saved_tsin_ = at_.tsin;
+    *saved_scale_theta_ = scale_theta_;
+    *saved_scale_lambda_ = scale_lambda_;
+    *saved_scale_r_ = scale_r_;
+    sum_degrees(mode_, series_, at_, sums_);
+  }
+
+  void turn_to(double lon) {
+    *last_lon_ = lon;
+    tabulate_multiples(lon, series_.N, series_.rec_b);
+  }
+
+  void write(CoordinateTriple& out) const {
+    switch (mode_) {
+      case kGradient: {
+        const auto sum = sum_orders<kGradient>(series_, at_, sums_);
+        out = {scale_theta_ * sum.A + scale_theta_ * sum.B, scale_lambda_ * sum.L,
+               scale_r_ * sum.R};
+        break;
+      }
+      case kAlongTheta: {
+        const auto sum = sum_orders<kAlongTheta>(series_, at_, sums_);
+        out.x = scale_theta_ * sum.A + scale_theta_ * sum.B;
+        break;
+      }
+      case kAlongLambda:
+        out.x = scale_lambda_ * sum_orders<kAlongLambda>(series_, at_, sums_).L;
+        break;
+      case kRadial:
+        out.x = scale_r_ * sum_orders<kRadial>(series_, at_, sums_).R;
+        break;
+      case kGravity:
+        out.x = scale_theta_ * sum_orders<kGravity>(series_, at_, sums_).A;
+        break;
+      default:
+        break;
+    }
+  }
+
+  int16_t mode_;
+  Series series_;
+  double radius_, tolerance_;
+  Sums sums_;
+  double *last_colat_, *last_radius_, *last_lon_;
+  double *saved_tcos_, *saved_tsin_, *saved_scale_theta_, *saved_scale_lambda_, *saved_scale_r_;
+  Argument<double> at_;
+  double scale_theta_, scale_lambda_, scale_r_;
+  bool moved_ = false, turned_ = false;
+  double a_ = 0, e_ = 0, gm_ = 0, gamma_equator_ = 0, gamma_pole_ = 0;
+};
+
 }  // namespace
+
+}  // namespace tidewater::detail
+
+using namespace tidewater::detail;
 
 void TWhar_sum(int16_t mode, int32_t N, double radius, double** C, double** S, double** rec_a,
                double** rec_b, double* sum_dC, double* sum_dS, double* sum_lC, double* sum_lS,
@@ -229,100 +361,27 @@ void TWhar_sum(int16_t mode, int32_t N, double radius, double** C, double** S, d
   *status = TW_SUCCESS;
   const Series series = {N, C, S, rec_a, rec_b};
   const Sums sums = {sum_dC, sum_dS, sum_lC, sum_lS, sum_rC, sum_rS, sum_C, sum_S};
-  Argument at = {*saved_tcos, *saved_tsin, 0};
-  double scale_theta = *saved_scale_theta;
-  double scale_lambda = *saved_scale_lambda;
-  double scale_r = *saved_scale_r;
   for (double* sum : {sum_dS, sum_lS, sum_rS, sum_S, sum_lC}) sum[0] = 0;
+  Synthesis synthesis(mode, series, radius, tolerance, sums, last_colat, last_radius, last_lon,
+                      saved_tcos, saved_tsin, saved_scale_theta, saved_scale_lambda, saved_scale_r);
+  synthesis.set_gravity(a, e, gm, gamma_equator, gamma_pole);
 
-  for (int32_t i = 0; i < count; ++i) {
-    const auto [x, y, z] = in[i];
-    const double r = std::sqrt(y * y + x * x + z * z);
-    double colat = std::acos(z / r);
-    double lon = 0;
-    if (colat < kAxisLimit) {
-      colat = kAxisLimit;
-    } else if (colat > kPi - kAxisLimit) {
-      colat = kPi - kAxisLimit;
-    } else {
-      lon = std::atan2(y, x);
-    }
-
-    const bool same_place = radius * std::fabs(colat - *last_colat) <= tolerance &&
-                            std::fabs(r - *last_radius) <= tolerance;
-    if (!same_place) {
-      *last_colat = colat;
-      *last_radius = r;
-      const double q = radius / r;
-      const double sin_colat = std::sin(colat);
-      at.q2 = q * q;
-      at.tcos = q * std::cos(colat);
-      at.tsin = q * sin_colat;
-      scale_theta = at.q2;
-      scale_lambda = at.q2 / sin_colat;
-      scale_r = -at.q2;
-      if (mode == kGravity) {
-        const CoordinateTriple position = {x, y, z};
-        CoordinateTriple place = {};
-        double gamma = 0;
-        TWstatus word = TW_SUCCESS;  // neither call can fail
-        TWxyz_to_llh(a, e, 1, &position, &place, &word);
-        TWnormal_grav(a, e, gamma_equator, gamma_pole, place.y, place.z, &gamma, &word);
-        scale_theta = gm / (r * gamma);
-      }
-      *saved_tcos = at.tcos;
-      *saved_tsin = at.tsin;
-      *saved_scale_theta = scale_theta;
-      *saved_scale_lambda = scale_lambda;
-      *saved_scale_r = scale_r;
-      switch (mode) {
-        case kGradient:
-          sum_degrees<kGradient>(series, at, sums);
-          break;
-        case kAlongTheta:
-          sum_degrees<kAlongTheta>(series, at, sums);
-          break;
-        case kAlongLambda:
-          sum_degrees<kAlongLambda>(series, at, sums);
-          break;
-        case kRadial:
-          sum_degrees<kRadial>(series, at, sums);
-          break;
-        case kGravity:
-          sum_degrees<kGravity>(series, at, sums);
-          break;
-        default:
-          break;  // wanted: another mode keeps the cache and the sines up to date alone
-      }
-    }
-
-    if (radius * std::fabs(lon - *last_lon) > tolerance) {
-      *last_lon = lon;
-      tabulate_multiples(lon, N, rec_b);
-    }
-
+  // Few points gain nothing from being computed at once; high degrees are not served.
+  constexpr int32_t kWorthwhile = 16;
+  if (level() != Level::one_by_one && count >= kWorthwhile && N >= 2 &&
+      N <= HarmonicSums<kGradient>::kMostDegree) {
     switch (mode) {
-      case kGradient: {
-        const OrderSums sum = sum_orders<kGradient>(series, at, sums);
-        out[i] = {scale_theta * sum.A + scale_theta * sum.B, scale_lambda * sum.L, scale_r * sum.R};
-        break;
-      }
-      case kAlongTheta: {
-        const OrderSums sum = sum_orders<kAlongTheta>(series, at, sums);
-        out[i].x = scale_theta * sum.A + scale_theta * sum.B;
-        break;
-      }
+      case kGradient:
+        return synthesis.at_once<kGradient>(count, in, out);
+      case kAlongTheta:
+        return synthesis.at_once<kAlongTheta>(count, in, out);
       case kAlongLambda:
-        out[i].x = scale_lambda * sum_orders<kAlongLambda>(series, at, sums).L;
-        break;
+        return synthesis.at_once<kAlongLambda>(count, in, out);
       case kRadial:
-        out[i].x = scale_r * sum_orders<kRadial>(series, at, sums).R;
-        break;
-      case kGravity:
-        out[i].x = scale_theta * sum_orders<kGravity>(series, at, sums).A;
-        break;
+        return synthesis.at_once<kRadial>(count, in, out);
       default:
         break;
     }
   }
+  synthesis.in_turn(count, in, out);
 }

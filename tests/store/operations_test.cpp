@@ -2,7 +2,10 @@
 
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <cmath>
+#include <fstream>
+#include <iterator>
 #include <thread>
 
 #include "source_folder.hpp"
@@ -200,6 +203,84 @@ TEST_F(StoreOperations, EachThreadHasAStoreOfItsOwn) {
   a.join();
   b.join();
   EXPECT_EQ(names().size(), 4u);  // the walk of this thread goes on where it stood
+}
+
+TEST_F(StoreOperations, AStoreThatIsReplacedIsReadAgain) {
+  const std::string path = sources_.build();
+  const auto rows = [&] {
+    const OpenStore open(path);
+    int32_t count = -1;
+    OLB7R3_PF_inq_num_rows("t", &count);
+    return count;
+  };
+  EXPECT_EQ(rows(), 5);
+  SourceFolder other;
+  other.add("t", {"name,text,0,9"}, "name\nother\n");
+  std::filesystem::rename(other.build(), path);
+  EXPECT_EQ(rows(), 1);
+  std::filesystem::remove(path);
+  EXPECT_EQ(rows(), -1);
+}
+
+TEST_F(StoreOperations, AStoreThatIsWrittenInItsPlaceIsReadAgain) {
+  // As long as before and within the same tick of the file's clock.
+  const std::string path = sources_.build();
+  const auto bytes = [&] {
+    std::ifstream in(path, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(in), {});
+  }();
+  std::string changed = bytes;
+  changed.replace(changed.find("alpha"), 5, "gamma");
+  for (int i = 0; i < 200; ++i) {
+    std::fstream(path, std::ios::binary | std::ios::in | std::ios::out)
+        << (i % 2 == 0 ? changed : bytes);
+    const OpenStore open(path);
+    RowBuffer row;
+    EXPECT_EQ(OLB7R3_PF_get_row_by_value("t", 0, "name", i % 2 == 0 ? "gamma" : "alpha", row.bytes),
+              TW_STORE_SUCCESS)
+        << i;
+  }
+}
+
+TEST_F(StoreOperations, AnOpenStoreStaysAsItWasRead) {
+  const std::string path = sources_.build();
+  const OpenStore open(path);
+  OLB7R3_PF_reset_table("t");
+  std::filesystem::resize_file(path, 100);
+  EXPECT_EQ(names().size(), 5u);
+}
+
+TEST_F(StoreOperations, AStoreMayBeReplacedWhileItIsOpened) {
+  const std::string path = sources_.build();
+  std::atomic<bool> done = false;
+  std::thread builder([&] {
+    while (!done) sources_.build();
+  });
+  for (int i = 0; i < 300; ++i) {
+    const OpenStore open(path);
+    EXPECT_EQ(open.word, TW_STORE_SUCCESS);
+    OLB7R3_PF_reset_table("t");
+    EXPECT_EQ(names().size(), 5u);
+  }
+  done = true;
+  builder.join();
+}
+
+TEST_F(StoreOperations, ManyThreadsShareAStore) {
+  // Orders are made when they are first asked for, here by all threads at once.
+  const std::string path = sources_.build();
+  std::vector<std::thread> threads;
+  for (int i = 0; i < 64; ++i) {
+    threads.emplace_back([&] {
+      const OpenStore open(path);
+      for (const char* column : {"name", "small", "big", "real"}) {
+        OLB7R3_PF_define_table_search("t", column);
+        EXPECT_EQ(names().size(), 5u);
+      }
+      EXPECT_EQ(find("big", int32_t{70000}), "Zulu");
+    });
+  }
+  for (std::thread& thread : threads) thread.join();
 }
 
 }  // namespace

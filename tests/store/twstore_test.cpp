@@ -1,6 +1,7 @@
 // The command that builds, lists and checks stores, run as a command.
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 
 #include <cstdio>
@@ -20,8 +21,9 @@ struct Result {
 
 std::string in_quotes(const std::string& word) { return "'" + word + "'"; }
 
-Result twstore(const std::string& arguments) {
-  const std::string command = std::string(TWSTORE_COMMAND) + " " + arguments + " 2>&1";
+// A shell command; where it leads its output elsewhere, what is left of it.
+Result shell(const std::string& line) {
+  const std::string command = "{ " + line + "; } 2>&1";
   FILE* pipe = popen(command.c_str(), "r");
   if (!pipe) return {-1, "cannot run " + command};
   Result result = {0, ""};
@@ -30,6 +32,10 @@ Result twstore(const std::string& arguments) {
   const int status = pclose(pipe);
   result.code = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
   return result;
+}
+
+Result twstore(const std::string& arguments) {
+  return shell(std::string(TWSTORE_COMMAND) + " " + arguments);
 }
 
 class Twstore : public testing::Test {
@@ -171,7 +177,169 @@ TEST_F(Twstore, CheckReadsEveryRow) {
   alter(sources_.store(), "UPDATE system SET cs_num = 70000 WHERE cs_name = 'Mercator'");
   const Result result = run("check");
   EXPECT_EQ(result.code, 1);
-  EXPECT_EQ(result.output, "table \"system\": row 4: a cell is no integer of the field's range\n");
+  EXPECT_NE(
+      result.output.find(
+          "built.store: table \"system\": row 4: a cell is no integer of the field's range\n"),
+      std::string::npos)
+      << result.output;
+}
+
+TEST_F(Twstore, CheckFindsValuesThatMislead) {
+  struct {
+    const char* change;
+    const char* words;
+  } const kChanges[] = {
+      {"UPDATE \"magnetic models\" SET \"reference radius\" = 0 WHERE \"model number\" = 1",
+       "\"magnetic models\": row 1: a radius that is not above 0"},
+      {"UPDATE \"magnetic models\" SET normalisation = -1 WHERE \"model number\" = 1",
+       "\"magnetic models\": row 1: a normalisation that is none of 0 to 3"},
+      {"UPDATE \"magnetic models\" SET normalisation = 4 WHERE \"model number\" = 1",
+       "\"magnetic models\": row 1: a normalisation that is none of 0 to 3"},
+      {"UPDATE \"magnetic models\" SET \"first date\" = -1 WHERE \"model number\" = 1",
+       "\"magnetic models\": row 1: bounds that do not rise"},
+      {"UPDATE \"magnetic models\" SET \"last date\" = 2024 WHERE \"model number\" = 1",
+       "\"magnetic models\": row 1: bounds that do not rise"},
+      {"UPDATE \"magnetic models\" SET interval = -1 WHERE \"model number\" = 1",
+       "\"magnetic models\": row 1: an interval below 0"},
+      {"DELETE FROM \"wmm2025 epochs\" WHERE \"Epoch date\" > 2026",
+       "\"magnetic models\": row 1: fewer than two epochs"},
+      {"UPDATE \"wmm2025 epochs\" SET \"Epoch date\" = 2025",
+       "\"wmm2025 epochs\": two epochs of one date"},
+      {"UPDATE \"wmm2025 epochs\" SET degree = 0",
+       "\"wmm2025 epochs\": row 1: a degree of 0, 2 at least are needed"},
+      {"UPDATE \"wmm2025 epochs\" SET degree = 11",
+       "\"wmm2025 epochs\": row 2: degree 11 has 78 coefficients, table \"wmm2025"},
+      {"UPDATE \"conus latitude\" SET power_u = 10 WHERE rowid = 3",
+       "\"conus latitude\": row 3: a power of 10, none of 0 to 9"},
+      {"UPDATE \"conus latitude\" SET power_v = -1 WHERE rowid = 3",
+       "\"conus latitude\": row 3: a power of -1, none of 0 to 9"}};
+  for (const auto& [change, words] : kChanges) {
+    std::filesystem::copy_file(TIDEWATER_STORE, sources_.store(),
+                               std::filesystem::copy_options::overwrite_existing);
+    alter(sources_.store(), change);
+    const Result result = run("check");
+    EXPECT_EQ(result.code, 1) << change;
+    EXPECT_NE(result.output.find(words), std::string::npos) << change << '\n' << result.output;
+  }
+}
+
+// A file in the folder of sources, told by its bytes.
+std::string bytes_of(const std::filesystem::path& path) {
+  std::ifstream in(path, std::ios::binary);
+  return {std::istreambuf_iterator<char>(in), {}};
+}
+
+class TwstoreBuild : public Twstore {
+ protected:
+  void SetUp() override { sources_.add("t", {"n,text,0,4"}, "n\nnew\n"); }
+  std::size_t files() const {
+    const std::filesystem::directory_iterator folder(sources_.path());
+    return static_cast<std::size_t>(std::distance(begin(folder), end(folder)));
+  }
+  // The build fails with these words and leaves as many files as there were.
+  void expect_refused(const std::string& words) {
+    const std::size_t before = files();
+    const Result result = build();
+    EXPECT_EQ(result.code, 1);
+    EXPECT_NE(result.output.find("built.store: " + words), std::string::npos) << result.output;
+    EXPECT_EQ(files(), before);
+  }
+};
+
+TEST_F(TwstoreBuild, KeepsAFilesPermissions) {
+  namespace fs = std::filesystem;
+  for (const auto mode : {fs::perms{0600}, fs::perms{0640}, fs::perms{0664}}) {
+    EXPECT_EQ(build().code, 0);
+    fs::permissions(sources_.store(), mode);
+    EXPECT_EQ(build().code, 0);
+    EXPECT_EQ(fs::status(sources_.store()).permissions(), mode);
+  }
+}
+
+TEST_F(TwstoreBuild, ANewFileHasThePermissionsOfAnyNewFile) {
+  sources_.write("other", "");
+  EXPECT_EQ(build().code, 0);
+  EXPECT_EQ(std::filesystem::status(sources_.store()).permissions(),
+            std::filesystem::status(sources_.path() / "other").permissions());
+}
+
+TEST_F(TwstoreBuild, LeavesNeighboursAlone) {
+  const std::vector<std::string> neighbours = {"built.store.new", "built.store.new-journal",
+                                               "built.store-journal", "built.store-wal",
+                                               ".built.store"};
+  for (const std::string& name : neighbours) sources_.write(name, "mine");
+  EXPECT_EQ(build().code, 0);
+  sources_.write("rows1.csv", "n\ntoo long\n");
+  EXPECT_EQ(build().code, 1);
+  EXPECT_EQ(run("list", " t").output, "n\nnew\n");
+  for (const std::string& name : neighbours) {
+    EXPECT_EQ(bytes_of(sources_.path() / name), "mine") << name;
+  }
+}
+
+TEST_F(TwstoreBuild, FollowsALinkAndKeepsIt) {
+  namespace fs = std::filesystem;
+  fs::create_directory(sources_.path() / "there");
+  std::ofstream(sources_.path() / "there" / "real") << "old";
+  fs::create_symlink("there/real", sources_.store());
+  EXPECT_EQ(build().code, 0);
+  EXPECT_TRUE(fs::is_symlink(sources_.store()));
+  EXPECT_TRUE(fs::is_regular_file(fs::symlink_status(sources_.path() / "there" / "real")));
+  EXPECT_EQ(run("list", " t").output, "n\nnew\n");
+}
+
+TEST_F(TwstoreBuild, RefusesALinkToNothing) {
+  std::filesystem::create_symlink("nothing", sources_.store());
+  expect_refused("a link to nothing");
+  EXPECT_TRUE(std::filesystem::is_symlink(sources_.store()));
+}
+
+TEST_F(TwstoreBuild, RefusesWhatIsNoFile) {
+  namespace fs = std::filesystem;
+  fs::create_directory(sources_.store());
+  expect_refused("there, and no regular file");
+  fs::remove(sources_.store());
+  ASSERT_EQ(mkfifo(sources_.store().c_str(), 0600), 0);
+  expect_refused("there, and no regular file");
+  EXPECT_TRUE(fs::is_fifo(sources_.store()));
+  fs::remove(sources_.store());
+  // A device by a link, so that a slip destroys no device of the machine.
+  fs::create_symlink("/dev/null", sources_.store());
+  expect_refused("there, and no regular file");
+  EXPECT_TRUE(fs::is_character_file("/dev/null"));
+}
+
+TEST_F(TwstoreBuild, AFullDiskLeavesTheStoreThatWasThere) {
+  EXPECT_EQ(build().code, 0);
+  const std::string before = bytes_of(sources_.store());
+  const std::size_t count = files();
+  // No file of this process may grow beyond 4096 bytes.
+  const std::string command = "ulimit -f 4; trap '' XFSZ; exec " + std::string(TWSTORE_COMMAND) +
+                              " build " + in_quotes(sources_.store()) + " " +
+                              in_quotes(sources_.path().string());
+  const Result result = shell(command);
+  EXPECT_EQ(result.code, 1);
+  EXPECT_NE(result.output.find("built.store: cannot be written: "), std::string::npos)
+      << result.output;
+  EXPECT_EQ(bytes_of(sources_.store()), before);
+  EXPECT_EQ(files(), count);
+}
+
+TEST_F(TwstoreBuild, SourcesAreFiles) {
+  sources_.write("tables.csv", "table,layout,file\nt,rows1.csv,/dev/zero\n");
+  const Result result = build();
+  EXPECT_EQ(result.code, 1);
+  EXPECT_NE(result.output.find("/dev/zero: cannot be opened"), std::string::npos) << result.output;
+}
+
+TEST_F(TwstoreBuild, AFullDiskBehindTheListIsSaid) {
+  EXPECT_EQ(build().code, 0);
+  for (const char* rest : {" >/dev/full", " t >/dev/full"}) {
+    const Result result =
+        shell(std::string(TWSTORE_COMMAND) + " list " + in_quotes(sources_.store()) + rest);
+    EXPECT_EQ(result.code, 1);
+    EXPECT_EQ(result.output, "twstore: the output cannot be written\n");
+  }
 }
 
 TEST_F(Twstore, WhatIsNoStoreIsSaidToBeNone) {

@@ -103,7 +103,7 @@ const struct {
                   {"BETA2007.gsb", {5.51, 47.01, 15.66, 55.29}},
                   {"CHENYX06.gsb", {5.56, 45.48, 11.04, 48.06}},
                   {"nzgd2kgrid0005.gsb", {166.01, -47.99, 179.99, -34.01}}};
-const std::string kProjData = "/usr/share/proj/";
+const std::string kProjData = proj_data().string() + "/";
 
 TEST(ShiftGrids, RealNationalGridsAgainstProj) {
   TIDEWATER_NEED_PROJ();
@@ -438,7 +438,7 @@ TEST_F(BadGrids, DamagedFilesDoNoHarm) {
           .bytes();
   const std::string geoid = gtx(10, 350, 1, 1, 3, 3, std::vector<float>(9));
   std::mt19937 random(3);
-  for (int k = 0; k < 1000; ++k) {
+  for (int k = 0; k < 300; ++k) {
     for (const bool shift : {true, false}) {
       std::string bytes = shift ? good : geoid;
       for (int n = 0; n < 3; ++n) bytes[random() % bytes.size()] = static_cast<char>(random());
@@ -807,9 +807,9 @@ TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
       } catch (const Error&) {
       }
     };
-    for (std::size_t length = 0; length < good.size(); length += 7) try_it(good.substr(0, length));
+    for (std::size_t length = 0; length < good.size(); length += 41) try_it(good.substr(0, length));
     std::mt19937 random(5);
-    for (int k = 0; k < 1500; ++k) {
+    for (int k = 0; k < 300; ++k) {
       std::string bytes = good;
       // For the most part where the directory is.
       for (int n = 0; n < 2; ++n) {

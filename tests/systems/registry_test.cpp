@@ -616,6 +616,8 @@ TEST(RegistryNames, ByName) {
   EXPECT_EQ(registry().meridian("PARIS")->code, 8903);
   EXPECT_EQ(registry().unit("US survey foot")->code, 9003);
   EXPECT_EQ(registry().unit("Clarkes foot")->code, 9005);
+  EXPECT_EQ(registry().unit("Foot_US")->code, 9003);
+  EXPECT_EQ(registry().unit("Meter")->code, 9001);
   EXPECT_FALSE(registry().unit("cubit"));
 }
 

@@ -115,6 +115,23 @@ TEST(HarmonicTables, SixTablesNeverReachTheCaller) {
   }
 }
 
+TEST(HarmonicTables, ANullBlockIsNotReadNorCountedFrom) {
+  TWstatus status = 0;
+  TWhar_aloc_Cnm(3, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr,
+                 nullptr, nullptr, nullptr, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  const int32_t degrees[] = {1, 2};
+  double** C[2] = {};
+  double** S[2] = {};
+  TWhar_alocCtnm(2, degrees, nullptr, nullptr, C, S, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  for (double** table : {C[0], C[1], S[0], S[1]}) {
+    EXPECT_EQ(table[0], nullptr);
+    EXPECT_EQ(table[1], nullptr);
+    std::free(table);
+  }
+}
+
 TEST(HarmonicTables, AFailedAllocationLeavesNothing) {
   TIDEWATER_NEED_MEMORY_LIMIT();
   expect_with_little_memory([] {
@@ -319,9 +336,9 @@ TEST_F(HarmonicInterpolation, AnyOtherFlagIsRefused) {
 class HarmonicDate : public testing::Test {
  protected:
   HarmonicDate() { sets_.number(); }
-  TWstatus set(double date, double tolerance = 0) {
+  TWstatus set(double date, double tolerance = 0, int32_t epoch_count = 4) {
     TWstatus status = 0;
-    TWhar_set_date(date, &last_date_, tolerance, 4, sets_.degrees.data(), epochs_, 10,
+    TWhar_set_date(date, &last_date_, tolerance, epoch_count, sets_.degrees.data(), epochs_, 10,
                    sets_.C.data(), sets_.S.data(), &n_main_, &n_sec_, out_.cnm.rows(),
                    out_.snm.rows(), out_.ctnm.rows(), out_.stnm.rows(), &status);
     return status;
@@ -339,6 +356,19 @@ class HarmonicDate : public testing::Test {
   double last_date_ = 1e30;
   int32_t n_main_ = -7, n_sec_ = -7;
 };
+
+TEST_F(HarmonicDate, FewerThanTwoEpochsHaveNoInterval) {
+  EXPECT_EQ(set(2002, 0, 1), TW_BAD_INPUT);
+  EXPECT_EQ(set(1999, 0, 1), TW_BAD_DATE);
+  EXPECT_EQ(set(2006, 0, 1), TW_BAD_DATE);
+  EXPECT_EQ(set(2002, 0, 0), TW_BAD_INPUT);
+  EXPECT_EQ(set(2002, 0, -2147483647), TW_BAD_INPUT);
+  expect_untouched_outputs();
+  EXPECT_EQ(last_date_, 1e30);
+  last_date_ = 2002;
+  EXPECT_EQ(set(2002, 0, 1), TW_SUCCESS);  // nothing to do
+  expect_untouched_outputs();
+}
 
 TEST_F(HarmonicDate, LimitsOfTheDate) {
   EXPECT_EQ(set(std::nextafter(2000.0, 0)), TW_BAD_DATE);

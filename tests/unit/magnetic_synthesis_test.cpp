@@ -403,4 +403,71 @@ TEST(HarmonicSum, NotANumberAndTheGeocentre) {
   expect_near(out, expected.x, expected.y, expected.z, 5e-9);
 }
 
+// Points of a track, of a parallel, of a meridian and at random, some repeated.
+std::vector<CoordinateTriple> many_places() {
+  std::vector<CoordinateTriple> points;
+  const auto place = [](double colat, double lon) {
+    const double r = 6371200;
+    return CoordinateTriple{r * std::sin(colat) * std::cos(lon),
+                            r * std::sin(colat) * std::sin(lon), r * std::cos(colat)};
+  };
+  for (int i = 0; i < 40; ++i) points.push_back(place(0.7, 0.1 * i - 2));
+  for (int i = 0; i < 40; ++i) points.push_back(place(0.1 + 0.07 * i, 0.3));
+  for (int i = 0; i < 5; ++i) points.push_back(points.back());
+  points.push_back({0, 0, 6371200});
+  points.push_back({0, 0, -6371200});
+  for (int i = 0; i < 70; ++i) points.push_back(place(0.05 + 0.04 * i, 2.1 * i));
+  return points;
+}
+
+TEST(HarmonicSum, AnArrayGivesTheFiguresAndLeavesTheCachesOfItsPointsOneByOne) {
+  const auto points = many_places();
+  for (int16_t mode = 0; mode <= 4; ++mode) {
+    for (const double tolerance : {0.0, 1e-3}) {
+      Coefficients c(9);
+      Coefficients::fill(c, 4);
+      Synthesis at_once(9), in_turn(9);
+      at_once.tolerance = in_turn.tolerance = tolerance;
+      std::vector<CoordinateTriple> a(points.size(), kUntouchedPoint), b = a;
+      // The second round starts where the first ended; the third meets other coefficients, so that
+      // the sums of a point that does not move are stale by contract.
+      for (int round = 0; round < 3; ++round) {
+        at_once.sum(mode, c, static_cast<int32_t>(points.size()), points.data(), a.data());
+        for (std::size_t i = 0; i < points.size(); ++i) {
+          in_turn.sum(mode, c, 1, &points[i], &b[i]);
+        }
+        for (std::size_t i = 0; i < points.size(); ++i) {
+          ASSERT_EQ(a[i].x, b[i].x) << mode << " " << i;
+          ASSERT_EQ(a[i].y, b[i].y) << mode << " " << i;
+          ASSERT_EQ(a[i].z, b[i].z) << mode << " " << i;
+        }
+        EXPECT_EQ(at_once.rec_b.block(), in_turn.rec_b.block());
+        EXPECT_EQ(at_once.cache.dC, in_turn.cache.dC);
+        EXPECT_EQ(at_once.cache.dS, in_turn.cache.dS);
+        EXPECT_EQ(at_once.cache.lC, in_turn.cache.lC);
+        EXPECT_EQ(at_once.cache.lS, in_turn.cache.lS);
+        EXPECT_EQ(at_once.cache.rC, in_turn.cache.rC);
+        EXPECT_EQ(at_once.cache.rS, in_turn.cache.rS);
+        EXPECT_EQ(at_once.cache.C, in_turn.cache.C);
+        EXPECT_EQ(at_once.cache.S, in_turn.cache.S);
+        EXPECT_EQ(at_once.cache.last_colat, in_turn.cache.last_colat);
+        EXPECT_EQ(at_once.cache.last_radius, in_turn.cache.last_radius);
+        EXPECT_EQ(at_once.last_lon, in_turn.last_lon);
+        EXPECT_EQ(at_once.cache.tcos, in_turn.cache.tcos);
+        EXPECT_EQ(at_once.cache.scale_theta, in_turn.cache.scale_theta);
+        EXPECT_EQ(at_once.cache.scale_lambda, in_turn.cache.scale_lambda);
+        EXPECT_EQ(at_once.cache.scale_r, in_turn.cache.scale_r);
+        if (round == 1) {
+          // back to the first point, which the third round does not leave at first
+          for (auto* s : {&at_once, &in_turn}) {
+            CoordinateTriple p = points[0];
+            s->sum(mode, c, 1, &p, &p);
+          }
+          Coefficients::fill(c, 5);
+        }
+      }
+    }
+  }
+}
+
 }  // namespace
