@@ -268,6 +268,16 @@ Next MapInverse<Map>::other(const CoordinateTriple&, CoordinateTriple*, TWstatus
   return Next::point;
 }
 
+// The level sources call these.
+template struct MapForward<Cassini>;
+template struct MapInverse<Cassini>;
+template struct MapForward<Polyconic>;
+template struct MapInverse<Polyconic>;
+template struct MapForward<EquidistantConic>;
+template struct MapInverse<EquidistantConic>;
+template struct MapForward<PolarEquidistant>;
+template struct MapInverse<PolarEquidistant>;
+
 // The lines that the many do not cover, one by one.
 Next EquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
                                TWstatus* status) const {
