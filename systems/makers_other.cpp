@@ -279,8 +279,8 @@ template struct MapForward<PolarEquidistant>;
 template struct MapInverse<PolarEquidistant>;
 
 // The lines that the many do not cover, one by one.
-Next EquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
-                               TWstatus* status) const {
+Next GeodesicEquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                       TWstatus* status) const {
   const auto arc = lines.any_line(lat0, 0, in.y * kDegreesPerRadian, in.x * kDegreesPerRadian);
   if (!arc.plain) {
     *status = TW_BAD_LATITUDE;
@@ -291,7 +291,8 @@ Next EquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out
   return Next::point;
 }
 
-Next EquidistantInverse::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+Next GeodesicEquidistantInverse::other(const CoordinateTriple&, CoordinateTriple*,
+                                       TWstatus* status) const {
   *status = TW_RANGE_ERROR;
   return Next::point;
 }
@@ -386,8 +387,8 @@ Made make_azimuthal_equidistant(const MethodArguments& given) {
   }
   require(given.f <= Geodesics::kLargestFlattening, given,
           "geodesics are served up to a flattening of 0.01");
-  const EquidistantForward forward{Geodesics(given.a, given.f), lat0 * kDegreesPerRadian};
-  const EquidistantInverse inverse{forward.lines, forward.lat0};
+  const GeodesicEquidistantForward forward{Geodesics(given.a, given.f), lat0 * kDegreesPerRadian};
+  const GeodesicEquidistantInverse inverse{forward.lines, forward.lat0};
   return formula(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },

@@ -59,7 +59,7 @@ struct MapInverse {
 };
 
 // Azimuthal equidistant about any point: azimuth and length of the geodesic from there.
-struct EquidistantForward {
+struct GeodesicEquidistantForward {
   Geodesics lines;
   double lat0;  // degrees
 
@@ -75,7 +75,7 @@ struct EquidistantForward {
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
 };
 
-struct EquidistantInverse {
+struct GeodesicEquidistantInverse {
   Geodesics lines;
   double lat0;
 
@@ -103,7 +103,7 @@ TIDEWATER_MAP(Polyconic)
 TIDEWATER_MAP(EquidistantConic)
 TIDEWATER_MAP(PolarEquidistant)
 #undef TIDEWATER_MAP
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantForward)
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantInverse)
+TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantForward)
+TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantInverse)
 TIDEWATER_INSTANCE(tidewater::detail::TransverseMercatorForward)
 TIDEWATER_INSTANCE(tidewater::detail::TransverseMercatorInverse)
