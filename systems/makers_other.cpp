@@ -7,6 +7,7 @@
 #include "formulas/latitudes.hpp"
 #include "makers.hpp"
 #include "tidewater/conformal.h"
+#include "tidewater/lines.hpp"
 #include "tidewater/special.h"
 
 namespace tidewater::detail {
@@ -15,7 +16,6 @@ namespace {
 
 #define TW_BLOCK int count, const CoordinateTriple *in, CoordinateTriple *out, TWstatus *status
 
-
 // The authalic latitude, whose series serve the ellipsoids of the Earth and others up to e = 0.2.
 struct Authalic {
   double radius;  // of the authalic sphere
@@ -23,10 +23,10 @@ struct Authalic {
 
   explicit Authalic(const MethodArguments& given)
       : radius(std::sqrt(authalic_radius_squared(given.a, given.f))),
-        to_authalic(latitude_series(Latitude::geodetic, Latitude::authalic,
-                                    third_flattening(given.f))),
-        to_geodetic(latitude_series(Latitude::authalic, Latitude::geodetic,
-                                    third_flattening(given.f))) {}
+        to_authalic(
+            latitude_series(Latitude::geodetic, Latitude::authalic, third_flattening(given.f))),
+        to_geodetic(
+            latitude_series(Latitude::authalic, Latitude::geodetic, third_flattening(given.f))) {}
 };
 
 double transverse_radius(const MethodArguments& given, double lat) {
@@ -102,8 +102,22 @@ struct Cassini {
   void forward(TW_BLOCK) const {
     TWcassini_f(e, 0, c0, c2, c4, c6, c8, m0, count, in, out, status);
   }
+  // The inverse series with what they miss put right by the forward ones.
   void inverse(TW_BLOCK) const {
-    TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, count, in, out, status);
+    for (int i = 0; i < count; ++i) {
+      const CoordinateTriple wanted = in[i];
+      CoordinateTriple aim = wanted;
+      for (int pass = 0; pass < 8; ++pass) {
+        CoordinateTriple back;
+        TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, 1, &aim, out + i, status);
+        forward(1, out + i, &back, status);
+        const double dx = wanted.x - back.x;
+        const double dy = wanted.y - back.y;
+        aim.x += dx;
+        aim.y += dy;
+        if (std::fabs(dx) < 1e-15 && std::fabs(dy) < 1e-15) break;
+      }
+    }
   }
 };
 
@@ -211,13 +225,13 @@ Made make_equal_earth(const MethodArguments& given) {
       plane,
       [=](double lon, double lat) {
         Pair answer{};
-        points::EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
+        EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
         answer.plain = true;
         return answer;
       },
       [=](double x, double y) {
         Pair answer{};
-        answer.plain = points::EqualEarth::inverse(x, y, &answer.x, &answer.y);
+        answer.plain = EqualEarth::inverse(x, y, &answer.x, &answer.y);
         answer.y = sphere.to_geodetic(answer.y);
         return answer;
       });
@@ -300,7 +314,7 @@ Made make_polyconic(const MethodArguments& given) {
 
 // IOGP Publication 373-7-2, method 1028.
 Made make_equidistant_cylindrical(const MethodArguments& given) {
-  const MeridianArc arc(given.a, given.f);
+  const ExactMeridianArc arc(given.a, given.f);
   const double lat1 = given(kLat1);
   const double parallel = transverse_radius(given, lat1) * std::cos(lat1);
   require(parallel > 0, given, "the standard parallel lies at a pole");
@@ -351,15 +365,32 @@ Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
       [=](TW_BLOCK) { TWaz_eq_i(e, 0, lat0, n1, count, in, out, status); });
 }
 
+// By the geodesics from the origin: distances and azimuths from it are true everywhere.
 Made make_azimuthal_equidistant(const MethodArguments& given) {
-  return make_modified_azimuthal_equidistant(given);
+  const Geodesic lines(given.a, given.f);
+  const double lat0 = given(kLat0) * kDegreesPerRadian;
+  return pointwise(
+      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
+      [=](double lon, double lat) {
+        const LineCourse course =
+            lines.inverse(0, lat0, lon * kDegreesPerRadian, lat * kDegreesPerRadian);
+        const double azimuth = course.azimuth1 * kRadiansPerDegree;
+        return Pair{course.length * std::sin(azimuth), course.length * std::cos(azimuth),
+                    std::isfinite(course.length)};
+      },
+      [=](double x, double y) {
+        const LineEnd end =
+            lines.direct(0, lat0, std::atan2(x, y) * kDegreesPerRadian, std::hypot(x, y));
+        return Pair{end.lon * kRadiansPerDegree, end.lat * kRadiansPerDegree,
+                    std::isfinite(end.lat)};
+      });
 }
 
 // IOGP Publication 373-7-2, method 9831.
 Made make_guam(const MethodArguments& given) {
   const double a = given.a;
   const double e2 = given.e2;
-  const MeridianArc arc(a, given.f);
+  const ExactMeridianArc arc(a, given.f);
   const double origin = arc.arc(given(kLat0));
   const auto bend = [=](double x, double lat) {
     const double s = std::sin(lat);
@@ -386,7 +417,7 @@ Made make_guam(const MethodArguments& given) {
 }
 
 Made make_colombia_urban(const MethodArguments& given) {
-  const points::ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
+  const ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](double lon, double lat) {
@@ -424,7 +455,7 @@ Made make_tunisia_mining(const MethodArguments& given) {
 // Lambert's conic with the arc's scale cut off after the third power: IOGP Publication 373-7-2,
 // method 9817.
 Made make_lambert_near_conformal(const MethodArguments& given) {
-  const MeridianArc arc(given.a, given.f);
+  const ExactMeridianArc arc(given.a, given.f);
   const double lat0 = given(kLat0);
   const double k0 = given(kK0, 1);
   const double s0 = std::sin(lat0);

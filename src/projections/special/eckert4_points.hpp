@@ -40,7 +40,7 @@ TW_INLINE SinCos<V> eckert_angle(const SinCos<V>& lat) {
   const V excess = select(s < 0.8, pole_side, equator_side);
   const V slope = 2.0 * at.sin * (1.0 + at.sin);
   const V newton = excess / slope;
-  const V step = newton * (1.0 + newton * at.cos * (1.0 + 2.0 * at.sin) / slope);
+  const V step = newton * (1.0 - newton * at.cos * (1.0 + 2.0 * at.sin) / slope);
   const V sine = at.cos - step * (at.sin + 0.5 * step * at.cos);
   const V cosine = at.sin + step * (at.cos - 0.5 * step * at.sin);
   return {copysign(sine, lat.sin), cosine};
