@@ -3,27 +3,14 @@
 
 #include "datum/similarity_points.hpp"
 
-#include <algorithm>
-
 #include "tidewater/datum.h"
 
 using namespace tidewater::detail;
 
-namespace {
-
-// A kernel with its copy of the matrix.
-template <class Kernel>
-Kernel with_matrix(const double* rotation, Kernel kernel) {
-  std::copy_n(rotation, 9, kernel.r);
-  return kernel;
-}
-
-}  // namespace
-
 void TWbw_f(int32_t count, const CoordinateTriple* in, double s, const double* rotation, double tx,
             double ty, double tz, CoordinateTriple* out, TWstatus* status) {
-  *status = over_points(
-      with_matrix(rotation, SimilarityForward{{}, 1 + s, {0, 0, 0}, {tx, ty, tz}}), count, in, out);
+  *status =
+      over_points(SimilarityForward{rotation, 1 + s, {0, 0, 0}, {tx, ty, tz}}, count, in, out);
 }
 
 void TWbw_i(int32_t count, const CoordinateTriple* in, double s, const double* rotation, double tx,
@@ -31,8 +18,7 @@ void TWbw_i(int32_t count, const CoordinateTriple* in, double s, const double* r
   const bool singular = 1 + s == 0;  // the points are written undivided
   const double over_scale = singular ? 1 : 1 / (1 + s);
   *status =
-      over_points(with_matrix(rotation, SimilarityInverse{{}, over_scale, {0, 0, 0}, {tx, ty, tz}}),
-                  count, in, out);
+      over_points(SimilarityInverse{rotation, over_scale, {0, 0, 0}, {tx, ty, tz}}, count, in, out);
   if (singular && count > 0) *status = TW_SINGULAR;
 }
 
@@ -40,16 +26,14 @@ void TWmol_bdk_f(int32_t count, const CoordinateTriple* in, double s, const doub
                  double px, double py, double pz, double qx, double qy, double qz,
                  CoordinateTriple* out, TWstatus* status) {
   *status =
-      over_points(with_matrix(rotation, SimilarityForward{{}, 1 + s, {px, py, pz}, {qx, qy, qz}}),
-                  count, in, out);
+      over_points(SimilarityForward{rotation, 1 + s, {px, py, pz}, {qx, qy, qz}}, count, in, out);
 }
 
 void TWmol_bdk_i(int32_t count, const CoordinateTriple* in, double s, const double* rotation,
                  double px, double py, double pz, double qx, double qy, double qz,
                  CoordinateTriple* out, TWstatus* status) {
-  *status = over_points(
-      with_matrix(rotation, SimilarityInverse{{}, 1 / (1 + s), {px, py, pz}, {qx, qy, qz}}), count,
-      in, out);
+  *status = over_points(SimilarityInverse{rotation, 1 / (1 + s), {px, py, pz}, {qx, qy, qz}}, count,
+                        in, out);
   // By contract: the guard is on the scale difference itself, unlike that of TWbw_i.  Without a
   // scale change the coordinates are right and the word is a failure; a factor of zero is divided
   // by.

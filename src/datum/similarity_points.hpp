@@ -9,7 +9,7 @@ namespace tidewater::detail {
 // The position vector rotated: IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2 (2022),
 // sections 4.3.3 and 4.3.5.
 struct SimilarityForward {
-  double r[9];  // row by row
+  const double* r;  // nine, row by row
   double scale;
   CoordinateTriple from, to;  // the centre in the source and in the target datum
 
@@ -25,7 +25,7 @@ struct SimilarityForward {
 
 // The transposed matrix takes the place of an inverse.
 struct SimilarityInverse {
-  double r[9];
+  const double* r;
   double over_scale;
   CoordinateTriple from, to;
 
