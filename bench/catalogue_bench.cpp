@@ -7,44 +7,26 @@ using namespace tidewater::bench;
 
 namespace {
 
-template <class LookUp>
-Kernel repeated(LookUp look_up) {
-  return [look_up] {
-    for (int32_t i = 0; i < kPoints; ++i) keep(look_up());
-  };
+void look_up(const char* what, std::function<void()> once) {
+  add({what, repeated(std::move(once)), {}, {}, {}, "", false});
 }
 
 const Suite suite([] {
-  add({"Catalogue, system by name",
-       "",
-       repeated([] {
-         int16_t number = 0;
-         TWstatus status = 0;
-         TWcs_to_num(TIDEWATER_STORE, "Robinson", &number, &status);
-         return number;
-       }),
-       {},
-       {}});
-  add({"Catalogue, zone by number",
-       "",
-       repeated([] {
-         char name[42];
-         TWstatus status = 0;
-         TWsp_num_t_nam(TIDEWATER_STORE, 83, 4202, name, &status);
-         return name[0];
-       }),
-       {},
-       {}});
-  add({"Catalogue, names of 11 datum models",
-       "",
-       repeated([] {
-         char names[16][41];
-         TWstatus status = 0;
-         TWget_dt_names(TIDEWATER_STORE, -1, names[0], &status);
-         return names[0][0];
-       }),
-       {},
-       {}});
+  look_up("Catalogue, system by name", [] {
+    int16_t number = 0;
+    TWstatus status = 0;
+    TWcs_to_num(TIDEWATER_STORE, "Robinson", &number, &status);
+  });
+  look_up("Catalogue, zone by number", [] {
+    char name[42];
+    TWstatus status = 0;
+    TWsp_num_t_nam(TIDEWATER_STORE, 83, 4202, name, &status);
+  });
+  look_up("Catalogue, names of 11 datum models", [] {
+    char names[16][41];
+    TWstatus status = 0;
+    TWget_dt_names(TIDEWATER_STORE, -1, names[0], &status);
+  });
 });
 
 }  // namespace

@@ -10,6 +10,7 @@
 #include "harness.hpp"
 #include "support/grids.hpp"
 #include "tidewater/datum.h"
+#include "tidewater/grids.hpp"
 
 using namespace tidewater::bench;
 namespace fs = std::filesystem;
@@ -121,10 +122,61 @@ void add_geoid() {
   }
 }
 
+// The systems layer's objects, which take degrees, on the same points.
+template <class Grid, class Work>
+void add_object(const std::string& name, const Grid& grid, const std::string& peer_name,
+                const std::shared_ptr<Side>& peer, const std::vector<CoordinateTriple>& in,
+                Work work) {
+  std::vector<CoordinateTriple> points = in;
+  for (CoordinateTriple& p : points) p = {p.x / kDegree, p.y / kDegree, p.z};
+  const auto out = std::make_shared<std::vector<CoordinateTriple>>(points);
+  const auto run = [grid, points, out, work] {
+    const auto* from = points.data();
+    auto* to = out->data();
+    work(grid, points.size(), tidewater::Coordinates<const double>{&from->x, &from->y, &from->z, 3},
+         tidewater::Coordinates<double>{&to->x, &to->y, &to->z, 3});
+  };
+  const auto result = [out](std::size_t i) {
+    const CoordinateTriple& p = (*out)[i];
+    return CoordinateTriple{p.x * kDegree, p.y * kDegree, p.z};
+  };
+  add({name, side(run, result), {peer_name}, {peer}, ground_apart});
+}
+
+void add_objects() {
+  const fs::path folder = "/usr/share/proj";
+  const auto forward = [](const auto& grid, std::size_t n, auto in, auto out) {
+    grid.forward(n, in, out);
+  };
+  const auto inverse = [](const auto& grid, std::size_t n, auto in, auto out) {
+    grid.inverse(n, in, out);
+  };
+  if (fs::exists(folder / "ntf_r93.gsb")) {
+    const tidewater::ShiftGrid grid("ntf_r93.gsb", {folder.string()});
+    const auto points = box(-4.5, 43, 8, 50);
+    const char* definition = "+proj=hgridshift +grids=ntf_r93.gsb";
+    add_object("ShiftGrid NTv2 forward, scattered", grid, "PROJ", proj(definition, true, points),
+               points, forward);
+    add_object("ShiftGrid NTv2 inverse, scattered", grid, "PROJ", proj(definition, false, points),
+               points, inverse);
+  }
+  if (fs::exists(folder / "egm96_15.gtx")) {
+    const auto points = box(-180, -90, 180, 90);
+    using Geoid = tidewater::GeoidGrid;
+    const char* definition = "+proj=vgridshift +grids=egm96_15.gtx +multiplier=1";
+    add_object("GeoidGrid bilinear, scattered", Geoid("egm96_15.gtx", {folder.string()}), "PROJ",
+               proj(definition, true, points), points, forward);
+    add_object("GeoidGrid biquadratic, scattered",
+               Geoid("egm96_15.gtx", {folder.string()}, Geoid::Interpolation::biquadratic),
+               "PROJ, bilinear", proj(definition, true, points), points, forward);
+  }
+}
+
 const Suite suite([] {
   add_nadcon();
   add_national();
   add_geoid();
+  add_objects();
 });
 
 }  // namespace

@@ -34,6 +34,7 @@ struct Row {
   Sides peers;
   Apart apart;             // empty: not compared
   std::string unit = "m";  // of the difference
+  bool levels = true;      // false: the same at every level, measured once
 };
 
 // A static object of this kind in each file adds its rows once the points are known.
@@ -52,6 +53,9 @@ std::shared_ptr<Side> ours(std::vector<CoordinateTriple> in, Call call);
 // Any function as a side, with a way to read its results (none: empty).
 std::shared_ptr<Side> side(std::function<void()> run,
                            std::function<CoordinateTriple(std::size_t)> result = {});
+
+// A call that takes no points, made once for each.
+std::shared_ptr<Side> repeated(std::function<void()> once);
 
 // A PROJ operation on our points in its own array form.  Null where PROJ is not installed or does
 // not know the operation.

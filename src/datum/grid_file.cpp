@@ -4,7 +4,9 @@
 
 #include <algorithm>
 #include <cstring>
+#include <new>
 #include <string_view>
+#include <utility>
 
 #ifndef _WIN32
 #include <sys/types.h>
@@ -92,6 +94,27 @@ bool may_hold(std::FILE* file, std::int64_t end) {
 
 bool read_exactly(std::FILE* file, void* bytes, std::size_t count) {
   return std::fread(bytes, 1, count, file) == count;
+}
+
+void FileImage::count_load(std::FILE* file, std::int64_t* budget) {
+  // A load costs a few reads, the time in which so many bytes are copied.
+  constexpr std::int64_t kLoadBytes = 1 << 15;
+  constexpr std::int64_t kLeastLoads = 4;
+  ++loads_;
+  // The length is asked for now and then, not at every load of a file that is too large.
+  if (bytes_ || loads_ < kLeastLoads || !std::has_single_bit(static_cast<std::uint64_t>(loads_))) {
+    return;
+  }
+  const std::int64_t size = length_of(file);
+  if (size <= 0 || size > *budget || size > loads_ * kLoadBytes) return;
+  std::unique_ptr<unsigned char[]> bytes(
+      new (std::nothrow) unsigned char[static_cast<std::size_t>(size)]);
+  if (!bytes || !seek_to(file, 0) ||
+      !read_exactly(file, bytes.get(), static_cast<std::size_t>(size)))
+    return;
+  bytes_ = std::move(bytes);
+  size_ = size;
+  *budget -= size;
 }
 
 bool read_header(const char* directory, const char* name, const char* extension,

@@ -63,6 +63,73 @@ bool may_hold(std::FILE* file, std::int64_t end);
 // True when all bytes could be read; what a shorter file has is in bytes then.
 bool read_exactly(std::FILE* file, void* bytes, std::size_t count);
 
+// A file read whole, for the time of one array call.
+class FileImage {
+ public:
+  // Counts a window that was loaded from the file, and reads the file whole once its windows have
+  // cost about as much as that: it takes twice the time of the better way at most.  The budget of
+  // the call's images is charged.  Where memory is short the file goes on serving.
+  void count_load(std::FILE* file, std::int64_t* budget);
+
+  bool whole() const { return bytes_ != nullptr; }
+
+  // The bytes from offset on; null where the file is not in memory or ends before all of them.
+  const unsigned char* at(std::int64_t offset, std::int64_t count) const {
+    if (!bytes_ || offset < 0 || offset > size_ || count > size_ - offset) return nullptr;
+    return bytes_.get() + offset;
+  }
+
+ private:
+  std::unique_ptr<unsigned char[]> bytes_;
+  std::int64_t size_ = 0;
+  std::int64_t loads_ = 0;
+};
+
+// Bytes of images that one array call may hold.
+inline constexpr std::int64_t kImageBudget = std::int64_t{1} << 26;
+
+// The files of a list of grids, kFiles each, for the time of one array call: those of the grid last
+// asked for are open, and those in frequent use in memory.
+template <std::size_t kFiles>
+class CallFiles {
+ public:
+  using Paths = std::array<GridPath, kFiles>;
+
+  // Opens a grid's files unless they are the open ones; false where one cannot be.
+  bool open(std::int32_t grid, const Paths& paths) {
+    if (grid == grid_) return true;
+    grid_ = -1;
+    for (std::size_t k = 0; k < kFiles; ++k) {
+      files_[k] = open_grid(paths[k].text());
+      if (!files_[k]) return false;
+    }
+    grid_ = grid;
+    return true;
+  }
+
+  // A file of the open grid.
+  std::FILE* file(std::size_t k) const { return files_[k].get(); }
+
+  const FileImage& image(std::int32_t grid, std::size_t k) const {
+    return images_[static_cast<std::size_t>(grid)][k];
+  }
+
+  // Counts a window that was loaded from the open grid.
+  void count_load() {
+    for (std::size_t k = 0; k < kFiles; ++k) {
+      images_[static_cast<std::size_t>(grid_)][k].count_load(file(k), &budget_);
+    }
+  }
+
+ private:
+  static constexpr std::size_t kMostGrids = 50;  // of a control block
+
+  std::int32_t grid_ = -1;
+  std::array<FileHandle, kFiles> files_;
+  std::array<std::array<FileImage, kFiles>, kMostGrids> images_;
+  std::int64_t budget_ = kImageBudget;
+};
+
 // Files are little-endian on every machine.
 inline std::uint32_t decode_u32(const unsigned char* p) {
   return static_cast<std::uint32_t>(p[0]) | static_cast<std::uint32_t>(p[1]) << 8 |

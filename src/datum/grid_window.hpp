@@ -7,6 +7,7 @@
 #include <cmath>
 #include <cstdint>
 #include <limits>
+#include <optional>
 #include <utility>
 
 #include "datum/grid_file.hpp"
@@ -17,6 +18,14 @@ namespace tidewater::detail {
 template <class Bounds>
 bool holds(const Bounds& g, double x, double y) {
   return g.xmin < x && x < g.xmax && g.ymin < y && y < g.ymax;
+}
+
+// The same without branches, for a window: which of the comparisons a scattered point fails cannot
+// be foreseen.
+template <class Bounds>
+bool holds_at_once(const Bounds& w, double x, double y) {
+  return (static_cast<int>(w.xmin < x) & static_cast<int>(x < w.xmax) &
+          static_cast<int>(w.ymin < y) & static_cast<int>(y < w.ymax)) != 0;
 }
 
 // Grids of the caller's block; a count that no block can hold is cut.
@@ -47,9 +56,19 @@ bool grid_can_be(const Grid& g, int32_t least) {
 enum Direction : std::uint8_t { kWest, kNorth, kEast, kSouth };
 
 // How far the window reaches into grid g, by the direction in which it would have to give way,
-// where the point (x, y) does not lie beyond the edge concerned; 0 where it need not.
+// where the point (x, y) does not lie beyond the edge concerned; 0 where it need not.  Nothing
+// where all four are 0.
 template <class Window, class Grid>
-std::array<double, 4> reach_into(const Window& w, const Grid& g, double x, double y) {
+std::optional<std::array<double, 4>> reach_into(const Window& w, const Grid& g, double x,
+                                                double y) {
+  // Most windows lie wholly inside or outside the other grid's bounds.
+  const auto crosses = [](auto min, auto max, auto bound) {
+    return static_cast<int>(min < bound) & static_cast<int>(max > bound);
+  };
+  if ((crosses(w.xmin, w.xmax, g.xmin) | crosses(w.xmin, w.xmax, g.xmax) |
+       crosses(w.ymin, w.ymax, g.ymin) | crosses(w.ymin, w.ymax, g.ymax)) == 0) {
+    return std::nullopt;
+  }
   const bool columns_meet = w.xmin < g.xmax && w.xmax > g.xmin;
   const bool rows_meet = w.ymin < g.ymax && w.ymax > g.ymin;
   std::array<double, 4> reach = {};
@@ -64,6 +83,7 @@ std::array<double, 4> reach_into(const Window& w, const Grid& g, double x, doubl
     reach[kEast] = between(g.xmax, w.xmin);
   if (w.ymin < g.ymin && w.ymax > g.ymin && columns_meet && g.ymin >= y)
     reach[kSouth] = between(w.ymax, g.ymin);
+  if (reach == std::array<double, 4>{}) return std::nullopt;
   return reach;
 }
 

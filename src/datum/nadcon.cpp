@@ -1,15 +1,18 @@
 // NADCON shifts: bilinear interpolation in a window of 4 by 4 nodes that is read from the grid
 // files when a point leaves it.
 
+#include <algorithm>
 #include <cmath>
+#include <limits>
 #include <memory>
 #include <new>
+#include <optional>
 
 #include "datum/grid_file.hpp"
 #include "datum/grid_window.hpp"
+#include "formulas/interpolation.hpp"
 #include "formulas/wraps.hpp"
 #include "tidewater/datum.h"
-#include "tidewater/foundation.h"
 
 using namespace tidewater::detail;
 
@@ -47,57 +50,207 @@ TWstatus read_grid(const char* directory, const char* name, NadconGrid* grid) {
   return TW_SUCCESS;
 }
 
-bool read_table(std::FILE* file, unsigned char* buffer, std::int64_t record, std::int64_t column,
-                double* table) {
-  if (!read_exactly(file, buffer, static_cast<std::size_t>(kSide * record))) return false;
+// Four values of four records each.
+void decode_nodes(const unsigned char* first, std::int64_t record, double* table) {
   for (int r = 0; r < kSide; ++r) {
-    const unsigned char* p = buffer + r * record + column * 4;
     for (int c = 0; c < kSide; ++c) {
-      table[r * kSide + c] = static_cast<double>(decode_f32(p + std::ptrdiff_t{4} * c));
+      table[r * kSide + c] =
+          static_cast<double>(decode_f32(first + r * record + std::ptrdiff_t{4} * c));
     }
   }
-  return true;
 }
 
 // Reads four whole records from record iy on and takes the four values from float ix on.
 TWstatus read_tables(std::FILE* los, std::FILE* las, int32_t nc, std::int64_t ix, std::int64_t iy,
                      double* lon_table, double* lat_table) {
   const std::int64_t record = record_bytes(nc);
-  // A window that gave way may have left its grid. Index 0 is the label of a record, and record 0
-  // the header: they are read as they stand.
-  if (ix < 0 || ix + kSide - 1 > nc || iy < 0 ||
-      iy > std::numeric_limits<std::int64_t>::max() / record - kSide) {
-    return TW_GRID_FILE_ERROR;
-  }
   const std::int64_t offset = iy * record;
   const std::int64_t end = offset + kSide * record;
   if (!may_hold(los, end) && !may_hold(las, end)) return TW_GRID_FILE_ERROR;  // both too short
-  const std::unique_ptr<unsigned char[]> buffer(
-      new (std::nothrow) unsigned char[static_cast<std::size_t>(kSide * record)]);
+  const auto size = static_cast<std::size_t>(kSide * record);
+  const std::unique_ptr<unsigned char[]> buffer(new (std::nothrow) unsigned char[size]);
   if (!buffer) return TW_NO_MEMORY;
   if (!seek_to(los, offset) || !seek_to(las, offset)) return TW_GRID_FILE_ERROR;
-  const bool lon_read = read_table(los, buffer.get(), record, ix, lon_table);
-  const bool lat_read = read_table(las, buffer.get(), record, ix, lat_table);
+  const bool lon_read = read_exactly(los, buffer.get(), size);
+  if (lon_read) decode_nodes(buffer.get() + ix * 4, record, lon_table);
+  const bool lat_read = read_exactly(las, buffer.get(), size);
+  if (lat_read) decode_nodes(buffer.get() + ix * 4, record, lat_table);
   return lon_read && lat_read ? TW_SUCCESS : TW_GRID_FILE_ERROR;
 }
+
+// The nodes of a window where they stand in files that are in memory.  They are brought into its
+// tables only when the window or the call ends: most windows serve a single point.
+struct NodesInMemory {
+  const unsigned char* los = nullptr;
+  const unsigned char* las = nullptr;
+  std::int64_t record = 0;
+
+  void settle(double* lon_table, double* lat_table) {
+    if (!los) return;
+    decode_nodes(los, record, lon_table);
+    decode_nodes(las, record, lat_table);
+    los = nullptr;
+  }
+};
 
 // False where a window gave way to a better grid so far that no cell of it serves the point.
 bool has_cell(double position) { return position > -1 && position <= kSide - 1; }
 
-// Shift in arc-seconds in the cell (ix, iy) of a table.
-double interpolate(const double* table, std::int64_t ix, std::int64_t iy, double fx, double fy) {
+// Shift in arc-seconds within a cell, from the values at its origin, a step north, a step east and
+// across.
+double interpolate(double p00, double p01, double p10, double p11, double fx, double fy) {
   constexpr double kMarker = 180;  // what is larger marks a node without data
-  const double* p = table + iy * kSide + ix;
-  double p00 = p[0], p01 = p[kSide], p10 = p[1], p11 = p[kSide + 1];
   // By contract: no count of the markers; of several, the later ones enter the means.
   if (std::fabs(p00) > kMarker) p00 = (p11 + p10 + p01) / 3;
   if (std::fabs(p01) > kMarker) p01 = (p11 + p10 + p00) / 3;
   if (std::fabs(p10) > kMarker) p10 = (p11 + p01 + p00) / 3;
   if (std::fabs(p11) > kMarker) p11 = (p10 + p01 + p00) / 3;
-  double shift = 0;
-  TWstatus always = TW_SUCCESS;
-  TWbilinear_interpolation(p00, p01, p10, p11, fx, fy, &shift, &always);
-  return shift;
+  return bilinear(p00, p01, p10, p11, fx, fy);
+}
+
+// Finds the grid of a point and places the window, whose nodes are then in its tables, or in
+// memory where the call has the files there.
+TWstatus locate(double x, double y, const NadconControl& control, NadconWindow* window,
+                double* lon_table, double* lat_table, CallFiles<2>* files, NodesInMemory* nodes) {
+  const int32_t chosen = first_grid_holding(control, x, y);
+  if (chosen < 0) return TW_I_OUTSIDE_NADCON;
+  const NadconGrid& grid = control.grids[chosen];
+  if (!grid_can_be(grid, kSide)) return TW_GRID_FILE_ERROR;
+  const auto open = [&] {
+    return files->open(chosen, {GridPath(control.directory, grid.name, ".los"),
+                                GridPath(control.directory, grid.name, ".las")});
+  };
+  const FileImage& los = files->image(chosen, 0);
+  const FileImage& las = files->image(chosen, 1);
+  if (!(los.whole() && las.whole()) && !open()) return TW_GRID_FILE_ERROR;
+
+  const double dx = grid.dx;
+  const double dy = grid.dy;
+  const double gx = (x - grid.xmin) / dx;
+  const double gy = (y - grid.ymin) / dy;
+  // The point lies beyond the first node, so that the cut is the floor.
+  std::int64_t ix = cut(gx);
+  std::int64_t iy = cut(gy);
+  const double in_cell_x = gx - static_cast<double>(ix);
+  const double in_cell_y = gy - static_cast<double>(iy);
+  // Columns ix - 1 to ix + 2 and rows iy - 1 to iy + 2 stay in the grid.
+  ix = ix > grid.nc - 3 ? grid.nc - 3 : std::max<std::int64_t>(ix, 1);
+  iy = iy > grid.nr - 3 ? grid.nr - 3 : std::max<std::int64_t>(iy, 1);
+  NadconWindow& w = *window;
+  w.nc = kSide;
+  w.nr = kSide;
+  w.xmin = grid.xmin + static_cast<double>(ix - 1) * dx;
+  w.ymin = grid.ymin + static_cast<double>(iy - 1) * dy;
+  w.xmax = w.xmin + 3 * dx;
+  w.ymax = w.ymin + 3 * dy;
+  w.dx = dx;
+  w.dy = dy;
+
+  // The window gives way to better grids, seen from a point in its centre cell.
+  const double x_ref = w.xmin + dx + in_cell_x * dx;
+  const double y_ref = w.ymin + dy + in_cell_y * dy;
+  for (int32_t g = 0; g < chosen; ++g) {
+    const auto reach = reach_into(w, control.grids[g], x_ref, y_ref);
+    if (!reach) continue;
+    const auto& [west, north, east, south] = *reach;
+    give_way({cut(west / dx), cut(north / dy), cut(east / dx), cut(south / dy)}, &w, &ix, &iy);
+  }
+
+  const std::int64_t record = record_bytes(grid.nc);
+  // A window that gave way may have left its grid. Index 0 is the label of a record, and record 0
+  // the header: they are read as they stand.
+  const bool in_records = ix >= 0 && ix + kSide - 1 <= grid.nc && iy >= 0 &&
+                          iy <= std::numeric_limits<std::int64_t>::max() / record - kSide;
+  if (in_records) {
+    const unsigned char* const los_bytes = los.at(iy * record, kSide * record);
+    const unsigned char* const las_bytes = las.at(iy * record, kSide * record);
+    if (los_bytes && las_bytes) {
+      *nodes = {los_bytes + ix * 4, las_bytes + ix * 4, record};
+      return TW_SUCCESS;
+    }
+  }
+  nodes->settle(lon_table, lat_table);
+  if (!in_records || !open()) return TW_GRID_FILE_ERROR;
+  const TWstatus word =
+      read_tables(files->file(0), files->file(1), grid.nc, ix, iy, lon_table, lat_table);
+  files->count_load();
+  return word;
+}
+
+// One array call: its files, and where the nodes of the held window are.
+class Call {
+ public:
+  Call() = default;
+  Call(const Call&) = delete;
+  Call& operator=(const Call&) = delete;
+  ~Call() { nodes_.settle(held.lon, held.lat); }
+
+  void shift(int32_t count, const CoordinateTriple* in, const NadconControl& control,
+             CoordinateTriple* out, TWstatus* status);
+
+ private:
+  double lon_shift(std::int64_t ix, std::int64_t iy, double fx, double fy) const {
+    return in_cell(held.lon, nodes_.los, ix, iy, fx, fy);
+  }
+  double lat_shift(std::int64_t ix, std::int64_t iy, double fx, double fy) const {
+    return in_cell(held.lat, nodes_.los ? nodes_.las : nullptr, ix, iy, fx, fy);
+  }
+  double in_cell(const double* table, const unsigned char* in_memory, std::int64_t ix,
+                 std::int64_t iy, double fx, double fy) const {
+    if (in_memory) {
+      const unsigned char* const p = in_memory + iy * nodes_.record + ix * 4;
+      const auto value = [](const unsigned char* q) { return static_cast<double>(decode_f32(q)); };
+      return interpolate(value(p), value(p + nodes_.record), value(p + 4),
+                         value(p + nodes_.record + 4), fx, fy);
+    }
+    const double* const p = table + iy * kSide + ix;
+    return interpolate(p[0], p[kSide], p[1], p[kSide + 1], fx, fy);
+  }
+
+  std::optional<CallFiles<2>> files_;  // from the first load on
+  NodesInMemory nodes_;
+};
+
+void Call::shift(int32_t count, const CoordinateTriple* in, const NadconControl& control,
+                 CoordinateTriple* out, TWstatus* status) {
+  *status = TW_SUCCESS;
+  bool outside = false;
+  for (int32_t i = 0; i < count; ++i) {
+    const CoordinateTriple point = in[i];
+    double x = point.x * kDegreesPerRadian;
+    double y = point.y * kDegreesPerRadian;
+    x = add_turns_while(x, -360, [](double v) { return v > 0; });
+    x = add_turns_while(x, 360, [](double v) { return v <= -360; });
+    const NadconWindow& w = held.bounds;
+    if (!holds_at_once(w, x, y)) {
+      if (!files_) files_.emplace();
+      *status = locate(x, y, control, &held.bounds, held.lon, held.lat, &*files_, &nodes_);
+    }
+    if (*status == TW_SUCCESS) {
+      const double u = (x - w.xmin) / w.dx;
+      const double v = (y - w.ymin) / w.dy;
+      if (!has_cell(u) || !has_cell(v)) {
+        *status = TW_GRID_FILE_ERROR;
+        continue;
+      }
+      // A point just short of the far edge may round up to it.
+      const std::int64_t ix = std::min<std::int64_t>(cut(u), kSide - 2);
+      const std::int64_t iy = std::min<std::int64_t>(cut(v), kSide - 2);
+      const double fx = u - static_cast<double>(ix);
+      const double fy = v - static_cast<double>(iy);
+      x -= lon_shift(ix, iy, fx, fy) / 3600;  // positive west
+      y += lat_shift(ix, iy, fx, fy) / 3600;
+      x = add_turns_while(x, -360, [](double d) { return d > 180; });
+      x = add_turns_while(x, 360, [](double d) { return d <= -180; });
+      out[i] = {x / kDegreesPerRadian, y / kDegreesPerRadian, point.z};
+    } else if (*status == TW_I_OUTSIDE_NADCON) {
+      out[i] = {wrap_turns_above_then_at_or_below(point.x), point.y, point.z};
+      outside = true;
+      *status = TW_SUCCESS;
+    }
+    // Any other word stands, and keeps points unwritten, until a window is loaded again.
+  }
+  if (outside) *status = TW_I_OUTSIDE_NADCON;
 }
 
 }  // namespace
@@ -127,104 +280,14 @@ int32_t TWnadcon_c(const char* directory, NadconControl* control, TWstatus* stat
 
 void TWloc_grids(double x, double y, double /*unused*/, const NadconControl* control,
                  NadconWindow* window, double* lon_table, double* lat_table, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const int32_t chosen = first_grid_holding(*control, x, y);
-  if (chosen < 0) {
-    *status = TW_I_OUTSIDE_NADCON;
-    return;
-  }
-  const NadconGrid& grid = control->grids[chosen];
-  if (!grid_can_be(grid, kSide)) {
-    *status = TW_GRID_FILE_ERROR;
-    return;
-  }
-  const FileHandle los = open_grid(GridPath(control->directory, grid.name, ".los").text());
-  if (!los) {
-    *status = TW_GRID_FILE_ERROR;
-    return;
-  }
-  const FileHandle las = open_grid(GridPath(control->directory, grid.name, ".las").text());
-  if (!las) {
-    *status = TW_GRID_FILE_ERROR;
-    return;
-  }
-
-  const double dx = grid.dx;
-  const double dy = grid.dy;
-  const double gx = (x - grid.xmin) / dx;
-  const double gy = (y - grid.ymin) / dy;
-  std::int64_t ix = cut(std::floor(gx));
-  std::int64_t iy = cut(std::floor(gy));
-  // Columns ix - 1 to ix + 2 and rows iy - 1 to iy + 2 stay in the grid.
-  if (iy + 2 >= grid.nr) {
-    iy = grid.nr - 3;
-  } else if (iy - 1 < 0) {
-    iy = 1;
-  }
-  if (ix + 2 >= grid.nc) {
-    ix = grid.nc - 3;
-  } else if (ix - 1 < 0) {
-    ix = 1;
-  }
-  NadconWindow& w = *window;
-  w.nc = kSide;
-  w.nr = kSide;
-  w.xmin = grid.xmin + static_cast<double>(ix - 1) * dx;
-  w.ymin = grid.ymin + static_cast<double>(iy - 1) * dy;
-  w.xmax = w.xmin + 3 * dx;
-  w.ymax = w.ymin + 3 * dy;
-  w.dx = dx;
-  w.dy = dy;
-
-  // The window gives way to better grids, seen from a point in its centre cell.
-  const double x_ref = w.xmin + dx + (gx - std::floor(gx)) * dx;
-  const double y_ref = w.ymin + dy + (gy - std::floor(gy)) * dy;
-  for (int32_t g = 0; g < chosen; ++g) {
-    const auto reach = reach_into(w, control->grids[g], x_ref, y_ref);
-    give_way({cut(reach[kWest] / dx), cut(reach[kNorth] / dy), cut(reach[kEast] / dx),
-              cut(reach[kSouth] / dy)},
-             &w, &ix, &iy);
-  }
-  *status = read_tables(los.get(), las.get(), grid.nc, ix, iy, lon_table, lat_table);
+  CallFiles<2> files;
+  NodesInMemory nodes;
+  *status = locate(x, y, *control, window, lon_table, lat_table, &files, &nodes);
 }
 
 void TWnadcon_f(int32_t count, const CoordinateTriple* in, const NadconControl* control,
                 CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  bool outside = false;
-  for (int32_t i = 0; i < count; ++i) {
-    const CoordinateTriple point = in[i];
-    double x = point.x * kDegreesPerRadian;
-    double y = point.y * kDegreesPerRadian;
-    x = add_turns_while(x, -360, [](double v) { return v > 0; });
-    x = add_turns_while(x, 360, [](double v) { return v <= -360; });
-    const NadconWindow& w = held.bounds;
-    if (!holds(w, x, y)) TWloc_grids(x, y, 0, control, &held.bounds, held.lon, held.lat, status);
-    if (*status == TW_SUCCESS) {
-      const double u = (x - w.xmin) / w.dx;
-      const double v = (y - w.ymin) / w.dy;
-      if (!has_cell(u) || !has_cell(v)) {
-        *status = TW_GRID_FILE_ERROR;
-        continue;
-      }
-      // A point just short of the far edge may round up to it.
-      const std::int64_t ix = std::min<std::int64_t>(cut(u), kSide - 2);
-      const std::int64_t iy = std::min<std::int64_t>(cut(v), kSide - 2);
-      const double fx = u - static_cast<double>(ix);
-      const double fy = v - static_cast<double>(iy);
-      x -= interpolate(held.lon, ix, iy, fx, fy) / 3600;  // positive west
-      y += interpolate(held.lat, ix, iy, fx, fy) / 3600;
-      x = add_turns_while(x, -360, [](double d) { return d > 180; });
-      x = add_turns_while(x, 360, [](double d) { return d <= -180; });
-      out[i] = {x / kDegreesPerRadian, y / kDegreesPerRadian, point.z};
-    } else if (*status == TW_I_OUTSIDE_NADCON) {
-      out[i] = {wrap_turns_above_then_at_or_below(point.x), point.y, point.z};
-      outside = true;
-      *status = TW_SUCCESS;
-    }
-    // Any other word stands, and keeps points unwritten, until a window is loaded again.
-  }
-  if (outside) *status = TW_I_OUTSIDE_NADCON;
+  Call().shift(count, in, *control, out, status);
 }
 
 void TWnadcon_i(int32_t count, const CoordinateTriple* in, const NadconControl* control,
@@ -232,6 +295,7 @@ void TWnadcon_i(int32_t count, const CoordinateTriple* in, const NadconControl* 
   constexpr double kTolerance = 1.7453292519943298e-11;  // radians: 1e-9 of a degree
   constexpr int kMostPasses = 4;
   *status = TW_SUCCESS;
+  Call call;
   bool outside = false;
   for (int32_t i = 0; i < count; ++i) {
     const CoordinateTriple point = in[i];
@@ -242,7 +306,7 @@ void TWnadcon_i(int32_t count, const CoordinateTriple* in, const NadconControl* 
     int passes = 0;
     do {
       CoordinateTriple shifted;
-      TWnadcon_f(1, &estimate, control, &shifted, status);
+      call.shift(1, &estimate, *control, &shifted, status);
       if (*status != TW_SUCCESS) break;
       dlon = lon - shifted.x;
       dlat = point.y - shifted.y;

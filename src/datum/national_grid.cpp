@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <array>
-#include <bit>
 #include <cmath>
 #include <cstring>
 #include <limits>
@@ -39,6 +38,13 @@ struct CntSubGrid {
   int32_t gs_count;
   int32_t first_record;  // of its nodes, from 0
   int64_t rows, cols;
+  int32_t first_child, last_child;  // range of its children in the table of children
+};
+
+// A sub-grid by its parent's name.
+struct Child {
+  Name parent;
+  int32_t grid;
 };
 
 struct Node {
@@ -55,6 +61,9 @@ int64_t cnt_block_col = 0;
 int64_t cnt_block_row = 0;
 Node cnt_block[kSide][kSide] = {};
 CntSubGrid* cnt_subgrids = nullptr;
+Child* cnt_children = nullptr;  // sorted by parent, those of one parent in the order of the file
+int32_t cnt_first_root = 0;     // range of those without a parent
+int32_t cnt_last_root = 0;
 TWstatus cnt_read_status = TW_SUCCESS;
 
 // By contract: an earlier grid is neither closed nor freed when another is opened.  This list keeps
@@ -62,14 +71,10 @@ TWstatus cnt_read_status = TW_SUCCESS;
 struct OpenedGrid {
   std::FILE* file;
   CntSubGrid* subgrids;
+  Child* children;
   OpenedGrid* earlier;
 };
 OpenedGrid* opened_grids = nullptr;
-
-// As one number, not as a call of the library for each sub-grid that is looked at.
-bool same(const Name& a, const Name& b) {
-  return std::bit_cast<uint64_t>(a) == std::bit_cast<uint64_t>(b);
-}
 
 Name decode_name(const unsigned char* p) {
   Name name;
@@ -95,7 +100,9 @@ CntSubGrid decode_subgrid(const unsigned char* p, int32_t first_record) {
                   .gs_count = decode_i32(p + 168),
                   .first_record = first_record,
                   .rows = 0,
-                  .cols = 0};
+                  .cols = 0,
+                  .first_child = 0,
+                  .last_child = 0};
   g.rows = node_count(g.n_lat, g.s_lat, g.lat_inc);
   g.cols = node_count(g.w_long, g.e_long, g.long_inc);
   return g;
@@ -128,27 +135,71 @@ struct Found {
   Code code = kOutside;
 };
 
+// Of the children from first to before last, other than the one named.
+Found best_child(int32_t first, int32_t last, int32_t except, double x, double y) {
+  Found best;
+  for (int32_t k = first; k < last && best.code != kInside; ++k) {
+    const int32_t i = cnt_children[k].grid;
+    if (i == except) continue;
+    const Code code = classify(cnt_subgrids[i], x, y);
+    if (code < best.code) best = {i, code};
+  }
+  return best;
+}
+
 Found find_subgrid(double x, double y) {
-  Found found;
-  Name parent = kNoParent;
-  // A tree has no more levels than sub-grids; names in a damaged file may run in a circle.
-  for (int32_t level = 0; level < cnt_num_file; ++level) {
-    Found best;
-    for (int32_t i = 0; i < cnt_num_file; ++i) {
-      if (i == found.grid || !same(cnt_subgrids[i].parent, parent)) continue;
-      const Code code = classify(cnt_subgrids[i], x, y);
-      if (code < best.code) best = {i, code};
+  Found found = best_child(cnt_first_root, cnt_last_root, kNone, x, y);
+  // Names in a damaged file may run in a circle.  The way down is told by the last found sub-grid
+  // alone, so that one which is met again ends it: of all that were passed the one at the last
+  // power of two is kept for the comparison.
+  int32_t passed = kNone;
+  int64_t next_kept = 1;
+  for (int64_t level = 1; found.grid != kNone && found.grid != passed; ++level) {
+    if (level == next_kept) {
+      passed = found.grid;
+      next_kept *= 2;
     }
-    if (best.grid == kNone) break;
-    found = best;
-    parent = cnt_subgrids[found.grid].name;
+    const CntSubGrid& g = cnt_subgrids[found.grid];
+    const Found deeper = best_child(g.first_child, g.last_child, found.grid, x, y);
+    if (deeper.grid == kNone) break;
+    found = deeper;
   }
   return found;
 }
 
+Node decode_node(const unsigned char* p) {
+  return {decode_f32(p), decode_f32(p + 4), decode_f32(p + 8), decode_f32(p + 12)};
+}
+
+// The open file for the time of one call.
+struct Call {
+  Call() = default;
+  Call(const Call&) = delete;
+  Call& operator=(const Call&) = delete;
+  ~Call() { settle(); }
+
+  // Brings the block's nodes from the image into the block.
+  void settle() {
+    if (!nodes) return;
+    for (int r = 0; r < kSide; ++r) {
+      for (int c = 0; c < kSide; ++c) {
+        cnt_block[r][c] = decode_node(nodes + r * row_bytes + c * kRecordBytes);
+      }
+    }
+    nodes = nullptr;
+  }
+
+  FileImage image;
+  std::int64_t budget = kImageBudget;
+  // The first node of the block where it stands in the image; most blocks serve a single point, so
+  // that they are brought into cnt_block only when another is read or the call ends.
+  const unsigned char* nodes = nullptr;
+  int64_t row_bytes = 0;
+};
+
 // Moves the block so that it begins one node south and east of a node of a sub-grid, as far as the
 // sub-grid reaches.
-void load_block(int32_t grid, int64_t node_row, int64_t node_col) {
+void load_block(int32_t grid, int64_t node_row, int64_t node_col, Call* call) {
   const CntSubGrid& g = cnt_subgrids[grid];
   const int64_t row = std::max<int64_t>(std::min(node_row - 1, g.rows - kSide), 0);
   const int64_t col = std::max<int64_t>(std::min(node_col - 1, g.cols - kSide), 0);
@@ -157,34 +208,40 @@ void load_block(int32_t grid, int64_t node_row, int64_t node_col) {
   cnt_block_grid = grid;
   cnt_block_row = row;
   cnt_block_col = col;
+  constexpr int64_t kNodesBytes = kSide * kRecordBytes;
+  const int64_t row_bytes = g.cols * kRecordBytes;
+  const int64_t offset = (g.first_record + row * g.cols + col) * kRecordBytes;
+  // By contract: four reads of four records each, also where a sub-grid has fewer rows or columns
+  // and they reach into what follows, or behind the end of the file.
+  const unsigned char* const in_memory =
+      call->image.at(offset, (kSide - 1) * row_bytes + kNodesBytes);
+  if (in_memory) {
+    call->nodes = in_memory;
+    call->row_bytes = row_bytes;
+    return;
+  }
+  call->settle();
   // One read for the four rows saves most of the time of a load, as long as they are near enough.
   constexpr int64_t kMostBytes = 32768;
   unsigned char bytes[kMostBytes];
-  const int64_t row_bytes = g.cols * kRecordBytes;
-  const int rows_at_once = (kSide - 1) * row_bytes + kSide * kRecordBytes <= kMostBytes ? kSide : 1;
+  const int rows_at_once = (kSide - 1) * row_bytes + kNodesBytes <= kMostBytes ? kSide : 1;
   for (int r = 0; r < kSide; r += rows_at_once) {
-    const int64_t first = (row + r) * g.cols + col;
-    const int64_t span = (rows_at_once - 1) * row_bytes + kSide * kRecordBytes;
+    const int64_t span = (rows_at_once - 1) * row_bytes + kNodesBytes;
     std::size_t read = 0;
-    if (seek_to(cnt_file, (g.first_record + first) * kRecordBytes)) {
+    if (seek_to(cnt_file, offset + r * row_bytes)) {
       read = std::fread(bytes, 1, static_cast<std::size_t>(span), cnt_file);
     }
-    const auto got = static_cast<int64_t>(read);
     for (int k = 0; k < rows_at_once; ++k) {
-      // The last sub-grid may have fewer nodes than the block, with nothing behind them in the
-      // file: only nodes of the sub-grid must be there.
-      const int64_t nodes = std::clamp<int64_t>(g.gs_count - (first + k * g.cols), 0, kSide);
-      if (nodes > 0 && k * row_bytes + nodes * kRecordBytes > got) {
+      if (k * row_bytes + kNodesBytes > static_cast<int64_t>(read)) {
         cnt_read_status = TW_GSB_READ_ERROR;  // the row keeps what it held
         continue;
       }
-      for (int64_t c = 0; c < nodes; ++c) {
-        const unsigned char* p = bytes + k * row_bytes + c * kRecordBytes;
-        cnt_block[r + k][c] = {decode_f32(p), decode_f32(p + 4), decode_f32(p + 8),
-                               decode_f32(p + 12)};
+      for (int c = 0; c < kSide; ++c) {
+        cnt_block[r + k][c] = decode_node(bytes + k * row_bytes + c * kRecordBytes);
       }
     }
   }
+  call->image.count_load(cnt_file, &call->budget);
 }
 
 // Shifts in arc-seconds.
@@ -192,12 +249,15 @@ struct Shift {
   double lon, lat;
 };
 
+// Without branches: which of the comparisons a scattered point fails cannot be foreseen.
 bool in_block(int64_t row, int64_t col) {
-  return row >= cnt_block_row && row < cnt_block_row + kSide && col >= cnt_block_col &&
-         col < cnt_block_col + kSide;
+  const auto within = [](int64_t offset) {
+    return static_cast<int>(static_cast<uint64_t>(offset) < uint64_t{kSide});
+  };
+  return (within(row - cnt_block_row) & within(col - cnt_block_col)) != 0;
 }
 
-Shift interpolate(const Found& found, double x, double y) {
+Shift interpolate(const Found& found, double x, double y, Call* call) {
   const CntSubGrid& g = cnt_subgrids[found.grid];
   const double u = (x - g.e_long) / g.long_inc;
   const double v = (y - g.s_lat) / g.lat_inc;
@@ -212,19 +272,25 @@ Shift interpolate(const Found& found, double x, double y) {
   const bool own_corner = found.code == kNorthWestCorner && row + 1 < g.rows && col + 1 < g.cols;
   const int64_t to_corner_row = own_corner ? 1 : to_north;
   const int64_t to_corner_col = own_corner ? 1 : to_west;
-  if (cnt_block_grid != found.grid || !in_block(row, col) ||
-      !in_block(row + to_corner_row, col + to_corner_col)) {
-    load_block(found.grid, row, col);
+  const int held_already = static_cast<int>(cnt_block_grid == found.grid) &
+                           static_cast<int>(in_block(row, col)) &
+                           static_cast<int>(in_block(row + to_corner_row, col + to_corner_col));
+  if (held_already == 0) {
+    load_block(found.grid, row, col, call);
   }
 
   // Rounding may put a point a node beyond a sub-grid of absurdly small spacing.
   const int64_t r = std::clamp<int64_t>(row - cnt_block_row, 0, kSide - 1);
   const int64_t c = std::clamp<int64_t>(col - cnt_block_col, 0, kSide - 1);
   const auto held = [](int64_t index) { return std::min<int64_t>(index, kSide - 1); };
-  const Node& base = cnt_block[r][c];
-  const Node& west = cnt_block[r][held(c + to_west)];
-  const Node& north = cnt_block[held(r + to_north)][c];
-  const Node& northwest = cnt_block[held(r + to_corner_row)][held(c + to_corner_col)];
+  const auto node = [call](int64_t in_row, int64_t in_col) {
+    if (!call->nodes) return cnt_block[in_row][in_col];
+    return decode_node(call->nodes + in_row * call->row_bytes + in_col * kRecordBytes);
+  };
+  const Node base = node(r, c);
+  const Node west = node(r, held(c + to_west));
+  const Node north = node(held(r + to_north), c);
+  const Node northwest = node(held(r + to_corner_row), held(c + to_corner_col));
   const double fx = u - static_cast<double>(col);
   const double fy = v - static_cast<double>(row);
   const auto bilinear = [&](float Node::*field) {
@@ -240,7 +306,7 @@ Shift interpolate(const Found& found, double x, double y) {
 }
 
 // Shift of a point in radians, with the call's word; unwritten outside all sub-grids.
-TWstatus shift_at(double lon, double lat, double* lon_shift, double* lat_shift) {
+TWstatus shift_at(double lon, double lat, double* lon_shift, double* lat_shift, Call* call) {
   lon = add_turns_while(lon, kTwoPi, [](double v) { return v <= 0; });
   lon = add_turns_while(lon, -kTwoPi, [](double v) { return v > kTwoPi; });
   lon = add_turns_while(lon, -kTwoPi, [](double v) { return v >= kPi; });
@@ -252,10 +318,34 @@ TWstatus shift_at(double lon, double lat, double* lon_shift, double* lat_shift) 
   const Found found = find_subgrid(x, y);
   if (found.grid == kNone) return TW_I_OUTSIDE_CNT;
   cnt_read_status = TW_SUCCESS;
-  const Shift shift = interpolate(found, x, y);
+  const Shift shift = interpolate(found, x, y, call);
   *lon_shift = shift.lon * sign * kRadiansPerArcSecond;
   *lat_shift = shift.lat * kRadiansPerArcSecond;
   return cnt_read_status;
+}
+
+// Gives each sub-grid the range of its children.
+void index_children() {
+  Child* const end = cnt_children + cnt_num_file;
+  for (int32_t i = 0; i < cnt_num_file; ++i) cnt_children[i] = {cnt_subgrids[i].parent, i};
+  std::sort(cnt_children, end, [](const Child& a, const Child& b) {
+    return a.parent != b.parent ? a.parent < b.parent : a.grid < b.grid;
+  });
+  const auto range_of = [end](const Name& parent, int32_t* first, int32_t* last) {
+    const Child* const begin =
+        std::lower_bound(cnt_children, end, parent,
+                         [](const Child& c, const Name& name) { return c.parent < name; });
+    const Child* const behind =
+        std::upper_bound(cnt_children, end, parent,
+                         [](const Name& name, const Child& c) { return name < c.parent; });
+    *first = static_cast<int32_t>(begin - cnt_children);
+    *last = static_cast<int32_t>(behind - cnt_children);
+  };
+  range_of(kNoParent, &cnt_first_root, &cnt_last_root);
+  for (int32_t i = 0; i < cnt_num_file; ++i) {
+    CntSubGrid& g = cnt_subgrids[i];
+    range_of(g.name, &g.first_child, &g.last_child);
+  }
 }
 
 // Reads the header of the file and those of its sub-grids.
@@ -272,8 +362,10 @@ TWstatus read_headers() {
   constexpr auto kBytes = static_cast<int64_t>(kHeaderBytes);
   if (num_file < 0 || num_file > length_of(cnt_file) / kBytes - 1) return TW_GSB_READ_ERROR;
   cnt_subgrids = new (std::nothrow) CntSubGrid[static_cast<std::size_t>(num_file)];
-  if (!cnt_subgrids) return TW_NO_MEMORY;
   opened_grids->subgrids = cnt_subgrids;
+  cnt_children = new (std::nothrow) Child[static_cast<std::size_t>(num_file)];
+  opened_grids->children = cnt_children;
+  if (!cnt_subgrids || !cnt_children) return TW_NO_MEMORY;
   int64_t record = kHeaderRecords;
   for (int32_t i = 0; i < num_file; ++i) {
     const int64_t first_node = record + kHeaderRecords;
@@ -295,6 +387,9 @@ void clear_state() {
   cnt_num_file = 0;
   cnt_file = nullptr;
   cnt_subgrids = nullptr;
+  cnt_children = nullptr;
+  cnt_first_root = 0;
+  cnt_last_root = 0;
   cnt_block_grid = kNone;
 }
 
@@ -318,7 +413,7 @@ void TWrd_cnt_fhdr(const char* path, int32_t flag, TWstatus* status) {
     *status = TW_GSB_READ_ERROR;
     return;
   }
-  auto* opened = new (std::nothrow) OpenedGrid{file.get(), nullptr, opened_grids};
+  auto* opened = new (std::nothrow) OpenedGrid{file.get(), nullptr, nullptr, opened_grids};
   if (!opened) {
     *status = TW_NO_MEMORY;
     return;
@@ -327,6 +422,7 @@ void TWrd_cnt_fhdr(const char* path, int32_t flag, TWstatus* status) {
   clear_state();
   cnt_file = file.release();
   *status = read_headers();
+  index_children();  // also of a table that ends early
 }
 
 void TWcnt_c(const char* directory, int32_t /*reserved*/, TWstatus* status) {
@@ -347,23 +443,26 @@ void TWload_cnt_local_grid(int32_t sub_grid, int32_t record) {
   if (sub_grid < 0 || sub_grid >= cnt_num_file) return;
   const CntSubGrid& g = cnt_subgrids[sub_grid];
   const int64_t offset = int64_t{record} - g.first_record - 1;
-  load_block(sub_grid, offset / g.cols, offset % g.cols);
+  Call call;
+  load_block(sub_grid, offset / g.cols, offset % g.cols, &call);
 }
 
 void TWget_cnt_shift(CoordinateTriple point, int32_t /*reserved*/, double* lon_shift,
                      double* lat_shift, TWstatus* status) {
-  *status = shift_at(point.x, point.y, lon_shift, lat_shift);
+  Call call;
+  *status = shift_at(point.x, point.y, lon_shift, lat_shift, &call);
 }
 
 void TWcnt_f(int32_t count, const CoordinateTriple* in, int32_t /*reserved*/, CoordinateTriple* out,
              TWstatus* status) {
   *status = TW_SUCCESS;
+  Call call;
   bool outside = false;
   for (int32_t i = 0; i < count; ++i) {
     const CoordinateTriple point = in[i];
     double dlon = 0;
     double dlat = 0;
-    *status = shift_at(point.x, point.y, &dlon, &dlat);
+    *status = shift_at(point.x, point.y, &dlon, &dlat, &call);
     if (!TW_OK(*status)) return;
     if (*status == TW_I_OUTSIDE_CNT) {
       out[i] = point;
@@ -380,6 +479,7 @@ void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t /*reserved*/, Co
              TWstatus* status) {
   constexpr int kPasses = 4;
   *status = TW_SUCCESS;
+  Call call;
   bool outside = false;
   for (int32_t i = 0; i < count; ++i) {
     const CoordinateTriple point = in[i];
@@ -387,7 +487,7 @@ void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t /*reserved*/, Co
     double dlat = 0;
     for (int pass = 0; pass < kPasses; ++pass) {
       // A pass outside leaves the shifts as they are.
-      *status = shift_at(point.x - dlon, point.y - dlat, &dlon, &dlat);
+      *status = shift_at(point.x - dlon, point.y - dlat, &dlon, &dlat, &call);
       if (!TW_OK(*status)) return;
     }
     if (*status == TW_I_OUTSIDE_CNT) {  // the last pass alone decides

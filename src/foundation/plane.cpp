@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "formulas/constants.hpp"
+#include "formulas/interpolation.hpp"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::detail;
@@ -47,16 +48,11 @@ void TWpt_line_dist(const CoordinateTriple* points, int32_t count, double* dista
 void TWbilinear_interpolation(double p00, double p01, double p10, double p11, double fx, double fy,
                               double* result, TWstatus* status) {
   *status = TW_SUCCESS;
-  *result = (p11 - p10 - p01 + p00) * fy * fx + (p01 - p00) * fy + (p10 - p00) * fx + p00;
+  *result = tidewater::detail::bilinear(p00, p01, p10, p11, fx, fy);
 }
 
 void TWqterp2(const float* t, const float* f0, const float* f1, const float* f2, float* result,
               TWstatus* status) {
   *status = TW_SUCCESS;
-  const float d1 = *f1 - *f0;
-  const float d2 = *f2 - *f1;
-  const float dd = d2 - d1;
-  const double p = static_cast<double>(*t);
-  *result = static_cast<float>((p - 1) * p * static_cast<double>(dd) * 0.5 +
-                               p * static_cast<double>(d1) + static_cast<double>(*f0));
+  *result = tidewater::detail::quadratic(*t, *f0, *f1, *f2);
 }

@@ -135,11 +135,11 @@ std::string sexagesimal_text(double v, int precision, Form form) {
   double min = whole_min;
   double sec = t - (deg * 3600 + min * 60) + f;
 
-  // Seconds that would be rounded to 60 go to the next minute.  The bound is included; seconds that
-  // are at the bound but for the rounding of v count as being there.
+  // Seconds that would be rounded to 60 go to the next minute.  The bound is included, with an
+  // allowance for its own rounding; it does not grow with the value, the double alone decides.
+  constexpr double kBoundRounding = 4 * std::numeric_limits<double>::epsilon() * 60;
   const double half_unit = std::pow(10.0, -precision) * 0.5;
-  const double rounding = 4 * std::numeric_limits<double>::epsilon() * std::fabs(v);
-  if (std::fabs(60 - sec) <= half_unit + rounding) {
+  if (std::fabs(60 - sec) <= half_unit + kBoundRounding) {
     sec = 0;
     min += 1;
     if (60 - min < 1e-12) {
@@ -215,10 +215,15 @@ void TWascii_to_rad_wide(TWchar16* text, AngleUnit unit, int16_t axis, double* v
   without_exceptions(status, [&] {
     const LocaleSigns signs = adopt_user_locale_signs();
     *status = TW_SUCCESS;
-    const std::u16string allowed =
-        u"0123456789NEWSnews-+ :\n" + signs.decimal_separator + signs.positive + signs.negative;
     const std::u16string_view given = text;
-    if (given.find_first_not_of(allowed) != given.npos) {
+    const auto allowed = [&](char16_t c) {
+      constexpr std::u16string_view kAllowed = u"0123456789NEWSnews-+ :\n";
+      return kAllowed.find(c) != kAllowed.npos ||
+             signs.decimal_separator.find(c) != std::u16string::npos ||
+             signs.positive.find(c) != std::u16string::npos ||
+             signs.negative.find(c) != std::u16string::npos;
+    };
+    if (!std::all_of(given.begin(), given.end(), allowed)) {
       *status = TW_BAD_TEXT;
       return;
     }

@@ -1,7 +1,6 @@
 // The user's locale: the text functions adopt it for the whole process on every call.
 #pragma once
 
-#include <clocale>
 #include <string>
 
 namespace tidewater::detail {
@@ -13,8 +12,9 @@ struct LocaleSigns {
   std::u16string negative = u"-";
 };
 
-// False where there is no such locale; the one in force then stays.
-inline bool adopt_user_locale() { return std::setlocale(LC_ALL, "") != nullptr; }
+// Leaves the process as setlocale(LC_ALL, "") leaves it.  False where there is no such locale; the
+// one in force then stays.
+bool adopt_user_locale();
 
 // Adopts the user's locale and asks the platform for its signs.
 LocaleSigns adopt_user_locale_signs();

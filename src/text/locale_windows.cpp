@@ -1,5 +1,7 @@
 #include <windows.h>
 
+#include <clocale>
+
 #include "text/locale.hpp"
 #include "text/wide.hpp"
 
@@ -14,6 +16,8 @@ std::u16string item_or(LCID user, LCTYPE item, const std::u16string& otherwise) 
 }
 
 }  // namespace
+
+bool adopt_user_locale() { return std::setlocale(LC_ALL, "") != nullptr; }
 
 LocaleSigns adopt_user_locale_signs() {
   adopt_user_locale();

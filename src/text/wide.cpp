@@ -7,10 +7,26 @@
 
 namespace tidewater::detail {
 
+namespace {
+
+// Characters whose byte is their code in every locale's encoding; the C library need not be asked.
+// Backslash and tilde have given way to national characters in some.
+constexpr bool is_invariant(char32_t c) {
+  return (c >= U' ' && c < U'~' && c != U'\\') || c == U'\n';
+}
+
+}  // namespace
+
 std::u16string widen(std::string_view narrow, std::size_t limit) {
   std::u16string wide;
+  wide.reserve(std::min(narrow.size(), limit) + 1);
   std::mbstate_t state = {};
   while (!narrow.empty() && wide.size() < limit) {
+    if (is_invariant(static_cast<unsigned char>(narrow.front()))) {
+      wide += static_cast<char16_t>(narrow.front());
+      narrow.remove_prefix(1);
+      continue;
+    }
     wchar_t character = 0;
     std::size_t bytes = std::mbrtowc(&character, narrow.data(), narrow.size(), &state);
     auto code = static_cast<char32_t>(character);
@@ -37,6 +53,10 @@ std::string narrow(std::u16string_view wide) {
   std::mbstate_t state = {};
   char bytes[MB_LEN_MAX];
   for (const char16_t unit : wide) {
+    if (is_invariant(unit)) {
+      narrow += static_cast<char>(unit);
+      continue;
+    }
     const std::size_t count = std::wcrtomb(bytes, unit, &state);
     if (count <= sizeof bytes) {
       narrow.append(bytes, count);

@@ -33,10 +33,13 @@ void copy_whole(std::u16string_view text, char16_t* out);
 // The C library's formatted output, however long; empty where it cannot be formatted.
 template <class... Arguments>
 std::string formatted(const char* format, Arguments... arguments) {
-  const int length = std::snprintf(nullptr, 0, format, arguments...);
+  char usual[64];
+  const int length = std::snprintf(usual, sizeof usual, format, arguments...);
   if (length <= 0) return {};
-  std::string text(static_cast<std::size_t>(length), '\0');
-  std::snprintf(text.data(), text.size() + 1, format, arguments...);
+  const auto size = static_cast<std::size_t>(length);
+  if (size < sizeof usual) return {usual, size};
+  std::string text(size, '\0');
+  std::snprintf(text.data(), size + 1, format, arguments...);
   return text;
 }
 

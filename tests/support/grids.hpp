@@ -1,15 +1,21 @@
 // Small grid files made up for the tests, byte by byte.
 #pragma once
 
+#include <gtest/gtest.h>
+
 #include <algorithm>
 #include <bit>
 #include <cstdint>
+#include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <functional>
+#include <random>
 #include <sstream>
 #include <string>
 #include <vector>
+
+#include "tidewater/frame.h"
 
 namespace tidewater::test {
 
@@ -153,5 +159,60 @@ struct GsbFile {
     return all;
   }
 };
+
+// Points at random in a box of degrees, the same each time.
+inline std::vector<CoordinateTriple> scattered(std::size_t count, double west, double east,
+                                               double south, double north) {
+  constexpr double kDegree = 3.14159265358979323846 / 180;
+  std::mt19937 random(9);
+  std::uniform_real_distribution<double> lon(west * kDegree, east * kDegree);
+  std::uniform_real_distribution<double> lat(south * kDegree, north * kDegree);
+  std::vector<CoordinateTriple> points(count);
+  for (CoordinateTriple& p : points) p = {lon(random), lat(random), 7};
+  return points;
+}
+
+// An array call of a grid function gives each point, to the last bit, what a call of its own gives
+// it, and leaves the same window: that of the last load serves on, also when damage() has taken the
+// files away.  reset() brings files and window back; run(n, in, out) is the call.
+template <class Reset, class Run, class Damage>
+void expect_one_call_as_many(const std::vector<CoordinateTriple>& in, Reset reset, Run run,
+                             Damage damage) {
+  constexpr CoordinateTriple kNothing = {-7e9, -7e9, -7e9};
+  const auto same = [](const CoordinateTriple& a, const CoordinateTriple& b) {
+    return std::memcmp(&a, &b, sizeof a) == 0;
+  };
+  // Near the last point: inside its window for the greater part.
+  std::vector<CoordinateTriple> probes;
+  for (double d = -0.02; d <= 0.02; d += 0.004) {
+    probes.push_back({in.back().x + d, in.back().y + d / 2, 1});
+    probes.push_back({in.back().x + d, in.back().y - d, 1});
+  }
+  const auto after = [&](std::vector<CoordinateTriple>* out) {
+    damage();
+    std::vector<TWstatus> words;
+    out->assign(probes.size(), kNothing);
+    for (std::size_t i = 0; i < probes.size(); ++i) words.push_back(run(1, &probes[i], &(*out)[i]));
+    return words;
+  };
+  reset();
+  std::vector<CoordinateTriple> each(in.size(), kNothing);
+  TWstatus joined = TW_SUCCESS;
+  for (std::size_t i = 0; i < in.size(); ++i) {
+    const TWstatus word = run(1, &in[i], &each[i]);
+    if (word != TW_SUCCESS) joined = word;
+  }
+  std::vector<CoordinateTriple> each_after;
+  const std::vector<TWstatus> each_words = after(&each_after);
+  reset();
+  std::vector<CoordinateTriple> all(in.size(), kNothing);
+  EXPECT_EQ(run(static_cast<std::int32_t>(in.size()), in.data(), all.data()), joined);
+  std::vector<CoordinateTriple> all_after;
+  EXPECT_EQ(after(&all_after), each_words);
+  for (std::size_t i = 0; i < in.size(); ++i) EXPECT_TRUE(same(all[i], each[i])) << i;
+  for (std::size_t i = 0; i < probes.size(); ++i) {
+    EXPECT_TRUE(same(all_after[i], each_after[i])) << i;
+  }
+}
 
 }  // namespace tidewater::test

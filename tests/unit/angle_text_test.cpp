@@ -399,13 +399,27 @@ TEST_F(AngleText, TheBoundOfTheCarryIsIncluded) {
   EXPECT_EQ(write_angle(59.5, narrow_unit(":", 0, 0, 1), 0), "0:01:00");
   EXPECT_EQ(write_angle(std::nextafter(59.5, 0) - 1e-12, narrow_unit(":", 0, 0, 1), 0), "0:00:59");
   EXPECT_EQ(write_angle(59.9375, narrow_unit(":", 1, 0, 1), 0), "0:00:59.9");
-  for (int minute = 0; minute < 180 * 60; minute += 7) {
-    const double seconds = minute * 60.0;
+  // Larger values hold 59.9995 less truly; what the double holds decides, on the seconds alone.
+  EXPECT_EQ(write_angle(1192319.9995, narrow_unit(":", 3, 0, 1), 0), "331:11:59.999");
+  EXPECT_EQ(write_angle(std::nextafter(1192319.9995, 2e6), narrow_unit(":", 3, 0, 1), 0),
+            "331:12:00.000");
+  int carried = 0, kept = 0;
+  for (int minute = 0; minute < 360 * 60; minute += 7) {
+    const double seconds = minute * 60.0 + 59.9995;
+    // The exact remainder; the allowance is 4 epsilon times 60.
+    const bool carries = 60 - std::fmod(seconds, 60) <= 0.0005 + 0x1p-50 * 60;
+    ++(carries ? carried : kept);
     char expected[32];
-    std::snprintf(expected, sizeof expected, "%d:%02d:00.000", (minute + 1) / 60,
-                  (minute + 1) % 60);
-    EXPECT_EQ(write_angle((seconds + 59.9995) * kArcSecond, colon_form(0, 3), 0), expected);
+    if (carries) {
+      std::snprintf(expected, sizeof expected, "%d:%02d:00.000", (minute + 1) / 60,
+                    (minute + 1) % 60);
+    } else {
+      std::snprintf(expected, sizeof expected, "%d:%02d:59.999", minute / 60, minute % 60);
+    }
+    EXPECT_EQ(write_angle(seconds, narrow_unit(":", 3, 0, 1), 0), expected);
   }
+  EXPECT_GT(carried, 500);
+  EXPECT_GT(kept, 500);
 }
 
 TEST_F(AngleText, WritesTheLetter) {

@@ -481,6 +481,52 @@ TEST_F(Geoid, NarrowGrids) {
   }
 }
 
+TEST_F(Geoid, OneCallAsOneForEachPoint) {
+  // Enough points for the files to be read whole on the way; three grids, off which windows move
+  // and to which they are clipped, and points outside.
+  const auto node = [](int r, int c) { return static_cast<float>(r * r % 13 + c * c % 7); };
+  const auto write = [&] {
+    write_grid(folder, "fine", {-84.3F, 24.2F, 32, 30, node, 0.25F, 0.25F});
+    write_grid(folder, "a", {-100, 20, 45, 37, node, 0.5F, 0.5F});
+    write_grid(folder, "b", {-79, 21, 14, 15, node});
+  };
+  write();
+  const Opened opened = open(folder, {"fine", "a", "b"});
+  ASSERT_EQ(opened.status, TW_SUCCESS);
+  for (const auto call : {TWgeo90_f, TWgeo90_i}) {
+    const auto run = [&](std::int32_t n, const CoordinateTriple* from, CoordinateTriple* to) {
+      TWstatus status = 0;
+      call(n, from, &opened.control, to, &status);
+      return status;
+    };
+    const auto aside = [&] {
+      const CoordinateTriple p = {degrees(-98.5), degrees(34.5), 0};
+      CoordinateTriple out;
+      run(1, &p, &out);
+    };
+    const auto reset = [&] {
+      write();
+      aside();
+    };
+    write();
+    // Not where windows give way so far that a point stops the call.
+    Points in;
+    for (const CoordinateTriple& p : scattered(900, -101, -64, 19, 38)) {
+      aside();
+      CoordinateTriple out;
+      if (TW_OK(run(1, &p, &out))) in.push_back(p);
+    }
+    ASSERT_GT(in.size(), 700U);
+    // A window held from an earlier point serves such a point, and may give it another figure: both
+    // ways see the same windows.
+    expect_one_call_as_many(in, reset, run, [&] {
+      for (const char* name : {"fine", "a", "b"}) {
+        fs::remove(folder.path() / (std::string(name) + ".geo"));
+      }
+    });
+  }
+}
+
 TEST_F(Geoid, GridsOfTooFewNodes) {
   write_grid(folder, "columns", {-100, 20, 11, 60, place});
   write_grid(folder, "rows", {-70, 20, 60, 11, place});

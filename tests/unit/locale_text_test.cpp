@@ -1,6 +1,9 @@
 #include <gtest/gtest.h>
 
+#include <cstdlib>
+#include <optional>
 #include <string>
+#include <thread>
 
 #include "support/text.hpp"
 
@@ -256,6 +259,72 @@ TEST_F(LocaleText, TheUsersLocaleIsAskedForOnEveryCall) {
     const ScopedLocale plain("C");
     EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), "12.5");
   }
+}
+
+// What the last adoption left may be gone in any of these ways.
+TEST_F(CommaLocaleText, AChangeInBetweenIsSeen) {
+  const auto expect_written = [](const char* text) {
+    EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), text);
+    // Nothing has changed: the second call passes the adoption over.
+    EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), text);
+  };
+  expect_written("12,5");
+  // One category of the process, the others stay.
+  std::setlocale(LC_NUMERIC, "C");
+  expect_written("12,5");
+  EXPECT_EQ(process_locale(), kCommaLocale);
+  std::setlocale(LC_TIME, "C");
+  expect_written("12,5");
+  EXPECT_EQ(process_locale(), kCommaLocale);
+
+  // The entries of the environment, in the order of their rank.
+  const char* const lang = std::getenv("LANG");
+  const std::optional<std::string> lang_before =
+      lang != nullptr ? std::optional<std::string>(lang) : std::nullopt;
+  unsetenv("LC_ALL");
+  setenv("LANG", "C", 1);
+  expect_written("12.5");
+  setenv("LC_NUMERIC", kCommaLocale, 1);
+  expect_written("12,5");
+  setenv("LC_NUMERIC", "C", 1);
+  expect_written("12.5");
+  setenv("LANG", kCommaLocale, 1);
+  expect_written("12.5");
+  unsetenv("LC_NUMERIC");
+  expect_written("12,5");
+  // Another category alone leaves a locale of several names.
+  setenv("LC_TIME", "C", 1);
+  expect_written("12,5");
+  EXPECT_NE(process_locale().find("LC_TIME=C"), std::string::npos);
+  setenv("LC_ALL", "C", 1);
+  expect_written("12.5");
+  EXPECT_EQ(process_locale(), "C");
+  unsetenv("LC_TIME");
+  if (lang_before) {
+    setenv("LANG", lang_before->c_str(), 1);
+  } else {
+    unsetenv("LANG");
+  }
+}
+
+TEST_F(CommaLocaleText, AnEnvironmentTooLongToBeRememberedIsAskedEachTime) {
+  setenv("LC_UNHEARD_OF", std::string(2000, 'x').c_str(), 1);
+  for (int i = 0; i < 2; ++i) {
+    EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), "12,5");
+    std::setlocale(LC_ALL, "C");
+  }
+  unsetenv("LC_UNHEARD_OF");
+  EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), "12,5");
+}
+
+TEST_F(CommaLocaleText, EachThreadSeesTheChange) {
+  EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), "12,5");
+  std::thread([] {
+    EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), "12,5");
+    std::setlocale(LC_ALL, "C");
+  }).join();
+  EXPECT_EQ(write_angle(degrees(12.5), decimal_degrees(0, 1), 0), "12,5");
+  EXPECT_EQ(process_locale(), kCommaLocale);
 }
 
 }  // namespace

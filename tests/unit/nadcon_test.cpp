@@ -909,6 +909,70 @@ TEST_F(Nadcon, LaterCallsUseWhatAShortReadLeft) {
   expect_near(out[1], in[1].x - degrees(0, 0, 1), in[1].y - degrees(0, 0, 2), 5, 1e-15);
 }
 
+TEST_F(Nadcon, OneCallAsOneForEachPoint) {
+  // Enough points for the files to be read whole on the way; three grids, off which windows move,
+  // and points outside.
+  const auto node = [](int r, int c) { return static_cast<float>(r * r % 13 + c * c % 7) / 8; };
+  const auto write = [&] {
+    write_pair(folder, "fine", {-84.3F, 24.2F, 12, 10, node, 0.5F, 0.5F});
+    write_pair(folder, "a", {-100, 20, 25, 17, node});
+    write_pair(folder, "b", {-79, 21, 9, 12, node});
+  };
+  write();
+  const Opened opened = open(folder, "fine\na\nb\n");
+  ASSERT_EQ(opened.status, TW_SUCCESS);
+  for (const auto call : {TWnadcon_f, TWnadcon_i}) {
+    const auto run = [&](std::int32_t n, const CoordinateTriple* from, CoordinateTriple* to) {
+      TWstatus status = 0;
+      call(n, from, &opened.control, to, &status);
+      return status;
+    };
+    const auto reset = [&] {
+      write();
+      const CoordinateTriple p = at(-98.5, 34.5);
+      CoordinateTriple out;
+      run(1, &p, &out);
+    };
+    expect_one_call_as_many(scattered(800, -101, -69, 19, 37), reset, run, [&] {
+      for (const char* name : {"fine.las", "a.las", "b.los"}) fs::remove(folder.path() / name);
+    });
+  }
+}
+
+TEST_F(Nadcon, ShortFilesInMemory) {
+  // The rows that a file lacks are told also where the rest has been read whole.
+  const auto node = [](int r, int c) { return static_cast<float>(r * r % 13 + c * c % 7) / 8; };
+  write_pair(folder, "g", {-100, 20, 30, 30, node});
+  const Opened opened = open(folder, "g\n");
+  fs::resize_file(folder.path() / "g.las", 31 * 4 * 21);  // rows 0 to 19
+  const auto run = [&](std::int32_t n, const CoordinateTriple* from, CoordinateTriple* to) {
+    TWstatus status = 0;
+    TWnadcon_f(n, from, &opened.control, to, &status);
+    return status;
+  };
+  Points in = scattered(300, -99, -72, 21, 48);
+  in.push_back(at(-80.5, 45.5));
+  Points all = untouched(in.size());
+  EXPECT_EQ(run(static_cast<std::int32_t>(in.size()), in.data(), all.data()), TW_GRID_FILE_ERROR);
+  int written = 0;
+  for (std::size_t i = 0; i < in.size(); ++i) {
+    // Far from any window that another point may have left.
+    const CoordinateTriple aside = at(in[i].x < degrees(-85) ? -75.5 : -95.5, 22.5);
+    CoordinateTriple out = kUntouchedPoint;
+    run(1, &aside, &out);
+    out = kUntouchedPoint;
+    const TWstatus word = run(1, &in[i], &out);
+    if (word != TW_SUCCESS) expect_untouched(all[i]);
+    // A window's place is rounded: another one gives the same to the last bits.
+    if (all[i].y != kUntouched) {
+      ++written;
+      EXPECT_NEAR(all[i].y, out.y, 1e-12);
+    }
+  }
+  EXPECT_GT(written, 100);
+  EXPECT_LT(written, 250);
+}
+
 TEST_F(Nadcon, GridsOfTooFewNodes) {
   for (const auto& [nc, nr] : {std::pair{3, 8}, {8, 3}, {1, 1}}) {
     write_pair(folder, "g", {-100, 20, 30, 8, flat});

@@ -7,6 +7,7 @@
 #include <random>
 
 #include "support/data.hpp"
+#include "support/failing_new.hpp"
 #include "support/grids.hpp"
 #include "support/little_memory.hpp"
 #include "support/points.hpp"
@@ -696,17 +697,115 @@ TEST_F(NationalBlock, LoadsTheSameBlockOnce) {
   EXPECT_NEAR(shift_at(west(107.5, 45.5)).lat, 50, 1e-9);
 }
 
-TEST_F(NationalGrid, SmallLastSubGridNeedsNoEndRecord) {
-  // Fewer rows and columns than the block: only its own nodes must be in the file.
+TEST_F(NationalGrid, SmallLastSubGridIsReadWithWhatFollows) {
+  // Fewer rows or columns than the block: four reads of four records each reach behind the nodes.
   for (const auto& [lat_cells, lon_cells] : {std::pair{1, 1}, {2, 2}, {2, 6}, {6, 2}, {3, 3}}) {
     SubGrid g = root();
     g.n_lat = g.s_lat + lat_cells * kDegree;
     g.w_long = g.e_long + lon_cells * kDegree;
-    ASSERT_EQ(open({g}, false), TW_SUCCESS);
+    const std::string bytes = GsbFile{{g}}.bytes();
+    const int rows = lat_cells + 1, cols = lon_cells + 1;
+    // Where the last of the four records of the fourth read ends, for the block of the first cell.
+    const auto needed = static_cast<std::size_t>(352 + (3 * cols + 4) * 16);
+    for (const int spare : {-16, -8, 0, 8}) {
+      SCOPED_TRACE(testing::Message() << rows << " by " << cols << " spare " << spare);
+      std::string cut = bytes.substr(0, 352 + static_cast<std::size_t>(rows * cols) * 16);
+      cut.resize(static_cast<std::size_t>(static_cast<int>(needed) + spare), '\0');
+      ASSERT_EQ(open(cut), TW_SUCCESS);
+      const Shift s = shift_at(west(100.25, 40.25));
+      EXPECT_EQ(s.status, spare < 0 ? TW_GSB_READ_ERROR : TW_SUCCESS);
+      EXPECT_NE(s.lat, kUntouched);  // written all the same
+    }
+    // With enough behind it a small sub-grid serves all its cells.
+    ASSERT_EQ(open(bytes + std::string(256, 'x')), TW_SUCCESS);
     for (double r = 0; r <= lat_cells; r += 0.25) {
       for (double c = 0; c <= lon_cells; c += 0.25) expect_plane(100 + c, 40 + r);
     }
   }
+}
+
+TEST_F(NationalGrid, OneCallAsOneForEachPoint) {
+  // Enough points for the file to be read whole on the way; two roots, and points outside.
+  const std::string bytes = GsbFile{
+      {root(), child("IN", "ROOT", 43, 47, 104, 108, 2),
+       child("B", "NONE", 53, 55, 104, 106,
+             3)}}.bytes();
+  const auto open_grid = [&] { ASSERT_EQ(open(bytes), TW_SUCCESS); };
+  const Points in = scattered(600, -116, -99, 39, 56);
+  for (const auto run : {TWcnt_f, TWcnt_i}) {
+    expect_one_call_as_many(
+        in, open_grid,
+        [&](std::int32_t n, const CoordinateTriple* from, CoordinateTriple* to) {
+          TWstatus status = 0;
+          run(n, from, 0, to, &status);
+          return status;
+        },
+        // The block outlives the call: other nodes in the file are not seen inside it.
+        [&] { overwrite(std::string(bytes.size(), '\0')); });
+  }
+}
+
+TEST_F(NationalGrid, WithoutMemoryForTheFileItIsReadOn) {
+  ASSERT_EQ(open({root()}), TW_SUCCESS);
+  const Points in = scattered(300, -114, -101, 41, 49);
+  Points with = untouched(in.size()), without = untouched(in.size());
+  TWstatus status = 0;
+  const auto n = static_cast<std::int32_t>(in.size());
+  TWcnt_f(n, in.data(), 0, with.data(), &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  {
+    const FailingNew failing;
+    TWcnt_f(n, in.data(), 0, without.data(), &status);
+    EXPECT_GT(failing.asked(), 0);  // the file was wanted whole
+  }
+  EXPECT_EQ(status, TW_SUCCESS);
+  for (std::size_t i = 0; i < in.size(); ++i) {
+    EXPECT_EQ(with[i].x, without[i].x);
+    EXPECT_EQ(with[i].y, without[i].y);
+  }
+}
+
+TEST_F(NationalGrid, ShortFileInMemory) {
+  // A block behind the end is told also where the rest of the file has been read whole.
+  const GsbFile file{{root(), child("B", "NONE", 53, 55, 104, 106, 3)}};
+  const std::string bytes = file.bytes();
+  ASSERT_EQ(open(bytes.substr(0, bytes.size() - 16 - 5 * 16)), TW_SUCCESS);
+  Points in = scattered(200, -114, -101, 41, 49);
+  in.push_back(west(105.25, 53.25));  // in the part that is there
+  in.push_back(west(105.75, 54.75));  // not there
+  in.push_back(west(105, 45));
+  Points out = untouched(in.size());
+  TWstatus status = 0;
+  TWcnt_f(static_cast<std::int32_t>(in.size()), in.data(), 0, out.data(), &status);
+  EXPECT_EQ(status, TW_GSB_READ_ERROR);
+  EXPECT_NEAR((out[200].y - in[200].y) / kSecond, 3, 1e-6);
+  expect_untouched(out[201]);
+  expect_untouched(out[202]);
+  // By contract: the block counts as loaded, and holds what it held where nothing could be read.
+  EXPECT_NEAR(shift_at(west(105.75, 54.75)).lat, 3, 1e-9);
+}
+
+TEST_F(NationalGrid, ManySubGridsUnderOneName) {
+  // The way down looks at each a few times, not at all of them at each of as many levels.
+  const SubGrid one = child("NONE", "NONE", 43, 44, 104, 105, 2);
+  std::vector<SubGrid> grids(20000, one);
+  ASSERT_EQ(open(grids), TW_SUCCESS);
+  const Points in(20, west(104.25, 43.25));
+  Points out = untouched(20);
+  TWstatus status = 0;
+  TWcnt_i(20, in.data(), 0, out.data(), &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  for (const CoordinateTriple& p : out) EXPECT_NEAR((in[0].y - p.y) / kSecond, 2, 1e-6);
+  // And a line of parents and children ends at the last.
+  grids.clear();
+  for (int i = 0; i < 5000; ++i) {
+    grids.push_back(child("", "", 43, 44, 104, 105, static_cast<float>(i)));
+    grids.back().name = std::to_string(i);
+    grids.back().parent = i == 0 ? "NONE" : std::to_string(i - 1);
+  }
+  std::ranges::reverse(grids);
+  ASSERT_EQ(open(grids), TW_SUCCESS);
+  EXPECT_NEAR(shift_at(west(104.25, 43.25)).lat, 4999, 1e-9);
 }
 
 TEST_F(NationalGrid, NoMemoryForTheTable) {

@@ -1,0 +1,164 @@
+/**
+ * @file lines.hpp
+ * Geodesics and rhumb lines on an ellipsoid: where a line leads, which line joins two points,
+ * points along it, length and area of polygons.
+ *
+ * Angles are degrees: longitudes east, latitudes north, azimuths clockwise from north.  Lengths are
+ * in the unit of the semi-major axis, metres by custom.  Objects are values; any number of threads
+ * may use one.
+ */
+#ifndef TIDEWATER_LINES_HPP
+#define TIDEWATER_LINES_HPP
+
+#include <cstddef>
+#include <memory>
+
+#include "tidewater/coordinates.hpp"
+#include "tidewater/ellipsoid.hpp"
+#include "tidewater/error.hpp"
+
+namespace tidewater {
+
+/** Where a line ends. */
+struct LineEnd {
+  double lon;     /**< degrees, within half a turn */
+  double lat;     /**< degrees */
+  double azimuth; /**< of the line at its end, degrees from -180 to 180 */
+  double area;    /**< between the line and the equator, square units of a; positive where the line
+                       runs east in the north */
+};
+
+/** A line between two points. */
+struct LineCourse {
+  double length;
+  double azimuth1; /**< at the first point, degrees from -180 to 180 */
+  double azimuth2; /**< at the second, going on */
+  double area;     /**< as in LineEnd */
+};
+
+/** What a polygon measures. */
+struct PolygonMeasure {
+  double perimeter;
+  double area; /**< positive for a ring that runs counterclockwise, negative for the other sense; of
+                    the two parts of the earth the one of less than half */
+};
+
+/** Arrays of lines to lead on: each of `count` numbers. */
+struct LineStarts {
+  const double* lon;
+  const double* lat;
+  const double* azimuth;
+  const double* length;
+};
+
+/** Where the ends go; null what is not wanted.  May be the arrays of the starts. */
+struct LineEnds {
+  double* lon = nullptr;
+  double* lat = nullptr;
+  double* azimuth = nullptr;
+  double* area = nullptr;
+};
+
+/** Arrays of pairs of points. */
+struct LinePairs {
+  const double* lon1;
+  const double* lat1;
+  const double* lon2;
+  const double* lat2;
+};
+
+/** Where the courses go; null what is not wanted. */
+struct LineCourses {
+  double* length = nullptr;
+  double* azimuth1 = nullptr;
+  double* azimuth2 = nullptr;
+  double* area = nullptr;
+};
+
+/**
+ * Geodesics: the shortest lines.
+ *
+ * After C. F. F. Karney, Algorithms for geodesics, Journal of Geodesy 87 (2013), 43-55.  On the
+ * earth's ellipsoids, measured against lines worked out at 40 digits: lengths and ends within 8 nm
+ * for lines between any two points, nearly antipodal ones, poles, meridians and the equator
+ * included (to a flattening of 0.01: 15 nm); areas below a line within 0.2 square metres, or as far
+ * as the azimuths carry where the ends are nearly antipodal.
+ *
+ * Latitudes beyond 90 degrees and numbers that are not finite give not-a-numbers, counted as
+ * failed.
+ */
+class TW_SYSTEMS_API Geodesic {
+ public:
+  /**
+   * @param a  semi-major axis, above zero
+   * @param f  flattening, from -0.01 to 0.01; 0 for a sphere
+   * @throws Error for other figures
+   */
+  Geodesic(double a, double f);
+  /** @throws Error for an ellipsoid beyond that flattening */
+  explicit Geodesic(const Ellipsoid& ellipsoid);
+
+  double a() const;
+  double f() const;
+
+  /** Where a line leads: from a point by an azimuth for a length, which may be negative. */
+  LineEnd direct(double lon, double lat, double azimuth, double length) const;
+  /** The shortest line between two points. */
+  LineCourse inverse(double lon1, double lat1, double lon2, double lat2) const;
+
+  /** Many lines, several at a time. */
+  Summary direct(std::size_t count, const LineStarts& starts, const LineEnds& ends) const noexcept;
+  Summary inverse(std::size_t count, const LinePairs& pairs,
+                  const LineCourses& courses) const noexcept;
+  /** Points of one line at given lengths from its start. */
+  Summary along(double lon, double lat, double azimuth, std::size_t count, const double* lengths,
+                const LineEnds& points) const noexcept;
+
+  /**
+   * A polygon whose sides are geodesics; the last vertex is joined to the first.
+   * Rings may lie around a pole or across any meridian.
+   */
+  PolygonMeasure polygon(std::size_t count, const double* lon, const double* lat) const;
+
+ private:
+  struct Impl;
+  std::shared_ptr<const Impl> impl_;
+};
+
+/**
+ * Rhumb lines: lines of constant azimuth.
+ *
+ * After C. F. F. Karney, The area of rhumb polygons, Studia Geophysica et Geodaetica 68 (2024),
+ * 99-120.  On the earth's ellipsoids lengths and ends are within 10 nm, parallels and lines close
+ * to them included; ends of lines that wind around a pole within 2e-15 of their length.
+ *
+ * Between two points the shorter way around is taken, eastwards where both are of one length.  A
+ * point at a pole is reached along its meridian.  A line that would go on over a pole has no end:
+ * not-a-numbers, counted as failed.
+ */
+class TW_SYSTEMS_API Rhumb {
+ public:
+  /** As Geodesic's, likewise. */
+  Rhumb(double a, double f);
+  explicit Rhumb(const Ellipsoid& ellipsoid);
+
+  double a() const;
+  double f() const;
+
+  LineEnd direct(double lon, double lat, double azimuth, double length) const;
+  LineCourse inverse(double lon1, double lat1, double lon2, double lat2) const;
+  Summary direct(std::size_t count, const LineStarts& starts, const LineEnds& ends) const noexcept;
+  Summary inverse(std::size_t count, const LinePairs& pairs,
+                  const LineCourses& courses) const noexcept;
+  Summary along(double lon, double lat, double azimuth, std::size_t count, const double* lengths,
+                const LineEnds& points) const noexcept;
+  PolygonMeasure polygon(std::size_t count, const double* lon, const double* lat) const;
+
+ private:
+  struct Impl;
+  std::shared_ptr<const Impl> impl_;
+};
+
+}  // namespace tidewater
+
+#endif

@@ -1,0 +1,74 @@
+/**
+ * @file magnetic_model.hpp
+ * The Earth's magnetic field by the models of the store.
+ */
+#ifndef TIDEWATER_MAGNETIC_MODEL_HPP
+#define TIDEWATER_MAGNETIC_MODEL_HPP
+
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "tidewater/coordinates.hpp"
+
+namespace tidewater {
+
+namespace detail {
+class MagneticModelImpl;
+}
+
+/** The field at a point, or its change in a year. */
+struct MagneticField {
+  double north, east, down; /**< components, nanotesla */
+  double horizontal;        /**< horizontal intensity, nanotesla */
+  double total;             /**< total intensity, nanotesla */
+  double declination;       /**< degrees, east of true north positive */
+  double inclination;       /**< degrees, downwards positive */
+};
+
+/** The field at a point, and how it changes. */
+struct MagneticValue {
+  MagneticField field;  /**< at the model's date */
+  MagneticField yearly; /**< change in a year */
+};
+
+/**
+ * A spherical harmonic model of the geomagnetic field at a date.
+ *
+ * A shared handle: copies are cheap, and any number of threads may use one at once.
+ */
+class TW_SYSTEMS_API MagneticModel {
+ public:
+  /**
+   * @param name  the model's name in the store, "WMM2025"; empty for that of the newest
+   * coefficients
+   * @param year  decimal year
+   * @throws Error if the store has no such model, or the model no field at that date
+   */
+  MagneticModel(std::string_view name, double year);
+
+  const std::string& name() const;
+  double year() const;
+  double first_year() const; /**< the first year for which the model is published */
+  double last_year() const;  /**< the last one; the model may reach a few years further */
+
+  /**
+   * @param count  number of points
+   * @param in     longitude, latitude in degrees on WGS 84, height in metres above the ellipsoid
+   * @param out    count results; not-a-numbers for a point that fails
+   */
+  Summary field(std::size_t count, Coordinates<const double> in, MagneticValue* out,
+                Run run = {}) const noexcept;
+  MagneticValue field(Point point) const noexcept;
+
+  /** Names of the models of the store. */
+  static std::vector<std::string> models();
+
+ private:
+  std::shared_ptr<const detail::MagneticModelImpl> impl_;
+};
+
+}  // namespace tidewater
+
+#endif

@@ -1,0 +1,97 @@
+/**
+ * @file projection.hpp
+ * Map projections by method and named parameters.
+ */
+#ifndef TIDEWATER_PROJECTION_HPP
+#define TIDEWATER_PROJECTION_HPP
+
+#include <memory>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "tidewater/coordinates.hpp"
+#include "tidewater/ellipsoid.hpp"
+
+namespace tidewater {
+
+namespace detail {
+class ProjectionImpl;
+}
+
+/** How a projection distorts at a point. */
+struct Factors {
+  double meridional;  /**< scale along the meridian, h */
+  double parallel;    /**< scale along the parallel, k */
+  double areal;       /**< scale of areas */
+  double convergence; /**< bearing of grid north from true north, degrees, clockwise positive */
+  double angular;     /**< largest angular distortion, degrees */
+};
+
+/**
+ * A map projection of an ellipsoid: longitude and latitude in degrees to easting and northing in
+ * metres, both counted as the method's definition says (westing and southing where it has those).
+ *
+ * A shared handle: copies are cheap, and any number of threads may use one at once.
+ */
+class TW_SYSTEMS_API Projection {
+ public:
+  /**
+   * @param method      the method in the field's words or the registry's: "transverse mercator",
+   *                    "lambert conformal", "Lambert Conic Conformal (2SP)", "EPSG:9802"
+   * @param parameters  by the field's words ("latitude of origin"), the registry's names or the
+   *                    short forms (lat0, lon0, lat1, lat2, k0, x0, y0, azimuth ...); angles in
+   *                    degrees, lengths in metres.  One that is not given has its usual value.
+   * @param ellipsoid   what is projected
+   * @throws Error for an unknown method, a parameter that it does not take or a value that it
+   * cannot serve
+   */
+  Projection(std::string_view method, const std::vector<std::pair<std::string, double>>& parameters,
+             const Ellipsoid& ellipsoid);
+
+  /** The method's name in the registry's words. */
+  std::string method() const;
+  /** Registry code of the method; below zero for a method that the registry lacks. */
+  int method_code() const;
+  /** The parameters by the registry's names; degrees, metres. */
+  std::vector<std::pair<std::string, double>> parameters() const;
+  Ellipsoid ellipsoid() const;
+
+  /**
+   * Longitude, latitude in degrees to easting, northing in metres.
+   *
+   * A point that has no image becomes not-a-number and leaves its word; points do not disturb each
+   * other.  Never throws.  In place is safe where in and out are the same view.
+   */
+  Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
+                  Run run = {}) const noexcept;
+  /** Easting, northing in metres to longitude, latitude in degrees; otherwise as forward(). */
+  Summary inverse(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
+                  Run run = {}) const noexcept;
+  Point forward(Point point) const noexcept;
+  Point inverse(Point point) const noexcept;
+
+  /**
+   * Distortion at points given as longitude, latitude in degrees, by central differences of the
+   * forward formula to the sixth order: 1e-9 of a scale away from the map's edges.
+   * @param out  count results; not-a-numbers where a point or its neighbourhood has no image
+   */
+  Summary factors(std::size_t count, Coordinates<const double> in, Factors* out,
+                  Run run = {}) const noexcept;
+  Factors factors(Point point) const noexcept;
+
+  /** The names of all methods, in the registry's words where it has them. */
+  static std::vector<std::string> methods();
+
+  /** @private */
+  explicit Projection(std::shared_ptr<const detail::ProjectionImpl> impl)
+      : impl_(std::move(impl)) {}
+
+ private:
+  std::shared_ptr<const detail::ProjectionImpl> impl_;
+};
+
+}  // namespace tidewater
+
+#endif

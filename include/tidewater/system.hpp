@@ -1,0 +1,105 @@
+/**
+ * @file system.hpp
+ * Coordinate systems by name, code, definition, PROJ string or WKT.
+ */
+#ifndef TIDEWATER_SYSTEM_HPP
+#define TIDEWATER_SYSTEM_HPP
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "tidewater/ellipsoid.hpp"
+#include "tidewater/projection.hpp"
+#include "tidewater/system_kind.hpp"
+
+namespace tidewater {
+
+namespace detail {
+struct Definition;
+class SystemImpl;
+}  // namespace detail
+
+/** An area on the Earth in degrees; west is greater than east across the 180th meridian. */
+struct Area {
+  std::string name; /**< empty when unknown */
+  double west = -180, south = -90, east = 180, north = 90;
+};
+
+/** What a search found. */
+struct FoundSystem {
+  int code;         /**< registry code */
+  std::string name; /**< the registry's name */
+  SystemKind kind;
+};
+
+/**
+ * A coordinate system.
+ *
+ * A shared handle: copies are cheap, and any number of threads may use one at once.
+ */
+class TW_SYSTEMS_API System {
+ public:
+  /**
+   * From what users have:
+   * - a registry code: "EPSG:2154", "2154"; a compound "EPSG:7405", or two codes "EPSG:2154+5720";
+   * - a short name: "wgs84", "web mercator", "utm:30N", "ups:N", "spcs83:2900", "spcs27:0401",
+   *   "geocentric:wgs84"; "utm:30N ED50" on another system's datum;
+   * - a registry name that only one system bears: "RGF93 v1 / Lambert-93";
+   * - a definition: "lambert conformal lat1=44 lat2=49 lat0=46.5 lon0=3 x0=700000 y0=6600000
+   *   ellps=GRS80" (degrees and metres; ellps, datum or a and rf; pm, units, axes);
+   * - a PROJ string, or WKT in any of its dialects.
+   * @throws Error that names what was asked and what there is
+   */
+  explicit System(std::string_view text);
+
+  /**
+   * The same, where the zone of "utm" or "ups" is found from a point.
+   * @param longitude,latitude  degrees
+   */
+  System(std::string_view text, double longitude, double latitude);
+
+  std::string name() const;
+  int code() const; /**< registry code, 0 without one */
+  SystemKind kind() const;
+  Ellipsoid ellipsoid() const;
+  std::string datum() const; /**< name of the datum */
+  PrimeMeridian meridian() const;
+  std::string unit() const;   /**< name of the unit of the horizontal axes */
+  double unit_factor() const; /**< metres or radians in one unit of the horizontal axes */
+  /** The axes in the definition's own order: letters E N W S U, or "XYZ". */
+  std::string axes() const;
+  std::string method() const; /**< projection method; empty if there is none */
+  /** Parameters by the registry's names; degrees, metres. */
+  std::vector<std::pair<std::string, double>> parameters() const;
+  Area area() const; /**< area of use */
+  /** Projection of a projected system, without its unit. */
+  std::optional<Projection> projection() const;
+
+  std::string to_proj() const;
+  std::string to_wkt() const;                         /**< WKT 2 */
+  std::string to_wkt(std::string_view dialect) const; /**< "wkt1", "esri" or "wkt2" */
+  /** All of the above in words, a line each. */
+  std::string describe() const;
+
+  /**
+   * Systems whose names have these words, without regard to case and accents.
+   * @param limit  how many at most
+   */
+  static std::vector<FoundSystem> search(std::string_view words, std::size_t limit = 20);
+
+  /** @private */
+  const detail::SystemImpl& impl() const { return *impl_; }
+  /** @private */
+  explicit System(std::shared_ptr<const detail::SystemImpl> impl) : impl_(std::move(impl)) {}
+
+ private:
+  std::shared_ptr<const detail::SystemImpl> impl_;
+};
+
+}  // namespace tidewater
+
+#endif

@@ -1,0 +1,363 @@
+#include "operation.hpp"
+
+#include <algorithm>
+#include <cmath>
+#include <optional>
+#include <tuple>
+
+#include "makers.hpp"
+#include "system_impl.hpp"
+
+namespace tidewater::detail {
+
+namespace {
+
+constexpr int kWgs84 = 4326;
+constexpr int kGreenwich = 8901;
+constexpr int kLongitudeRotation = 9601;
+
+// --- areas --------------------------------------------------------------------------------------
+
+double overlap(double a1, double a2, double b1, double b2) {
+  return std::max(0.0, std::min(a2, b2) - std::max(a1, b1));
+}
+
+// Width of a span of longitudes that may cross the 180th meridian.
+double width(const Area& area) {
+  return area.east >= area.west ? area.east - area.west : area.east - area.west + 360;
+}
+
+double shared_longitudes(const Area& a, const Area& b) {
+  const double a2 = a.west + width(a);
+  const double b2 = b.west + width(b);
+  double sum = 0;
+  for (const double turn : {-360.0, 0.0, 360.0})
+    sum += overlap(a.west, a2, b.west + turn, b2 + turn);
+  return sum;
+}
+
+// How much of an area another covers, from 0 to 1.
+double coverage(const Area& wanted, const Area& by) {
+  const double w = std::max(width(wanted), 1e-9);
+  const double h = std::max(wanted.north - wanted.south, 1e-9);
+  double lon = shared_longitudes(wanted, by);
+  double lat = overlap(wanted.south, wanted.north, by.south, by.north);
+  // An area may be a point.
+  if (w <= 1e-9) {
+    Area wide = wanted;
+    wide.east += 1e-6;
+    lon = shared_longitudes(wide, by) > 0 ? w : 0;
+  }
+  if (h <= 1e-9) lat = wanted.south >= by.south && wanted.north <= by.north ? h : 0;
+  return std::min(1.0, lon / w) * std::min(1.0, lat / h);
+}
+
+// What two areas have in common; the first where that is nothing.
+Area common(const Area& a, const Area& b) {
+  if (width(b) >= 360 && b.south <= -90 && b.north >= 90) return a;
+  if (width(a) >= 360 && a.south <= -90 && a.north >= 90) return b;
+  Area result = a;
+  result.south = std::max(a.south, b.south);
+  result.north = std::min(a.north, b.north);
+  double best = 0;
+  for (const double turn : {-360.0, 0.0, 360.0}) {
+    const double west = std::max(a.west, b.west + turn);
+    const double east = std::min(a.west + width(a), b.west + width(b) + turn);
+    if (east - west <= best) continue;
+    best = east - west;
+    result.west = west;
+    result.east = east > 180 && west < 180 ? east - 360 : east;
+  }
+  if (best <= 0 || result.south >= result.north) return a;
+  result.name = a.name == b.name ? a.name : a.name + " and " + b.name;
+  return result;
+}
+
+Area area_of(const Definition& definition) {
+  return {definition.area, definition.west, definition.south, definition.east, definition.north};
+}
+
+Area area_of(const OperationRecord& operation) {
+  if (const auto area = Registry::shared().area(operation.area)) {
+    return {area->name, area->west, area->south, area->east, area->north};
+  }
+  return {};
+}
+
+// --- ways ---------------------------------------------------------------------------------------
+
+int datum_of(int system) {
+  const auto record = Registry::shared().system(system);
+  return record ? record->datum : 0;
+}
+
+// A system of the registry on the definition's datum, 0 where there is none.
+int registered_system(const Definition& definition) {
+  if (definition.kind == SystemKind::compound && definition.horizontal_code != 0) {
+    return definition.horizontal_code;
+  }
+  if (definition.code != 0) return definition.code;
+  if (definition.datum.code == 0) return 0;
+  if (definition.base_code != 0 && datum_of(definition.base_code) == definition.datum.code) {
+    return definition.base_code;
+  }
+  const Registry& registry = Registry::shared();
+  for (const int code : registry.systems()) {
+    const auto record = registry.system(code);
+    if (record->datum == definition.datum.code && record->kind == SystemKind::geographic2d) {
+      return code;
+    }
+  }
+  return 0;
+}
+
+// The steps of an operation in order, each in its direction; empty where they do not join.
+std::vector<Link> expanded(const Link& link) {
+  if (link.operation.steps.empty()) return {link};
+  const Registry& registry = Registry::shared();
+  std::vector<Link> links;
+  int at = datum_of(link.operation.source);
+  for (const int code : link.operation.steps) {
+    auto step = registry.operation(code);
+    if (!step) return {};
+    const int from = datum_of(step->source);
+    const int to = datum_of(step->target);
+    const bool reversed = from != at;
+    if (reversed && to != at) return {};
+    at = reversed ? from : to;
+    for (Link& inner : expanded({*std::move(step), reversed})) links.push_back(std::move(inner));
+  }
+  if (link.reversed) {
+    std::reverse(links.begin(), links.end());
+    for (Link& inner : links) inner.reversed = !inner.reversed;
+  }
+  return links;
+}
+
+std::string hindrance(const OperationRecord& operation, const TransformationOptions& options) {
+  if (is_similarity_or_offset(operation.method)) {
+    if (depends_on_time(operation.method) && !std::isfinite(options.epoch)) {
+      return "the epoch of the coordinates";
+    }
+    return "";
+  }
+  if (is_shift_grid(operation.method)) {
+    if (!shift_grid_file(operation, options.grid_folders).empty()) return "";
+    std::string names;
+    for (const GridName& grid : operation.grids) {
+      names += (names.empty() ? "the grid " : ", ") + grid.name;
+      if (!grid.proj_name.empty() && grid.proj_name != grid.name) {
+        names += " (or " + grid.proj_name + ")";
+      }
+    }
+    return names;
+  }
+  return "the method " + Registry::shared().method_name(operation.method);
+}
+
+std::optional<Way> way_of(const OperationRecord& operation, bool reversed,
+                          const TransformationOptions& options) {
+  Way way;
+  way.links = expanded({operation, reversed});
+  if (way.links.empty()) return std::nullopt;
+  way.name = operation.name;
+  if (reversed) way.name = "inverse of " + way.name;
+  way.accuracy = operation.accuracy;
+  way.area = area_of(operation);
+  for (const Link& link : way.links) {
+    const std::string hinders = hindrance(link.operation, options);
+    if (!hinders.empty()) way.missing += (way.missing.empty() ? "" : ", ") + hinders;
+  }
+  return way;
+}
+
+// The ways between the datums of two registered systems by one operation of the registry, which may
+// be a concatenated one.
+std::vector<Way> direct_ways(int source, int target, const TransformationOptions& options) {
+  const Registry& registry = Registry::shared();
+  const int source_datum = datum_of(source);
+  std::vector<Way> list;
+  for (const OperationRecord& operation : registry.operations(source, target)) {
+    if (operation.replaced_by != 0) continue;
+    if (auto way = way_of(operation, datum_of(operation.source) != source_datum, options)) {
+      list.push_back(*std::move(way));
+    }
+  }
+  // A datum ensemble and its members are one within the ensemble's accuracy.
+  const auto member = [&](int whole, int part) -> std::optional<double> {
+    const auto record = registry.datum(datum_of(whole));
+    if (!record) return std::nullopt;
+    const int datum = datum_of(part);
+    const auto& members = record->members;
+    if (std::find(members.begin(), members.end(), datum) == members.end()) return std::nullopt;
+    return record->ensemble_accuracy;
+  };
+  auto accuracy = member(source, target);
+  if (!accuracy) accuracy = member(target, source);
+  if (accuracy) {
+    Way way;
+    way.name = "a datum ensemble and its member taken as one";
+    way.accuracy = *accuracy;
+    list.push_back(std::move(way));
+  }
+  return list;
+}
+
+Way joined(const Way& first, const Way& second) {
+  Way way = first;
+  way.links.insert(way.links.end(), second.links.begin(), second.links.end());
+  way.name += " + " + second.name;
+  way.accuracy += second.accuracy;
+  way.area = common(first.area, second.area);
+  if (!second.missing.empty()) {
+    way.missing += (way.missing.empty() ? "" : ", ") + second.missing;
+  }
+  return way;
+}
+
+void rank(std::vector<Way>& list, const Area& wanted) {
+  const auto key = [&](const Way& way) {
+    const double covered = coverage(wanted, way.area);
+    // Boxes of systems and operations differ by hairs.
+    const double grade = covered > 0.98 ? 0 : 1 + std::round((1 - covered) * 10);
+    return std::tuple(way.missing.empty() ? 0 : 1, grade,
+                      std::isfinite(way.accuracy) ? way.accuracy : 1e6, way.links.size(),
+                      way.links.empty() ? 0 : -way.links[0].operation.code);
+  };
+  std::stable_sort(list.begin(), list.end(),
+                   [&](const Way& a, const Way& b) { return key(a) < key(b); });
+}
+
+bool usable(const std::vector<Way>& list, const Area& wanted) {
+  return std::any_of(list.begin(), list.end(), [&](const Way& way) {
+    return way.missing.empty() && coverage(wanted, way.area) > 0;
+  });
+}
+
+// The rotation that turns a system's datum to the same one on Greenwich, if there is one.
+std::optional<OperationRecord> rotation_from(int system) {
+  const int datum = datum_of(system);
+  const auto record = Registry::shared().datum(datum);
+  if (!record || record->meridian == kGreenwich || record->meridian == 0) return std::nullopt;
+  for (OperationRecord& operation : Registry::shared().operations(system)) {
+    if (operation.method == kLongitudeRotation && datum_of(operation.source) == datum) {
+      return std::move(operation);
+    }
+  }
+  return std::nullopt;
+}
+
+// By one operation, also from and to the same datum on Greenwich.
+std::vector<Way> turned_ways(int source, int target, const TransformationOptions& options) {
+  std::vector<Way> list = direct_ways(source, target, options);
+  const auto first = rotation_from(source);
+  const auto last = rotation_from(target);
+  const auto append = [&](int from, int to) {
+    for (Way& way : direct_ways(from, to, options)) {
+      if (first && from != source) way = joined(*way_of(*first, false, options), way);
+      if (last && to != target) way = joined(way, *way_of(*last, true, options));
+      list.push_back(std::move(way));
+    }
+  };
+  if (first && datum_of(first->target) == datum_of(target)) {
+    list.push_back(*way_of(*first, false, options));
+  } else if (first) {
+    append(first->target, target);
+  }
+  if (last && datum_of(last->target) == datum_of(source)) {
+    list.push_back(*way_of(*last, true, options));
+  } else if (last) {
+    append(source, last->target);
+  }
+  if (first && last) append(first->target, last->target);
+  return list;
+}
+
+// Ways over a system in between.
+void add_ways_over(int source, int hub, int target, const Area& wanted,
+                   const TransformationOptions& options, std::vector<Way>& list) {
+  auto first = turned_ways(source, hub, options);
+  if (first.empty()) return;
+  auto second = turned_ways(hub, target, options);
+  if (second.empty()) return;
+  rank(first, wanted);
+  rank(second, wanted);
+  // The best few of each side; the others are worse on that side.
+  constexpr std::size_t kFew = 6;
+  for (std::size_t i = 0; i < std::min(kFew, first.size()); ++i) {
+    for (std::size_t j = 0; j < std::min(kFew, second.size()); ++j) {
+      if (coverage(first[i].area, second[j].area) > 0) list.push_back(joined(first[i], second[j]));
+    }
+  }
+}
+
+std::vector<Way> ways_between(int source, int target, const Area& wanted,
+                              const TransformationOptions& options) {
+  std::vector<Way> list = turned_ways(source, target, options);
+  if (usable(list, wanted)) return list;
+  const int pivot = datum_of(kWgs84);
+  const bool to_pivot = datum_of(source) == pivot || datum_of(target) == pivot;
+  if (!to_pivot) add_ways_over(source, kWgs84, target, wanted, options, list);
+  if (usable(list, wanted)) return list;
+  // Any other datum in between.
+  const Registry& registry = Registry::shared();
+  std::vector<int> seen = {datum_of(source), datum_of(target), pivot};
+  const int near = datum_of(source) == pivot ? target : source;
+  for (const OperationRecord& operation : registry.operations(near)) {
+    const int hub =
+        datum_of(operation.source) == datum_of(near) ? operation.target : operation.source;
+    const int datum = datum_of(hub);
+    if (datum == 0 || std::find(seen.begin(), seen.end(), datum) != seen.end()) continue;
+    seen.push_back(datum);
+    add_ways_over(source, hub, target, wanted, options, list);
+  }
+  return list;
+}
+
+}  // namespace
+
+bool same_datum(const DatumDefinition& a, const DatumDefinition& b) {
+  if (a.code != 0 || b.code != 0) return a.code == b.code;
+  return a.name == b.name && a.ellipsoid.a == b.ellipsoid.a &&
+         a.ellipsoid.inverse_flattening == b.ellipsoid.inverse_flattening &&
+         a.to_wgs84 == b.to_wgs84;
+}
+
+std::vector<Way> ways(const Definition& source, const Definition& target,
+                      const TransformationOptions& options) {
+  const int from = registered_system(source);
+  const int to = registered_system(target);
+  if (from == 0 || to == 0) return {};
+  const Area wanted = options.area ? *options.area : common(area_of(source), area_of(target));
+  std::vector<Way> list = ways_between(from, to, wanted, options);
+  rank(list, wanted);
+  std::erase_if(list, [&](const Way& way) { return !(coverage(wanted, way.area) > 0); });
+  return list;
+}
+
+Way way_by_operation(const OperationRecord& operation, bool reversed,
+                     const TransformationOptions& options) {
+  auto way = way_of(operation, reversed, options);
+  if (!way) {
+    throw Error("The steps of EPSG:" + std::to_string(operation.code) + ", " + operation.name +
+                ", do not join.");
+  }
+  return *std::move(way);
+}
+
+std::unique_ptr<const DatumStep> datum_step(const Link& link, const TransformationOptions& options,
+                                            bool flat) {
+  const OperationRecord& operation = link.operation;
+  const Frame source = frame_of(datum_from_registry(datum_of(operation.source)));
+  const Frame target = frame_of(datum_from_registry(datum_of(operation.target)));
+  if (is_similarity_or_offset(operation.method)) {
+    return similarity_or_offset(link, source, target, options.epoch, flat);
+  }
+  if (is_shift_grid(operation.method)) {
+    return shift_grid_step(link, source, target, options.grid_folders);
+  }
+  throw Error(in_words(link) + " cannot be carried out: there is no formula for " +
+              Registry::shared().method_name(operation.method) + ".");
+}
+
+}  // namespace tidewater::detail

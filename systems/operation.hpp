@@ -1,0 +1,83 @@
+// Datum operations: which there are between two systems, and the steps that carry them out.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "block.hpp"
+#include "definition.hpp"
+#include "registry.hpp"
+#include "tidewater/transformation.hpp"
+
+namespace tidewater::detail {
+
+// An operation of the registry in one direction.
+struct Link {
+  OperationRecord operation;
+  bool reversed;
+};
+
+// A way from one datum to another.
+struct Way {
+  std::vector<Link> links;  // none where the datum stays
+  std::string name;
+  double accuracy = 0;  // metres, NaN when unknown
+  Area area;
+  std::string missing;  // grids that were not found, or what else hinders it; empty when usable
+};
+
+// The ways between the datums of two systems, the best first; those that cannot be used stand last.
+std::vector<Way> ways(const Definition& source, const Definition& target,
+                      const TransformationOptions& options);
+
+// One operation that the caller has named.
+Way way_by_operation(const OperationRecord& operation, bool reversed,
+                     const TransformationOptions& options);
+
+// Is the datum the same, so that nothing has to be done?
+bool same_datum(const DatumDefinition& a, const DatumDefinition& b);
+
+// One datum step between longitudes from Greenwich, latitudes (radians) and heights.
+class DatumStep : public Step {
+ public:
+  virtual std::string describe() const = 0;
+};
+
+// The ellipsoid and the prime meridian that an operation's figures are meant for.
+struct Frame {
+  double a, e, meridian;  // metres, one, radians
+};
+Frame frame_of(const DatumDefinition& datum);
+
+// "EPSG:1671 RGF93 to WGS 84 (1)", "inverse of ...".
+std::string in_words(const Link& link);
+
+// Methods by parameters.
+bool is_similarity_or_offset(int method);
+bool depends_on_time(int method);
+std::unique_ptr<const DatumStep> similarity_or_offset(const Link& link, const Frame& source,
+                                                      const Frame& target, double epoch, bool flat);
+
+// Methods by grids of longitude and latitude shifts.
+bool is_shift_grid(int method);
+// The file that serves an operation, empty where there is none in the folders.
+std::string shift_grid_file(const OperationRecord& operation,
+                            const std::vector<std::string>& folders);
+std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& source,
+                                                 const Frame& target,
+                                                 const std::vector<std::string>& folders);
+// A grid of the caller's.
+std::unique_ptr<const DatumStep> shift_grid_step(const std::string& file, bool reversed,
+                                                 const Frame& source, const Frame& target,
+                                                 const std::vector<std::string>& folders);
+
+// What carries out one operation; null where it changes nothing.  `flat` takes every position to
+// lie on the ellipsoid.  Throws an Error where it cannot be carried out.
+std::unique_ptr<const DatumStep> datum_step(const Link& link, const TransformationOptions& options,
+                                            bool flat);
+// Position vector parameters of a definition (towgs84), from its datum to WGS 84.
+std::unique_ptr<const DatumStep> towgs84_step(const DatumDefinition& datum, bool reversed,
+                                              bool flat);
+
+}  // namespace tidewater::detail

@@ -1,0 +1,38 @@
+// What the readers and writers of PROJ strings and WKT share.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "definition.hpp"
+#include "methods.hpp"
+
+namespace tidewater::detail {
+
+inline constexpr double kDegreeInRadians = 3.14159265358979323846 / 180;
+inline constexpr double kGradInRadians = 3.14159265358979323846 / 200;
+
+// Small letters and digits alone: "Bonne_(South_Orientated)" and "Bonne South Orientated" are one.
+std::string bare(std::string_view name);
+
+// The shortest decimal text that is the number, with as few digits as 15 where they give it to
+// within two units in the last place.
+std::string number_text(double value);
+std::string degrees_text(double radians);
+
+// Gives the definition all parameters that its method takes, at their usual value where none is
+// given, in the method's order.
+void complete_parameters(Definition& definition, const Method& method);
+
+// Finds the datum, or the base system, in the registry by what the text calls it, so that the
+// datum's code is known; leaves it as it is where the registry has none of that name with this
+// ellipsoid and meridian, or where there is no registry.
+void recognise_datum(Definition& definition);
+
+// The method's parameter among these codes; 0 where it takes none of them.
+int parameter_among(const Method& method, std::initializer_list<int> codes);
+
+// As the method's formulas take it: the sentence names the system.
+const Method& method_of(const Definition& definition);
+
+}  // namespace tidewater::detail

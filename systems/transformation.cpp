@@ -1,0 +1,505 @@
+#include "tidewater/transformation.hpp"
+
+#include <cmath>
+#include <cstdio>
+
+#include "makers.hpp"
+#include "operation.hpp"
+#include "system_impl.hpp"
+#include "words.hpp"
+
+namespace tidewater {
+
+namespace detail {
+
+namespace {
+
+constexpr double kDegree = kPi / 180;
+
+bool has_height(SystemKind kind) {
+  return kind == SystemKind::geographic3d || kind == SystemKind::geocentric ||
+         kind == SystemKind::compound;
+}
+
+// Geocentric coordinates to longitude from Greenwich, latitude and height, and back.
+class GeocentricStep final : public Step {
+ public:
+  explicit GeocentricStep(const Frame& frame) : frame_(frame) {}
+  void run(Block& block, bool inverse) const override {
+    TWstatus status;
+    if (inverse) {
+      TWllh_to_xyz(frame_.a, frame_.e, block.count, block.now, block.spare, &status);
+    } else {
+      TWxyz_to_llh(frame_.a, frame_.e, block.count, block.now, block.spare, &status);
+    }
+    block.swap();
+  }
+
+ private:
+  Frame frame_;
+};
+
+// Turns longitudes from a prime meridian into longitudes from Greenwich.
+class MeridianStep final : public Step {
+ public:
+  explicit MeridianStep(double longitude) : longitude_(longitude) {}
+  void run(Block& block, bool inverse) const override {
+    const double by = inverse ? -longitude_ : longitude_;
+    for (int i = 0; i < block.count; ++i) block.now[i].x += by;
+  }
+
+ private:
+  double longitude_;
+};
+
+}  // namespace
+
+// One end of a transformation: between the caller's arrays and blocks of radians and metres.
+struct End {
+  SystemKind kind;
+  bool angles;           // the first two axes are angles
+  bool swapped = false;  // the second axis comes first
+  double sx = 1, sy = 1, sz = 1;
+
+  // What the axes' letters say of signs that the projection does not.
+  End(const Definition& definition, const TransformationOptions& options)
+      : kind(definition.kind), angles(definition.method == 0 && kind != SystemKind::geocentric) {
+    if (angles) {
+      sx = sy = options.radians ? 1 : kDegree;
+    } else if (kind != SystemKind::geocentric) {
+      sx = sy = definition.unit.factor;
+      std::string_view natural = "EN";
+      if (definition.method == 9808 || definition.method == 9828 || definition.method == 9819 ||
+          definition.method == 1042) {
+        natural = "WS";
+      } else if (definition.method == 9826) {
+        natural = "WN";
+      }
+      for (const char letter : definition.axes.substr(0, 2)) {
+        if ((letter == 'E' || letter == 'W') && letter != natural[0]) sx = -sx;
+        if ((letter == 'N' || letter == 'S') && letter != natural[1]) sy = -sy;
+      }
+    }
+    const char first = definition.axes.empty() ? 'E' : definition.axes[0];
+    swapped = options.own_axes && kind != SystemKind::geocentric && (first == 'N' || first == 'S');
+    if (kind == SystemKind::compound && definition.vertical_unit.factor > 0) {
+      sz = definition.vertical_unit.factor;
+    }
+  }
+
+  template <class T>
+  void load(Coordinates<const T> in, std::size_t at, Block& block) const {
+    const std::ptrdiff_t stride = in.stride;
+    const T* x = (swapped ? in.y : in.x) + static_cast<std::ptrdiff_t>(at) * stride;
+    const T* y = (swapped ? in.x : in.y) + static_cast<std::ptrdiff_t>(at) * stride;
+    bool odd = false;
+    const double limit_x = angles ? 4 * kPi + 1e-9 : 1e100;
+    const double limit_y = angles ? kHalfPi + 1e-12 : 1e100;
+    for (int i = 0; i < block.count; ++i) {
+      const double px = static_cast<double>(x[i * stride]) * sx;
+      const double py = static_cast<double>(y[i * stride]) * sy;
+      block.now[i].x = px;
+      block.now[i].y = py;
+      odd |= !(std::fabs(px) <= limit_x) | !(std::fabs(py) <= limit_y);
+    }
+    if (in.z == nullptr) {
+      for (int i = 0; i < block.count; ++i) block.now[i].z = 0;
+    } else {
+      const T* z = in.z + static_cast<std::ptrdiff_t>(at) * stride;
+      for (int i = 0; i < block.count; ++i) {
+        block.now[i].z = static_cast<double>(z[i * stride]) * sz;
+        odd |= !(std::fabs(block.now[i].z) <= 1e100);
+      }
+    }
+    if (!odd) return;
+    for (int i = 0; i < block.count; ++i) {
+      const CoordinateTriple p = block.now[i];
+      if (!(std::isfinite(p.x) && std::isfinite(p.y) && std::isfinite(p.z))) {
+        block.fail(i, TW_BAD_INPUT);
+      } else if (!(std::fabs(p.x) <= limit_x)) {
+        block.fail(i, angles ? TW_BAD_LONGITUDE : TW_BAD_INPUT);
+      } else if (!(std::fabs(p.y) <= limit_y)) {
+        block.fail(i, angles ? TW_BAD_LATITUDE : TW_BAD_INPUT);
+      } else if (!(std::fabs(p.z) <= 1e100)) {
+        block.fail(i, TW_BAD_INPUT);
+      }
+    }
+  }
+
+  template <class T>
+  void store(Coordinates<T> out, std::size_t at, const Block& block) const {
+    const std::ptrdiff_t stride = out.stride;
+    T* x = (swapped ? out.y : out.x) + static_cast<std::ptrdiff_t>(at) * stride;
+    T* y = (swapped ? out.x : out.y) + static_cast<std::ptrdiff_t>(at) * stride;
+    const double by_x = 1 / sx;
+    const double by_y = 1 / sy;
+    if (angles) {
+      for (int i = 0; i < block.count; ++i) {
+        x[i * stride] = static_cast<T>(within_half_turn(block.now[i].x) * by_x);
+        y[i * stride] = static_cast<T>(block.now[i].y * by_y);
+      }
+    } else {
+      for (int i = 0; i < block.count; ++i) {
+        x[i * stride] = static_cast<T>(block.now[i].x * by_x);
+        y[i * stride] = static_cast<T>(block.now[i].y * by_y);
+      }
+    }
+    if (out.z == nullptr) return;
+    T* z = out.z + static_cast<std::ptrdiff_t>(at) * stride;
+    const double by_z = 1 / sz;
+    for (int i = 0; i < block.count; ++i) {
+      z[i * stride] = static_cast<T>(block.now[i].z * by_z);
+    }
+  }
+};
+
+class TransformationImpl {
+ public:
+  TransformationImpl(const System& from, const System& to, const TransformationOptions& options)
+      : source(from),
+        target(to),
+        source_end(from.impl().definition, options),
+        target_end(to.impl().definition, options) {
+    const Definition& one = from.impl().definition;
+    const Definition& other = to.impl().definition;
+    check_heights(one, other, options);
+    keeps_heights = !has_height(one.kind) && !has_height(other.kind);
+    flat = keeps_heights;
+    area = options.area ? *options.area : Area{};
+
+    enter(from, chain, describe);
+    choose(one, other, options);
+    enter(to, back, leaving);
+    close_meridians();
+  }
+
+  void run(Block& block, bool inverse) const {
+    double heights[kBlockSize];
+    if (keeps_heights) {
+      for (int i = 0; i < block.count; ++i) heights[i] = block.now[i].z;
+    }
+    const auto& first = inverse ? back : chain;
+    const auto& last = inverse ? chain : back;
+    for (const auto& step : first) step->run(block, false);
+    if (inverse) {
+      for (auto step = middle.rbegin(); step != middle.rend(); ++step) (*step)->run(block, true);
+    } else {
+      for (const auto& step : middle) step->run(block, false);
+    }
+    for (auto step = last.rbegin(); step != last.rend(); ++step) (*step)->run(block, true);
+    if (keeps_heights) {
+      for (int i = 0; i < block.count; ++i) block.now[i].z = heights[i];
+    }
+  }
+
+  template <class From, class To>
+  Summary apply(std::size_t count, Coordinates<const From> in, Coordinates<To> out, const Run& how,
+                bool inverse) const noexcept {
+    const End& first = inverse ? target_end : source_end;
+    const End& last = inverse ? source_end : target_end;
+    return run_blocks(
+        count, how, [&](std::size_t at, Block& block) { first.load(in, at, block); },
+        [&](Block& block) { run(block, inverse); },
+        [&](std::size_t at, const Block& block) { last.store(out, at, block); });
+  }
+
+  System source, target;
+  End source_end, target_end;
+  std::vector<std::string> describe, leaving;
+  double accuracy = 0;
+  std::string operation;
+  Area area;
+
+ private:
+  using Steps = std::vector<std::shared_ptr<const Step>>;
+
+  static void check_heights(const Definition& one, const Definition& other,
+                            const TransformationOptions& options) {
+    if (one.kind == SystemKind::vertical || other.kind == SystemKind::vertical) {
+      throw Error("A height alone is no position: give " +
+                  (one.kind == SystemKind::vertical ? one.name : other.name) +
+                  " together with a horizontal system, as in \"EPSG:2154+5720\".");
+    }
+    const bool both = has_height(one.kind) && has_height(other.kind);
+    const bool vertical_changes = both && (one.vertical_code != other.vertical_code ||
+                                           one.vertical_name != other.vertical_name);
+    if (vertical_changes && options.operation != "no shift") {
+      const auto heights = [](const Definition& definition) {
+        return definition.vertical_name.empty() ? std::string("heights above the ellipsoid")
+                                                : definition.vertical_name;
+      };
+      throw Error("There is no operation between " + heights(one) + " and " + heights(other) +
+                  "; \"no shift\" leaves heights as they are.");
+    }
+  }
+
+  // From a system's coordinates to longitude and latitude from its own prime meridian (from
+  // Greenwich for geocentric ones), in a chain that the other end runs backwards.
+  void enter(const System& system, Steps& steps, std::vector<std::string>& words) {
+    const Definition& definition = system.impl().definition;
+    if (definition.kind == SystemKind::geocentric) {
+      steps.push_back(std::make_shared<GeocentricStep>(frame_of(definition.datum)));
+      words.push_back("geocentric coordinates of " + definition.name);
+      return;
+    }
+    if (system.impl().projection != nullptr) {
+      // The step itself goes from positions to the plane.
+      class Inverse final : public Step {
+       public:
+        explicit Inverse(std::shared_ptr<const ProjectionImpl> map) : map_(std::move(map)) {}
+        void run(Block& block, bool inverse) const override { map_->run(block, !inverse); }
+
+       private:
+        std::shared_ptr<const ProjectionImpl> map_;
+      };
+      steps.push_back(std::make_shared<Inverse>(system.impl().projection));
+      words.push_back(system.method() + " of " + definition.name);
+    }
+  }
+
+  // Longitudes go over Greenwich where the two meridians differ or an operation stands between.
+  void close_meridians() {
+    const auto meridian = [](const System& system) {
+      const Definition& definition = system.impl().definition;
+      return definition.kind == SystemKind::geocentric ? 0 : definition.datum.meridian.longitude;
+    };
+    const double one = meridian(source);
+    const double other = meridian(target);
+    if (one == other && middle.empty()) return;
+    if (one != 0) chain.push_back(std::make_shared<MeridianStep>(one));
+    if (other != 0) back.push_back(std::make_shared<MeridianStep>(other));
+    if (one != other) {
+      datum_words.push_back("longitudes from " + source.impl().definition.datum.meridian.name +
+                            " to longitudes from " + target.impl().definition.datum.meridian.name);
+    }
+  }
+
+  void take(const Way& way, const TransformationOptions& options) {
+    for (const Link& link : way.links) {
+      if (!operation.empty()) operation += " ";
+      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
+      datum_words.push_back(in_words(link) + " (" +
+                            Registry::shared().method_name(link.operation.method) + ")");
+      if (auto step = datum_step(link, options, flat)) {
+        middle.push_back(std::move(step));
+      } else {
+        datum_words.back() += ", which changes nothing";
+      }
+    }
+    if (way.links.empty()) datum_words.push_back(way.name);
+    accuracy = way.accuracy;
+    if (!way.area.name.empty()) area = way.area;
+  }
+
+  void choose(const Definition& one, const Definition& other,
+              const TransformationOptions& options) {
+    const std::string_view asked = trimmed(options.operation);
+    if (asked == "no shift") {
+      if (!same_datum(one.datum, other.datum)) {
+        datum_words.push_back("no shift from " + one.datum.name + " to " + other.datum.name +
+                              ", as asked");
+        accuracy = kNotANumber;
+      }
+      return;
+    }
+    if (!asked.empty()) {
+      named(asked, one, other, options);
+      return;
+    }
+    if (same_datum(one.datum, other.datum)) return;
+
+    auto list = ways(one, other, options);
+    if (!list.empty() && list.front().missing.empty()) {
+      take(list.front(), options);
+      return;
+    }
+    if (over_wgs84(one, other, options)) return;
+
+    std::string sentence = "No way is known from the datum " + one.datum.name + " of " + one.name +
+                           " to " + other.datum.name + " of " + other.name;
+    if (!list.empty()) {
+      sentence = "The ways from the datum " + one.datum.name + " to " + other.datum.name +
+                 " need what is not there: ";
+      for (std::size_t i = 0; i < std::min<std::size_t>(3, list.size()); ++i) {
+        sentence += (i == 0 ? "" : "; ") + list[i].name + " needs " + list[i].missing;
+      }
+    }
+    throw Error(sentence +
+                "; name an operation, give a grid, or say \"no shift\" to leave positions as they "
+                "are.");
+  }
+
+  // Through the parameters to WGS 84 that one or both definitions bring along.
+  bool over_wgs84(const Definition& one, const Definition& other,
+                  const TransformationOptions& options) {
+    if (!one.datum.to_wgs84 && !other.datum.to_wgs84) return false;
+    const Definition wgs84 = definition_from_registry(4326);
+    const auto half = [&](const Definition& from, const Definition& to) -> std::optional<Way> {
+      if (same_datum(from.datum, to.datum)) return Way{};
+      auto list = ways(from, to, options);
+      if (list.empty() || !list.front().missing.empty()) return std::nullopt;
+      return std::move(list.front());
+    };
+    std::optional<Way> first;
+    std::optional<Way> second;
+    if (!one.datum.to_wgs84 && !(first = half(one, wgs84))) return false;
+    if (!other.datum.to_wgs84 && !(second = half(wgs84, other))) return false;
+    if (one.datum.to_wgs84) {
+      add(towgs84_step(one.datum, false, flat));
+    } else {
+      take(*first, options);
+    }
+    if (other.datum.to_wgs84) {
+      add(towgs84_step(other.datum, true, flat));
+    } else {
+      take(*second, options);
+    }
+    accuracy = kNotANumber;
+    return true;
+  }
+
+  void add(std::unique_ptr<const DatumStep> step) {
+    datum_words.push_back(step->describe());
+    middle.push_back(std::move(step));
+  }
+
+  // What the caller has named.
+  void named(std::string_view asked, const Definition& one, const Definition& other,
+             const TransformationOptions& options) {
+    for (std::string word : words_of(asked)) {
+      bool reversed = word.starts_with('-');
+      if (reversed) word.erase(0, 1);
+      if (word.starts_with("grid:")) {
+        add(shift_grid_step(word.substr(5), reversed, frame_of(one.datum), frame_of(other.datum),
+                            options.grid_folders));
+        accuracy = kNotANumber;
+        continue;
+      }
+      const auto code = registry_code(word);
+      const auto operation_named = code ? Registry::shared().operation(*code) : std::nullopt;
+      if (!operation_named) {
+        throw Error("The registry has no operation \"" + word +
+                    "\"; an operation is named as \"EPSG:1671\", a grid as \"grid:file.gsb\".");
+      }
+      take_named(*operation_named, reversed, one, other, options);
+    }
+  }
+
+  void take_named(const OperationRecord& record, bool reversed, const Definition& one,
+                  const Definition& other, const TransformationOptions& options) {
+    auto list = operation_ways(record, one, other, reversed, options);
+    const double before = accuracy;
+    take(list, options);
+    accuracy += before;
+  }
+
+  static Way operation_ways(const OperationRecord& record, const Definition& one,
+                            const Definition& other, bool reversed,
+                            const TransformationOptions& options) {
+    // Without a sign the direction is that in which the operation fits the systems.
+    if (!reversed) {
+      const auto datum_of = [](int system) {
+        const auto found = Registry::shared().system(system);
+        return found ? found->datum : 0;
+      };
+      const int from = datum_of(record.source);
+      const int to = datum_of(record.target);
+      reversed = (to == one.datum.code && from != one.datum.code) ||
+                 (from == other.datum.code && to != other.datum.code);
+    }
+    auto way = way_by_operation(record, reversed, options);
+    if (!way.missing.empty()) {
+      throw Error("EPSG:" + std::to_string(record.code) + ", " + record.name + ", needs " +
+                  way.missing + ".");
+    }
+    return way;
+  }
+
+  bool keeps_heights = false;
+  bool flat = false;
+  Steps chain;   // from the source to longitude and latitude from Greenwich
+  Steps middle;  // datum steps
+  Steps back;    // from the target to the same
+
+ public:
+  std::vector<std::string> datum_words;
+};
+
+}  // namespace detail
+
+Transformation::Transformation(const System& source, const System& target,
+                               const TransformationOptions& options)
+    : impl_(std::make_shared<const detail::TransformationImpl>(source, target, options)) {}
+
+#define TIDEWATER_ARRAY_CALLS(From, To)                                          \
+  Summary Transformation::forward(std::size_t count, Coordinates<const From> in, \
+                                  Coordinates<To> out, Run run) const noexcept { \
+    return impl_->apply(count, in, out, run, false);                             \
+  }                                                                              \
+  Summary Transformation::inverse(std::size_t count, Coordinates<const From> in, \
+                                  Coordinates<To> out, Run run) const noexcept { \
+    return impl_->apply(count, in, out, run, true);                              \
+  }
+TIDEWATER_ARRAY_CALLS(double, double)
+TIDEWATER_ARRAY_CALLS(float, float)
+TIDEWATER_ARRAY_CALLS(float, double)
+TIDEWATER_ARRAY_CALLS(double, float)
+#undef TIDEWATER_ARRAY_CALLS
+
+Point Transformation::forward(Point point) const noexcept {
+  Point out;
+  forward(1, Coordinates<const double>{&point.x, &point.y, &point.z},
+          Coordinates<double>{&out.x, &out.y, &out.z});
+  return out;
+}
+
+Point Transformation::inverse(Point point) const noexcept {
+  Point out;
+  inverse(1, Coordinates<const double>{&point.x, &point.y, &point.z},
+          Coordinates<double>{&out.x, &out.y, &out.z});
+  return out;
+}
+
+const System& Transformation::source() const { return impl_->source; }
+const System& Transformation::target() const { return impl_->target; }
+double Transformation::accuracy() const { return impl_->accuracy; }
+std::string Transformation::operation() const { return impl_->operation; }
+Area Transformation::area() const { return impl_->area; }
+
+std::string Transformation::describe() const {
+  std::string text;
+  int number = 0;
+  const auto line = [&](const std::string& words) {
+    text += std::to_string(++number) + ". " + words + "\n";
+  };
+  for (const auto& words : impl_->describe) line("inverse of " + words);
+  for (const auto& words : impl_->datum_words) line(words);
+  for (const auto& words : impl_->leaving) line(words);
+  if (number == 0) line("nothing: both systems are the same");
+  if (!impl_->datum_words.empty()) {
+    char accuracy[40] = "unknown";
+    if (std::isfinite(impl_->accuracy)) {
+      std::snprintf(accuracy, sizeof accuracy, "%g m", impl_->accuracy);
+    }
+    text += "accuracy of the datum step: " + std::string(accuracy) + "\n";
+  }
+  if (!impl_->area.name.empty()) text += "area: " + impl_->area.name + "\n";
+  return text;
+}
+
+std::vector<Candidate> Transformation::candidates(const System& source, const System& target,
+                                                  const TransformationOptions& options) {
+  std::vector<Candidate> list;
+  for (const auto& way :
+       detail::ways(source.impl().definition, target.impl().definition, options)) {
+    Candidate candidate{"", way.name, way.accuracy, way.area, way.missing};
+    for (const auto& link : way.links) {
+      if (!candidate.steps.empty()) candidate.steps += " ";
+      candidate.steps += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
+    }
+    list.push_back(std::move(candidate));
+  }
+  return list;
+}
+
+}  // namespace tidewater

@@ -1,0 +1,611 @@
+// Definitions from WKT: version 1 as it is commonly written, the dialect of .prj files, and
+// version 2 of 2015 and 2019 (ISO 19162, OGC 18-010).
+
+#include <cmath>
+#include <cstdlib>
+#include <optional>
+
+#include "makers.hpp"
+#include "text_forms.hpp"
+#include "text_forms_parts.hpp"
+#include "wkt_text.hpp"
+
+namespace tidewater::detail {
+
+namespace {
+
+std::string place(const WktNode& node) { return ", at character " + std::to_string(node.at); }
+
+[[noreturn]] void refuse(const WktNode& node, const std::string& what) {
+  throw Error("The WKT's " + node.value + " " + what + place(node) + ".");
+}
+
+const WktNode& need(const WktNode& node, std::string_view keyword, std::string_view second = {},
+                    std::string_view third = {}, std::string_view fourth = {}) {
+  const WktNode* found = node.find(keyword, second, third, fourth);
+  if (found == nullptr) refuse(node, "has no " + std::string(keyword));
+  return *found;
+}
+
+double need_figure(const WktNode& node, std::size_t at) {
+  const double value = node.figure(at, std::nan(""));
+  if (std::isnan(value)) refuse(node, "lacks a number");
+  return value;
+}
+
+int registry_code(const WktNode& node) {
+  const WktNode* id = node.find("ID", "AUTHORITY");
+  if (id == nullptr || bare(id->text(0)) != "epsg") return 0;
+  const double number = id->figure(1, 0);
+  if (number > 0 && number < 1e8) return static_cast<int>(number);
+  return std::atoi(id->text(1).substr(0, 8).c_str());
+}
+
+// A unit's factor as the text rounds it, to what it stands for.
+double exact_factor(double factor) {
+  for (const double known : {kDegreeInRadians, kGradInRadians, 1200.0 / 3937.0}) {
+    if (std::fabs(factor - known) < 1e-11 * known) return known;
+  }
+  return factor;
+}
+
+UnitDefinition read_unit(const WktNode& node) {
+  UnitDefinition unit;
+  unit.name = node.text(0);
+  unit.code = registry_code(node);
+  unit.factor = exact_factor(need_figure(node, 1));
+  if (!(unit.factor > 0) || !std::isfinite(unit.factor)) refuse(node, "is not above zero");
+  return unit;
+}
+
+const WktNode* any_unit(const WktNode& node) {
+  return node.find("ANGLEUNIT", "LENGTHUNIT", "SCALEUNIT", "UNIT");
+}
+
+EllipsoidDefinition read_ellipsoid(const WktNode& node) {
+  EllipsoidDefinition ellipsoid;
+  ellipsoid.name = node.text(0);
+  ellipsoid.code = registry_code(node);
+  const WktNode* unit = any_unit(node);
+  ellipsoid.a = need_figure(node, 1) * (unit != nullptr ? read_unit(*unit).factor : 1);
+  ellipsoid.inverse_flattening = need_figure(node, 2);
+  if (!(ellipsoid.a > 0) || !std::isfinite(ellipsoid.a)) {
+    refuse(node, "has a semi-major axis that is not above zero");
+  }
+  if (ellipsoid.inverse_flattening != 0 && !(ellipsoid.inverse_flattening >= 3)) {
+    refuse(node, "has an inverse flattening below 3");
+  }
+  return ellipsoid;
+}
+
+MeridianDefinition read_meridian(const WktNode& node, bool first_version,
+                                 const UnitDefinition& angle) {
+  MeridianDefinition meridian;
+  meridian.name = node.text(0);
+  meridian.code = registry_code(node);
+  double factor = kDegreeInRadians;
+  if (const WktNode* unit = any_unit(node)) {
+    factor = read_unit(*unit).factor;
+  } else if (!first_version && angle.factor > 0) {
+    factor = angle.factor;
+  }
+  const double value = need_figure(node, 1);
+  // Version 1 has the unit of its system, its writers have degrees; Paris tells which.
+  if (first_version && std::fabs(value - 2.5969213) < 1e-6) factor = kGradInRadians;
+  meridian.longitude = value * factor;
+  if (std::fabs(meridian.longitude) > 2 * kPi) refuse(node, "is beyond a whole turn");
+  return meridian;
+}
+
+// TOWGS84 of version 1.
+void read_shift(const WktNode& node, DatumDefinition& datum) {
+  if (node.children.size() != 3 && node.children.size() != 7) {
+    refuse(node, "has neither three nor seven numbers");
+  }
+  datum.to_wgs84.emplace();
+  for (std::size_t i = 0; i < node.children.size(); ++i) {
+    (*datum.to_wgs84)[i] = need_figure(node, i);
+  }
+}
+
+// Datum, ellipsoid and prime meridian of a geographic or geocentric system.
+void read_datum(const WktNode& system, bool first_version, Definition& definition) {
+  const WktNode& datum =
+      need(system, "DATUM", "ENSEMBLE", "GEODETICDATUM", first_version ? "" : "TRF");
+  definition.datum.name = datum.text(0);
+  definition.datum.code = registry_code(datum);
+  definition.datum.ellipsoid = read_ellipsoid(need(datum, "ELLIPSOID", "SPHEROID"));
+  if (const WktNode* shift = datum.find("TOWGS84")) read_shift(*shift, definition.datum);
+  const WktNode* angle = system.find("ANGLEUNIT", "UNIT");
+  UnitDefinition unit{"degree", 9102, kDegreeInRadians};
+  if (angle != nullptr && first_version) unit = read_unit(*angle);
+  if (const WktNode* meridian = system.find("PRIMEM", "PRIMEMERIDIAN")) {
+    definition.datum.meridian = read_meridian(*meridian, first_version, unit);
+  }
+}
+
+// --- axes ----------------------------------------------------------------------------------------
+
+char letter_of(const std::string& direction) {
+  const std::string word = bare(direction);
+  if (word == "east") return 'E';
+  if (word == "north") return 'N';
+  if (word == "west") return 'W';
+  if (word == "south") return 'S';
+  if (word == "up") return 'U';
+  if (word == "down") return 'D';
+  if (word == "geocentricx") return 'X';
+  if (word == "geocentricy") return 'Y';
+  if (word == "geocentricz") return 'Z';
+  return '\0';
+}
+
+// In the order that the text has, or that it numbers; empty where it has none.
+std::string read_axes(const WktNode& system) {
+  std::string axes;
+  std::string names;  // the letter of each axis by its name
+  for (const WktNode& child : system.children) {
+    if (!child.is("AXIS") || child.children.size() < 2) continue;
+    const char letter = letter_of(child.children[1].value);
+    if (letter == '\0' || axes.size() == 3) refuse(child, "has no direction that is known here");
+    const std::string name = bare(child.text(0));
+    const bool northing = name.starts_with("north") || name == "n" || name == "y";
+    axes += letter;
+    names += northing ? 'N' : 'E';
+  }
+  // At a pole both point the same way: their names tell.
+  if (axes.size() >= 2 && axes[0] == axes[1]) {
+    if (names[0] == names[1]) names = "EN";
+    axes[0] = names[0];
+    axes[1] = names[1];
+  }
+  return axes;
+}
+
+// --- methods -------------------------------------------------------------------------------------
+
+// Names in texts that are none of the table's.
+struct MethodAlias {
+  std::string_view name;
+  int code;
+};
+constexpr MethodAlias kMethodAliases[] = {
+    {"gausskruger", 9807},
+    {"transversemercatorcomplex", 9807},
+    {"igacplanocartesiano", 1052},
+    {"tunisiamappinggrid", 9816},
+    {"tunisiamininggrid", 9816},
+    {"behrmann", 9835},
+    {"platecarree", 1029},
+    {"equirectangular", 1028},
+    {"equidistantcylindrical", 1028},
+    {"mercatorauxiliarysphere", 1024},
+    {"popularvisualisationpseudomercator", 1024},
+    {"rectifiedskeworthomorphiccenter", 9815},
+    {"rectifiedskeworthomorphicnaturalorigin", 9812},
+    {"hotineobliquemercatorazimuthnaturalorigin", 9812},
+    {"obliquemercator", 9815},
+    {"stereographicnorthpole", 9829},
+    {"stereographicsouthpole", 9829},
+    {"polarstereographic", 9829},
+    {"lambertconformalconic", 9802},
+    {"lambertazimuthalequalarea", 9820},
+    {"cylindricalequalarea", 9835},
+    {"lambertcylindricalequalarea", 9835},
+    {"azimuthalequidistant", kAzimuthalEquidistant},
+    {"mercator", 9805},
+    {"krovak", 9819},
+    {"nearsideperspective", 9838},
+    {"verticalnearsideperspective", 9838},
+    {"vandergrinten", kVanDerGrinten},
+    {"vandergrinteni", kVanDerGrinten},
+};
+
+const Method& find_method(const WktNode& node) {
+  if (const Method* method = method_by_code(registry_code(node))) return *method;
+  const std::string name = bare(node.text(0));
+  if (name.empty()) refuse(node, "has no name");
+  for (const MethodAlias& alias : kMethodAliases) {
+    if (alias.name == name) return *method_by_code(alias.code);
+  }
+  for (const Method& method : methods()) {
+    if (bare(method.name) == name || bare(method.wkt1) == name) return method;
+  }
+  for (const Method& method : methods()) {
+    if (!method.esri.empty() && bare(method.esri) == name) return method;
+  }
+  if (const Method* method = method_by_words(node.text(0))) return *method;
+  refuse(node, "names the projection method \"" + node.text(0).substr(0, 80) +
+                   "\", which is not among those that are known here");
+}
+
+struct Given {
+  const WktNode* node;
+  std::string name;  // bare
+  int code;          // by its identifier, 0 without one
+  double value;
+  const WktNode* unit;
+};
+
+// Which of the table's parameters a name stands for, by what it is about.
+int code_by_name(const Method& method, const Given& given) {
+  if (given.code != 0 && parameter_among(method, {given.code}) != 0) return given.code;
+  for (const MethodParameter& parameter : method.parameters) {
+    const ParameterKind& kind = *parameter_kind(parameter.code);
+    if (bare(kind.name) == given.name || bare(parameter.wkt1) == given.name) return parameter.code;
+  }
+  struct Group {
+    std::initializer_list<std::string_view> names;
+    std::initializer_list<int> codes;
+  };
+  static const Group kGroups[] = {
+      {{"latitudeoforigin", "latitudeofcenter", "latitudeofcentre", "latitudeofnaturalorigin",
+        "latitudeoffalseorigin", "latitudeofprojectioncentre", "centralparallel"},
+       {kLat0, kLatC, kLatF, kTopoLat}},
+      {{"centralmeridian", "longitudeofcenter", "longitudeofcentre", "longitudeoforigin",
+        "longitudeofnaturalorigin", "longitudeoffalseorigin", "longitudeofprojectioncentre"},
+       {kLon0, kLonC, kLonF, kLonOrigin, kTopoLon}},
+      {{"standardparallel1", "latitudeof1ststandardparallel", "latitudeofstandardparallel"},
+       {kLat1, kLatTrue}},
+      {{"scalefactor", "scalefactoratnaturalorigin", "scalefactoroninitialline"},
+       {kK0, kLineScale, kPseudoScale, kEllipsoidScaling}},
+      {{"falseeasting", "eastingatfalseorigin", "eastingatprojectioncentre"}, {kX0, kXC, kXF}},
+      {{"falsenorthing", "northingatfalseorigin", "northingatprojectioncentre"}, {kY0, kYC, kYF}},
+      {{"azimuth"}, {kAzimuth, kColatitude}},
+      {{"rectifiedgridangle", "xyplanerotation"}, {kRectifiedAngle}},
+      {{"height"}, {kViewHeight, kPlaneHeight}},
+      {{"pseudostandardparallel1"}, {kPseudoParallel}},
+  };
+  for (const Group& group : kGroups) {
+    for (const auto name : group.names) {
+      if (name != given.name) continue;
+      for (const int code : group.codes) {
+        if (parameter_among(method, {code}) != 0) return code;
+      }
+    }
+  }
+  return 0;
+}
+
+const Given* find(const std::vector<Given>& given, std::initializer_list<std::string_view> names) {
+  for (const auto name : names) {
+    for (const Given& one : given) {
+      if (one.name == name) return &one;
+    }
+  }
+  return nullptr;
+}
+
+double value_of(const std::vector<Given>& given, std::initializer_list<std::string_view> names,
+                double otherwise) {
+  const Given* found = find(given, names);
+  return found != nullptr ? found->value : otherwise;
+}
+
+// Names that stand for several methods: what is given beside them tells.
+const Method& variant(const WktNode& name, const Method& method, std::vector<Given>& given,
+                      const std::string& axes, bool by_code) {
+  if (by_code) return method;
+  const std::string word = bare(name.text(0));
+  const auto code = [](int wanted) -> const Method& { return *method_by_code(wanted); };
+  const auto drop = [&](std::initializer_list<std::string_view> names) {
+    while (const Given* found = find(given, names))
+      given.erase(given.begin() + (found - &given[0]));
+  };
+  const double lat0 = value_of(given, {"latitudeoforigin", "latitudeofcenter"}, 0);
+  const double scale = value_of(given, {"scalefactor"}, 1);
+  const Given* first = find(given, {"standardparallel1"});
+  if (word == "lambertconformalconic") {
+    if (find(given, {"standardparallel2"}) != nullptr) return code(scale == 1 ? 9802 : 1051);
+    if (first != nullptr && std::fabs(first->value - lat0) > 1e-10) return code(1102);
+    drop({"standardparallel1"});
+    return code(9801);
+  }
+  if (word == "mercator" && first == nullptr && find(given, {"scalefactor"}) != nullptr) {
+    return code(9804);
+  }
+  if (word == "polarstereographic" || word == "stereographicnorthpole" ||
+      word == "stereographicsouthpole" || word == "stereographic") {
+    const double pole = std::fabs(lat0 != 0 || first == nullptr ? lat0 : first->value);
+    const bool scaled = find(given, {"scalefactor"}) != nullptr;
+    if (word == "stereographic" && std::fabs(pole - 90) > 1e-9) return method;
+    if (std::fabs(pole - 90) < 1e-9 && scaled) {
+      if (lat0 == 0 && first != nullptr) {
+        given[static_cast<std::size_t>(first - &given[0])].name = "latitudeoforigin";
+      }
+      return code(9810);
+    }
+    for (Given& one : given) {
+      if (one.name == "latitudeoforigin" && first == nullptr) one.name = "standardparallel1";
+    }
+    if (first != nullptr) drop({"latitudeoforigin"});
+    return code(9829);
+  }
+  if (word == "krovak") {
+    const bool turned = value_of(given, {"xyplanerotation"}, 0) == 90 || axes == "EN";
+    drop({"xscale", "yscale", "xyplanerotation"});
+    return code(turned ? 1041 : 9819);
+  }
+  if (word == "mercatorauxiliarysphere") drop({"standardparallel1", "auxiliaryspheretype"});
+  if (method.code == 9815 || method.code == 9812) {
+    // Without an angle of its own the grid is rectified by the azimuth.
+    const Given* azimuth = find(given, {"azimuth"});
+    if (azimuth != nullptr && find(given, {"rectifiedgridangle", "xyplanerotation"}) == nullptr) {
+      Given angle = *azimuth;
+      angle.name = "rectifiedgridangle";
+      given.push_back(angle);
+    }
+  }
+  return method;
+}
+
+void read_parameters(const WktNode& owner, const WktNode& name, const UnitDefinition& angle,
+                     const UnitDefinition& length, const std::string& axes,
+                     Definition& definition) {
+  std::vector<Given> given;
+  for (const WktNode& child : owner.children) {
+    if (!child.is("PARAMETER")) continue;
+    given.push_back({&child, bare(child.text(0)), registry_code(child), need_figure(child, 1),
+                     any_unit(child)});
+  }
+  const Method& named = find_method(name);
+  const bool by_code = registry_code(name) == named.code || bare(named.name) == bare(name.text(0));
+  const bool second_version = name.value == "METHOD";
+  const Method& method = variant(name, named, given, axes, by_code && second_version);
+  definition.method = method.code;
+  for (const Given& one : given) {
+    const int code = code_by_name(method, one);
+    if (code == 0) {
+      // What changes nothing is let pass.
+      const bool scale = one.name.find("scale") != std::string::npos;
+      if (one.value == (scale ? 1 : 0)) continue;
+      refuse(*one.node, "\"" + one.node->text(0).substr(0, 80) +
+                            "\" is not taken by the projection method " + std::string(method.name));
+    }
+    double factor = 1;
+    switch (parameter_kind(code)->quantity) {
+      case Quantity::angle:
+        factor = angle.factor;
+        break;
+      case Quantity::length:
+        factor = length.factor;
+        break;
+      case Quantity::scale:
+        break;
+    }
+    if (one.unit != nullptr) factor = read_unit(*one.unit).factor;
+    if (!std::isfinite(one.value * factor)) refuse(*one.node, "is out of range");
+    definition.parameters.push_back({code, one.value * factor});
+  }
+  complete_parameters(definition, method);
+}
+
+// --- systems -------------------------------------------------------------------------------------
+
+void read_area(const WktNode& system, Definition& definition) {
+  const WktNode* usage = system.find("USAGE");
+  const WktNode& owner = usage != nullptr ? *usage : system;
+  if (const WktNode* area = owner.find("AREA")) definition.area = area->text(0);
+  if (const WktNode* box = owner.find("BBOX")) {
+    definition.south = need_figure(*box, 0);
+    definition.west = need_figure(*box, 1);
+    definition.north = need_figure(*box, 2);
+    definition.east = need_figure(*box, 3);
+    if (definition.area.empty()) definition.area = "as given";
+  }
+}
+
+bool is_geographic(const WktNode& node) {
+  return node.is("GEOGCS") || node.is("GEOGCRS") || node.is("GEOGRAPHICCRS") ||
+         node.is("GEODCRS") || node.is("GEODETICCRS") || node.is("GEOCCS");
+}
+bool is_projected(const WktNode& node) {
+  return node.is("PROJCS") || node.is("PROJCRS") || node.is("PROJECTEDCRS");
+}
+bool is_vertical(const WktNode& node) {
+  return node.is("VERT_CS") || node.is("VERTCS") || node.is("VERTCRS") || node.is("VERTICALCRS");
+}
+
+Definition read_geographic(const WktNode& node) {
+  Definition definition;
+  const bool first_version = node.is("GEOGCS") || node.is("GEOCCS");
+  definition.name = node.text(0);
+  definition.code = registry_code(node);
+  read_datum(node, first_version, definition);
+  const WktNode* unit = any_unit(node);
+  if (unit == nullptr) {
+    // Version 2 may have it at the axes.
+    if (const WktNode* axis = node.find("AXIS")) unit = any_unit(*axis);
+  }
+  const WktNode* kind = node.find("CS");
+  const bool cartesian =
+      kind != nullptr && !kind->children.empty() && bare(kind->children[0].value) == "cartesian";
+  if (node.is("GEOCCS") || cartesian) {
+    definition.kind = SystemKind::geocentric;
+    definition.unit = unit != nullptr ? read_unit(*unit) : UnitDefinition{"metre", 9001, 1};
+    definition.axes = "XYZ";
+  } else {
+    definition.axes = read_axes(node);
+    const bool height = (kind != nullptr && kind->figure(1, 2) == 3) ||
+                        definition.axes.size() == 3 || node.find("LINUNIT") != nullptr;
+    definition.kind = height ? SystemKind::geographic3d : SystemKind::geographic2d;
+    definition.unit =
+        unit != nullptr ? read_unit(*unit) : UnitDefinition{"degree", 9102, kDegreeInRadians};
+    if (definition.axes.empty()) definition.axes = height ? "ENU" : "EN";
+  }
+  read_area(node, definition);
+  recognise_datum(definition);
+  return definition;
+}
+
+Definition read_projected(const WktNode& node) {
+  Definition definition;
+  const bool first_version = node.is("PROJCS");
+  definition.kind = SystemKind::projected;
+  definition.name = node.text(0);
+  definition.code = registry_code(node);
+  const WktNode& base = first_version
+                            ? need(node, "GEOGCS")
+                            : need(node, "BASEGEOGCRS", "BASEGEODCRS", "BASEGEOGRAPHICCRS");
+  read_datum(base, first_version, definition);
+  definition.base = base.text(0);
+  definition.base_code = registry_code(base);
+
+  definition.axes = read_axes(node);
+  const WktNode* unit = node.find("LENGTHUNIT", "UNIT");
+  if (unit == nullptr) {
+    if (const WktNode* axis = node.find("AXIS")) unit = any_unit(*axis);
+  }
+  definition.unit = unit != nullptr ? read_unit(*unit) : UnitDefinition{"metre", 9001, 1};
+
+  UnitDefinition angle{"degree", 9102, kDegreeInRadians};
+  if (const WktNode* given = base.find("ANGLEUNIT", "UNIT")) angle = read_unit(*given);
+  if (first_version) {
+    const WktNode& method = need(node, "PROJECTION");
+    read_parameters(node, method, angle, definition.unit, definition.axes, definition);
+    // The pseudo-Mercator of web maps has no name of its own in version 1.
+    const WktNode* extension = node.find("EXTENSION");
+    const std::string proj = extension != nullptr ? extension->text(1) : std::string();
+    if (definition.method == 9804 &&
+        (definition.code == 3857 || proj.find("nadgrids=@null") != std::string::npos)) {
+      definition.method = 1024;
+      complete_parameters(definition, *method_by_code(1024));
+    }
+  } else {
+    const WktNode& conversion = need(node, "CONVERSION");
+    definition.conversion = conversion.text(0);
+    read_parameters(conversion, need(conversion, "METHOD", "PROJECTION"), angle, definition.unit,
+                    definition.axes, definition);
+  }
+  if (definition.axes.empty()) {
+    definition.axes = "EN";
+    if (definition.method == 9808 || definition.method == 9828) definition.axes = "WS";
+    if (definition.method == 9819 || definition.method == 1042) definition.axes = "SW";
+    if (definition.method == 9826) definition.axes = "WN";
+  }
+  read_area(node, definition);
+  recognise_datum(definition);
+  return definition;
+}
+
+void read_vertical(const WktNode& node, Definition& definition) {
+  definition.vertical_name = node.text(0);
+  definition.vertical_code = registry_code(node);
+  if (const WktNode* datum = node.find("VDATUM", "VERT_DATUM", "VERTICALDATUM", "ENSEMBLE")) {
+    definition.vertical_datum = datum->text(0);
+  }
+  const WktNode* unit = node.find("LENGTHUNIT", "UNIT");
+  const WktNode* axis = node.find("AXIS");
+  if (unit == nullptr && axis != nullptr) unit = any_unit(*axis);
+  definition.vertical_unit = unit != nullptr ? read_unit(*unit) : UnitDefinition{"metre", 9001, 1};
+  const std::string axes = read_axes(node);
+  definition.axes += axes.empty() ? "U" : axes;
+}
+
+Definition read_system(const WktNode& node);
+
+Definition read_compound(const WktNode& node) {
+  const WktNode* horizontal = nullptr;
+  const WktNode* vertical = nullptr;
+  for (const WktNode& child : node.children) {
+    if (child.kind != WktNode::Kind::object) continue;
+    if (is_vertical(child)) {
+      vertical = &child;
+    } else if (is_projected(child) || is_geographic(child) || child.is("BOUNDCRS")) {
+      horizontal = &child;
+    }
+  }
+  if (horizontal == nullptr || vertical == nullptr) {
+    refuse(node, "has no horizontal or no vertical system");
+  }
+  Definition definition = read_system(*horizontal);
+  definition.horizontal_code = definition.code;
+  definition.kind = SystemKind::compound;
+  definition.name = node.text(0);
+  definition.code = registry_code(node);
+  read_vertical(*vertical, definition);
+  read_area(node, definition);
+  return definition;
+}
+
+// A system with the transformation to WGS 84 that belongs to it.
+Definition read_bound(const WktNode& node) {
+  const WktNode& source = need(node, "SOURCECRS");
+  if (source.children.empty()) refuse(source, "is empty");
+  Definition definition = read_system(source.children[0]);
+  const WktNode& way = need(node, "ABRIDGEDTRANSFORMATION");
+  const WktNode& method = need(way, "METHOD");
+  const std::string name = bare(method.text(0));
+  const bool position_vector = name.find("positionvector") != std::string::npos;
+  const bool frame = name.find("coordinateframe") != std::string::npos;
+  const bool translation = name.find("geocentrictranslation") != std::string::npos;
+  if (!position_vector && !frame && !translation) {
+    refuse(method, "is none that is known here; three or seven parameters to WGS 84 are");
+  }
+  std::array<double, 7> seven{};
+  for (const WktNode& child : way.children) {
+    if (!child.is("PARAMETER")) continue;
+    const int code = registry_code(child);
+    if (code < 8605 || code > 8611) continue;
+    const auto i = static_cast<std::size_t>(code - 8605);
+    double value = need_figure(child, 1);
+    // Arc-seconds and parts per million; an abridged transformation gives the scale as a factor.
+    if (const WktNode* unit = any_unit(child)) {
+      const double factor = read_unit(*unit).factor;
+      if (i < 3) value *= factor;
+      if (i >= 3 && i < 6) value *= factor / (kDegreeInRadians / 3600);
+      if (i == 6) value *= factor / 1e-6;
+    } else if (i == 6) {
+      value = (value - 1) * 1e6;
+    }
+    seven[i] = frame && i >= 3 && i < 6 ? -value : value;
+  }
+  definition.datum.to_wgs84 = seven;
+  return definition;
+}
+
+Definition read_system(const WktNode& node) {
+  if (is_projected(node)) return read_projected(node);
+  if (is_geographic(node)) return read_geographic(node);
+  if (node.is("COMPD_CS") || node.is("COMPOUNDCRS")) return read_compound(node);
+  if (node.is("BOUNDCRS")) return read_bound(node);
+  if (is_vertical(node)) {
+    Definition definition;
+    definition.kind = SystemKind::vertical;
+    read_vertical(node, definition);
+    definition.name = definition.vertical_name;
+    definition.code = definition.vertical_code;
+    read_area(node, definition);
+    return definition;
+  }
+  throw Error("The WKT describes a " + node.value.substr(0, 60) +
+              "; geographic, geocentric, projected, vertical and compound systems are known here" +
+              place(node) + ".");
+}
+
+}  // namespace
+
+Definition definition_from_wkt(std::string_view text) {
+  while (!text.empty() && (text.back() == '\0' || text.back() == '\n' || text.back() == ' ' ||
+                           text.back() == '\r' || text.back() == '\t')) {
+    text.remove_suffix(1);
+  }
+  constexpr std::string_view kMark = "\xEF\xBB\xBF";  // as some .prj files begin
+  if (text.starts_with(kMark)) text.remove_prefix(kMark.size());
+  const std::vector<WktNode> objects = parse_wkt(text);
+  Definition definition = read_system(objects.front());
+  if (objects.size() == 1) return definition;
+  // A .prj file may have the vertical system behind the horizontal one.
+  if (objects.size() > 2 || !is_vertical(objects[1])) {
+    throw Error("The WKT has a " + objects[1].value.substr(0, 60) + " behind its system" +
+                place(objects[1]) + ".");
+  }
+  definition.horizontal_code = definition.code;
+  definition.code = 0;
+  definition.kind = SystemKind::compound;
+  read_vertical(objects[1], definition);
+  definition.name += " + " + definition.vertical_name;
+  return definition;
+}
+
+}  // namespace tidewater::detail

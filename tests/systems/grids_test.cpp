@@ -1,0 +1,847 @@
+// Grids as objects: against PROJ on real grids and on files made from them, and files that lie.
+
+#include "tidewater/grids.hpp"
+
+#include <gtest/gtest.h>
+
+#include <bit>
+#include <cmath>
+#include <filesystem>
+#include <functional>
+#include <limits>
+#include <memory>
+#include <random>
+#include <thread>
+
+#include "support/data.hpp"
+#include "support/grids.hpp"
+#include "support/points.hpp"
+#include "support/proj_peer.hpp"
+#include "tidewater/datum.h"
+
+#ifdef TIDEWATER_HAVE_TIFF
+#include <tiffio.h>
+#endif
+
+using namespace tidewater;
+using namespace tidewater::test;
+namespace fs = std::filesystem;
+
+namespace {
+
+using tidewater::GeoidGrid;  // not the C structure of that name
+
+constexpr double kDegree = kPi / 180;
+constexpr double kTenthOfMillimetre = 1e-4 / 6378137 / kDegree;  // degrees
+
+struct Box {
+  double west, south, east, north;
+};
+
+std::vector<Point> points_in(const Box& box, std::size_t count) {
+  std::mt19937 random(11);
+  std::uniform_real_distribution<double> lon(box.west, box.east), lat(box.south, box.north);
+  std::vector<Point> points(count);
+  for (Point& p : points) p = {lon(random), lat(random), 12};
+  return points;
+}
+
+Coordinates<double> view(std::vector<Point>* points) {
+  return {&points->front().x, &points->front().y, &points->front().z, 3};
+}
+Coordinates<const double> view(const std::vector<Point>& points) {
+  return {&points.front().x, &points.front().y, &points.front().z, 3};
+}
+
+double apart(double a, double b) { return std::fabs(std::remainder(a - b, 360)); }
+
+#ifdef TIDEWATER_HAVE_PROJ
+// Both ways within a tenth of a millimetre of the peer, wherever it has a figure; tells the worst
+// difference in metres.
+double expect_as_peer(const ShiftGrid& grid, const std::string& peer_grid, const Box& box,
+                      std::size_t count = 3000) {
+  const ProjPeer peer("+proj=hgridshift +grids=" + peer_grid);
+  if (!peer.ok()) {
+    ADD_FAILURE() << "PROJ does not read " << peer_grid;
+    return 0;
+  }
+  const std::vector<Point> in = points_in(box, count);
+  std::vector<Point> forward(count), inverse(count);
+  grid.forward(count, view(in), view(&forward));
+  std::vector<TWstatus> words(count);
+  std::vector<int> passes(count);
+  grid.inverse(count, view(in), view(&inverse), words.data(), passes.data());
+  std::size_t compared = 0;
+  double worst = 0;
+  for (std::size_t i = 0; i < count; ++i) {
+    const CoordinateTriple p = {in[i].x * kDegree, in[i].y * kDegree, 12};
+    for (const bool back : {false, true}) {
+      const CoordinateTriple theirs = back ? peer.inverse(p) : peer.forward(p);
+      const Point& ours = back ? inverse[i] : forward[i];
+      if (!std::isfinite(theirs.x)) continue;
+      ++compared;
+      const double d =
+          std::max(apart(ours.x, theirs.x / kDegree), std::fabs(ours.y - theirs.y / kDegree));
+      EXPECT_LT(d, kTenthOfMillimetre) << in[i].x << " " << in[i].y << (back ? " back" : "");
+      worst = std::max(worst, d);
+      if (back) {
+        EXPECT_EQ(words[i], TW_SUCCESS);
+        EXPECT_GE(passes[i], 1);
+        EXPECT_LE(passes[i], 5);
+      }
+    }
+  }
+  EXPECT_GT(compared, count);
+  return worst * kDegree * 6378137;
+}
+#endif
+
+const struct {
+  const char* name;
+  Box box;
+} kRealGrids[] = {{"ntf_r93.gsb", {-5.49, 41.01, 9.99, 51.99}},
+                  {"BETA2007.gsb", {5.51, 47.01, 15.66, 55.29}},
+                  {"CHENYX06.gsb", {5.56, 45.48, 11.04, 48.06}},
+                  {"nzgd2kgrid0005.gsb", {166.01, -47.99, 179.99, -34.01}}};
+const std::string kProjData = proj_data().string() + "/";
+
+TEST(ShiftGrids, RealNationalGridsAgainstProj) {
+  TIDEWATER_NEED_PROJ();
+#ifdef TIDEWATER_HAVE_PROJ
+  for (const auto& [name, box] : kRealGrids) {
+    if (!fs::exists(kProjData + name)) continue;
+    SCOPED_TRACE(name);
+    const double worst = expect_as_peer(ShiftGrid(name, {"/nowhere", kProjData}), name, box);
+    RecordProperty(name, std::to_string(worst));
+    EXPECT_LT(worst, 2e-5);  // metres; what the docstring says
+  }
+#endif
+}
+
+TEST(ShiftGrids, SubGridsAgainstProj) {
+  TIDEWATER_NEED_SHARED_DATA();
+  TIDEWATER_NEED_PROJ();
+#ifdef TIDEWATER_HAVE_PROJ
+  const std::string path = (shared_data() / "ntv2" / "canada.gsb").string();
+  const ShiftGrid grid(path);
+  EXPECT_GT(grid.bounds().size(), 0U);
+  for (const GridBounds& b : grid.bounds()) {
+    expect_as_peer(grid, path, {b.west + 0.01, b.south + 0.01, b.east - 0.01, b.north - 0.01});
+  }
+  EXPECT_NE(grid.describe().find("sub-grids"), std::string::npos) << grid.describe();
+#endif
+}
+
+// A grid of our own with a child; longitudes positive west, as in the file.
+SubGrid plane(const char* name, const char* parent, double south, double north, double east,
+              double west, double inc, float add) {
+  const auto value = [add](int r, int c) {
+    return add + static_cast<float>(r) / 8 - static_cast<float>(c) / 4;
+  };
+  return {name,         parent,      south * 3600,
+          north * 3600, east * 3600, west * 3600,
+          inc * 3600,   value,       [value](int r, int c) { return -2 * value(r, c); }};
+}
+
+TEST(ShiftGrids, ShiftsHaveTheirSignsEastAndWest) {
+  const ScratchFolder folder;
+  // From 10 west to 20 east: across Greenwich.
+  folder.write("g.gsb", GsbFile{{plane("A", "NONE", 40, 50, -20, 10, 1, 1),
+                                 plane("B", "A", 44, 46, -4, -2, 0.5, 100)}}
+                            .bytes());
+  const ShiftGrid grid("g.gsb", {folder.directory()});
+  EXPECT_EQ(grid.describe(), "NTv2 grid of 2 sub-grids, OLD to NEW");
+  ASSERT_EQ(grid.bounds().size(), 1U);
+  EXPECT_NEAR(grid.bounds()[0].west, -10, 1e-12);
+  EXPECT_NEAR(grid.bounds()[0].east, 20, 1e-12);
+  const auto expect = [&](double lon, double lat, double seconds, bool and_back = true) {
+    for (const double turn : {-360.0, 0.0, 360.0, 720.0}) {
+      const Point p = grid.forward(Point{lon + turn, lat, 7});
+      EXPECT_NEAR((p.y - lat) * 3600, seconds, 1e-8) << lon << " " << lat;
+      EXPECT_NEAR((p.x - lon - turn) * 3600, 2 * seconds, 1e-8) << lon << " " << lat;
+      EXPECT_EQ(p.z, 7);
+      if (!and_back) continue;
+      const Point back = grid.inverse(p);
+      EXPECT_NEAR(back.x, lon + turn, 1e-10);
+      EXPECT_NEAR(back.y, lat, 1e-10);
+    }
+  };
+  // Columns count from 20 east, westwards: 1 + row/8 - column/4, positive west in the longitude.
+  expect(15.5, 42.25, 1 + 2.25 / 8 - 4.5 / 4);
+  expect(-9.75, 49.5, 1 + 9.5 / 8 - 29.75 / 4);
+  expect(20, 40, 1);
+  expect(-10, 50, 1 + 10.0 / 8 - 30.0 / 4);
+  expect(3.25, 44.75, 100 + 1.5 / 8 - 1.5 / 4);  // in the child
+  // The shift jumps at the child's edge: two points go where this one goes.
+  expect(2, 46, 100 + 4.0 / 8 - 4.0 / 4, false);  // on its corner
+  TWstatus word = 0;
+  const double nan = std::numeric_limits<double>::quiet_NaN();
+  for (const auto& [x, y] : {std::pair{21.0, 45.0},
+                             {-11.0, 45.0},
+                             {0.0, 39.9},
+                             {0.0, 50.1},
+                             {nan, 45.0},
+                             {0.0, nan},
+                             {HUGE_VAL, 45.0},
+                             {1e300, 1e300}}) {
+    std::vector<Point> p = {{x, y, 3}};
+    for (const bool back : {false, true}) {
+      const Summary s = back ? grid.inverse(1, view(std::as_const(p)), view(&p), &word)
+                             : grid.forward(1, view(std::as_const(p)), view(&p), &word);
+      EXPECT_EQ(s.failed, 1U);
+      EXPECT_EQ(s.word, TW_I_OUTSIDE_CNT);
+      EXPECT_EQ(word, TW_I_OUTSIDE_CNT);
+      EXPECT_TRUE(std::isnan(p[0].x) && std::isnan(p[0].y) && std::isnan(p[0].z));
+    }
+  }
+}
+
+TEST(ShiftGrids, PointsDoNotDisturbEachOther) {
+  const ScratchFolder folder;
+  folder.write("g.gsb", GsbFile{{plane("A", "NONE", 40, 50, 10, 20, 1, 1)}}.bytes());
+  const ShiftGrid grid((folder.path() / "g.gsb").string());
+  std::vector<Point> p = {{-15, 45, 1}, {15, 45, 2}, {-12, 41, 3}};
+  const std::vector<Point> in = p;
+  std::vector<TWstatus> words(3);
+  const Summary s = grid.forward(3, view(std::as_const(p)), view(&p), words.data());  // in place
+  EXPECT_EQ(s.failed, 1U);
+  EXPECT_EQ(words, (std::vector<TWstatus>{TW_SUCCESS, TW_I_OUTSIDE_CNT, TW_SUCCESS}));
+  EXPECT_EQ(p[2].x, grid.forward(in[2]).x);
+  EXPECT_EQ(p[2].z, 3);
+  EXPECT_EQ(grid.forward(0, view(in), view(&p)).failed, 0U);
+  // The file may go: the grid is in memory.  Copies share it, also between threads.
+  fs::remove(folder.path() / "g.gsb");
+  const ShiftGrid copy = grid;
+  std::vector<std::thread> threads;
+  std::vector<double> results(4);
+  for (double& result : results) {
+    threads.emplace_back([&copy, &in, &result] {
+      for (int k = 0; k < 1000; ++k) result = copy.inverse(in[0]).x;
+    });
+  }
+  for (std::thread& t : threads) t.join();
+  for (const double r : results) EXPECT_EQ(r, grid.inverse(in[0]).x);
+}
+
+TEST(ShiftGrids, NadconPairsAgainstTheArrayFunctions) {
+  TIDEWATER_NEED_SHARED_DATA();
+  const std::string folder = (shared_data() / "nadcon").string() + "/";
+  NadconControl control = {};
+  TWstatus status = 0;
+  TWnadcon_c(folder.c_str(), &control, &status);
+  ASSERT_EQ(status, TW_SUCCESS);
+  for (const char* name : {"conus", "conus.las", "conus.los"}) {
+    const ShiftGrid grid(name, {folder});
+    for (const Point& p : points_in({-120, 28, -72, 47}, 300)) {
+      const CoordinateTriple in = {p.x * kDegree, p.y * kDegree, 0};
+      CoordinateTriple out = {};
+      TWnadcon_f(1, &in, &control, &out, &status);
+      const Point ours = grid.forward(p);
+      EXPECT_NEAR(ours.x, out.x / kDegree, 1e-11);
+      EXPECT_NEAR(ours.y, out.y / kDegree, 1e-11);
+    }
+  }
+}
+
+TEST(GeoidGrids, WorldGridAgainstProj) {
+  TIDEWATER_NEED_PROJ();
+#ifdef TIDEWATER_HAVE_PROJ
+  if (!fs::exists(kProjData + "egm96_15.gtx")) GTEST_SKIP() << "egm96_15.gtx is not installed";
+  const GeoidGrid grid("egm96_15.gtx", {kProjData});
+  const ProjPeer peer("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1");
+  std::vector<Point> in = points_in({-180, -90, 180, 90}, 5000);
+  for (const double lon : {-180.0, 179.76, 179.9, 179.999, 180.0, -179.99, 0.0, 540.0}) {
+    for (const double lat : {-90.0, -45.1, 0.0, 60.0, 90.0}) in.push_back({lon, lat, 5});
+  }
+  std::vector<Point> up(in.size()), down(in.size());
+  EXPECT_TRUE(grid.forward(in.size(), view(in), view(&up)));
+  EXPECT_TRUE(grid.inverse(in.size(), view(in), view(&down)));
+  double worst = 0;
+  for (std::size_t i = 0; i < in.size(); ++i) {
+    const double n = peer.forward({std::remainder(in[i].x, 360) * kDegree, in[i].y * kDegree, 0}).z;
+    worst = std::max(worst, std::fabs(up[i].z - in[i].z - n));
+    EXPECT_NEAR(up[i].z, in[i].z + n, 1e-6) << in[i].x << " " << in[i].y;
+    EXPECT_NEAR(down[i].z, in[i].z - n, 1e-6);
+    EXPECT_EQ(up[i].x, in[i].x);
+  }
+  EXPECT_LT(worst, 1e-6);
+  EXPECT_EQ(grid.describe(), "GTX grid of 721 rows and 1440 columns");
+#endif
+}
+
+TEST(GeoidGrids, BiquadraticReturnsAParabola) {
+  // Columns and rows of a degree; the node values are a form of the second order, which the nine
+  // nodes give back exactly.
+  const ScratchFolder folder;
+  const auto value = [](double r, double c) {
+    return 3 + 0.25 * r - 0.5 * c + 0.125 * r * r - 0.0625 * c * c;
+  };
+  folder.write("g.geo", GridFile{-20, 40, 24, 8,
+                                 [&](int r, int c) { return static_cast<float>(value(r, c)); }}
+                            .bytes());
+  const std::string path = (folder.path() / "g.geo").string();
+  const GeoidGrid grid(path, {}, GeoidGrid::Interpolation::biquadratic);
+  const GeoidGrid linear(path);
+  for (double r = 0; r <= 7; r += 0.125) {
+    for (double c = 0; c <= 23; c += 0.125) {
+      EXPECT_NEAR(grid.undulation(-20 + c, 40 + r), value(r, c), 1e-9) << r << " " << c;
+    }
+  }
+  EXPECT_NEAR(linear.undulation(-19.5, 40), (value(0, 0) + value(0, 1)) / 2, 1e-9);
+  EXPECT_TRUE(std::isnan(grid.undulation(-20.1, 42)));
+}
+
+TEST(GeoidGrids, RealGeoFilesAgainstTheArrayFunctions) {
+  TIDEWATER_NEED_SHARED_DATA();
+  const std::string folder = (shared_data() / "geoid").string() + "/";
+  GeoidControl control = {};
+  TWstatus status = 0;
+  TWgeo90_c(folder.c_str(), &control, &status);
+  ASSERT_EQ(status, TW_SUCCESS);
+  const GeoidGrid grid("namer96.geo", {folder}, GeoidGrid::Interpolation::biquadratic);
+  const GridBounds b = grid.bounds().front();
+  for (const Point& p : points_in({b.west + 1, b.south + 1, b.east - 1, b.north - 1}, 500)) {
+    double n = 0;
+    TWget_geo90(p.x * kDegree, p.y * kDegree, 0, &control, &n, &status);
+    ASSERT_EQ(status, TW_SUCCESS);
+    EXPECT_NEAR(grid.undulation(p.x, p.y), n, 1e-4);  // those work in single precision
+  }
+}
+
+std::string big(std::string bytes, std::size_t width) {
+  for (std::size_t k = 0; k < bytes.size(); k += width) {
+    std::reverse(bytes.begin() + static_cast<std::ptrdiff_t>(k),
+                 bytes.begin() + static_cast<std::ptrdiff_t>(k + width));
+  }
+  return bytes;
+}
+
+std::string gtx(double south, double west, double dy, double dx, std::int32_t rows,
+                std::int32_t columns, const std::vector<float>& values) {
+  std::string doubles, counts, floats;
+  for (const double v : {south, west, dy, dx}) append_f64(doubles, v);
+  for (const std::int32_t n : {rows, columns}) append_i32(counts, n);
+  for (const float v : values) append_f32(floats, v);
+  return big(doubles, 8) + big(counts, 4) + big(floats, 4);
+}
+
+TEST(GeoidGrids, NodesWithoutData) {
+  const ScratchFolder folder;
+  folder.write("g.gtx", gtx(10, 350, 1, 1, 3, 3, {1, 2, 3, 4, -88.8888F, 6, 7, 8, 9}));
+  folder.write("h.gtx", gtx(10, 350, 1, 1, 3, 3, {1, 2, 3, 4, 5, 6, 7, 8, 9}));
+  const GeoidGrid whole("h.gtx", {folder.directory()}), holed("g.gtx", {folder.directory()});
+  EXPECT_NEAR(whole.undulation(-9.5, 10.5), 3, 1e-12);
+  EXPECT_NEAR(whole.undulation(350.5, 10.5), 3, 1e-12);
+  EXPECT_TRUE(std::isnan(holed.undulation(-9.5, 10.5)));
+  std::vector<Point> p = {{-9.5, 10.5, 1}};
+  TWstatus word = 0;
+  EXPECT_EQ(holed.forward(1, view(std::as_const(p)), view(&p), &word).word, TW_I_OUTSIDE_GEOID);
+  EXPECT_EQ(word, TW_I_OUTSIDE_GEOID);
+}
+
+// The sentence with which a file is refused; empty where it is taken.
+template <class Grid>
+std::string refusal(const std::string& path) {
+  try {
+    const Grid grid(path);
+    return {};
+  } catch (const Error& e) {
+    return e.what();
+  }
+}
+
+class BadGrids : public ::testing::Test {
+ protected:
+  template <class Grid = ShiftGrid>
+  void expect_refused(const std::string& name, const std::string& bytes, const std::string& part) {
+    folder.write(name, bytes);
+    const std::string path = (folder.path() / name).string();
+    const std::string sentence = refusal<Grid>(path);
+    EXPECT_NE(sentence.find(path), std::string::npos) << sentence;
+    EXPECT_NE(sentence.find(part), std::string::npos) << sentence;
+  }
+  ScratchFolder folder;
+};
+
+TEST_F(BadGrids, NamesThatAreNotThere) {
+  EXPECT_EQ(refusal<ShiftGrid>("/nowhere/x.gsb"), "There is no grid file /nowhere/x.gsb.");
+  try {
+    const ShiftGrid grid("x.gsb", {"/a", "/b"});
+    FAIL();
+  } catch (const Error& e) {
+    EXPECT_STREQ(e.what(), "There is no grid file x.gsb in /a, /b.");
+  }
+  EXPECT_NE(refusal<ShiftGrid>(folder.directory()), "");  // a folder
+  expect_refused("x.txt", "nothing", "of no form that is known");
+  expect_refused<GeoidGrid>("x.gsb", GsbFile{{plane("A", "NONE", 40, 50, 10, 20, 1, 1)}}.bytes(),
+                            "holds no undulations");
+  expect_refused("x.gtx", gtx(0, 0, 1, 1, 2, 2, {1, 2, 3, 4}), "holds no datum shifts");
+  folder.write("half.las", GridFile{-20, 40, 9, 8, [](int, int) { return 1.0F; }}.bytes());
+  EXPECT_NE(refusal<ShiftGrid>((folder.path() / "half").string()).find("half.los"),
+            std::string::npos);
+}
+
+TEST_F(BadGrids, CutAtEveryLength) {
+  const std::string national =
+      GsbFile{{plane("A", "NONE", 40, 42, 10, 12, 1, 1), plane("B", "A", 40, 41, 10, 11, 0.5, 2)}}
+          .bytes();
+  const std::string rows = GridFile{-20, 40, 30, 4, [](int, int) { return 1.0F; }}.bytes();
+  const std::string geoid = gtx(10, 350, 1, 1, 3, 3, std::vector<float>(9));
+  const std::size_t end_record = 16;
+  for (std::size_t length = 0; length < national.size() - end_record; length += 4) {
+    folder.write("g.gsb", national.substr(0, length));
+    EXPECT_NE(refusal<ShiftGrid>((folder.path() / "g.gsb").string()), "") << length;
+  }
+  for (std::size_t length = 0; length < rows.size(); length += 3) {
+    folder.write("g.las", rows.substr(0, length));
+    folder.write("g.los", rows);
+    folder.write("g.geo", rows.substr(0, length));
+    EXPECT_NE(refusal<ShiftGrid>((folder.path() / "g.las").string()), "") << length;
+    EXPECT_NE(refusal<GeoidGrid>((folder.path() / "g.geo").string()), "") << length;
+  }
+  for (std::size_t length = 0; length < geoid.size(); ++length) {
+    folder.write("g.gtx", geoid.substr(0, length));
+    EXPECT_NE(refusal<GeoidGrid>((folder.path() / "g.gtx").string()), "") << length;
+  }
+}
+
+TEST_F(BadGrids, NationalHeadersThatCannotBe) {
+  const auto file = [](auto change) {
+    GsbFile f{{plane("A", "NONE", 40, 44, 10, 14, 1, 1), plane("B", "A", 41, 42, 11, 12, 0.5, 2),
+               plane("C", "A", 42, 43, 12, 13, 0.5, 3)}};
+    change(f);
+    return f.bytes();
+  };
+  EXPECT_NO_THROW({
+    folder.write("good.gsb", file([](GsbFile&) {}));
+    ShiftGrid((folder.path() / "good.gsb").string());
+  });
+  expect_refused("x.gsb", file([](GsbFile& f) { f.num_orec = 12; }), "eleven records");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.num_srec = -1; }), "eleven records");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.num_orec = 11 << 24; }), "big-endian");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.num_file = 0; }), "sub-grids");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.num_file = 2147483647; }), "sub-grids");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.num_file = 4; }), "ends in");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.grids[1].count_error = 1; }), "count of");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.grids[1].parent = "Z"; }), "is not there");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.grids[2].name = "B"; }), "two sub-grids named B");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.grids[0].parent = "C"; }),
+                 "each other's parents");
+  expect_refused("x.gsb", file([](GsbFile& f) { f.grids[1].parent = "B"; }),
+                 "each other's parents");
+  expect_refused("x.gsb", file([](GsbFile& f) {
+                   f.grids[2] = plane("C", "A", 41.5, 42.5, 11.5, 12.5, 0.5, 3);
+                 }),
+                 "overlap");
+  // Doubles of the first sub-grid's header.
+  const double nan = std::numeric_limits<double>::quiet_NaN();
+  for (const std::size_t offset : {72, 88, 104, 120, 136, 152}) {
+    for (const double v : {nan, HUGE_VAL, -HUGE_VAL, 0.0, -1e300, 1e300, 1e-300, -3600.0}) {
+      if (v == 0 && offset == 104) continue;
+      std::string bytes = file([](GsbFile&) {});
+      std::string eight;
+      append_f64(eight, v);
+      bytes.replace(176 + offset, 8, eight);
+      folder.write("x.gsb", bytes);
+      EXPECT_NE(refusal<ShiftGrid>((folder.path() / "x.gsb").string()), "") << offset << " " << v;
+    }
+  }
+}
+
+TEST_F(BadGrids, DamagedFilesDoNoHarm) {
+  // Any byte changed: taken or refused, and a figure asked for is none or finite.
+  const std::string good =
+      GsbFile{{plane("A", "NONE", 40, 42, 10, 12, 1, 1), plane("B", "A", 40, 41, 10, 11, 0.5, 2)}}
+          .bytes();
+  const std::string geoid = gtx(10, 350, 1, 1, 3, 3, std::vector<float>(9));
+  std::mt19937 random(3);
+  for (int k = 0; k < 300; ++k) {
+    for (const bool shift : {true, false}) {
+      std::string bytes = shift ? good : geoid;
+      for (int n = 0; n < 3; ++n) bytes[random() % bytes.size()] = static_cast<char>(random());
+      folder.write(shift ? "g.gsb" : "g.gtx", bytes);
+      const std::string path = (folder.path() / (shift ? "g.gsb" : "g.gtx")).string();
+      try {
+        if (shift) {
+          ShiftGrid(path).inverse(Point{-10.75, 40.75, 0});
+        } else {
+          GeoidGrid(path).undulation(-9, 11);
+        }
+      } catch (const Error&) {
+      }
+    }
+  }
+}
+
+TEST_F(BadGrids, SizesThatNoFileHas) {
+  expect_refused<GeoidGrid>("g.gtx", gtx(0, 0, 1e-7, 1e-7, 2147483647, 2147483647, {}),
+                            "more nodes");
+  expect_refused<GeoidGrid>("g.gtx", gtx(0, 0, 1, 1, -1, 5, {}), "fewer than two");
+  expect_refused<GeoidGrid>("g.gtx", gtx(0, 0, 1, 1, 90, 5000, {}), "ends in");
+  expect_refused<GeoidGrid>("g.gtx", gtx(0, 0, 1, 200, 2, 3, std::vector<float>(6)),
+                            "make no grid");
+  GridFile file{-20, 40, 23, 8, [](int, int) { return 1.0F; }};
+  const std::string bytes = file.bytes();
+  std::string most;
+  append_i32(most, 2147483647);
+  expect_refused<GeoidGrid>("g.geo", std::string(bytes).replace(64, 4, most), "ends in");
+  file.nc = 22;
+  expect_refused<GeoidGrid>("g.geo", file.bytes(), "header covers");
+  expect_refused<GeoidGrid>("g.geo", std::string(bytes).replace(68, 4, most), "ends in");
+}
+
+#ifdef TIDEWATER_HAVE_TIFF
+
+// A band of a GeoTIFF: nodes from the north-west, by rows southwards.
+struct Band {
+  std::string description, unit, positive;
+  std::function<float(int row, int column)> value;  // rows from the south
+  double scale = 1, offset = 0;
+};
+
+struct TiffImage {
+  double west, south, dx, dy;
+  int columns, rows;
+  std::vector<Band> bands;
+  std::string type = "HORIZONTAL_OFFSET", name = {}, parent = {};
+  bool tiled = false, separate = false, areas = false, overview = false, from_south = false;
+  int compression = COMPRESSION_NONE, bits = 32, format = SAMPLEFORMAT_IEEEFP;
+  std::string no_data = {};
+};
+
+constexpr std::uint32_t kScaleTag = 33550, kTieTag = 33922, kKeysTag = 34735, kMetadataTag = 42112,
+                        kNoDataTag = 42113;
+
+void add_geo_tags(TIFF* tiff) {
+  static char names[5][12] = {"scale", "tie", "keys", "metadata", "nodata"};
+  static const TIFFFieldInfo fields[] = {
+      {kScaleTag, -1, -1, TIFF_DOUBLE, FIELD_CUSTOM, 1, 1, names[0]},
+      {kTieTag, -1, -1, TIFF_DOUBLE, FIELD_CUSTOM, 1, 1, names[1]},
+      {kKeysTag, -1, -1, TIFF_SHORT, FIELD_CUSTOM, 1, 1, names[2]},
+      {kMetadataTag, -1, -1, TIFF_ASCII, FIELD_CUSTOM, 1, 0, names[3]},
+      {kNoDataTag, -1, -1, TIFF_ASCII, FIELD_CUSTOM, 1, 0, names[4]}};
+  TIFFMergeFieldInfo(tiff, fields, 5);
+}
+
+void append_sample(std::string* bytes, float value, const TiffImage& image) {
+  const auto put = [bytes](auto v) { bytes->append(reinterpret_cast<const char*>(&v), sizeof v); };
+  if (image.format == SAMPLEFORMAT_INT) {
+    image.bits == 16 ? put(static_cast<std::int16_t>(value))
+                     : put(static_cast<std::int32_t>(value));
+  } else if (image.format == SAMPLEFORMAT_UINT) {
+    image.bits == 16 ? put(static_cast<std::uint16_t>(value))
+                     : put(static_cast<std::uint32_t>(value));
+  } else {
+    image.bits == 32 ? put(value) : put(static_cast<double>(value));
+  }
+}
+
+void write_tiff(const std::string& path, const std::vector<TiffImage>& images) {
+  TIFF* const tiff = TIFFOpen(path.c_str(), "w");
+  ASSERT_NE(tiff, nullptr);
+  for (const TiffImage& image : images) {
+    add_geo_tags(tiff);
+    const auto samples = static_cast<int>(image.bands.size());
+    TIFFSetField(tiff, TIFFTAG_IMAGEWIDTH, image.columns);
+    TIFFSetField(tiff, TIFFTAG_IMAGELENGTH, image.rows);
+    TIFFSetField(tiff, TIFFTAG_SAMPLESPERPIXEL, samples);
+    TIFFSetField(tiff, TIFFTAG_BITSPERSAMPLE, image.bits);
+    TIFFSetField(tiff, TIFFTAG_SAMPLEFORMAT, image.format);
+    TIFFSetField(tiff, TIFFTAG_PHOTOMETRIC, PHOTOMETRIC_MINISBLACK);
+    TIFFSetField(tiff, TIFFTAG_PLANARCONFIG,
+                 image.separate ? PLANARCONFIG_SEPARATE : PLANARCONFIG_CONTIG);
+    TIFFSetField(tiff, TIFFTAG_COMPRESSION, image.compression);
+    const std::vector<std::uint16_t> extra(static_cast<std::size_t>(samples - 1), 0);
+    if (samples > 1) TIFFSetField(tiff, TIFFTAG_EXTRASAMPLES, samples - 1, extra.data());
+    if (image.overview) TIFFSetField(tiff, TIFFTAG_SUBFILETYPE, FILETYPE_REDUCEDIMAGE);
+    const double scale[3] = {image.dx, image.from_south ? -image.dy : image.dy, 0};
+    const double half = image.areas ? 0.5 : 0;
+    const double top = image.from_south ? image.south - half * image.dy
+                                        : image.south + (image.rows - 1 + half) * image.dy;
+    const double tie[6] = {0, 0, 0, image.west - half * image.dx, top, 0};
+    TIFFSetField(tiff, kScaleTag, 3, scale);
+    TIFFSetField(tiff, kTieTag, 6, tie);
+    const auto raster = static_cast<std::uint16_t>(image.areas ? 1 : 2);
+    const std::uint16_t keys[] = {1, 1, 0, 3, 1024, 0, 1, 2, 1025, 0, 1, raster, 2048, 0, 1, 4326};
+    TIFFSetField(tiff, kKeysTag, 16, keys);
+    std::string xml = "<GDALMetadata>\n<Item name=\"TYPE\">" + image.type + "</Item>\n";
+    if (!image.name.empty()) xml += "<Item name=\"grid_name\">" + image.name + "</Item>\n";
+    if (!image.parent.empty()) {
+      xml += "<Item name=\"parent_grid_name\">" + image.parent + "</Item>\n";
+    }
+    for (int k = 0; k < samples; ++k) {
+      const Band& band = image.bands[static_cast<std::size_t>(k)];
+      const auto add = [&](const char* name, const char* role, const std::string& text) {
+        if (text.empty()) return;
+        xml += std::string("<Item name=\"") + name + "\" sample=\"" + std::to_string(k) + "\"" +
+               (role ? std::string(" role=\"") + role + "\"" : "") + ">" + text + "</Item>\n";
+      };
+      add("DESCRIPTION", "description", band.description);
+      add("UNITTYPE", "unittype", band.unit);
+      add("positive_value", nullptr, band.positive);
+      if (band.scale != 1) add("SCALE", "scale", std::to_string(band.scale));
+      if (band.offset != 0) add("OFFSET", "offset", std::to_string(band.offset));
+    }
+    TIFFSetField(tiff, kMetadataTag, (xml + "</GDALMetadata>").c_str());
+    if (!image.no_data.empty()) TIFFSetField(tiff, kNoDataTag, image.no_data.c_str());
+    constexpr int kTile = 32;
+    const int piece = image.tiled ? kTile : 1;
+    if (image.tiled) {
+      TIFFSetField(tiff, TIFFTAG_TILEWIDTH, kTile);
+      TIFFSetField(tiff, TIFFTAG_TILELENGTH, kTile);
+    } else {
+      TIFFSetField(tiff, TIFFTAG_ROWSPERSTRIP, 7);
+    }
+    const int across = image.tiled ? kTile : image.columns;
+    for (int plane = 0; plane < (image.separate ? samples : 1); ++plane) {
+      for (int y = 0; y < image.rows; y += piece) {
+        for (int x = 0; x < image.columns; x += across) {
+          std::string bytes;
+          for (int r = y; r < y + piece; ++r) {
+            for (int c = x; c < x + across; ++c) {
+              const int row =
+                  std::clamp(image.from_south ? r : image.rows - 1 - r, 0, image.rows - 1);
+              const int column = std::min(c, image.columns - 1);
+              for (int k = image.separate ? plane : 0; k < (image.separate ? plane + 1 : samples);
+                   ++k) {
+                append_sample(&bytes, image.bands[static_cast<std::size_t>(k)].value(row, column),
+                              image);
+              }
+            }
+          }
+          const auto sample = static_cast<std::uint16_t>(plane);
+          if (image.tiled) {
+            TIFFWriteTile(tiff, bytes.data(), static_cast<std::uint32_t>(x),
+                          static_cast<std::uint32_t>(y), 0, sample);
+          } else {
+            TIFFWriteScanline(tiff, bytes.data(), static_cast<std::uint32_t>(y), sample);
+          }
+        }
+      }
+    }
+    TIFFWriteDirectory(tiff);
+  }
+  TIFFClose(tiff);
+}
+
+// The single sub-grid of a .gsb file as a GeoTIFF.
+TiffImage as_tiff(const std::string& national) {
+  const auto all = std::make_shared<std::string>(file_bytes(national));
+  const auto at = [&](std::size_t offset) { return f64_at(*all, 176 + offset) / 3600; };
+  TiffImage image{-at(120), at(72), at(152), at(136), 0, 0, {}};
+  image.columns = static_cast<int>((at(120) - at(104)) / at(152) + 1.5);
+  image.rows = static_cast<int>((at(88) - at(72)) / at(136) + 1.5);
+  const auto value = [all, columns = image.columns](int row, int column, std::size_t which) {
+    const auto node = static_cast<std::size_t>(row * columns + columns - 1 - column);
+    return f32_at(*all, 352 + node * 16 + which * 4);
+  };
+  image.bands = {
+      {"latitude_offset", "arc-second", "", [value](int r, int c) { return value(r, c, 0); }},
+      {"longitude_offset", "arc-second", "east",
+       [value](int r, int c) { return -value(r, c, 1); }}};
+  return image;
+}
+
+TEST(TiffGrids, RealShiftsInEveryLayout) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "g.tif").string();
+  for (const auto& [name, box] : kRealGrids) {
+    if (!fs::exists(kProjData + name) || std::string(name) == "CHENYX06.gsb") continue;
+    SCOPED_TRACE(name);
+    const ShiftGrid national(kProjData + name);
+    const std::vector<Point> in = points_in(box, 500);
+    for (int layout = 0; layout < 16; ++layout) {
+      SCOPED_TRACE(layout);
+      TiffImage image = as_tiff(kProjData + name);
+      image.tiled = (layout & 1) != 0;
+      image.separate = (layout & 2) != 0;
+      image.areas = (layout & 4) != 0;
+      image.from_south = (layout & 8) != 0;
+      image.compression = layout % 3 == 0 ? COMPRESSION_NONE : COMPRESSION_ADOBE_DEFLATE;
+      image.bits = layout == 5 ? 64 : 32;
+      write_tiff(path, {image});
+      const ShiftGrid grid(path);
+      for (const Point& p : in) {
+        EXPECT_NEAR(grid.forward(p).x, national.forward(p).x, 1e-12);
+        EXPECT_NEAR(grid.forward(p).y, national.forward(p).y, 1e-12);
+      }
+#ifdef TIDEWATER_HAVE_PROJ
+      if (layout % 5 == 0 && !image.from_south) expect_as_peer(grid, path, box, 300);
+#endif
+    }
+  }
+}
+
+Band flat_band(const char* description, float value, const char* unit = "arc-second",
+               const char* positive = "") {
+  return {description, unit, positive, [value](int, int) { return value; }};
+}
+
+TEST(TiffGrids, BandsUnitsAndSubGrids) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "g.tif").string();
+  const auto shift_at = [&](double lon, double lat) {
+    const Point p = ShiftGrid(path).forward(Point{lon, lat, 0});
+    return std::pair((p.x - lon) * 3600, (p.y - lat) * 3600);
+  };
+  const TiffImage plain{
+      10, 50, 1, 1, 4, 4, {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  const auto expect = [&](const std::vector<TiffImage>& images, double lon, double lat,
+                          double x = 11.5, double y = 51.5) {
+    write_tiff(path, images);
+    const auto [east, north] = shift_at(x, y);
+    EXPECT_NEAR(east, lon, 1e-8);
+    EXPECT_NEAR(north, lat, 1e-8);
+  };
+  expect({plain}, 5, 3);
+  TiffImage image = plain;
+  image.bands = {flat_band("longitude_offset", 5, "arc-second", "west"),
+                 flat_band("longitude_offset_accuracy", 9), flat_band("latitude_offset", 3)};
+  expect({image}, -5, 3);  // in another order, positive west, with a third between them
+  image.bands = {flat_band("", 3, ""), flat_band("", 5, "")};
+  expect({image}, 5, 3);  // without descriptions: latitude first
+  image.bands = {flat_band("latitude_offset", 0.5, "degree"),
+                 flat_band("longitude_offset", 0.25, "degree")};
+  expect({image}, 900, 1800);
+  image = plain;
+  image.format = SAMPLEFORMAT_INT;
+  for (const int bits : {16, 32}) {
+    image.bits = bits;
+    image.bands = {flat_band("latitude_offset", -300), flat_band("longitude_offset", 200)};
+    for (Band& b : image.bands) b.scale = 0.25;
+    image.bands[1].offset = 1.5;
+    expect({image}, 51.5, -75);
+  }
+  // A child by name, one by its extent, and an overview, which is passed over.
+  TiffImage child{11,
+                  51,
+                  0.5,
+                  0.5,
+                  3,
+                  3,
+                  {flat_band("latitude_offset", 30), flat_band("longitude_offset", 50)}};
+  TiffImage parent = plain;
+  expect({parent, child}, 50, 30);
+  parent.name = "P";
+  child.name = "C";
+  child.parent = "P";
+  expect({parent, child}, 50, 30);
+  expect({parent, child}, 5, 3, 12.5, 52.5);
+  child.overview = true;
+  expect({parent, child}, 5, 3);
+  // Nodes without data.
+  image = plain;
+  image.no_data = "5";
+  write_tiff(path, {image});
+  EXPECT_TRUE(std::isnan(shift_at(11.5, 51.5).first));
+}
+
+TEST(TiffGrids, GeoidAgainstItsGtx) {
+  const std::string path = kProjData + "egm96_15.gtx";
+  if (!fs::exists(path)) GTEST_SKIP() << "egm96_15.gtx is not installed";
+  const std::string bytes = file_bytes(path);
+  const auto value = [&bytes](int row, int column) {
+    const auto at =
+        40 + 4 * (static_cast<std::size_t>(row) * 1440 + static_cast<std::size_t>(column));
+    std::uint32_t bits = 0;
+    for (std::size_t k = 0; k < 4; ++k)
+      bits = bits << 8 | static_cast<unsigned char>(bytes[at + k]);
+    return std::bit_cast<float>(bits);
+  };
+  const ScratchFolder folder;
+  const std::string tif = (folder.path() / "g.tif").string();
+  TiffImage image{-180, -90, 0.25, 0.25, 1440, 721, {{"geoid_undulation", "metre", "", value}}};
+  image.type = "VERTICAL_OFFSET_GEOGRAPHIC_TO_VERTICAL";
+  image.tiled = true;
+  image.compression = COMPRESSION_ADOBE_DEFLATE;
+  write_tiff(tif, {image});
+  const GeoidGrid ours(tif), theirs(path);
+  for (const Point& p : points_in({-180, -90, 180, 90}, 2000)) {
+    EXPECT_NEAR(ours.undulation(p.x, p.y), theirs.undulation(p.x, p.y), 1e-10);
+  }
+#ifdef TIDEWATER_HAVE_PROJ
+  const ProjPeer peer("+proj=vgridshift +multiplier=1 +grids=" + tif);
+  ASSERT_TRUE(peer.ok());
+  for (const Point& p : points_in({-180, -90, 180, 90}, 500)) {
+    EXPECT_NEAR(ours.undulation(p.x, p.y), peer.forward({p.x * kDegree, p.y * kDegree, 0}).z, 1e-6);
+  }
+#endif
+}
+
+TEST_F(BadGrids, TiffsThatCannotBe) {
+  const std::string path = (folder.path() / "x.tif").string();
+  const TiffImage plain{
+      10, 50, 1, 1, 4, 4, {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  const auto expect = [&](const std::vector<TiffImage>& images, const std::string& part) {
+    write_tiff(path, images);
+    const std::string sentence = refusal<ShiftGrid>(path);
+    EXPECT_NE(sentence.find(part), std::string::npos) << sentence;
+  };
+  TiffImage image = plain;
+  image.bands[0].description = "northing_offset";
+  expect({image}, "no bands of datum shifts");
+  image = plain;
+  image.bands[0].unit = "metre";
+  expect({image}, "in the unit metre");
+  image.bands[0].unit = "degree";
+  expect({image}, "bands of different units");
+  image = plain;
+  image.dx = std::numeric_limits<double>::quiet_NaN();
+  expect({image}, "make no grid");
+  image.dx = 1e300;
+  expect({image}, "make no grid");
+  image = plain;
+  image.overview = true;
+  expect({image}, "no image at full size");
+  TiffImage child{10.5, 50.5, 0.5, 0.5, 3, 3, plain.bands};
+  TiffImage other = child;
+  other.west = 11;
+  expect({plain, child, other}, "overlap");
+  child.name = "A";
+  child.parent = "B";
+  other = child;
+  other.name = "B";
+  other.parent = "A";
+  expect({plain, child, other}, "each other's parents");
+  child.parent = "nobody";
+  expect({plain, child}, "is not there");
+  write_tiff(path, {plain});
+  EXPECT_NE(refusal<GeoidGrid>(path).find("no band of undulations"), std::string::npos);
+}
+
+TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
+  const std::string path = (folder.path() / "x.tif").string();
+  TiffImage image{
+      10, 50, 1, 1, 40, 40, {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  for (const bool tiled : {false, true}) {
+    image.tiled = tiled;
+    image.compression = tiled ? COMPRESSION_ADOBE_DEFLATE : COMPRESSION_NONE;
+    write_tiff(path, {image});
+    const std::string good = file_bytes(path);
+    const auto try_it = [&](const std::string& bytes) {
+      folder.write("x.tif", bytes);
+      try {
+        const Point p = ShiftGrid(path).inverse(Point{11.5, 51.5, 0});
+        static_cast<void>(p);
+      } catch (const Error&) {
+      }
+    };
+    for (std::size_t length = 0; length < good.size(); length += 41) try_it(good.substr(0, length));
+    std::mt19937 random(5);
+    for (int k = 0; k < 300; ++k) {
+      std::string bytes = good;
+      // For the most part where the directory is.
+      for (int n = 0; n < 2; ++n) {
+        const std::size_t at =
+            k % 3 == 0 ? random() % bytes.size()
+                       : bytes.size() - 1 - random() % std::min<std::size_t>(900, bytes.size());
+        bytes[at] = static_cast<char>(random());
+      }
+      try_it(bytes);
+    }
+  }
+}
+
+#endif
+
+}  // namespace
