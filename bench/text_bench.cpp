@@ -1,6 +1,4 @@
 #include <array>
-#include <cstdio>
-#include <cstdlib>
 #include <string>
 #include <vector>
 
@@ -31,77 +29,62 @@ std::vector<Text> written(const std::vector<CoordinateTriple>& points) {
 }
 
 // The peer's own form of the same angles, where it is compiled in.
-Kernel peer_reading([[maybe_unused]] const std::vector<Text>& texts) {
+std::shared_ptr<Side> peer_reading([[maybe_unused]] const std::vector<Text>& texts) {
 #ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
   std::vector<std::string> strings;
   for (const Text& text : texts) strings.emplace_back(text.data());
-  return [strings] {
-    double sum = 0;
+  return side([strings, values = std::vector<double>(strings.size())]() mutable {
     GeographicLib::DMS::flag axis;
-    for (const std::string& text : strings) sum += GeographicLib::DMS::Decode(text, axis);
-    keep(sum);
-  };
+    for (std::size_t i = 0; i < strings.size(); ++i) {
+      values[i] = GeographicLib::DMS::Decode(strings[i], axis);
+    }
+  });
 #else
-  return {};
+  return nullptr;
 #endif
 }
 
-Kernel peer_writing([[maybe_unused]] const std::vector<CoordinateTriple>& points) {
+std::shared_ptr<Side> peer_writing([[maybe_unused]] const std::vector<CoordinateTriple>& points) {
 #ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
-  return [points] {
-    std::size_t sum = 0;
-    for (const auto& p : points) {
-      sum += GeographicLib::DMS::Encode(p.x / kArcSecond / 3600, GeographicLib::DMS::SECOND, 3,
-                                        GeographicLib::DMS::LONGITUDE, ':')
-                 .size();
+  return side([points, texts = std::vector<std::string>(points.size())]() mutable {
+    for (std::size_t i = 0; i < points.size(); ++i) {
+      texts[i] =
+          GeographicLib::DMS::Encode(points[i].x / kArcSecond / 3600, GeographicLib::DMS::SECOND, 3,
+                                     GeographicLib::DMS::LONGITUDE, ':');
     }
-    keep(static_cast<double>(sum));
-  };
+  });
 #else
-  return {};
+  return nullptr;
 #endif
 }
 
 const Suite suite([] {
   const auto points = box(-180, -90, 180, 90);
   const auto texts = written(points);
-  add({"angle from text", "GeographicLib",
-       [texts] {
-         double sum = 0;
-         for (const Text& text : texts) {
-           double value = 0;
-           TWstatus word = 0;
-           TWascii_to_rad(text.data(), kColonForm, 0, &value, &word);
-           sum += value;
+  add({"Angle from text",
+       side([texts, values = std::vector<double>(texts.size())]() mutable {
+         TWstatus word = 0;
+         for (std::size_t i = 0; i < texts.size(); ++i) {
+           TWascii_to_rad(texts[i].data(), kColonForm, 0, &values[i], &word);
          }
-         keep(sum);
-       },
-       peer_reading(texts),
-       [texts] {
-         double sum = 0;
-         for (const Text& text : texts) sum += std::strtod(text.data(), nullptr);
-         keep(sum);
-       }});
-  add({"angle to text", "GeographicLib",
-       [points] {
-         double sum = 0;
-         Text text;
-         for (const auto& p : points) {
-           TWstatus word = 0;
-           TWrad_to_ascii(p.x, kColonForm, 0, text.data(), &word);
-           sum += text[0];
+       }),
+       {"GeographicLib"},
+       {peer_reading(texts)},
+       {},
+       "",
+       false});
+  add({"Angle to text",
+       side([points, out = texts]() mutable {
+         TWstatus word = 0;
+         for (std::size_t i = 0; i < points.size(); ++i) {
+           TWrad_to_ascii(points[i].x, kColonForm, 0, out[i].data(), &word);
          }
-         keep(sum);
-       },
-       peer_writing(points),
-       [points] {
-         double sum = 0;
-         Text text;
-         for (const auto& p : points) {
-           sum += std::snprintf(text.data(), text.size(), "%.3f", p.x / kArcSecond);
-         }
-         keep(sum);
-       }});
+       }),
+       {"GeographicLib"},
+       {peer_writing(points)},
+       {},
+       "",
+       false});
 });
 
 }  // namespace

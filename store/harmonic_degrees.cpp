@@ -26,16 +26,13 @@ std::string fault_of_epochs(const TableStore& store, std::string_view name) {
     const char* row = epochs->row(i);
     std::int16_t degree = 0;
     std::memcpy(&degree, row + 8, sizeof degree);
-    const std::string row_words =
-        "table \"" + std::string(name) + "\": row " + std::to_string(i + 1) + ": degree ";
-    if (degree == 1) return row_words + "1, 2 at least are needed";
     const Table* coefficients = find(store, text_at(row, 10, 33), 24);
     if (degree < 1 || !coefficients) continue;
     const std::size_t needed = rows_of_degree(static_cast<std::size_t>(degree));
     if (coefficients->size() >= needed) continue;
-    return row_words + std::to_string(degree) + " needs " + std::to_string(needed) +
-           " coefficients, table \"" + std::string(text_at(row, 10, 33)) + "\" has " +
-           std::to_string(coefficients->size());
+    return "table \"" + std::string(name) + "\": row " + std::to_string(i + 1) + ": degree " +
+           std::to_string(degree) + " needs " + std::to_string(needed) + " coefficients, table \"" +
+           std::string(text_at(row, 10, 33)) + "\" has " + std::to_string(coefficients->size());
   }
   return {};
 }

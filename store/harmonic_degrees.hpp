@@ -11,11 +11,10 @@ class TableStore;
 // Rows of a coefficient table of degree N: one for each (n, m), 0 <= m <= n <= N.
 constexpr std::size_t rows_of_degree(std::size_t degree) { return (degree + 1) * (degree + 2) / 2; }
 
-// The first epoch of a magnetic model whose coefficient table has fewer rows than its degree needs,
-// or whose degree is 1; empty where there is none.  The library repeats the last row of a table
-// that is too short, which gives a field that no model has, and its users allocate by the degree;
-// the synthesis writes the rows of degree 2 whatever the degree.  What the library itself refuses,
-// and a table that is missing or packed otherwise, is no fault here.
+// The first epoch of a magnetic model whose coefficient table has fewer rows than its degree needs;
+// empty where there is none.  The library repeats the last row of a table that is too short, which
+// gives a field that no model has, and its users allocate by the degree.  What the library or its
+// users refuse, and a table that is missing or packed otherwise, is no fault here.
 std::string fault_of_harmonic_degrees(const TableStore& store);
 
 }  // namespace tabdll

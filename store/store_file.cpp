@@ -14,7 +14,7 @@ namespace tabdll {
 namespace {
 
 // Longer than any store that serves its purpose; ours has two hundred thousand bytes.
-constexpr std::int64_t kLongestFile = std::int64_t{256} << 20;
+constexpr std::int64_t kLongestFile = std::int64_t{64} << 20;
 
 class Descriptor {
  public:

@@ -19,18 +19,24 @@ namespace {
 using Layouts = std::map<std::string, Layout, std::less<>>;
 
 // The longest text that is read from a file, a table's definition included: one of as many columns
-// as a row has bytes fits with names of a hundred letters.
-constexpr int kLongestText = 100'000;
+// as a row has bytes fits with names of a hundred letters each.
+constexpr int kLongestText = 60'000;
+
+// The same for the cells of a table: no field takes a longer one, in whatever encoding it stands.
+constexpr int kLongestCell = 4 * TW_STORE_ROW_LIMIT;
 
 // Packed rows in memory.  A sound file of the longest allowed length stays far below; one with
 // layouts much longer than its cells need not.
 constexpr std::size_t kMostPackedBytes = std::size_t{512} << 20;
 
-// Steps of SQLite's machine that reading a file may take.  A sound one takes a few for each of its
-// bytes; one whose pages are shared or lie in a circle would go on for ever.
+// Steps of SQLite's machine that reading a file may take, a thousand to the tick.  Ours takes one
+// for five of its bytes, and a wide table of the shortest cells four for each; a file whose pages
+// are shared or lie in a circle would go on for ever.  Steps through the schema are the dearest, as
+// each row may hold a definition of the longest length, and there are few.
 constexpr int kStepsPerTick = 1000;
+constexpr std::int64_t kSchemaTicks = 1000;
 std::int64_t ticks_for(std::size_t file_size) {
-  return 1000 + static_cast<std::int64_t>(file_size) * 40 / kStepsPerTick;
+  return 200 + static_cast<std::int64_t>(file_size) * 10 / kStepsPerTick;
 }
 
 template <class Number>
@@ -150,7 +156,7 @@ bool is_plain(std::string_view sql) {
 class Loader {
  public:
   explicit Loader(std::vector<unsigned char>& file)
-      : database_(open_in_memory()), ticks_(ticks_for(file.size())) {
+      : database_(open_in_memory()), size_(file.size()) {
     harden();
     const auto size = static_cast<sqlite3_int64>(file.size());
     if (sqlite3_deserialize(database_.get(), "main", file.data(), size, size,
@@ -205,7 +211,10 @@ class Loader {
   }
 
   std::map<std::string, Table, std::less<>> load_tables() {
+    ticks_ = std::min(ticks_for(size_), kSchemaTicks);
     const std::vector<std::string> names = read_names();
+    ticks_ = ticks_for(size_);
+    sqlite3_limit(database_.get(), SQLITE_LIMIT_LENGTH, kLongestCell);
     Layouts layouts = read_layouts();
     std::map<std::string, Table, std::less<>> tables;
     for (const std::string& name : names) {
@@ -309,7 +318,8 @@ class Loader {
   }
 
   Database database_;
-  std::int64_t ticks_;  // left; below 0 once the reading was broken off
+  std::size_t size_;        // of the file
+  std::int64_t ticks_ = 0;  // left; below 0 once the reading was broken off
   std::size_t packed_ = 0;
 };
 

@@ -314,7 +314,7 @@ Made make_polyconic(const MethodArguments& given) {
 
 // IOGP Publication 373-7-2, method 1028.
 Made make_equidistant_cylindrical(const MethodArguments& given) {
-  const MeridianArc arc(given.a, given.f);
+  const ExactMeridianArc arc(given.a, given.f);
   const double lat1 = given(kLat1);
   const double parallel = transverse_radius(given, lat1) * std::cos(lat1);
   require(parallel > 0, given, "the standard parallel lies at a pole");
@@ -390,7 +390,7 @@ Made make_azimuthal_equidistant(const MethodArguments& given) {
 Made make_guam(const MethodArguments& given) {
   const double a = given.a;
   const double e2 = given.e2;
-  const MeridianArc arc(a, given.f);
+  const ExactMeridianArc arc(a, given.f);
   const double origin = arc.arc(given(kLat0));
   const auto bend = [=](double x, double lat) {
     const double s = std::sin(lat);
@@ -455,7 +455,7 @@ Made make_tunisia_mining(const MethodArguments& given) {
 // Lambert's conic with the arc's scale cut off after the third power: IOGP Publication 373-7-2,
 // method 9817.
 Made make_lambert_near_conformal(const MethodArguments& given) {
-  const MeridianArc arc(given.a, given.f);
+  const ExactMeridianArc arc(given.a, given.f);
   const double lat0 = given(kLat0);
   const double k0 = given(kK0, 1);
   const double s0 = std::sin(lat0);

@@ -66,7 +66,7 @@ class TransverseMercatorGrid {
   }
 
  private:
-  detail::TransverseMercator map_{kA, kF, 0.9996};
+  TransverseMercator map_{kA, kF, 0.9996};
 };
 
 // Degrees to metres and back about a pole.

@@ -253,6 +253,24 @@ class Writer {
     }
   }
 
+  // The dialect's Mercator has the parallel of true scale in place of the scale on the equator.
+  void mercator_of_esri(const Definition& definition, const std::string& name) {
+    const double k0 = definition.parameter(kK0, 1);
+    const double rf = definition.datum.ellipsoid.inverse_flattening;
+    const double f = rf == 0 ? 0 : 1 / rf;
+    const double e2 = f * (2 - f);
+    if (!(k0 <= 1)) {
+      throw Error("The dialect of .prj files has no Mercator with a scale above one, which " +
+                  definition.name + " has.");
+    }
+    const double parallel = std::asin(std::sqrt((1 - k0 * k0) / (1 - k0 * k0 * e2)));
+    out_ += ",PROJECTION[" + in_quotes(name) + "]";
+    parameter("False_Easting", definition.parameter(kX0), Quantity::length, 0, definition);
+    parameter("False_Northing", definition.parameter(kY0), Quantity::length, 0, definition);
+    parameter("Central_Meridian", definition.parameter(kLon0), Quantity::angle, 0, definition);
+    parameter("Standard_Parallel_1", parallel, Quantity::angle, 0, definition);
+  }
+
   void method_of_version_1(const Definition& definition, const Method& method) {
     const bool common = esri() ? !method.esri.empty() : has_common_name(method.code);
     std::string name(esri() ? method.esri : method.wkt1);
@@ -260,9 +278,17 @@ class Writer {
       name = method.name;
       for (char& c : name) c = c == ' ' ? '_' : c;
     }
-    const double pole = definition.parameter(method.code == 9829 ? kLatTrue : kLat0);
-    const bool polar = method.code == 9829 || method.code == 9810;
+    const double pole = definition.parameter(kLatTrue);
+    const bool polar = method.code == 9829;
     if (esri() && polar && pole < 0) name = "Stereographic_South_Pole";
+    // The dialect has no polar grid with a scale at the pole; it is written as in version 1.
+    if (esri() && method.code == 9810) name = method.wkt1;
+    // Its axes or its rotation tell it from the other Krovak.
+    if (method.code == 1041) name = "Krovak";
+    if (esri() && method.code == 9804) {
+      mercator_of_esri(definition, name);
+      return;
+    }
     out_ += ",PROJECTION[" + in_quotes(name) + "]";
     for (const MethodParameter& given : method.parameters) {
       const ParameterKind& kind = *parameter_kind(given.code);
@@ -271,8 +297,7 @@ class Writer {
       // A Mercator on the equator and a polar grid with its scale have no latitude in version 1.
       if (!esri() && method.code == 9804 && given.code == kLat0 && value == 0) continue;
       if (esri()) {
-        if (polar && (given.code == kLatTrue || given.code == kLat0)) word = "Standard_Parallel_1";
-        if (method.code == 9804 && given.code == kLat0) continue;
+        if (polar && given.code == kLatTrue) word = "Standard_Parallel_1";
         if (method.code == 1024 && given.code == kLat0) word = "Standard_Parallel_1";
         if ((method.code == 9815 || method.code == 9812) && given.code == kRectifiedAngle) {
           // The dialect has another name where the grid is not rectified by the azimuth itself.
@@ -333,8 +358,7 @@ class Writer {
       out_ += "]";
       method_of_version_1(definition, method);
       unit("LENGTHUNIT", definition.unit, "unknown");
-      // Krovak without axes is the southing, westing one.
-      if (!esri() && method.code != 9819) axes(definition, "", kNamesOfVersion1);
+      if (!esri()) axes(definition, "", kNamesOfVersion1);
       if (method.code == 1024 && !esri()) {
         out_ += ",EXTENSION[\"PROJ4\",\"+proj=merc +a=6378137 +b=6378137 +lat_ts=0 +lon_0=" +
                 degrees_text(definition.parameter(kLon0)) +

@@ -16,8 +16,7 @@
  *
  * A name list is a flat area of entries 41 bytes apart, each a text with its terminator; the area
  * holds as many entries as the count function of the same table tells, and is not checked.  Lists
- * come in the byte order of the names.  A list never has more entries than the
- * store counts rows: where the walk goes on behind them the word is #TW_PF_TABLE_ERROR.
+ * come in the byte order of the names.
  */
 #ifndef TIDEWATER_CATALOGUE_H
 #define TIDEWATER_CATALOGUE_H
@@ -655,8 +654,7 @@ TW_API void TWmagmdl_info(const char* store, char* name, int16_t* number, int16_
  * @param epochs       date of each set, years
  * @param table_names  names of the coefficient tables, 33 bytes apart
  * @param status       #TW_BAD_DATA where the dates do not rise strictly or a degree is not above 0:
- *                     the sets before it (and the date, where it is the degree) are written; also
- *                     where the store's rows are more than it counts
+ *                     the sets before it (and the date, where it is the degree) are written
  */
 TW_API void TWepoch_info(const char* store, const char* epoch_table, int32_t* degrees,
                          double* epochs, char* table_names, TWstatus* status);

@@ -39,20 +39,19 @@ TWstatus read_model(const Row& row, char* epoch_table, double* model_constant_1,
 
 // One walk of an epoch table, up to its end or to the first row that cannot be.
 TWstatus read_epochs(const char* epoch_table, int32_t* degrees, double* epochs, char* table_names) {
+  Row row;
   double last = 0;
-  return walk_counted(
-      epoch_table,
-      [&](const Row& row, std::size_t i) {
-        const auto date = row.number<double>(epoch_row::kDate);
-        if (i > 0 && !(date > last)) return TW_BAD_DATA;
-        epochs[i] = last = date;
-        const auto degree = row.number<int16_t>(epoch_row::kDegree);
-        if (degree <= 0) return TW_BAD_DATA;
-        degrees[i] = degree;
-        row.text(epoch_row::kTable, table_names + i * kTableSlot);
-        return TW_SUCCESS;
-      },
-      TW_BAD_DATA);
+  for (std::size_t i = 0; OLB7R3_PF_get_next_row(epoch_table, row.data()) != TW_STORE_END_OF_TABLE;
+       ++i) {
+    const auto date = row.number<double>(epoch_row::kDate);
+    if (i > 0 && !(date > last)) return TW_BAD_DATA;
+    epochs[i] = last = date;
+    const auto degree = row.number<int16_t>(epoch_row::kDegree);
+    if (degree <= 0) return TW_BAD_DATA;
+    degrees[i] = degree;
+    row.text(epoch_row::kTable, table_names + i * kTableSlot);
+  }
+  return TW_SUCCESS;
 }
 
 }  // namespace

@@ -42,10 +42,9 @@ void TWsomps_get_all(const char* store, SatelliteRecord* records, TWstatus* stat
   in_store(store, Close::kIgnored, status, [&] {
     const TWstatus begun = begin_walk(kTable, "sat_name");
     if (!TW_OK(begun)) return begun;
-    return walk_counted(kTable, [&](const Row& row, std::size_t index) {
-      unpack(row, records[index]);
-      return TW_SUCCESS;
-    });
+    SatelliteRecord* record = records;
+    walk(kTable, [&](const Row& row) { unpack(row, *record++); });
+    return TW_SUCCESS;
   });
 }
 

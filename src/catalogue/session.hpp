@@ -62,41 +62,22 @@ void walk(const char* table, Visit visit) {
   while (OLB7R3_PF_get_next_row(table, row.data()) != TW_STORE_END_OF_TABLE) visit(row);
 }
 
-// The number of rows of a table; failed is the word where the store does not tell it.
-inline TWstatus count_rows(const char* table, Judge judge, TWstatus failed, int32_t* count) {
-  int32_t rows = 0;
-  if (!worked(OLB7R3_PF_inq_num_rows(table, &rows), judge) || rows < 0) return failed;
-  *count = rows;
-  return TW_SUCCESS;
-}
-
-// A walk for a list whose size the caller has from the table's row count: visit() gets a row and
-// its index as often as the store counts and no oftener, whatever the walk would give.  A walk that
-// goes on behind the count gives too_long; by contract one that ends before it is no failure.
-// visit() returns a status that ends the walk where it is a failure.
-template <class Visit>
-TWstatus walk_counted(const char* table, Visit visit, TWstatus too_long = TW_PF_TABLE_ERROR) {
-  int32_t count = 0;
-  const TWstatus counted = count_rows(table, Judge::kExact, TW_PF_TABLE_ERROR, &count);
-  if (!TW_OK(counted)) return counted;
-  Row row;
-  for (int32_t i = 0; OLB7R3_PF_get_next_row(table, row.data()) != TW_STORE_END_OF_TABLE; ++i) {
-    if (i == count) return too_long;
-    const TWstatus visited = visit(row, static_cast<std::size_t>(i));
-    if (!TW_OK(visited)) return visited;
-  }
-  return TW_SUCCESS;
-}
-
 // The names of all rows, in the order of the column.
 inline TWstatus list_names(const char* table, const char* column, const TextField& field,
                            char* names, TWstatus search_failed = TW_PF_TABLE_ERROR) {
   const TWstatus begun = begin_walk(table, column, search_failed);
   if (!TW_OK(begun)) return begun;
-  return walk_counted(table, [&](const Row& row, std::size_t index) {
-    row.list_name(field, names, index);
-    return TW_SUCCESS;
-  });
+  std::size_t index = 0;
+  walk(table, [&](const Row& row) { row.list_name(field, names, index++); });
+  return TW_SUCCESS;
+}
+
+// The number of rows of a table; failed is the word where the store does not tell it.
+inline TWstatus count_rows(const char* table, Judge judge, TWstatus failed, int32_t* count) {
+  int32_t rows = 0;
+  if (!worked(OLB7R3_PF_inq_num_rows(table, &rows), judge)) return failed;
+  *count = rows;
+  return TW_SUCCESS;
 }
 
 }  // namespace tidewater::detail

@@ -24,11 +24,13 @@ int32_t TWspcs_get_all(const char* store, int16_t datum_kind, ZoneRecord* record
     const char* table = zone_table(datum_kind);
     const TWstatus begun = begin_walk(table, "zone_name");
     if (!TW_OK(begun)) return begun;
-    return walk_counted(table, [&](const Row& row, std::size_t index) {
-      records[index].zone_number = row.number<int16_t>(zone_row::kNumber);
-      row.text(zone_row::kName, records[index].zone_name);
-      return TW_SUCCESS;
+    ZoneRecord* record = records;
+    walk(table, [&](const Row& row) {
+      record->zone_number = row.number<int16_t>(zone_row::kNumber);
+      row.text(zone_row::kName, record->zone_name);
+      ++record;
     });
+    return TW_SUCCESS;
   });
   return 1;
 }

@@ -334,9 +334,12 @@ void index_children() {
   }
   std::ranges::sort(children, {}, [](const Child& c) { return std::pair(c.parent, c.grid); });
   const auto range_of = [&](const Name& parent, int32_t* first, int32_t* last) {
-    const auto range = std::ranges::equal_range(children, parent, {}, &Child::parent);
-    *first = static_cast<int32_t>(range.begin() - children.begin());
-    *last = static_cast<int32_t>(range.end() - children.begin());
+    // Two searches where one would do: clang 14 does not compile a pair of ends from GCC 12's
+    // library.
+    const auto begin = std::ranges::lower_bound(children, parent, {}, &Child::parent);
+    const auto end = std::ranges::upper_bound(children, parent, {}, &Child::parent);
+    *first = static_cast<int32_t>(begin - children.begin());
+    *last = static_cast<int32_t>(end - children.begin());
   };
   range_of(kNoParent, &cnt_first_root, &cnt_last_root);
   for (int32_t i = 0; i < cnt_num_file; ++i) {

@@ -98,11 +98,11 @@ inline double authalic_radius_squared(double a, double f) {
 }
 
 // The distance along the meridian from the equator, both ways, radians and the unit of a.
-struct MeridianArc {
+struct ExactMeridianArc {
   double radius;  // of the rectifying sphere
   LatitudeSeries to_rectifying, to_geodetic;
 
-  MeridianArc(double a, double f)
+  ExactMeridianArc(double a, double f)
       : radius(rectifying_radius(a, f)),
         to_rectifying(kRectifyingFromGeodetic, third_flattening(f)),
         to_geodetic(kGeodeticFromRectifying, third_flattening(f)) {}

@@ -20,6 +20,7 @@
 #include "tidewater/lines.h"
 
 using namespace tidewater::detail;
+namespace points = tidewater::points;
 
 namespace {
 
@@ -71,10 +72,30 @@ class VertexExpansion {
 
   // As to(), with the point pulled back; and its two halves.
   ArcAndLongitude pulled_back(double x, double k) const { return to(pull_back(x, k), k); }
-  double pulled_back_arc(double x, double k) const { return arc(integrate(pull_back(x, k), k)); }
-  double pulled_back_longitude(double x, double k) const {
-    x = pull_back(x, k);
-    return longitude(integrate(x, k), x, k);
+
+  // The point at an arc from the vertex, from its equator to the vertex: its arc angle by Newton's
+  // method, and what follows from it.
+  struct Point {
+    double x;    // sine of reduced latitude
+    double lon;  // from the vertex
+  };
+  Point at(double wanted, double k, double ep2) const {
+    // Stated on x; on the angle, of which x = k cos(theta) is the cosine, a pass needs neither an
+    // arc tangent nor a root of a small difference, and comes to rest at the same point.  Running
+    // out of passes is not reported.
+    constexpr int kMostPasses = 11;
+    double theta = wanted / b_;
+    for (int pass = 0; pass < kMostPasses; ++pass) {
+      const auto [s, r] = points::sincos(theta);
+      const double d =
+          (wanted - arc(integrate(r, s, theta, k))) / (b_ * std::sqrt(1 + ep2 * square(k * r)));
+      theta += d;
+      // What this step leaves is of the order of its square, times the ellipsoid's ep2.
+      if (std::fabs(d) <= 1e-9) break;
+    }
+    const auto [s, r] = points::sincos(theta);
+    const double x = pull_back(k * r, k);
+    return {x, longitude(integrate(r, s, theta, k), x, k)};
   }
 
  private:
@@ -87,7 +108,11 @@ class VertexExpansion {
   static Integrals integrate(double x, double k) {
     const double r = x / k;
     const double s = std::sqrt(1 - r * r);
-    const double theta = std::atan2(s, r);
+    return integrate(r, s, points::atan2(s, r), k);
+  }
+
+  // With theta itself at hand.
+  static Integrals integrate(double r, double s, double theta, double k) {
     // f_j = g_j k^(2j) s / (2j)
     const double r2 = r * r;
     const double k2 = k * k;
@@ -119,7 +144,7 @@ class VertexExpansion {
     const double cx = std::sqrt(1 - x * x);
     const double ck = std::sqrt(1 - k * k);
     const double q = ck * i.r / cx;
-    const double sphere = q < 1 ? std::atan2(std::sqrt(1 - q * q), q) : 0;
+    const double sphere = q < 1 ? points::atan2(std::sqrt(1 - q * q), q) : 0;
     return sphere - ck * (lon_[0] * i.theta +
                           (lon_[1] * i.f1 + (lon_[2] * i.f2 + (lon_[3] * i.f3 + lon_[4] * i.f4))));
   }
@@ -205,22 +230,6 @@ void direct_on_sphere(CoordinateTriple start, double azimuth, double angle, Coor
   end->y = lat2;
 }
 
-// The sine of reduced latitude at an arc from the vertex, by Newton's method.  Running out of
-// passes is not reported.
-double latitude_sine_at(const VertexExpansion& expansion, double arc, double k, double b,
-                        double ep2) {
-  constexpr int kMostPasses = 11;
-  double w = k * std::cos(arc / b);
-  for (int pass = 0; pass < kMostPasses; ++pass) {
-    const double previous = w;
-    const double d = (expansion.pulled_back_arc(w, k) - arc) *
-                     std::sqrt((k * k - w * w) / (ep2 * w * w + 1)) / b;
-    w += d;
-    if (std::fabs(d) <= 1e-16 || w == previous) break;  // a further pass would be this one again
-  }
-  return w;
-}
-
 constexpr int kMostInversePasses = 30;
 
 void inverse_on_meridian(double dl, double lat1, double lat2, double a, double e, double* azimuth,
@@ -274,8 +283,10 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
   const double e2 = e * e;
   const double ep2 = e2 / (1 - e2);
   const double b = std::sqrt(1 - e2) * a;
-  auto [x1, c1] = reduced_latitude(std::sin(lat1), std::cos(lat1), ep2, a / b);
-  auto [x2, c2] = reduced_latitude(std::sin(lat2), std::cos(lat2), ep2, a / b);
+  const auto [s1, co1] = points::sincos(lat1);
+  const auto [s2, co2] = points::sincos(lat2);
+  auto [x1, c1] = reduced_latitude(s1, co1, ep2, a / b);
+  auto [x2, c2] = reduced_latitude(s2, co2, ep2, a / b);
   x1 = at_most_one(x1);
   c1 = at_most_one(c1);
   c2 = at_most_one(c2);
@@ -300,8 +311,7 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
   }
 
   // First estimate on the auxiliary sphere.
-  const double sl = std::sin(dl);
-  const double cl = std::cos(dl);
+  const auto [sl, cl] = points::sincos(dl);
   const double sin_arc =
       (sl < 0 ? -1 : 1) * std::sqrt(2 * (1 - cl) * c2 * x2 * c1 * x1 + square(c2 * x1 - x2 * c1) +
                                     square(sl * c2 * c1));
@@ -314,7 +324,7 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
   const double g2 = cos_az2 < 0 ? -1 : 1;
   const double m = sin_az1 * c1;
   double k = std::sqrt(1 - m * m);
-  double v = std::atan2(k, m);  // reduced latitude of the vertex
+  double v = points::atan2(k, m);  // reduced latitude of the vertex
 
   // The vertex is kept above both points.
   const double highest = x2 <= x1 ? x1 : x2;
@@ -353,7 +363,7 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
     } else {
       step = -excess / slope;
     }
-    k = std::sin(step + v);
+    k = points::sincos(step + v).sin;
     if (k <= highest) {
       k = pad + highest;
       v = std::asin(k);
@@ -388,8 +398,8 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
   if (std::fabs(p1) > 0.999999999999999) p1 = -1;
   double p2 = clairaut / c2 >= 1 ? 1 : clairaut / c2;
   if (std::fabs(p2) > 0.999999999999999) p2 = 1;
-  *azimuth = std::atan2(west * p1, mirror * (g1 * std::sqrt(1 - p1 * p1)));
-  *back_azimuth = std::atan2(west * p2, mirror * (g2 * std::sqrt(1 - p2 * p2)));
+  *azimuth = points::atan2(west * p1, mirror * (g1 * std::sqrt(1 - p1 * p1)));
+  *back_azimuth = points::atan2(west * p2, mirror * (g2 * std::sqrt(1 - p2 * p2)));
 }
 
 }  // namespace
@@ -434,11 +444,11 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
   const double e2 = e * e;
   const double ep2 = e2 / (1 - e2);
   const double b = std::sqrt(1 - e2) * a;
-  const double sin_az = std::sin(azimuth);
-  const double cos_az = std::cos(azimuth);
+  const auto [sin_az, cos_az] = points::sincos(azimuth);
   const double east = sin_az >= 0 ? 1 : -1;
   double ahead = cos_az >= 0 ? 1 : -1;  // whether the vertex lies ahead
-  const auto [sin_beta, c1] = reduced_latitude(std::sin(lat1), std::cos(lat1), ep2, a / b);
+  const auto [sin_lat1, cos_lat1] = points::sincos(lat1);
+  const auto [sin_beta, c1] = reduced_latitude(sin_lat1, cos_lat1, ep2, a / b);
   const double x1 = std::fabs(sin_beta);
   const double m = std::fabs(c1 * sin_az);  // Clairaut's constant
   // Either form keeps k accurate where the other does not.
@@ -469,17 +479,18 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
   const bool before_vertex = arc < 0;
   if (before_vertex) arc = -arc;
 
-  double w = k * std::cos(arc / b);
+  double w = k * points::sincos(arc / b).cos;
   double lon = arc / b * m;  // By contract: the product, and a limit in the unit of a, not scaled.
   if (!(arc < 0.01)) {
-    w = latitude_sine_at(expansion, arc, k, b, ep2);
-    lon = expansion.pulled_back_longitude(w, k);
+    const auto at = expansion.at(arc, k, ep2);
+    w = at.x;
+    lon = at.lon;
   }
   double c2 = std::sqrt(1 - w * w);
   if (c2 < m) c2 = m;
 
   const bool mirrored = south != (half_waves % 2 != 0);
-  const double lat2 = std::atan2(w * a, c2 * b);
+  const double lat2 = points::atan2(w * a, c2 * b);
   end->y = mirrored ? -lat2 : lat2;
   end->x = into_shifted_half_turn(lon1 +
                                   east * (2 * static_cast<double>(half_waves) * quarter.lon +
@@ -488,7 +499,7 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
   const double t = m / c2;
   double u = t < 0.999999 ? std::sqrt(1 - t * t) : std::sqrt((w + k) * (k - w)) / c2;
   if (mirrored != before_vertex) u = -u;
-  double back = (std::atan2(u, t) + kHalfPi) * east + kPi;
+  double back = (points::atan2(u, t) + kHalfPi) * east + kPi;
   if (back >= 6.283185307179585) back -= kTwoPi;  // 2 pi - 1e-15
   *back_azimuth = back;
 }

@@ -42,7 +42,7 @@ void store(const DegreeSums<kMode, double>& of, int32_t m, const Sums& sums) {
 }
 
 template <Mode kMode>
-void sum_degrees(const Series& series, const Argument<double>& at, const Sums& sums) {
+void sum_degrees(const HarmonicSeries& series, const Argument<double>& at, const Sums& sums) {
   const int32_t N = series.N;
   const Argument<Orders> both_at = {at.tcos, at.tsin, at.q2};
   int32_t m = 0;
@@ -57,7 +57,8 @@ void sum_degrees(const Series& series, const Argument<double>& at, const Sums& s
   if (m == N) store(DegreeSums<kMode, double>(series, m), m, sums);
 }
 
-void sum_degrees(int16_t mode, const Series& series, const Argument<double>& at, const Sums& sums) {
+void sum_degrees(int16_t mode, const HarmonicSeries& series, const Argument<double>& at,
+                 const Sums& sums) {
   switch (mode) {
     case kGradient:
       return sum_degrees<kGradient>(series, at, sums);
@@ -90,7 +91,8 @@ void tabulate_multiples(double lon, int32_t N, double* const* rec_b) {
 }
 
 template <Mode kMode>
-OrderSums<double> sum_orders(const Series& series, const Argument<double>& at, const Sums& sums) {
+OrderSums<double> sum_orders(const HarmonicSeries& series, const Argument<double>& at,
+                             const Sums& sums) {
   OrderChain<kMode, double> chain;
   for (int32_t m = series.N; m >= 0; --m) {
     const double cos_m = series.rec_b[m][m];
@@ -110,10 +112,10 @@ OrderSums<double> sum_orders(const Series& series, const Argument<double>& at, c
 // The synthesis of one call, on the caller's caches.
 class Synthesis {
  public:
-  Synthesis(int16_t mode, const Series& series, double radius, double tolerance, const Sums& sums,
-            double* last_colat, double* last_radius, double* last_lon, double* saved_tcos,
-            double* saved_tsin, double* saved_scale_theta, double* saved_scale_lambda,
-            double* saved_scale_r)
+  Synthesis(int16_t mode, const HarmonicSeries& series, double radius, double tolerance,
+            const Sums& sums, double* last_colat, double* last_radius, double* last_lon,
+            double* saved_tcos, double* saved_tsin, double* saved_scale_theta,
+            double* saved_scale_lambda, double* saved_scale_r)
       : mode_(mode),
         series_(series),
         radius_(radius),
@@ -333,7 +335,7 @@ class Synthesis {
   }
 
   int16_t mode_;
-  Series series_;
+  HarmonicSeries series_;
   double radius_, tolerance_;
   Sums sums_;
   double *last_colat_, *last_radius_, *last_lon_;
@@ -359,7 +361,7 @@ void TWhar_sum(int16_t mode, int32_t N, double radius, double** C, double** S, d
                double gamma_pole, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                TWstatus* status) {
   *status = TW_SUCCESS;
-  const Series series = {N, C, S, rec_a, rec_b};
+  const HarmonicSeries series = {N, C, S, rec_a, rec_b};
   const Sums sums = {sum_dC, sum_dS, sum_lC, sum_lS, sum_rC, sum_rS, sum_C, sum_S};
   for (double* sum : {sum_dS, sum_lS, sum_rS, sum_S, sum_lC}) sum[0] = 0;
   Synthesis synthesis(mode, series, radius, tolerance, sums, last_colat, last_radius, last_lon,

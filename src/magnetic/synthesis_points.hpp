@@ -24,7 +24,7 @@ inline constexpr bool kEast = kMode == kGradient || kMode == kAlongLambda;
 template <Mode kMode>
 inline constexpr bool kDown = kMode == kGradient || kMode == kRadial;
 
-struct Series {
+struct HarmonicSeries {
   int32_t N;
   double* const* C;
   double* const* S;
@@ -84,7 +84,7 @@ TW_INLINE Chain<double> order_of(const Chain<Orders>& chain, int j) {
 template <Mode kMode, class Value>
 struct DegreeSums {
   // At the degree of the series, above which y and d are zero.
-  TW_INLINE DegreeSums(const Series& series, int32_t m) {
+  TW_INLINE DegreeSums(const HarmonicSeries& series, int32_t m) {
     const int32_t n = series.N;
     c.y = take<Value>(series.C[n] + m);
     s.y = take<Value>(series.S[n] + m);
@@ -101,7 +101,8 @@ struct DegreeSums {
 
   // Goes down to degree n from n + 1.
   template <class Number>
-  TW_INLINE void step(const Series& series, const Argument<Number>& at, int32_t m, int32_t n) {
+  TW_INLINE void step(const HarmonicSeries& series, const Argument<Number>& at, int32_t m,
+                      int32_t n) {
     static constexpr double kNone[2] = {};
     const auto a = take<Value>(series.rec_a[n + 1] + m);
     const auto b = take<Value>(n + 2 <= series.N ? series.rec_b[n + 2] + m : kNone);
@@ -183,7 +184,7 @@ struct HarmonicSums {
   // Above this degree the table of multiples would not fit the stack.
   static constexpr int32_t kMostDegree = 64;
 
-  Series series;
+  HarmonicSeries series;
   double radius;
 
   template <Number V>

@@ -223,19 +223,31 @@ TEST_F(CraftedStore, SharedPagesWhoseRowsHaveNoEnd) {
     pages.make_inner(root, 540, child);
     pages.write(store);
     SCOPED_TRACE(table);
-    expect_refused(store, "");
+    expect_refused(store, table == std::string("vert_datum") ? "does not end" : "");
   }
 }
 
 TEST_F(CraftedStore, ADeepChainOfPagesIsNotFollowed) {
   const std::string store = datums();
+  alter(store, "PRAGMA page_size = 512; VACUUM");
   const std::uint32_t root = root_of(store, "vert_datum");
   Pages pages(store);
   std::uint32_t child = pages.add_copy(root);
-  for (int i = 0; i < 20000; ++i) child = pages.add_inner(1, child);
+  for (int i = 0; i < 60000; ++i) child = pages.add_inner(1, child);
   pages.make_inner(root, 1, child);
   pages.write(store);
   expect_refused(store, "malformed");
+}
+
+TEST_F(CraftedStore, ASchemaOfLongDefinitionsThatHasNoEnd) {
+  const std::string store = datums();
+  alter(store, "CREATE TABLE more (\"" + std::string(50000, 'n') + "\" INTEGER)");
+  Pages pages(store);
+  std::uint32_t child = pages.add_copy(1);
+  for (int i = 0; i < 6; ++i) child = pages.add_inner(540, child);
+  pages.make_inner(1, 540, child);
+  pages.write(store);
+  expect_refused(store, "does not end");
 }
 
 TEST_F(CraftedStore, APageOfTwoTables) {
@@ -276,7 +288,7 @@ TEST_F(CraftedStore, CoefficientTablesHoldTheirDegree) {
       {12, 90, "table \"e\": row 1: degree 12 needs 91 coefficients, table \"c\" has 90"},
       {12, 3, "degree 12 needs 91 coefficients"},
       {32767, 91, "degree 32767 needs 536887296 coefficients"},
-      {1, 3, "row 1: degree 1, 2 at least are needed"}};
+      {1, 3, nullptr}};
   for (const auto& [degree, rows, words] : kModels) {
     SCOPED_TRACE(degree);
     SourceFolder sources;

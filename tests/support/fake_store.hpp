@@ -50,9 +50,6 @@ class FakeStore {
   // Every call of the operation answers with word.
   void fail_always(StoreCall call, uint32_t word = kSomeFailure);
 
-  // The row count of a table is told as this, whatever rows it has.
-  void lie_about_rows(const std::string& table, int32_t count) { told_rows_[table] = count; }
-
   int calls(StoreCall call) const;
   int opens() const { return calls(StoreCall::kOpen); }
   int closes() const { return calls(StoreCall::kClose); }
@@ -92,7 +89,6 @@ class FakeStore {
   std::map<std::string, Table> tables_;
   std::map<StoreCall, int> counts_;
   std::multimap<StoreCall, Failure> failures_;
-  std::map<std::string, int32_t> told_rows_;
   std::vector<std::string> log_;
 };
 

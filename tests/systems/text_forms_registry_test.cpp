@@ -127,6 +127,7 @@ const std::vector<Definition>& known_systems() {
 constexpr Expected kWrittenDifferently[] = {
     {"WKT 1", 1111, "method 9807"},  // has no three axes
     {"WKT of", 1111, "method 9807"},
+    {"WKT of", 9804, "method 9805"},  // the dialect knows the parallel of true scale
     {"PROJ", 1111, "method 9807"},
     {"PROJ", 0, "PROJ strings have no form for"},  // vertical systems
     {"PROJ", 1027, "PROJ strings have no form for"},
@@ -254,6 +255,11 @@ class PeerPlane {
     PJ* base = proj_crs_get_geodetic_crs(context, crs);
     PJ* way = base != nullptr ? proj_create_crs_to_crs_from_pj(context, base, crs, nullptr, nullptr)
                               : nullptr;
+    if (PJ* axes = base != nullptr ? proj_crs_get_coordinate_system(context, base) : nullptr) {
+      proj_cs_get_axis_info(context, axes, 0, nullptr, nullptr, nullptr, &unit_, nullptr, nullptr,
+                            nullptr);
+      proj_destroy(axes);
+    }
     if (way != nullptr) {
       // Longitude and easting first, whatever the systems' axes.
       way_ = proj_normalize_for_visualization(context, way);
@@ -267,11 +273,13 @@ class PeerPlane {
   PeerPlane& operator=(const PeerPlane&) = delete;
 
   explicit operator bool() const { return way_ != nullptr; }
-  PJ_COORD operator()(double x, double y) const {
-    return proj_trans(way_, PJ_FWD, proj_coord(x, y, 0, 0));
+  // Of radians; PROJ wants the unit of the base system.
+  PJ_COORD operator()(double longitude, double latitude) const {
+    return proj_trans(way_, PJ_FWD, proj_coord(longitude / unit_, latitude / unit_, 0, 0));
   }
 
  private:
+  double unit_ = kDegree;
   PJ* way_ = nullptr;
 };
 
@@ -291,9 +299,6 @@ TEST(TextFormsRegistry, WhatIsWrittenIsTheSamePlaneToProj) {
         context, proj_create_from_database(context, "EPSG", std::to_string(known.code).c_str(),
                                            PJ_CATEGORY_CRS, 0, nullptr));
     if (!peer) continue;
-    // Angles of the base system: degrees, or its own unit.
-    const Definition base = definition_from_registry(known.base_code);
-    const double to_unit = kDegree / base.unit.factor;
     const double pm = known.datum.meridian.longitude / kDegree;
     double west = known.west, east = known.east;
     if (west > east) east += 360;
@@ -310,6 +315,8 @@ TEST(TextFormsRegistry, WhatIsWrittenIsTheSamePlaneToProj) {
       } catch (const Error&) {
         continue;  // told by the test above
       }
+      // PROJ has it since 9.4.
+      if (text.find("+proj=mod_krovak") != std::string::npos) continue;
       const PeerPlane ours(context, proj_create(context, text.c_str()));
       const std::string name =
           std::to_string(known.method) + " " + form + ", " + std::to_string(known.code) + " ";
@@ -322,13 +329,9 @@ TEST(TextFormsRegistry, WhatIsWrittenIsTheSamePlaneToProj) {
       for (int i = 1; i <= 3; ++i) {
         const double longitude = west + (east - west) * i / 4 - pm;
         const double latitude = known.south + (known.north - known.south) * i / 4;
-        const bool degrees =
-            form == std::string_view("PROJ") || form[4] == '1' || form[4] == 'o' || form[4] == '2';
-        const PJ_COORD a = peer(longitude * to_unit, latitude * to_unit);
-        const PJ_COORD b =
-            degrees ? ours(longitude, latitude) : ours(longitude * to_unit, latitude * to_unit);
+        const PJ_COORD a = peer(longitude * kDegree, latitude * kDegree);
+        const PJ_COORD b = ours(longitude * kDegree, latitude * kDegree);
         if (!std::isfinite(a.xy.x)) continue;
-        // South and west oriented systems may come with the one or the other sign.
         const double dx = std::fabs(a.xy.x - b.xy.x), dy = std::fabs(a.xy.y - b.xy.y);
         worst = std::max(worst, std::max(dx, dy) * known.unit.factor);
       }
@@ -337,8 +340,8 @@ TEST(TextFormsRegistry, WhatIsWrittenIsTheSamePlaneToProj) {
       }
     }
   }
-  std::printf("%s", differences.c_str());
-  for (const auto& [form, count] : compared) std::printf("%s %d\n", form.c_str(), count);
+  EXPECT_EQ(differences, "");
+  for (const auto& [form, count] : compared) EXPECT_GT(count, 350) << form;
   proj_context_destroy(context);
 }
 

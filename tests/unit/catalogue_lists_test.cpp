@@ -2,11 +2,8 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstddef>
 #include <cstring>
-#include <ostream>
-#include <string>
 
 #include "support/fake_store.hpp"
 #include "support/points.hpp"
@@ -44,7 +41,7 @@ TEST_F(CatalogueLists, VerticalDatumsHaveNumbersOf32Bits) {
   EXPECT_EQ(status_, TW_SUCCESS);
   EXPECT_STREQ(names[0], "First");
   EXPECT_STREQ(names[1], "Second");
-  EXPECT_EQ(store_.log()[store_.log().size() - 6], "search vert_datum vert_datum_name");
+  EXPECT_EQ(store_.log()[store_.log().size() - 5], "search vert_datum vert_datum_name");
 }
 
 TEST_F(CatalogueLists, AVerticalDatumsNameIsCutAtTheListsEntry) {
@@ -177,121 +174,6 @@ TEST_F(CatalogueLists, SatellitesComeWithTheirAnglesInRadians) {
   EXPECT_STREQ(text_, "Able");
   TWsomps_name2id("p", "Walker", &id, &status_);
   EXPECT_EQ(id, 9);
-}
-
-// A list that is sized by its table's row count.
-struct CountedList {
-  const char* table;
-  const char* column;
-  std::size_t offset;      // of the name in the row
-  FakeStore::Type type;    // of the column
-  std::size_t entry;       // bytes from one entry to the next
-  std::size_t first_byte;  // of an entry that is written
-  TWstatus too_long;
-  void (*read)(char* out, TWstatus* status);
-};
-
-const CountedList kCountedLists[] = {
-    {"vert_datum", "vert_datum_name", 4, Type::kText, 41, 0, TW_PF_TABLE_ERROR,
-     [](char* out, TWstatus* status) { TWget_vd_names("p", out, status); }},
-    {"undul", "undul_name", 16, Type::kText, 41, 0, TW_PF_TABLE_ERROR,
-     [](char* out, TWstatus* status) { TWget_undl_nam("p", out, status); }},
-    {"spcs27_tbl", "zone_name", 2, Type::kText, sizeof(ZoneRecord), 2, TW_PF_TABLE_ERROR,
-     [](char* out, TWstatus* status) {
-       TWspcs_get_all("p", 0, reinterpret_cast<ZoneRecord*>(out), status);
-     }},
-    {"Satellites", "sat_name", 0, Type::kText, sizeof(SatelliteRecord), 0, TW_PF_TABLE_ERROR,
-     [](char* out, TWstatus* status) {
-       TWsomps_get_all("p", reinterpret_cast<SatelliteRecord*>(out), status);
-     }},
-    {"mre models", "model name", 0, Type::kText, 41, 0, TW_PF_TABLE_ERROR,
-     [](char* out, TWstatus* status) { TWmre_names("p", out, status); }},
-    {"Complex Models", "Model Name", 0, Type::kText, 41, 0, TW_PF_TABLE_ERROR,
-     [](char* out, TWstatus* status) { TWcpx_names("p", out, status); }},
-    {"magnetic models", "model name", 0, Type::kText, 41, 0, TW_PF_TABLE_ERROR,
-     [](char* out, TWstatus* status) { TWmagmdl_names("p", out, status); }},
-    {"epochs", "Epoch date", 0, Type::kDouble, 33, 0, TW_BAD_DATA, [](char* out, TWstatus* status) {
-       int32_t degrees[8];
-       double dates[8];
-       TWepoch_info("p", "epochs", degrees, dates, out, status);
-     }}};
-
-std::ostream& operator<<(std::ostream& out, const CountedList& list) { return out << list.table; }
-
-class CountedLists : public testing::TestWithParam<CountedList> {
- protected:
-  // Three rows, of which the store tells another number.
-  void SetUp() override {
-    const CountedList& list = GetParam();
-    store_.clear();
-    store_.add_table(list.table, {{list.column, list.offset, list.type}});
-    for (int i = 1; i <= 3; ++i) {
-      PackedRow row(144);
-      if (list.type == Type::kText) {
-        row.text(list.offset, "N" + std::to_string(i));
-      } else {
-        row.f64(list.offset, i).i16(8, 1).text(10, "N");
-      }
-      store_.add_row(list.table, row);
-    }
-    std::memset(out_, '#', sizeof out_);
-  }
-  TWstatus read() {
-    TWstatus status = 0;
-    GetParam().read(reinterpret_cast<char*>(out_), &status);
-    return status;
-  }
-  // How many entries were written, one behind the other.
-  std::size_t written() const {
-    const char* bytes = reinterpret_cast<const char*>(out_);
-    std::size_t n = 0;
-    while (bytes[n * GetParam().entry + GetParam().first_byte] != '#') ++n;
-    for (std::size_t i = n * GetParam().entry; i < sizeof out_; ++i) EXPECT_EQ(bytes[i], '#') << i;
-    return n;
-  }
-
-  FakeStore& store_ = FakeStore::current();
-  double out_[128];
-};
-
-TEST_P(CountedLists, HaveNeverMoreEntriesThanTheStoreCounts) {
-  EXPECT_EQ(read(), TW_SUCCESS);
-  for (const int32_t count : {0, 1, 2, 4, 2147483647}) {
-    SetUp();
-    store_.lie_about_rows(GetParam().table, count);
-    // A walk that ends before the count is no failure.
-    EXPECT_EQ(read(), count < 3 ? GetParam().too_long : TW_SUCCESS) << count;
-    EXPECT_EQ(written(), static_cast<std::size_t>(std::min(count, 3)));
-    EXPECT_EQ(store_.closes(), 1);
-  }
-  for (const int32_t count : {-1, -2147483647}) {
-    SetUp();
-    store_.lie_about_rows(GetParam().table, count);
-    EXPECT_EQ(read(), TW_PF_TABLE_ERROR) << count;
-    EXPECT_EQ(written(), 0u);
-  }
-}
-
-TEST_P(CountedLists, EndWhereTheStoreAnswersWithErrorsForEver) {
-  store_.fail_always(StoreCall::kNext);
-  EXPECT_NE(read(), TW_SUCCESS);
-  EXPECT_LE(store_.calls(StoreCall::kNext), 4);
-}
-
-INSTANTIATE_TEST_SUITE_P(All, CountedLists, testing::ValuesIn(kCountedLists),
-                         [](const auto& tested) {
-                           std::string name = tested.param.table;
-                           std::erase_if(name, [](char c) { return c == ' ' || c == '_'; });
-                           return name;
-                         });
-
-TEST_F(CatalogueLists, ACountBelowZeroIsAFailure) {
-  store_.add_table("undul", {});
-  store_.lie_about_rows("undul", -1);
-  int32_t count = 99;
-  TWget_undl_cnt("p", &count, &status_);
-  EXPECT_EQ(status_, TW_PF_TABLE_ERROR);
-  EXPECT_EQ(count, 99);
 }
 
 }  // namespace
