@@ -3,7 +3,9 @@
 
 #include "formulas/equidistant.hpp"
 #include "formulas/geodesic.hpp"
+#include "formulas/mollweide.hpp"
 #include "formulas/transverse_mercator.hpp"
+#include "formulas/van_der_grinten.hpp"
 #include "points/over_points.hpp"
 
 namespace tidewater::detail {
@@ -33,7 +35,7 @@ struct TransverseMercatorInverse {
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
 };
 
-// A map with forward() and inverse() of its own, in metres from its origin.
+// A map with forward() and inverse() of its own, in metres or units of the plane from its origin.
 template <class Map>
 struct MapForward {
   Map map;
@@ -59,7 +61,7 @@ struct MapInverse {
 };
 
 // Azimuthal equidistant about any point: azimuth and length of the geodesic from there.
-struct EquidistantForward {
+struct GeodesicAzimuthalForward {
   Geodesics lines;
   double lat0;  // degrees
 
@@ -75,7 +77,7 @@ struct EquidistantForward {
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
 };
 
-struct EquidistantInverse {
+struct GeodesicAzimuthalInverse {
   Geodesics lines;
   double lat0;
 
@@ -102,8 +104,10 @@ TIDEWATER_MAP(Cassini)
 TIDEWATER_MAP(Polyconic)
 TIDEWATER_MAP(EquidistantConic)
 TIDEWATER_MAP(PolarEquidistant)
+TIDEWATER_MAP(VanDerGrinten)
+TIDEWATER_MAP(Mollweide)
 #undef TIDEWATER_MAP
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantForward)
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantInverse)
+TIDEWATER_INSTANCE(tidewater::detail::GeodesicAzimuthalForward)
+TIDEWATER_INSTANCE(tidewater::detail::GeodesicAzimuthalInverse)
 TIDEWATER_INSTANCE(tidewater::detail::TransverseMercatorForward)
 TIDEWATER_INSTANCE(tidewater::detail::TransverseMercatorInverse)

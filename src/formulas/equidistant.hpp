@@ -22,7 +22,7 @@ struct Planar {
 // the grids that use it.
 struct Cassini {
   double a, e2, m0;
-  MeridianArc arc;
+  ExactMeridianArc arc;
 
   Cassini(double semi_major, double f, double lat0)
       : a(semi_major), e2(f * (2 - f)), m0(0), arc(1, f) {
@@ -99,7 +99,7 @@ struct Cassini {
 // that the equator is a parallel like others.
 struct Polyconic {
   double a, e2, m0;
-  MeridianArc arc;
+  ExactMeridianArc arc;
 
   Polyconic(double semi_major, double f, double lat0)
       : a(semi_major), e2(f * (2 - f)), m0(0), arc(1, f) {
@@ -184,7 +184,7 @@ struct Polyconic {
 // Equidistant conic: Snyder eq. 16-1 to 16-4, 16-11.
 struct EquidistantConic {
   double a, n, G, rho0;
-  MeridianArc arc;
+  ExactMeridianArc arc;
 
   EquidistantConic(double semi_major, double f, double lat0, double lat1, double lat2)
       : a(semi_major), n(0), G(0), rho0(0), arc(1, f) {
@@ -225,7 +225,7 @@ struct EquidistantConic {
 struct PolarEquidistant {
   double a, pole;  // 1 north, -1 south
   double quadrant;
-  MeridianArc arc;
+  ExactMeridianArc arc;
 
   PolarEquidistant(double semi_major, double f, double which)
       : a(semi_major), pole(which), quadrant(0), arc(1, f) {
