@@ -279,8 +279,8 @@ template struct MapForward<Mollweide>;
 template struct MapInverse<Mollweide>;
 
 // The lines that the many do not cover, one by one.
-Next GeodesicAzimuthalForward::other(const CoordinateTriple& in, CoordinateTriple* out,
-                                     TWstatus* status) const {
+Next GeodesicEquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                       TWstatus* status) const {
   const auto arc = lines.any_line(lat0, 0, in.y * kDegreesPerRadian, in.x * kDegreesPerRadian);
   if (!arc.plain) {
     *status = TW_BAD_LATITUDE;
@@ -291,8 +291,8 @@ Next GeodesicAzimuthalForward::other(const CoordinateTriple& in, CoordinateTripl
   return Next::point;
 }
 
-Next GeodesicAzimuthalInverse::other(const CoordinateTriple&, CoordinateTriple*,
-                                     TWstatus* status) const {
+Next GeodesicEquidistantInverse::other(const CoordinateTriple&, CoordinateTriple*,
+                                       TWstatus* status) const {
   *status = TW_RANGE_ERROR;
   return Next::point;
 }
@@ -380,7 +380,6 @@ Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
       [=](TW_BLOCK) { TWaz_eq_i(e, 0, lat0, n1, count, in, out, status); });
 }
 
-// By the geodesics from the origin: distances and azimuths from it are true everywhere.
 Made make_azimuthal_equidistant(const MethodArguments& given) {
   const double lat0 = given(kLat0);
   if (kHalfPi - std::fabs(lat0) < 1e-12) {
@@ -389,8 +388,8 @@ Made make_azimuthal_equidistant(const MethodArguments& given) {
   }
   require(given.f <= Geodesics::kLargestFlattening, given,
           "geodesics are served up to a flattening of 0.01");
-  const GeodesicAzimuthalForward forward{Geodesics(given.a, given.f), lat0 * kDegreesPerRadian};
-  const GeodesicAzimuthalInverse inverse{forward.lines, forward.lat0};
+  const GeodesicEquidistantForward forward{Geodesics(given.a, given.f), lat0 * kDegreesPerRadian};
+  const GeodesicEquidistantInverse inverse{forward.lines, forward.lat0};
   return formula(
       metric_plane(given), [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
       [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });

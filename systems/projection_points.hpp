@@ -61,7 +61,7 @@ struct MapInverse {
 };
 
 // Azimuthal equidistant about any point: azimuth and length of the geodesic from there.
-struct GeodesicAzimuthalForward {
+struct GeodesicEquidistantForward {
   Geodesics lines;
   double lat0;  // degrees
 
@@ -77,7 +77,7 @@ struct GeodesicAzimuthalForward {
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
 };
 
-struct GeodesicAzimuthalInverse {
+struct GeodesicEquidistantInverse {
   Geodesics lines;
   double lat0;
 
@@ -107,7 +107,7 @@ TIDEWATER_MAP(PolarEquidistant)
 TIDEWATER_MAP(VanDerGrinten)
 TIDEWATER_MAP(Mollweide)
 #undef TIDEWATER_MAP
-TIDEWATER_INSTANCE(tidewater::detail::GeodesicAzimuthalForward)
-TIDEWATER_INSTANCE(tidewater::detail::GeodesicAzimuthalInverse)
+TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantForward)
+TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantInverse)
 TIDEWATER_INSTANCE(tidewater::detail::TransverseMercatorForward)
 TIDEWATER_INSTANCE(tidewater::detail::TransverseMercatorInverse)
