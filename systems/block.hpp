@@ -70,8 +70,8 @@ Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Ch
       chain(block);
       bool odd = block.failed;
       for (int i = 0; i < block.count; ++i) {
-        odd |= !(std::fabs(block.now[i].x) <= std::numeric_limits<double>::max()) |
-               !(std::fabs(block.now[i].y) <= std::numeric_limits<double>::max());
+        odd |= !(std::fabs(block.now[i].x) <= std::numeric_limits<double>::max());
+        odd |= !(std::fabs(block.now[i].y) <= std::numeric_limits<double>::max());
       }
       if (odd) {
         for (int i = 0; i < block.count; ++i) {
