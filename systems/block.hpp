@@ -52,8 +52,43 @@ class Step {
   virtual void run(Block& block, bool inverse) const = 0;
 };
 
+// Runs range(begin, end) over an array, each range one thread's and of whole blocks.
+template <class Range>
+Summary run_ranges(std::size_t count, const Run& run, std::size_t block,
+                   const Range& range) noexcept {
+  std::size_t threads = run.threads == 0 ? std::thread::hardware_concurrency() : run.threads;
+  const std::size_t worth_a_thread = 16 * block;
+  threads = std::min(threads, count / worth_a_thread);
+  if (threads <= 1) return range(0, count);
+
+  std::vector<Summary> summaries;
+  std::vector<std::thread> workers;
+  const std::size_t blocks = (count + block - 1) / block;
+  const auto border = [&](std::size_t k) { return std::min(count, blocks * k / threads * block); };
+  try {
+    summaries.resize(threads);
+    workers.reserve(threads - 1);
+    for (std::size_t k = 1; k < threads; ++k) {
+      workers.emplace_back([&, k] { summaries[k] = range(border(k), border(k + 1)); });
+    }
+  } catch (...) {
+    // No more threads are to be had: what they would have done is done here.
+  }
+  Summary total;
+  if (summaries.empty()) return range(0, count);
+  summaries[0] = range(0, border(1));
+  for (std::size_t k = workers.size() + 1; k < threads; ++k) {
+    summaries[k] = range(border(k), border(k + 1));
+  }
+  for (auto& worker : workers) worker.join();
+  for (const Summary& part : summaries) {
+    if (total.failed == 0) total.word = part.word;
+    total.failed += part.failed;
+  }
+  return total;
+}
+
 // Runs a chain over an array: load(begin, block) fills block.now, store(begin, block) takes it.
-// Each range of points is one thread's.
 template <class Load, class Chain, class Store>
 Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Chain& chain,
                    const Store& store) noexcept {
@@ -88,39 +123,7 @@ Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Ch
     }
     return summary;
   };
-
-  std::size_t threads = run.threads == 0 ? std::thread::hardware_concurrency() : run.threads;
-  constexpr std::size_t kWorthAThread = 16 * kBlockSize;
-  threads = std::min(threads, count / kWorthAThread);
-  if (threads <= 1) return range(0, count);
-
-  std::vector<Summary> summaries;
-  std::vector<std::thread> workers;
-  const std::size_t blocks = (count + kBlockSize - 1) / kBlockSize;
-  const auto border = [&](std::size_t k) {
-    return std::min(count, blocks * k / threads * kBlockSize);
-  };
-  try {
-    summaries.resize(threads);
-    workers.reserve(threads - 1);
-    for (std::size_t k = 1; k < threads; ++k) {
-      workers.emplace_back([&, k] { summaries[k] = range(border(k), border(k + 1)); });
-    }
-  } catch (...) {
-    // No more threads are to be had: what they would have done is done here.
-  }
-  Summary total;
-  if (summaries.empty()) return range(0, count);
-  summaries[0] = range(0, border(1));
-  for (std::size_t k = workers.size() + 1; k < threads; ++k) {
-    summaries[k] = range(border(k), border(k + 1));
-  }
-  for (auto& worker : workers) worker.join();
-  for (const Summary& part : summaries) {
-    if (total.failed == 0) total.word = part.word;
-    total.failed += part.failed;
-  }
-  return total;
+  return run_ranges(count, run, kBlockSize, range);
 }
 
 }  // namespace tidewater::detail
