@@ -138,7 +138,9 @@ struct GrintenScale {
     const V p = select(flat, 1.0, given_p);
     const V d = select(central, 1.0, given_d);
     const V S = sqrt(R - 4.0 * p * p);
-    const V A = (kPi - S) * kPi / (2.0 * p);
+    // pi - S = 4 p^2 / (pi + S), in the form that does not cancel
+    const V over_S = 2.0 / (kPi + S);
+    const V A = kPi * p * over_S;
     const V over_t = 1.0 / (kPi - abs(p));
     const V B = p * kPi * over_t;
     const V N = R - A * A;
@@ -146,7 +148,7 @@ struct GrintenScale {
     const V G = N * 0.5 * over_D;
     const V H = G - A;
     const V E = R * over_t * over_t;
-    const V dA = ((S - kPi) / (2.0 * p * p) + 2.0 / S) * kPi;
+    const V dA = (2.0 / S - over_S) * kPi;
     const V dG = (H * dA - E * G) * over_D;
     const V sg = select(G >= 0.0, 1.0, V(-1.0));
     const V W = (dG - dA) * sg;
