@@ -1,5 +1,5 @@
 // Datum shift by multiple regression equations.
-// Defense Mapping Agency Technical Report 8350.2 (1987), section 7.4.3 and appendix D.
+// Defense Mapping Agency Technical Report 8350.2 (1991), appendix D.
 #pragma once
 
 #include "formulas/constants.hpp"
