@@ -17,7 +17,7 @@ struct EquidistantConicForward {
   template <Number V>
   TW_INLINE Answer<V> operator()(V lon, V lat) const {
     const auto theta = sincos(wrap_turns_below_then_above(lon - lon0) * n);
-    const V r = G - meridian.arc(lat, sincos(lat));
+    const V r = G - meridian.arc(lat);
     return {theta.sin * r, rho0 - theta.cos * r};
   }
 };
