@@ -31,7 +31,7 @@ struct Sheet {
     return (1.0 - sincos(sin1 * d).cos) * r1;
   }
 
-  // The same as forward() for ordinary points: off the equator, within the poles and half a turn.
+  // The same as forward() for ordinary points: within the poles and half a turn.
   template <Number V>
   TW_INLINE Answer<V> ordinary(V lon, V lat) const {
     const V d = lon - lon0;
@@ -42,6 +42,7 @@ struct Sheet {
     const V g = select(lat >= 0.0, 1.0, V(-1.0));
     const V r = at.cos / (at.sin * sqrt(1.0 - e2 * square(at.sin)));
     const V under = r * r - xb_mid * xb_mid;
+    const auto flat = abs(lat) < kSheetNothing;  // the equator is a straight line
     const auto on_south_edge = abs(lat - lat1) < kSheetNothing;
     const V yc = select(on_south_edge, 0.0, g * sqrt(under) + yb_mid - r);
     // The meridian is the straight line between its points on the two bounding parallels.
@@ -66,10 +67,10 @@ struct Sheet {
     const V x = (b - g * sqrt(under_x) * slope) / w;
     const V under_y = r * r - x * x;
     const V y = yc + r - g * sqrt(under_y);
-    const Mask<V> plain = everywhere<V>(meridian.good()) & (abs(lat) <= kHalfPi) &
-                          (abs(lat) >= kSheetNothing) & (abs(d) < kPi) &
-                          ((under >= 0.0) | on_south_edge) & (under_x >= 0.0) & (under_y >= 0.0);
-    return {x, y, plain};
+    const auto real = ((under >= 0.0) | on_south_edge) & (under_x >= 0.0) & (under_y >= 0.0);
+    const Mask<V> plain =
+        everywhere<V>(meridian.good()) & (abs(lat) <= kHalfPi) & (abs(d) < kPi) & (flat | real);
+    return {select(flat, d, x), select(flat, yb_mid, y), plain};
   }
 };
 
