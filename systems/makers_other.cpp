@@ -228,12 +228,6 @@ Made make_sinusoidal(const MethodArguments& given) {
       [=](TW_BLOCK) { TWsinusoidal_i(0, 0, e, e2, m0, count, in, out, status); });
 }
 
-Made make_mollweide(const MethodArguments& given) {
-  return formula(
-      natural_plane(given, 1), [](TW_BLOCK) { TWmollweide_f(0, 0, count, in, out, status); },
-      [](TW_BLOCK) { TWmollweide_i(0, 0, count, in, out, status); });
-}
-
 Made make_eckert4(const MethodArguments& given) {
   return formula(
       natural_plane(given, 1), [](TW_BLOCK) { TWeckertIV_f(0, 0, count, in, out, status); },
@@ -242,16 +236,18 @@ Made make_eckert4(const MethodArguments& given) {
 
 namespace {
 
-// The plane of a map whose kernels work in metres.
+// The block functions of a map, and the plane of one that works in metres.
 template <class Map>
-Made metric_formula(const MethodArguments& given, const Map& map, bool false_origin = false) {
+Made map_formula(const Plane& plane, const Map& map) {
   const MapForward<Map> forward{map};
   const MapInverse<Map> inverse{map};
-  const Plane plane = false_origin ? Plane{given(kLonF), 1, 1, given(kXF), given(kYF)}
-                                   : Plane{given(kLon0), 1, 1, given(kX0), given(kY0)};
   return formula(
       plane, [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
       [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
+}
+
+Plane metric_plane(const MethodArguments& given) {
+  return {given(kLon0), 1, 1, given(kX0), given(kY0)};
 }
 
 }  // namespace
@@ -277,6 +273,10 @@ template struct MapForward<EquidistantConic>;
 template struct MapInverse<EquidistantConic>;
 template struct MapForward<PolarEquidistant>;
 template struct MapInverse<PolarEquidistant>;
+template struct MapForward<VanDerGrinten>;
+template struct MapInverse<VanDerGrinten>;
+template struct MapForward<Mollweide>;
+template struct MapInverse<Mollweide>;
 
 // The lines that the many do not cover, one by one.
 Next GeodesicEquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
@@ -298,7 +298,7 @@ Next GeodesicEquidistantInverse::other(const CoordinateTriple&, CoordinateTriple
 }
 
 Made make_cassini(const MethodArguments& given) {
-  return metric_formula(given, Cassini(given.a, given.f, given(kLat0)));
+  return map_formula(metric_plane(given), Cassini(given.a, given.f, given(kLat0)));
 }
 
 // The northing less its own cube: IOGP Publication 373-7-2, method 9833.
@@ -330,7 +330,7 @@ Made make_hyperbolic_cassini(const MethodArguments& given) {
 }
 
 Made make_polyconic(const MethodArguments& given) {
-  return metric_formula(given, Polyconic(given.a, given.f, given(kLat0)));
+  return map_formula(metric_plane(given), Polyconic(given.a, given.f, given(kLat0)));
 }
 
 // IOGP Publication 373-7-2, method 1028.
@@ -366,7 +366,7 @@ Made make_equidistant_cylindrical_spherical(const MethodArguments& given) {
 Made make_equidistant_conic(const MethodArguments& given) {
   const EquidistantConic map(given.a, given.f, given(kLatF), given(kLat1), given(kLat2));
   require(std::isfinite(map.rho0) && map.n != 0, given, "its standard parallels make no cone");
-  return metric_formula(given, map, true);
+  return map_formula(Plane{given(kLonF), 1, 1, given(kXF), given(kYF)}, map);
 }
 
 Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
@@ -383,15 +383,15 @@ Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
 Made make_azimuthal_equidistant(const MethodArguments& given) {
   const double lat0 = given(kLat0);
   if (kHalfPi - std::fabs(lat0) < 1e-12) {
-    return metric_formula(given, PolarEquidistant(given.a, given.f, std::copysign(1, lat0)));
+    return map_formula(metric_plane(given),
+                       PolarEquidistant(given.a, given.f, std::copysign(1, lat0)));
   }
   require(given.f <= Geodesics::kLargestFlattening, given,
           "geodesics are served up to a flattening of 0.01");
   const GeodesicEquidistantForward forward{Geodesics(given.a, given.f), lat0 * kDegreesPerRadian};
   const GeodesicEquidistantInverse inverse{forward.lines, forward.lat0};
   return formula(
-      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
-      [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
+      metric_plane(given), [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
       [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
 }
 
@@ -523,10 +523,12 @@ Made make_miller(const MethodArguments& given) {
       [](TW_BLOCK) { TWmiller_cyl_i(in, count, 0, 0, out, status); });
 }
 
+Made make_mollweide(const MethodArguments& given) {
+  return map_formula(natural_plane(given, 1), Mollweide());
+}
+
 Made make_van_der_grinten(const MethodArguments& given) {
-  return formula(
-      natural_plane(given, 1), [](TW_BLOCK) { TWvdg_f(0, 0, count, in, out, status); },
-      [](TW_BLOCK) { TWvdg_i(0, 0, count, in, out, status); });
+  return map_formula(natural_plane(given, 1), VanDerGrinten());
 }
 
 Made make_gnomonic(const MethodArguments& given) {
