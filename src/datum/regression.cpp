@@ -4,6 +4,7 @@
 #include "datum/regression_points.hpp"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 
 #include "formulas/wraps.hpp"
@@ -19,11 +20,28 @@ bool tabled(const RegressionSum& s) {
   });
 }
 
-double sum_of(const RegressionSum& s, double u, double v) {
+class Powers {
+ public:
+  explicit Powers(double base) : base_(base) {
+    power_[0] = 1;
+    for (std::size_t k = 1; k < power_.size(); ++k) power_[k] = power_[k - 1] * base;
+  }
+
+  // Powers beyond the table have no place in a model; they are still answered.
+  double operator[](int16_t k) const {
+    return k >= 0 && k < Regression::kPowers ? power_[static_cast<std::size_t>(k)]
+                                             : std::pow(base_, k);
+  }
+
+ private:
+  double base_;
+  std::array<double, Regression::kPowers> power_;
+};
+
+double sum_of(const RegressionSum& s, const Powers& u, const Powers& v) {
   double sum = 0;
   for (int32_t i = 0; i < s.count; ++i) {
-    sum +=
-        s.terms[i].coefficient * std::pow(u, s.terms[i].power_u) * std::pow(v, s.terms[i].power_v);
+    sum += s.terms[i].coefficient * u[s.terms[i].power_u] * v[s.terms[i].power_v];
   }
   return sum;
 }
@@ -36,16 +54,17 @@ double tidewater::detail::regression_longitude(double lon, bool from_zero) {
   return add_turns_while(lon, -360, [](double v) { return v > 180; });
 }
 
-Regression::Regression(const Parameters& parameters)
+Regression::Regression(const Parameters& parameters, bool few)
     : of_(parameters),
-      tabled_(tabled(parameters.lon) && tabled(parameters.lat) && tabled(parameters.height)) {}
+      tabled_(!few && tabled(parameters.lon) && tabled(parameters.lat) &&
+              tabled(parameters.height)) {}
 
-// Powers beyond the table have no place in a model; they are still answered.
+// The same bits, term by term with a look at each power.
 Next Regression::other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus*) const {
   constexpr double kSecondsPerRadian = kDegreesPerRadian * 3600;
   const double lon = regression_longitude(in.x * kDegreesPerRadian, of_.from_zero);
-  const double u = of_.k * (in.y * kDegreesPerRadian + of_.lat_offset);
-  const double v = of_.k * (lon + of_.lon_offset);
+  const Powers u(of_.k * (in.y * kDegreesPerRadian + of_.lat_offset));
+  const Powers v(of_.k * (lon + of_.lon_offset));
   const double seconds = of_.sign / kSecondsPerRadian;
   *out = {in.x + seconds * sum_of(of_.lon, u, v), in.y + seconds * sum_of(of_.lat, u, v),
           in.z + of_.sign * sum_of(of_.height, u, v)};
@@ -63,6 +82,7 @@ void TWmre(int32_t count, int16_t direction, int16_t lon_range, int32_t lon_coun
                                lat_offset,
                                {lon_terms, lon_count},
                                {lat_terms, lat_count},
-                               {height_terms, height_count}});
+                               {height_terms, height_count}},
+                              count <= kFew);
   *status = over_points(regression, count, in, out);
 }

@@ -27,7 +27,8 @@ class Regression {
     RegressionSum lon, lat, height;
   };
 
-  explicit Regression(const Parameters& parameters);
+  // For a few points a look through the terms would cost as much as their sum.
+  Regression(const Parameters& parameters, bool few);
 
   template <Number V>
   TW_INLINE Answer3<V> operator()(V lon, V lat, V height) const {
@@ -57,7 +58,7 @@ class Regression {
   template <Number V>
   TW_INLINE V sum(const RegressionSum& s, const V (&u)[kPowers], const V (&v)[kPowers]) const {
     V total = 0.0;
-    // The first pass is safe where a power lies outside the table, too; its sum is not used.
+    // Where a power may lie outside the table the sum is not used.
     const int32_t count = tabled_ ? s.count : 0;
     for (int32_t i = 0; i < count; ++i) {
       const MreTerm& term = s.terms[i];
@@ -67,7 +68,7 @@ class Regression {
   }
 
   Parameters of_;
-  bool tabled_;  // all powers are those of a model, 0 to 9
+  bool tabled_;  // all powers are known to be those of a model, 0 to 9
 };
 
 }  // namespace tidewater::detail
