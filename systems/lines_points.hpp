@@ -159,12 +159,12 @@ TW_INLINE void store_lanes(Lanes<N> v, double* at) {
   __builtin_memcpy(at, &v, sizeof v);
 }
 template <class T>
-TW_INLINE void load_lanes(points::PointAnswer<T>& v, const double* at) {
+TW_INLINE void load_lanes(points::Pair<T>& v, const double* at) {
   load_lanes(v.a, at);
   load_lanes(v.b, at + kWidth<T>);
 }
 template <class T>
-TW_INLINE void store_lanes(points::PointAnswer<T> v, double* at) {
+TW_INLINE void store_lanes(points::Pair<T> v, double* at) {
   store_lanes(v.a, at);
   store_lanes(v.b, at + kWidth<T>);
 }
