@@ -15,8 +15,8 @@ int run(int argc, char** argv) {
   app.require_subcommand(1);
   int exit_status = 0;
   tidewater::command::add_convert(app, exit_status);
-  tidewater::command::add_line(app, exit_status);
-  tidewater::command::add_magnetic(app, exit_status);
+  //LATER
+
   try {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {
