@@ -6,6 +6,7 @@
 #include "formulas/equal_earth.hpp"
 #include "formulas/latitudes.hpp"
 #include "makers.hpp"
+#include "projection_points.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
@@ -91,20 +92,6 @@ Made bonne(const MethodArguments& given, const Plane& plane) {
       plane, [=](TW_BLOCK) { TWbonne_f(0, lat1, e, e2, c1, r0, count, in, out, status); },
       [=](TW_BLOCK) { TWbonne_i(0, lat1, e, e2, c1, r0, count, in, out, status); });
 }
-
-struct Cassini {
-  double e, c0, c2, c4, c6, c8, m0, d2, d4, d6, d8;
-
-  Cassini(double eccentricity, double lat0) : e(eccentricity) {
-    TWcassini_c(e, 0, lat0, &c0, &c2, &c4, &c6, &c8, &m0, &d2, &d4, &d6, &d8);
-  }
-  void forward(TW_BLOCK) const {
-    TWcassini_f(e, 0, c0, c2, c4, c6, c8, m0, count, in, out, status);
-  }
-  void inverse(TW_BLOCK) const {
-    TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, count, in, out, status);
-  }
-};
 
 struct Orthographic {
   double e, lat0, x0, y0, z0;
@@ -210,13 +197,13 @@ Made make_equal_earth(const MethodArguments& given) {
       plane,
       [=](double lon, double lat) {
         Pair answer{};
-        points::EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
+        EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
         answer.plain = true;
         return answer;
       },
       [=](double x, double y) {
         Pair answer{};
-        answer.plain = points::EqualEarth::inverse(x, y, &answer.x, &answer.y);
+        answer.plain = EqualEarth::inverse(x, y, &answer.x, &answer.y);
         answer.y = sphere.to_geodetic(answer.y);
         return answer;
       });
@@ -253,23 +240,77 @@ Made make_eckert4(const MethodArguments& given) {
       [](TW_BLOCK) { TWeckertIV_i(0, 0, count, in, out, status); });
 }
 
-Made make_cassini(const MethodArguments& given) {
-  const Cassini map(given.e, given(kLat0));
+namespace {
+
+// The plane of a map whose kernels work in metres.
+template <class Map>
+Made metric_formula(const MethodArguments& given, const Map& map, bool false_origin = false) {
+  const MapForward<Map> forward{map};
+  const MapInverse<Map> inverse{map};
+  const Plane plane = false_origin ? Plane{given(kLonF), 1, 1, given(kXF), given(kYF)}
+                                   : Plane{given(kLon0), 1, 1, given(kX0), given(kY0)};
   return formula(
-      natural_plane(given, 1), [=](TW_BLOCK) { map.forward(count, in, out, status); },
-      [=](TW_BLOCK) { map.inverse(count, in, out, status); });
+      plane, [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
+      [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
+}
+
+}  // namespace
+
+template <class Map>
+Next MapForward<Map>::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
+template <class Map>
+Next MapInverse<Map>::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
+// The level sources call these.
+template struct MapForward<Cassini>;
+template struct MapInverse<Cassini>;
+template struct MapForward<Polyconic>;
+template struct MapInverse<Polyconic>;
+template struct MapForward<EquidistantConic>;
+template struct MapInverse<EquidistantConic>;
+template struct MapForward<PolarEquidistant>;
+template struct MapInverse<PolarEquidistant>;
+
+// The lines that the many do not cover, one by one.
+Next GeodesicEquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                       TWstatus* status) const {
+  const auto arc = lines.any_line(lat0, 0, in.y * kDegreesPerRadian, in.x * kDegreesPerRadian);
+  if (!arc.plain) {
+    *status = TW_BAD_LATITUDE;
+    return Next::point;
+  }
+  out->x = arc.length * arc.azimuth1.sin;
+  out->y = arc.length * arc.azimuth1.cos;
+  return Next::point;
+}
+
+Next GeodesicEquidistantInverse::other(const CoordinateTriple&, CoordinateTriple*,
+                                       TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
+Made make_cassini(const MethodArguments& given) {
+  return metric_formula(given, Cassini(given.a, given.f, given(kLat0)));
 }
 
 // The northing less its own cube: IOGP Publication 373-7-2, method 9833.
 Made make_hyperbolic_cassini(const MethodArguments& given) {
-  const Cassini map(given.e, given(kLat0));
   const double lat0 = given(kLat0);
-  const double cube =
-      given.a * given.a / (6 * meridional_radius(given, lat0) * transverse_radius(given, lat0));
+  const MapForward<Cassini> forward{Cassini(given.a, given.f, lat0)};
+  const MapInverse<Cassini> inverse{forward.map};
+  const double cube = 1 / (6 * meridional_radius(given, lat0) * transverse_radius(given, lat0));
   return formula(
-      natural_plane(given, 1),
+      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](TW_BLOCK) {
-        map.forward(count, in, out, status);
+        *status = over_points(forward, count, in, out);
         for (int i = 0; i < count; ++i) out[i].y -= cube * out[i].y * out[i].y * out[i].y;
       },
       [=](TW_BLOCK) {
@@ -277,24 +318,19 @@ Made make_hyperbolic_cassini(const MethodArguments& given) {
           double y = in[i].y;
           for (int pass = 0; pass < 30; ++pass) {
             const double next = in[i].y + cube * y * y * y;
-            const bool rest = std::fabs(next - y) < 1e-16;
+            const bool rest = std::fabs(next - y) < 1e-9;
             y = next;
             if (rest) break;
           }
           out[i].x = in[i].x;
           out[i].y = y;
         }
-        map.inverse(count, out, out, status);
+        *status = over_points(inverse, count, out, out);
       });
 }
 
 Made make_polyconic(const MethodArguments& given) {
-  const double e = given.e;
-  double m0;
-  TWpolycon_c(e, given(kLat0), &m0);
-  return formula(
-      natural_plane(given, 1), [=](TW_BLOCK) { TWpolycon_f(e, 0, m0, count, in, out, status); },
-      [=](TW_BLOCK) { TWpolycon_i(e, 0, m0, count, in, out, status); });
+  return metric_formula(given, Polyconic(given.a, given.f, given(kLat0)));
 }
 
 // IOGP Publication 373-7-2, method 1028.
@@ -328,15 +364,9 @@ Made make_equidistant_cylindrical_spherical(const MethodArguments& given) {
 }
 
 Made make_equidistant_conic(const MethodArguments& given) {
-  double n, G, rho0, C0, C2, C4, C6, C8, D2, D4, D6, D8;
-  TWstatus made;
-  TWconic_c(given.e, given(kLatF), given(kLat1), given(kLat2), &n, &G, &rho0, &C0, &C2, &C4, &C6,
-            &C8, &D2, &D4, &D6, &D8, &made);
-  require(std::isfinite(rho0) && n != 0, given, "its standard parallels make no cone");
-  return formula(
-      false_origin_plane(given, 1),
-      [=](TW_BLOCK) { TWconic_f(0, n, G, rho0, C0, C2, C4, C6, C8, count, in, out, status); },
-      [=](TW_BLOCK) { TWconic_i(0, n, G, rho0, C0, D2, D4, D6, D8, count, in, out, status); });
+  const EquidistantConic map(given.a, given.f, given(kLatF), given(kLat1), given(kLat2));
+  require(std::isfinite(map.rho0) && map.n != 0, given, "its standard parallels make no cone");
+  return metric_formula(given, map, true);
 }
 
 Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
@@ -351,7 +381,18 @@ Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
 }
 
 Made make_azimuthal_equidistant(const MethodArguments& given) {
-  return make_modified_azimuthal_equidistant(given);
+  const double lat0 = given(kLat0);
+  if (kHalfPi - std::fabs(lat0) < 1e-12) {
+    return metric_formula(given, PolarEquidistant(given.a, given.f, std::copysign(1, lat0)));
+  }
+  require(given.f <= Geodesics::kLargestFlattening, given,
+          "geodesics are served up to a flattening of 0.01");
+  const GeodesicEquidistantForward forward{Geodesics(given.a, given.f), lat0 * kDegreesPerRadian};
+  const GeodesicEquidistantInverse inverse{forward.lines, forward.lat0};
+  return formula(
+      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
+      [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
+      [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
 }
 
 // IOGP Publication 373-7-2, method 9831.
@@ -385,7 +426,7 @@ Made make_guam(const MethodArguments& given) {
 }
 
 Made make_colombia_urban(const MethodArguments& given) {
-  const points::ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
+  const ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](double lon, double lat) {
