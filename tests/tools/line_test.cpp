@@ -113,17 +113,9 @@ TEST(Line, GeodesicsAgreeWithThePeer) {
 #endif
 }
 
-TEST(Line, NearlyAntipodalPointsAreNeverGivenAFalseDistance) {
-  // the distance of the library would be 53 km
-  const Outcome r = shell("tidewater line", "0.5 0 -0.4 179.5 far\n0 0 0 179.9\n0 0 0 180\n");
-  const auto got = lines(r.out);
-  ASSERT_EQ(got.size(), 3u);
-  EXPECT_EQ(got[0], "* * * far");
-  EXPECT_EQ(got[1], "* * *");  // not along the equator, which is no shortest line there
-  EXPECT_NEAR(numbers(got[2])[2], 20003931.459, 0.001);  // half a meridian of GRS 80
-  EXPECT_NE(r.err.find("(TW_NOT_CONVERGED)"), std::string::npos) << r.err;
-  EXPECT_NE(r.err.find("1 solved, 2 refused"), std::string::npos) << r.err;
-  EXPECT_EQ(r.status, 1);
+TEST(Line, NearlyAntipodalPointsAreSolved) {
+  const Outcome r = shell("tidewater line", "0 0 0 180\n");
+  EXPECT_NEAR(numbers(r.out).at(2), 20003931.459, 0.001);  // half a meridian of GRS 80
   TIDEWATER_NEED_GEOGRAPHICLIB();
 #ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
   const GeographicLib::Geodesic earth(6378137, 1 / 298.257222101);
@@ -143,14 +135,12 @@ TEST(Line, NearlyAntipodalPointsAreNeverGivenAFalseDistance) {
   const auto given = lines(input);
   const auto answers = lines(shell("tidewater line", input).out);
   ASSERT_EQ(answers.size(), given.size());
-  int answered = 0;
   for (std::size_t i = 0; i < given.size(); ++i) {
     const auto f = numbers(given[i]), g = numbers(answers[i]);
-    if (g.empty()) continue;
-    ++answered;
-    EXPECT_NEAR(g[2], apart(earth, f[0], f[1], f[2], f[3]), 2e-3) << given[i];
+    ASSERT_EQ(g.size(), 3u) << given[i];
+    // three decimals are written
+    EXPECT_NEAR(g[2], apart(earth, f[0], f[1], f[2], f[3]), 0.00051) << given[i];
   }
-  EXPECT_GT(answered, 500);
 #endif
 }
 
@@ -231,15 +221,17 @@ TEST(Line, PolesHaveTheAzimuthsOfTheirLongitudes) {
 #endif
 }
 
-TEST(Line, StartsTooNearAPoleAreRefused) {
-  // 56 m from the pole, nearly along the parallel: the library is 800 m off at the far end
-  const Outcome r = shell("tidewater line --direct",
-                          "-89.9995056796 -10 90.049998243 19029262 x\n"
-                          "-89.9995056796 -10 90.049998243 0.05 y\n");
-  const auto got = lines(r.out);
-  EXPECT_EQ(got.at(0), "* * * x");
-  EXPECT_EQ(numbers(got.at(1)).size(), 3u);
-  EXPECT_NE(r.err.find("(TW_NOT_CONVERGED)"), std::string::npos) << r.err;
+TEST(Line, StartsNearAPole) {
+  TIDEWATER_NEED_GEOGRAPHICLIB();
+#ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
+  // 56 m from the pole, nearly along the parallel
+  const GeographicLib::Geodesic earth(6378137, 1 / 298.257222101);
+  double lat = 0, lon = 0;
+  earth.Direct(-89.9995056796, -10, 90.049998243, 19029262, lat, lon);
+  const auto n = solved("--direct", "-89.9995056796 -10 90.049998243 19029262 x");
+  ASSERT_EQ(n.size(), 3u);
+  EXPECT_LT(apart(earth, n[0], n[1], lat, lon), 1e-3);
+#endif
 }
 
 TEST(Line, OnTheSphereByHand) {
@@ -310,21 +302,22 @@ TEST(Line, RhumbLinesAgreeWithThePeer) {
 #endif
 }
 
-TEST(Line, RhumbLinesDoNotReachAPole) {
+TEST(Line, RhumbLinesEndAtAPoleAndNotBeyond) {
+  // Along the meridian: the quarter of GRS 80 is 10001965.729 m, and that of 10 degrees 1105854.833
   const Outcome inverse = shell("tidewater line --rhumb", "90 0 10 10 a\n10 10 -90 0 b\n");
-  EXPECT_EQ(inverse.out, "* * * a\n* * * b\n");
-  EXPECT_NE(inverse.err.find("(TW_BAD_LATITUDE)"), std::string::npos) << inverse.err;
+  const auto ends = lines(inverse.out);
+  ASSERT_EQ(ends.size(), 2u) << inverse.err;
+  EXPECT_NEAR(numbers(ends[0]).at(2), 10001965.729 - 1105854.833, 0.001);
+  EXPECT_NEAR(numbers(ends[1]).at(2), 10001965.729 + 1105854.833, 0.001);
   // the pole is 558 456 m away, or as much over the cosine of 60 degrees
   const Outcome direct = shell("tidewater line --rhumb --direct",
-                               "85 0 0 558400\n85 0 0 558500\n85 0 60 1116800\n85 0 60 1117000\n"
-                               "90 0 180 1000\n");
+                               "85 0 0 558400\n85 0 0 558500\n85 0 60 1116800\n85 0 60 1117000\n");
   const auto got = lines(direct.out);
-  ASSERT_EQ(got.size(), 5u);
+  ASSERT_EQ(got.size(), 4u);
   EXPECT_EQ(numbers(got[0]).size(), 3u);
   EXPECT_EQ(got[1], "* * *");
   EXPECT_EQ(numbers(got[2]).size(), 3u);
   EXPECT_EQ(got[3], "* * *");
-  EXPECT_EQ(got[4], "* * *");
   EXPECT_NE(direct.err.find("the rhumb line reaches a pole (TW_RANGE_ERROR)"), std::string::npos);
 }
 
@@ -345,21 +338,18 @@ TEST(Line, AngleFormatsOfConvert) {
 TEST(Line, WhatIsNoLineIsPassedThroughOrRefused) {
   const Outcome r = shell("tidewater line --direct",
                           "# a comment\n\n10 20 0 0, kept, as is\n10 20 0\n10 20 361 5\n"
-                          "91 20 0 5 a\n10 20 x 5 b\n10 20 0 1e5 c\n10 20 0 4100000000 d\n");
+                          "91 20 0 5 a\n10 20 x 5 b\n10 20 0 1e5 c\n");
   EXPECT_EQ(r.out,
             "# a comment\n\n10.000000000 20.000000000 180.000000000, kept, as is\n* * *\n* * *\n"
-            "* * * a\n* * * b\n* * * 1e5 c\n* * * d\n");
-  EXPECT_NE(r.err.find("standard input:4: \"10 20 0\": not a position in the given format "
-                       "(TW_BAD_TEXT)"),
+            "* * * a\n* * * b\n* * * c\n");
+  EXPECT_NE(r.err.find("standard input:4: \"10 20 0\": the distance is no number (TW_BAD_TEXT)"),
             std::string::npos)
       << r.err;
-  EXPECT_NE(r.err.find("\"10 20 361 5\": the formula has no answer there (TW_RANGE_ERROR)"),
+  EXPECT_NE(r.err.find("\"10 20 361 5\": an azimuth beyond 360 degrees (TW_RANGE_ERROR)"),
             std::string::npos)
       << r.err;
   EXPECT_NE(r.err.find("(TW_BAD_LATITUDE)"), std::string::npos);
-  EXPECT_NE(r.err.find("more than a hundred times round the ellipsoid (TW_RANGE_ERROR)"),
-            std::string::npos);
-  EXPECT_NE(r.err.find("1 solved, 6 refused"), std::string::npos) << r.err;
+  EXPECT_NE(r.err.find("1 solved, 5 refused"), std::string::npos) << r.err;
   EXPECT_EQ(r.status, 1);
   const Outcome inverse = shell("tidewater line", "1 2 3\n1 2 3 4x d\n1 2 3 4 5 e\n");
   const auto got = lines(inverse.out);

@@ -41,8 +41,9 @@ inline char* format_fixed(char* out, double value, int decimals) {
   }
   char* const end =
       std::to_chars(out, out + kNumberRoom, value, std::chars_format::fixed, decimals).ptr;
-  if (*out == '-' && std::string_view(out, static_cast<std::size_t>(end - out))
-                             .find_first_of("123456789in") == std::string_view::npos) {
+  if (*out == '-' &&
+      std::string_view(out, static_cast<std::size_t>(end - out)).find_first_of("123456789in") ==
+          std::string_view::npos) {
     std::memmove(out, out + 1, static_cast<std::size_t>(end - out - 1));
     return end - 1;
   }

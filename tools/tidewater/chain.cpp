@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <sstream>
 #include <stdexcept>
 
 namespace tidewater::command {
@@ -45,8 +46,8 @@ bool is_sphere_or_ellipsoid(const System& system) {
 }
 
 bool whole_earth(const Area& area) {
-  return area.name.empty() || (area.west <= -179.9 && area.east >= 179.9 && area.south <= -89 &&
-                               area.north >= 89);
+  return area.name.empty() ||
+         (area.west <= -179.9 && area.east >= 179.9 && area.south <= -89 && area.north >= 89);
 }
 
 bool far_outside(const Area& area, double lon, double lat) {
@@ -62,7 +63,7 @@ bool far_outside(const Area& area, double lon, double lat) {
 }
 
 // The grids that a folder's list names, or a file itself.
-std::vector<std::string> grid_files(const std::string& name, const std::string& extension) {
+std::vector<std::string> grid_files(const std::string& name, const std::string& kind) {
   namespace fs = std::filesystem;
   if (!fs::is_directory(name)) return {name};
   std::ifstream list(fs::path(name) / "area.par");
@@ -71,30 +72,32 @@ std::vector<std::string> grid_files(const std::string& name, const std::string& 
     for (std::string line; std::getline(list, line);) {
       while (!line.empty() && (line.back() == '\r' || line.back() == ' ')) line.pop_back();
       const std::size_t start = line.find_first_not_of(" \t");
-      if (start == line.npos || line[start] == '#') continue;
-      std::string file = line.substr(start, line.find_first_of(" \t", start) - start);
-      fs::path path = fs::path(name) / file;
-      for (const char* ending : {"", ".gsb", ".las", ".geo", ".gtx", ".tif"}) {
-        const fs::path with = path.string() + ending;
-        if (fs::is_regular_file(with)) {
-          path = with;
-          break;
+      if (start == line.npos || line[start] == '#' || line[start] == '*') continue;
+      // The area's name stands behind the grid's, or before it.
+      std::istringstream words(line);
+      std::string first, found;
+      for (std::string word; found.empty() && words >> word;) {
+        if (first.empty()) first = word;
+        for (const char* ending : {"", ".gsb", ".las", ".geo", ".gtx", ".tif"}) {
+          const fs::path path = fs::path(name) / (word + ending);
+          std::error_code error;
+          if (found.empty() && fs::is_regular_file(path, error)) found = path.string();
         }
       }
-      files.push_back(path.string());
+      files.push_back(found.empty() ? (fs::path(name) / first).string() : found);
     }
   } else {
     for (const auto& entry : fs::directory_iterator(name)) {
       const std::string ending = entry.path().extension().string();
-      const bool fits = extension == "shift"
-                            ? ending == ".gsb" || ending == ".las" || ending == ".tif"
-                            : ending == ".gtx" || ending == ".geo" || ending == ".tif";
+      const bool fits = kind == "shift" ? ending == ".gsb" || ending == ".las" || ending == ".tif"
+                                        : ending == ".gtx" || ending == ".geo" || ending == ".tif";
       if (fits) files.push_back(entry.path().string());
     }
     std::sort(files.begin(), files.end());
   }
   if (files.empty()) {
-    throw std::runtime_error(name + ": there are no grids in this folder, and no area.par names any");
+    throw std::runtime_error(name +
+                             ": there are no grids in this folder, and no area.par names any");
   }
   return files;
 }
@@ -181,8 +184,9 @@ Side::Side(const std::string& text, const std::string& other,
     } else {
       System known(base);
       if (known.kind() == SystemKind::projected || known.kind() == SystemKind::geocentric) {
-        system_ = known.code() != 0 ? System("geographic datum=EPSG:" + std::to_string(known.code()))
-                                    : plain_geographic(known.ellipsoid());
+        system_ = known.code() != 0
+                      ? System("geographic datum=EPSG:" + std::to_string(known.code()))
+                      : plain_geographic(known.ellipsoid());
       } else {
         system_ = std::move(known);
       }
@@ -193,13 +197,14 @@ Side::Side(const std::string& text, const std::string& other,
     const auto [end, error] = std::from_chars(text.data() + 4, text.data() + text.size(), zone);
     const std::string_view letter(end, static_cast<std::size_t>(text.data() + text.size() - end));
     const bool south = letter == "S" || letter == "s";
-    if (error != std::errc() || zone < 1 || zone > 60 || (!south && letter != "N" && letter != "n")) {
+    if (error != std::errc() || zone < 1 || zone > 60 ||
+        (!south && letter != "N" && letter != "n")) {
       throw std::invalid_argument("no such zone: " + text.substr(4) +
                                   " (auto, or 1N to 60N, 1S to 60S)");
     }
-    system_ = System("transverse mercator lat0=0 lon0=" + std::to_string(zone * 6 - 183) +
-                     " k0=0.9996 x0=500000 y0=" + (south ? "10000000 " : "0 ") +
-                     figure_text(*figure));
+    system_ =
+        System("transverse mercator lat0=0 lon0=" + std::to_string(zone * 6 - 183) +
+               " k0=0.9996 x0=500000 y0=" + (south ? "10000000 " : "0 ") + figure_text(*figure));
   } else {
     system_ = System(text);
   }
@@ -226,9 +231,9 @@ const Transformation& Side::zone(int number) const {
   auto& known = zones_->known[static_cast<std::size_t>(number + 60)];
   if (!known) {
     std::string name = std::to_string(std::abs(number)) + (number < 0 ? "S" : "N");
-    const Side side = zones_figure_
-                          ? Side("utm:" + name, "", zones_figure_)
-                          : Side("utm:" + name + (zones_on_.empty() ? "" : " " + zones_on_), "", {});
+    const Side side =
+        zones_figure_ ? Side("utm:" + name, "", zones_figure_)
+                      : Side("utm:" + name + (zones_on_.empty() ? "" : " " + zones_on_), "", {});
     known.emplace(*system_, side.system(), no_shift());
   }
   return *known;
@@ -295,7 +300,7 @@ Chain::Chain(const ChainRequest& request)
 }
 
 bool Chain::uses_heights() const {
-  return source_.has_height() || target_.kind() == Kind::space || geoid_.has_value();
+  return source_.has_height() || target_.has_height() || geoid_ || formulas_;
 }
 
 void Chain::apply(const Transformation& way, Batch& batch) const {
@@ -318,7 +323,8 @@ void Chain::run_zones(Batch& batch, bool inverse) const {
     if (!(batch.y[i] >= kUtmSouth && batch.y[i] <= kUtmNorth)) {
       batch.status[i] = TW_BAD_LATITUDE;
       if (std::fabs(batch.y[i]) <= 90) {
-        batch.reason[i] = "outside UTM's latitudes, 80 S to 84 N; --to ups:N and ups:S serve the poles";
+        batch.reason[i] =
+            "outside UTM's latitudes, 80 S to 84 N; --to ups:N and ups:S serve the poles";
       }
       continue;
     }

@@ -18,9 +18,9 @@ namespace tidewater::command {
 struct ChainRequest {
   std::string from = "wgs84";
   std::string to = "utm";
-  std::string operation;           // as TransformationOptions has it
-  std::vector<std::string> grids;  // files, or folders with a list of them
-  std::string shift;               // by formulas
+  std::string operation;                                  // as TransformationOptions has it
+  std::vector<std::string> grids;                         // files, or folders with a list of them
+  std::string shift;                                      // by formulas
   std::optional<Ellipsoid> from_ellipsoid, to_ellipsoid;  // for it
   bool inverse = false;                                   // grids and formulas turned round
   std::string geoid;
@@ -98,7 +98,7 @@ class Chain {
   std::vector<ShiftGrid> grids_;
   std::unique_ptr<DatumShift> formulas_;
   std::optional<tidewater::GeoidGrid> geoid_;
-  std::vector<tidewater::GeoidGrid> more_geoids_;  // of a folder with several
+  std::vector<tidewater::GeoidGrid> more_geoids_;                    // of a folder with several
   std::optional<Transformation> source_position_, target_position_;  // to longitude and latitude
   std::vector<Area> areas_;
   bool areas_before_ = false;  // the source's coordinates are positions

@@ -315,10 +315,9 @@ class TableWorker : public Worker {
              std::string& reason) const {
     const std::string_view text = record.field(static_cast<std::size_t>(column));
     const bool quoted = !text.empty() && text[0] == '"';
-    const bool ok =
-        quoted ? reader_.take_field(record.value(static_cast<std::size_t>(column)), is_latitude,
-                                    value, reason)
-               : reader_.take_field(text, is_latitude, value, reason);
+    const bool ok = quoted ? reader_.take_field(record.value(static_cast<std::size_t>(column)),
+                                                is_latitude, value, reason)
+                           : reader_.take_field(text, is_latitude, value, reason);
     if (!ok) reason = "column " + name(column) + ": " + reason;
     return ok;
   }
@@ -418,15 +417,14 @@ class Conversion : public Job {
         chain_(options.chain),
         reader_(chain_.source().kind(), options.in, Heights::never),
         writer_(chain_, options) {
-    if (options.heights || chain_.source().has_height()) reader_.set_heights(Heights::always);
+    if (asked()) reader_.set_heights(Heights::where_there);
   }
 
   const Chain& chain() const { return chain_; }
 
   std::string prepare(const std::string& source, std::string_view first) override {
     if (!options_.csv) {
-      if (!decided_ && !options_.heights && !chain_.source().has_height() &&
-          reader_.all_have_heights(first)) {
+      if (!decided_ && !asked() && reader_.all_have_heights(first)) {
         reader_.set_heights(Heights::where_there);
       }
       decided_ = true;
@@ -457,6 +455,9 @@ class Conversion : public Job {
   }
 
  private:
+  // Heights are asked for, by name or by what is done with them.
+  bool asked() const { return options_.heights || chain_.uses_heights(); }
+
   void find_columns() {
     const Table& table = *columns_.table;
     const auto find = [&](const std::string& given, const char* option,
@@ -580,7 +581,8 @@ int convert(ConvertOptions& options) {
     throw std::invalid_argument("geocentric coordinates have no height above the geoid");
   }
   for (const std::string& file : options.files) {
-    if (ends_with(file, ".geojson") || ends_with(file, ".geojsonl") || ends_with(file, ".geojsons")) {
+    if (ends_with(file, ".geojson") || ends_with(file, ".geojsonl") ||
+        ends_with(file, ".geojsons")) {
       options.geojson = true;
     }
   }
@@ -710,7 +712,8 @@ void add_convert(CLI::App& app, int& exit_status) {
   command->add_option("--x", options->x, "column of longitudes, eastings or X")->group("Table");
   command->add_option("--y", options->y, "column of latitudes, northings or Y")->group("Table");
   command->add_option("--z", options->z, "column of heights or Z")->group("Table");
-  command->add_option("--separator", options->separator, "of the table's fields: a character, or tab")
+  command
+      ->add_option("--separator", options->separator, "of the table's fields: a character, or tab")
       ->group("Table");
   command->add_flag("--in-place", options->in_place, "results take the place of the coordinates")
       ->needs("--csv")

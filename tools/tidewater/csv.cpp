@@ -77,7 +77,8 @@ Table::Table(std::string_view first_line, char given_separator) {
     }
   }
   Record record;
-  if (!record.take(first_line, separator)) throw std::runtime_error("the table has no line of names");
+  if (!record.take(first_line, separator))
+    throw std::runtime_error("the table has no line of names");
   for (std::size_t i = 0; i < record.size(); ++i) names.push_back(record.value(i));
 }
 
@@ -112,7 +113,8 @@ std::string Table::all_names() const {
 }
 
 void append_field(Buffer& out, std::string_view value, char separator) {
-  const bool plain = value.find_first_of("\"\r\n") == value.npos && value.find(separator) == value.npos;
+  const bool plain =
+      value.find_first_of("\"\r\n") == value.npos && value.find(separator) == value.npos;
   if (plain) return out.add(value);
   out.add('"');
   for (const char c : value) {

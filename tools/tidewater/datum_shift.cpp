@@ -38,9 +38,10 @@ class MolodenskyShift : public DatumShift {
 
   TWstatus run(int32_t count, CoordinateTriple* points) const override {
     TWstatus status = TW_SUCCESS;
-    (inverse_ ? TWmol_std_i : TWmol_std_f)(source_.a(), source_.eccentricity(), target_.a() - source_.a(),
-                                           target_.flattening() - source_.flattening(), d_[0], d_[1], d_[2], count,
-                                           points, points, &status);
+    (inverse_ ? TWmol_std_i : TWmol_std_f)(source_.a(), source_.eccentricity(),
+                                           target_.a() - source_.a(),
+                                           target_.flattening() - source_.flattening(), d_[0],
+                                           d_[1], d_[2], count, points, points, &status);
     return status == TW_SUCCESS ? checked(count, points) : status;
   }
 
@@ -123,8 +124,9 @@ std::unique_ptr<DatumShift> make_datum_shift(const ShiftRequest& request) {
   if (kind == "helmert") {
     return by_formulas<HelmertShift, 7>(request, what, "helmert:DX,DY,DZ,RX,RY,RZ,PPM");
   }
-  throw std::runtime_error("no such shift: " + request.text +
-                           " (molodensky:DX,DY,DZ or helmert:DX,DY,DZ,RX,RY,RZ,PPM; nadcon:DIR or ntv2:DIR)");
+  throw std::runtime_error(
+      "no such shift: " + request.text +
+      " (molodensky:DX,DY,DZ or helmert:DX,DY,DZ,RX,RY,RZ,PPM; nadcon:DIR or ntv2:DIR)");
 }
 
 }  // namespace tidewater::command

@@ -109,14 +109,16 @@ std::string man_page(const Page& page) {
   const std::size_t first_line = about.find('\n');
   std::string brief = about.substr(0, first_line);
   if (!brief.empty() && brief.back() == '.') brief.pop_back();
-  if (!brief.empty() && brief[0] >= 'A' && brief[0] <= 'Z') brief[0] = static_cast<char>(brief[0] + 32);
+  if (!brief.empty() && brief[0] >= 'A' && brief[0] <= 'Z')
+    brief[0] = static_cast<char>(brief[0] + 32);
   std::string text = ".TH " + title + " 1 \"\" \"Tidewater " TIDEWATER_VERSION "\"\n";
   text += ".SH NAME\n" + troff(page.name("-")) + " \\- " + troff(brief) + "\n";
   text += ".SH SYNOPSIS\n.B " + page.name(" ") + "\n[\\fIoptions\\fR]";
   for (const CLI::Option* option : options_of(app, true)) {
     text += " [\\fI" + option->get_name(true) + "\\fR...]";
   }
-  if (!app.get_subcommands([](const CLI::App*) { return true; }).empty()) text += " \\fIcommand\\fR";
+  if (!app.get_subcommands([](const CLI::App*) { return true; }).empty())
+    text += " \\fIcommand\\fR";
   text += "\n.SH DESCRIPTION\n" + troff(about) + "\n";
   bool any = false;
   for (const CLI::App* sub : app.get_subcommands([](const CLI::App*) { return true; })) {
@@ -138,7 +140,8 @@ std::string man_page(const Page& page) {
         const auto choices = choices_of(*option);
         std::string value;
         for (const std::string& choice : choices) value += (value.empty() ? "" : "|") + choice;
-        if (takes_value(*option)) head += " \\fI" + (value.empty() ? "value" : troff(value)) + "\\fR";
+        if (takes_value(*option))
+          head += " \\fI" + (value.empty() ? "value" : troff(value)) + "\\fR";
       }
       text += ".TP\n" + head + "\n" + troff(option->get_description());
       const std::string usual = option->get_default_str();
@@ -162,7 +165,8 @@ std::string bash_completion(const std::vector<Page>& pages) {
       "  for ((i = 1; i < COMP_CWORD; i++)); do\n"
       "    case \"$path ${COMP_WORDS[i]}\" in\n";
   for (const Page& page : pages) {
-    if (page.words.size() > 1) text += "      \"" + page.name(" ") + "\") path=\"" + page.name(" ") + "\" ;;\n";
+    if (page.words.size() > 1)
+      text += "      \"" + page.name(" ") + "\") path=\"" + page.name(" ") + "\" ;;\n";
   }
   text += "    esac\n  done\n  case \"$path $before\" in\n";
   for (const Page& page : pages) {
@@ -213,19 +217,23 @@ std::string brief(const std::string& text) {
 }
 
 std::string zsh_completion(const std::vector<Page>& pages) {
-  std::string text = "#compdef tidewater\n_tidewater() {\n  local path=tidewater i\n"
-                     "  for ((i = 2; i < CURRENT; i++)); do\n    case \"$path ${words[i]}\" in\n";
+  std::string text =
+      "#compdef tidewater\n_tidewater() {\n  local path=tidewater i\n"
+      "  for ((i = 2; i < CURRENT; i++)); do\n    case \"$path ${words[i]}\" in\n";
   for (const Page& page : pages) {
-    if (page.words.size() > 1) text += "      \"" + page.name(" ") + "\") path=\"" + page.name(" ") + "\" ;;\n";
+    if (page.words.size() > 1)
+      text += "      \"" + page.name(" ") + "\") path=\"" + page.name(" ") + "\" ;;\n";
   }
   text += "    esac\n  done\n  case \"$path\" in\n";
   for (const Page& page : pages) {
     text += "    \"" + page.name(" ") + "\")\n";
     std::string subs;
     for (const CLI::App* sub : page.app->get_subcommands([](const CLI::App*) { return true; })) {
-      if (is_shown(*sub)) subs += " " + in_quotes(sub->get_name() + ":" + brief(sub->get_description()));
+      if (is_shown(*sub))
+        subs += " " + in_quotes(sub->get_name() + ":" + brief(sub->get_description()));
     }
-    if (!subs.empty()) text += "      local -a commands=(" + subs + " )\n      _describe command commands\n";
+    if (!subs.empty())
+      text += "      local -a commands=(" + subs + " )\n      _describe command commands\n";
     text += "      local -a options=(";
     for (const CLI::Option* option : options_of(*page.app, false)) {
       for (const std::string& name : names_of(*option)) {
@@ -250,7 +258,8 @@ std::string fish_completion(const std::vector<Page>& pages) {
     const std::string start = "complete -c tidewater -n " + in_quotes(condition);
     for (const CLI::App* sub : page.app->get_subcommands([](const CLI::App*) { return true; })) {
       if (is_shown(*sub)) {
-        text += start + " -a " + sub->get_name() + " -d " + in_quotes(brief(sub->get_description())) + "\n";
+        text += start + " -a " + sub->get_name() + " -d " +
+                in_quotes(brief(sub->get_description())) + "\n";
       }
     }
     for (const CLI::Option* option : options_of(*page.app, false)) {
@@ -258,7 +267,8 @@ std::string fish_completion(const std::vector<Page>& pages) {
       for (const std::string& name : option->get_snames()) text += " -s " + name;
       for (const std::string& name : option->get_lnames()) text += " -l " + name;
       std::string words;
-      for (const std::string& choice : choices_of(*option)) words += (words.empty() ? "" : " ") + choice;
+      for (const std::string& choice : choices_of(*option))
+        words += (words.empty() ? "" : " ") + choice;
       if (!words.empty()) text += " -x -a " + in_quotes(words);
       if (words.empty() && takes_value(*option)) text += " -r";
       text += " -d " + in_quotes(brief(option->get_description())) + "\n";

@@ -156,7 +156,8 @@ class Converter {
     key_.clear();
     return true;
   }
-  bool parse_error(std::size_t place, const std::string&, const nlohmann::detail::exception& error) {
+  bool parse_error(std::size_t place, const std::string&,
+                   const nlohmann::detail::exception& error) {
     // The library's sentence begins with its own name and number.
     std::string words = error.what();
     const std::size_t colon = words.find(": ");
@@ -259,8 +260,9 @@ class Converter {
     const Kind target = chain_->target().kind();
     if (source == Kind::military || source == Kind::grid || target == Kind::military ||
         target == Kind::grid || target == Kind::space || source == Kind::space) {
-      throw std::invalid_argument("GeoJSON holds longitudes and latitudes or a map's coordinates: "
-                                  "say --to with such a system");
+      throw std::invalid_argument(
+          "GeoJSON holds longitudes and latitudes or a map's coordinates: "
+          "say --to with such a system");
     }
     decimals_ = options_.precision >= 0 ? options_.precision : target == Kind::angles ? 9 : 3;
     metres_ = options_.precision >= 0 ? options_.precision : 3;
@@ -277,7 +279,7 @@ class Converter {
     const std::size_t colon = name.rfind(':');
     std::string code = colon == name.npos ? name : name.substr(colon + 1);
     ChainRequest request = options_.chain;
-    request.from = code == "CRS84" ? "wgs84"
+    request.from = code == "CRS84"                  ? "wgs84"
                    : name.find("EPSG") != name.npos ? "EPSG:" + code
                                                     : name;
     if (converted_any_) late_crs();

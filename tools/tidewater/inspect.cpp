@@ -68,9 +68,8 @@ int write_found(const Listing& listing, const std::vector<FoundSystem>& found) {
     const std::string kind = kind_name(system.kind);
     if (!listing.kind.empty() && kind.rfind(listing.kind, 0) != 0) continue;
     if (listing.json) {
-      list.push_back({{"code", "EPSG:" + std::to_string(system.code)},
-                      {"kind", kind},
-                      {"name", system.name}});
+      list.push_back(
+          {{"code", "EPSG:" + std::to_string(system.code)}, {"kind", kind}, {"name", system.name}});
     } else {
       text += "EPSG:" + std::to_string(system.code) + "\t" + kind + "\t" + system.name + "\n";
     }
@@ -260,8 +259,8 @@ class FactorWorker : public Worker {
     Factors f = {};
     if (status == TW_SUCCESS) {
       f = job_.map_.factors(Point{lon, position.y, 0});
-      const bool finite = std::isfinite(f.meridional) && std::isfinite(f.parallel) &&
-                          std::isfinite(f.convergence);
+      const bool finite =
+          std::isfinite(f.meridional) && std::isfinite(f.parallel) && std::isfinite(f.convergence);
       if (!finite) status = TW_RANGE_ERROR;
     }
     if (status != TW_SUCCESS) {
@@ -509,8 +508,8 @@ void add_geoid(CLI::App& app, int& exit_status) {
 
 void add_doctor(CLI::App& app, int& exit_status) {
   auto as_json = std::make_shared<bool>(false);
-  CLI::App* command = app.add_subcommand(
-      "doctor", "Says which version, store, grids and processor are at work.");
+  CLI::App* command =
+      app.add_subcommand("doctor", "Says which version, store, grids and processor are at work.");
   command->add_flag("--json", *as_json, "for programs");
   command->callback([as_json, &exit_status] { exit_status = doctor(*as_json); });
 }

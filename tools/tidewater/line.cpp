@@ -75,7 +75,8 @@ struct Solved {
       : lon1(size), lat1(size), lon2(size), lat2(size), azimuth(size), ahead(size), length(size) {}
   std::vector<double> lon1, lat1, lon2, lat2, azimuth, ahead, length;
 
-  double back(std::size_t i) const { return wrapped(ahead[i] + 180); }
+  // Towards the start: a line of negative length ends looking away from it.
+  double back(std::size_t i) const { return wrapped(length[i] < 0 ? ahead[i] : ahead[i] + 180); }
 };
 
 class LineSolving : public Job {
@@ -274,12 +275,13 @@ class LineWorker : public Worker {
     const std::size_t count = entries_.size();
     job_.lines_.with([&](const auto& lines) {
       if (options_.direct) {
-        lines.direct(count, {work_.lon1.data(), work_.lat1.data(), work_.azimuth.data(),
-                             work_.length.data()},
-                     {work_.lon2.data(), work_.lat2.data(), work_.ahead.data(), nullptr});
+        lines.direct(
+            count,
+            {work_.lon1.data(), work_.lat1.data(), work_.azimuth.data(), work_.length.data()},
+            {work_.lon2.data(), work_.lat2.data(), work_.ahead.data(), nullptr});
       } else {
-        lines.inverse(count, {work_.lon1.data(), work_.lat1.data(), work_.lon2.data(),
-                              work_.lat2.data()},
+        lines.inverse(count,
+                      {work_.lon1.data(), work_.lat1.data(), work_.lon2.data(), work_.lat2.data()},
                       {work_.length.data(), work_.azimuth.data(), work_.ahead.data(), nullptr});
       }
     });
@@ -658,21 +660,18 @@ void add_line(CLI::App& app, int& exit_status) {
                  "distance); all are kept, and the results added")
       ->group("Input");
   command
-      ->add_option("--separator", options->separator,
-                   "of the table's fields: a character, or tab")
+      ->add_option("--separator", options->separator, "of the table's fields: a character, or tab")
       ->group("Input");
-  CLI::Option* direct =
-      command
-          ->add_flag("--direct", options->direct,
-                     "from a position, an azimuth and a distance in metres")
-          ->group("Line");
+  CLI::Option* direct = command
+                            ->add_flag("--direct", options->direct,
+                                       "from a position, an azimuth and a distance in metres")
+                            ->group("Line");
   command
       ->add_flag("--rhumb", options->rhumb,
                  "rhumb lines, of constant azimuth, the short way round; else geodesics, the "
                  "shortest lines")
       ->group("Line");
-  command
-      ->add_option("-e,--ellipsoid", options->ellipsoid, "ellipsoid: a name, or A,RF")
+  command->add_option("-e,--ellipsoid", options->ellipsoid, "ellipsoid: a name, or A,RF")
       ->capture_default_str()
       ->group("Line");
   CLI::Option* points =
@@ -707,7 +706,8 @@ void add_line(CLI::App& app, int& exit_status) {
       ->excludes(points)
       ->excludes(spacing)
       ->group("Line");
-  add_precision(*command, options->precision, "decimals of degrees or grads (9), or of seconds (5)");
+  add_precision(*command, options->precision,
+                "decimals of degrees or grads (9), or of seconds (5)");
   add_angle_options(*command, options->out, "out-", "Output");
   command->footer(kExamples);
   command->callback([options, &exit_status] { exit_status = solve_lines(*options); });

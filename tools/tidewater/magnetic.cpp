@@ -22,7 +22,6 @@ namespace tidewater::command {
 
 namespace {
 
-
 struct Options {
   std::vector<std::string> position;
   std::vector<std::string> files;
@@ -295,9 +294,7 @@ class FieldWorker : public Worker {
     place(entry, lon, lat, height);
   }
 
-  static bool is_good(const Entry& entry) {
-    return entry.is_data && entry.status == TW_SUCCESS;
-  }
+  static bool is_good(const Entry& entry) { return entry.is_data && entry.status == TW_SUCCESS; }
 
   // The model at a date; those last used are kept.
   const MagneticModel& model_at(double date) {
@@ -459,7 +456,9 @@ void add_magnetic(CLI::App& app, int& exit_status) {
       ->group("Model");
   command->add_option("--date", options->date, "decimal year, or YYYY-MM-DD; today if not given")
       ->group("Model");
-  command->add_option("--store", options->store, "parameter store, instead of that of the library or of TIDEWATER_STORE")
+  command
+      ->add_option("--store", options->store,
+                   "parameter store, instead of that of the library or of TIDEWATER_STORE")
       ->group("Model");
   command
       ->add_flag("--csv", options->csv,
@@ -471,7 +470,8 @@ void add_magnetic(CLI::App& app, int& exit_status) {
   command
       ->add_option("--date-column", options->when, "column of dates, one a row, as --date has them")
       ->group("Table");
-  command->add_option("--separator", options->separator, "of the table's fields: a character, or tab")
+  command
+      ->add_option("--separator", options->separator, "of the table's fields: a character, or tab")
       ->group("Table");
   command->footer(kExamples);
   command->callback([options, &exit_status] { exit_status = compute_fields(*options); });

@@ -19,13 +19,15 @@ void add_angle_options(CLI::App& app, AngleStyle& style, const std::string& pref
     add("hemisphere", style.hemisphere, "letters of the hemisphere: front and behind demand them",
         {"sign", "front", "behind"});
     app.add_option_function<std::string>(
-           "--decimal", [&style](const std::string& mark) { style.decimal_comma = mark == "comma"; },
+           "--decimal",
+           [&style](const std::string& mark) { style.decimal_comma = mark == "comma"; },
            "the decimal mark of the input")
         ->check(CLI::IsMember({"point", "comma"}))
         ->group(group);
   } else {
     style.form = "degrees";
-    add("format", style.form, "how an angle is written: 48.5, 53.9 grads, 48:30.0, 48:30:00, 48.3000",
+    add("format", style.form,
+        "how an angle is written: 48.5, 53.9 grads, 48:30.0, 48:30:00, 48.3000",
         {"degrees", "grads", "dm", "dms", "packed"});
     add("hemisphere", style.hemisphere, "a sign, or a letter in front of or behind each angle",
         {"sign", "front", "behind"});

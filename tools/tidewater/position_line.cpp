@@ -92,8 +92,8 @@ std::size_t fields_of(std::string_view line, bool decimal_comma,
   const auto separates = [&](std::size_t i) {
     if (line[i] == ';') return true;
     if (line[i] != ',') return false;
-    const bool inside = i > 0 && i + 1 < line.size() && is_digit(line[i - 1]) &&
-                        is_digit(line[i + 1]);
+    const bool inside =
+        i > 0 && i + 1 < line.size() && is_digit(line[i - 1]) && is_digit(line[i + 1]);
     return !(decimal_comma && inside);
   };
   while (count < kMostFields) {
@@ -134,7 +134,8 @@ bool packed_angle(std::string_view text, double& degrees) {
       return false;
     }
   }
-  if (digits.empty() || (point != text.npos && text.find('.', point + 1) != text.npos)) return false;
+  if (digits.empty() || (point != text.npos && text.find('.', point + 1) != text.npos))
+    return false;
   std::string behind = point == text.npos ? "" : std::string(text.substr(point + 1));
   while (behind.size() < 4) behind += '0';
   double whole = 0;
@@ -317,6 +318,10 @@ void PositionReader::take_height(std::string_view line, TakenPosition& position)
 }
 
 void PositionReader::finish_angles(TakenPosition& position) const {
+  if (std::fabs(position.x) > 360) {
+    position.status = TW_BAD_LONGITUDE;
+    position.reason.clear();
+  }
   if (style_.reverse == "none") return;
   if (style_.reverse != "lat") position.x = -position.x;
   if (style_.reverse != "lon") position.y = -position.y;
@@ -436,8 +441,8 @@ bool PositionReader::take_field(std::string_view field, bool is_latitude, double
   const char* const end = field.data() + field.size();
   if (is_plain_ && style_.hemisphere == "sign" &&
       plain_number(field.data(), end, value,
-                   kind_ == Kind::angles ? std::chars_format::fixed
-                                         : std::chars_format::general) == end) {
+                   kind_ == Kind::angles ? std::chars_format::fixed : std::chars_format::general) ==
+          end) {
     if (kind_ == Kind::angles && style_.reverse != "none" &&
         style_.reverse != (is_latitude ? "lon" : "lat")) {
       value = -value;
@@ -553,10 +558,11 @@ void append_angle(Buffer& out, double degrees, Axis axis, const AngleStyle& styl
       end = to;
     }
   }
-  const bool negative = degrees < 0 && std::string_view(text, static_cast<std::size_t>(end - text))
-                                               .find_first_of("123456789") != std::string_view::npos;
-  const char letter =
-      axis == Axis::latitude ? (negative ? 'S' : 'N') : (negative ? 'W' : 'E');
+  const bool negative =
+      degrees < 0 &&
+      std::string_view(text, static_cast<std::size_t>(end - text)).find_first_of("123456789") !=
+          std::string_view::npos;
+  const char letter = axis == Axis::latitude ? (negative ? 'S' : 'N') : (negative ? 'W' : 'E');
   if (letters && style.hemisphere == "front") out.add(letter);
   out.add(std::string_view(text, static_cast<std::size_t>(end - text)));
   if (letters && style.hemisphere == "behind") out.add(letter);

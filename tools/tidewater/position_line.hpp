@@ -36,7 +36,7 @@ enum class Kind {
 };
 
 // Whether a third number is a height.
-enum class Heights { never, always, where_there };
+enum class Heights { never, where_there };
 
 struct TakenPosition {
   double x = 0, y = 0, z = 0;  // longitude or easting first; degrees

@@ -87,8 +87,8 @@ class Source {
   // A line that is too long is given as far as it may go; the rest is passed over.
   bool cut(std::vector<char>& buffer, Chunk& chunk) {
     if (records_) {
-      throw std::runtime_error(name_ + ": a record is longer than " +
-                               std::to_string(kChunk >> 10) + " KB; is a quote left open?");
+      throw std::runtime_error(name_ + ": a record is longer than " + std::to_string(kChunk >> 10) +
+                               " KB; is a quote left open?");
     }
     std::vector<char> rest(kLongestLine);
     bool found = false;
