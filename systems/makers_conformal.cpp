@@ -1,8 +1,10 @@
 // Conformal methods.
 #include <optional>
 #include "formulas/krovak.hpp"
+#include "formulas/oblique_mercator.hpp"
 
 #include "makers.hpp"
+#include "projection_points.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
@@ -13,18 +15,20 @@ namespace {
 // Mercator, transverse Mercator and the rest take these arguments last.
 #define TW_BLOCK int count, const CoordinateTriple *in, CoordinateTriple *out, TWstatus *status
 
-struct TransverseMercator {
-  double e, lat0;
-  double A0, A2, A4, A6, A8, M0, B2, B4, B6;
+// By series: within 5 nm to 3,900 km from the central meridian, a refusal beyond.
+struct TransverseMercatorMap {
+  TransverseMercatorForward to_plane;
+  TransverseMercatorInverse to_ellipsoid;
 
-  TransverseMercator(double eccentricity, double lat_origin) : e(eccentricity), lat0(lat_origin) {
-    TWstatus made;
-    TWt_merc_c(e, 0, lat0, &A0, &A2, &A4, &A6, &A8, &M0, &B2, &B4, &B6, &made);
+  TransverseMercatorMap(const MethodArguments& given, double scale)
+      : to_plane{TransverseMercator(given.a, given.f, scale), 0}, to_ellipsoid{to_plane.map, 0} {
+    require(given.f <= TransverseMercator::kLargestFlattening, given,
+            "the series do not reach a flattening above 1/150");
+    to_plane.y0 = to_plane.map.forward(0.0, given(kLat0)).y;
+    to_ellipsoid.y0 = to_plane.y0;
   }
-  void forward(TW_BLOCK) const { TWt_merc_f(e, 0, A0, A2, A4, A6, A8, M0, count, in, out, status); }
-  void inverse(TW_BLOCK) const {
-    TWt_merc_i(e, 0, lat0, A0, M0, B2, B4, B6, count, in, out, status);
-  }
+  void forward(TW_BLOCK) const { *status = over_points(to_plane, count, in, out); }
+  void inverse(TW_BLOCK) const { *status = over_points(to_ellipsoid, count, in, out); }
 };
 
 // The block functions of a value that has forward() and inverse().
@@ -33,12 +37,6 @@ Made block_formula(const Plane& plane, const T& map) {
   return formula(
       plane, [map](TW_BLOCK) { map.forward(count, in, out, status); },
       [map](TW_BLOCK) { map.inverse(count, in, out, status); });
-}
-
-Plane mirrored(Plane plane) {
-  plane.sx = -plane.sx;
-  plane.sy = -plane.sy;
-  return plane;
 }
 
 Made lambert(const MethodArguments& given, const Plane& plane, double lat0, double lat1,
@@ -69,32 +67,6 @@ double parallel_radius(double e2, double lat) {
   return std::cos(lat) / std::sqrt(1 - e2 * s * s);
 }
 
-// Hotine's oblique Mercator about the crossing of its line with the aposphere's equator; `centre`
-// moves the origin to a point.
-Made oblique_mercator(const MethodArguments& given, Plane plane, int16_t mode, double lon1,
-                      double lat1, double lon2, double lat2, double azimuth,
-                      std::optional<double> rotation, bool from_centre) {
-  const double e = given.e;
-  double lat0 = given(kLatC);
-  double alpha = azimuth;
-  double B, A, E, crossing, gamma0;
-  TWstatus made;
-  TWo_merc_c(mode, e, lon1, lat1, lon2, lat2, &lat0, &alpha, &B, &A, &E, &crossing, &gamma0, &made);
-  require(made, given);
-  const double turn = rotation.value_or(alpha);
-  if (from_centre) {
-    CoordinateTriple centre = {lon1, lat1, 0};
-    TWo_merc_f(e, turn, gamma0, crossing, E, B, A, 1, &centre, &centre, &made);
-    require(made, given);
-    plane.x0 -= plane.sx * centre.x;
-    plane.y0 -= plane.sy * centre.y;
-  }
-  return formula(
-      plane,
-      [=](TW_BLOCK) { TWo_merc_f(e, turn, gamma0, crossing, E, B, A, count, in, out, status); },
-      [=](TW_BLOCK) { TWo_merc_i(e, turn, gamma0, crossing, E, B, A, count, in, out, status); });
-}
-
 Made polar_stereographic(const MethodArguments& given, const Plane& plane, double pole) {
   const double e = given.e;
   double C, m0 = 0, chi0 = 0;
@@ -118,8 +90,8 @@ double polar_scale(double e, double lat) {
 
 Made krovak(const MethodArguments& given, bool modified, double sign) {
   // Southing and westing are the second and first axis of the registry's grid.
-  const points::Krovak map(given.a, given.e, given(kLatC), given(kColatitude),
-                           given(kPseudoParallel), given(kPseudoScale, 1), modified);
+  const Krovak map(given.a, given.e, given(kLatC), given(kColatitude), given(kPseudoParallel),
+                   given(kPseudoScale, 1), modified);
   const Plane plane = {given(kLonOrigin), sign, sign, sign * given(kX0), sign * given(kY0)};
   require(std::isfinite(map.r0) && std::isfinite(map.t0), given, "its constants are not finite");
   return pointwise(
@@ -136,23 +108,34 @@ Made krovak(const MethodArguments& given, bool modified, double sign) {
 
 }  // namespace
 
+Next TransverseMercatorForward::other(const CoordinateTriple&, CoordinateTriple*,
+                                      TWstatus* status) const {
+  *status = TW_RANGE_ERROR;  // too far from the central meridian
+  return Next::point;
+}
+
+Next TransverseMercatorInverse::other(const CoordinateTriple&, CoordinateTriple*,
+                                      TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
 Made make_transverse_mercator(const MethodArguments& given) {
-  return block_formula(natural_plane(given, given(kK0, 1)),
-                       TransverseMercator(given.e, given(kLat0)));
+  return block_formula(Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
+                       TransverseMercatorMap(given, given(kK0, 1)));
 }
 
 Made make_transverse_mercator_south(const MethodArguments& given) {
-  return block_formula(mirrored(natural_plane(given, given(kK0, 1))),
-                       TransverseMercator(given.e, given(kLat0)));
+  return block_formula(Plane{given(kLon0), -1, -1, given(kX0), given(kY0)},
+                       TransverseMercatorMap(given, given(kK0, 1)));
 }
 
 // Each zone's million is put before its easting.
 Made make_zoned_transverse_mercator(const MethodArguments& given) {
-  const TransverseMercator map(given.e, given(kLat0));
+  const TransverseMercatorMap map(given, given(kK0, 1));
   const double first = given(kInitialLon);
   const double width = given(kZoneWidth);
   require(width > 0, given, "the zone width must be above zero");
-  const double scale = given.a * given(kK0, 1);
   const double x0 = given(kX0);
   const double y0 = given(kY0);
   const auto centre = [=](double zone) { return first + (zone - 0.5) * width; };
@@ -165,8 +148,8 @@ Made make_zoned_transverse_mercator(const MethodArguments& given) {
           const double zone = 1 + std::floor(from / width);
           CoordinateTriple point = {std::remainder(in[i].x - centre(zone), 2 * kPi), in[i].y, 0};
           map.forward(1, &point, &point, status);
-          out[i].x = zone * 1e6 + x0 + scale * point.x;
-          out[i].y = y0 + scale * point.y;
+          out[i].x = zone * 1e6 + x0 + point.x;
+          out[i].y = y0 + point.y;
         }
       },
       [=](TW_BLOCK) {
@@ -177,7 +160,7 @@ Made make_zoned_transverse_mercator(const MethodArguments& given) {
             *status = TW_BAD_ZONE;
             continue;
           }
-          CoordinateTriple point = {(in[i].x - zone * 1e6 - x0) / scale, (in[i].y - y0) / scale, 0};
+          CoordinateTriple point = {in[i].x - zone * 1e6 - x0, in[i].y - y0, 0};
           map.inverse(1, &point, &point, status);
           out[i].x = point.x + centre(zone);
           out[i].y = point.y;
@@ -240,33 +223,66 @@ Made make_pseudo_mercator(const MethodArguments& given) {
   return mercator(given, natural_plane(given, 1), 0, 0);
 }
 
-Made make_oblique_mercator_a(const MethodArguments& given) {
+namespace {
+
+// The skew coordinates turned to the grid; from the line's crossing or from the centre.
+Made hotine(const MethodArguments& given, double x0, double y0, double azimuth, double turn,
+            bool from_centre) {
+  const double lat = given(kLatC);
+  require(std::fabs(lat) < kHalfPi - 1e-10, given, "its centre lies at a pole");
+  const ObliqueMercator map(given.e, lat, azimuth);
   const double scale = given.a * given(kLineScale, 1);
+  const double c = std::cos(turn);
+  const double s = std::sin(turn);
+  const double u0 = from_centre ? map.centre_u : 0;
+  return pointwise(
+      Plane{given(kLonC), scale, scale, x0, y0},
+      [=](double lon, double lat_of_point) {
+        double u, v;
+        const bool plain = map.forward(lon, lat_of_point, &u, &v);
+        u -= u0;
+        return Pair{v * c + u * s, u * c - v * s, plain};
+      },
+      [=](double x, double y) {
+        Pair answer{};
+        map.inverse(y * c + x * s + u0, x * c - y * s, &answer.x, &answer.y);
+        answer.plain = std::isfinite(answer.x) && std::isfinite(answer.y);
+        return answer;
+      });
+}
+
+}  // namespace
+
+Made make_oblique_mercator_a(const MethodArguments& given) {
   const double azimuth = given(kAzimuth);
-  return oblique_mercator(given, {given(kLonC), scale, scale, given(kX0), given(kY0)}, 1, 0,
-                          given(kLatC), 0, 0, azimuth, given(kRectifiedAngle, azimuth), false);
+  return hotine(given, given(kX0), given(kY0), azimuth, given(kRectifiedAngle, azimuth), false);
 }
 
 Made make_oblique_mercator_b(const MethodArguments& given) {
-  const double scale = given.a * given(kLineScale, 1);
   const double azimuth = given(kAzimuth);
-  return oblique_mercator(given, {given(kLonC), scale, scale, given(kXC), given(kYC)}, 1, 0,
-                          given(kLatC), 0, 0, azimuth, given(kRectifiedAngle, azimuth), true);
+  return hotine(given, given(kXC), given(kYC), azimuth, given(kRectifiedAngle, azimuth), true);
 }
 
 Made make_swiss_oblique(const MethodArguments& given) {
-  const double scale = given.a * given(kLineScale, 1);
-  return oblique_mercator(given, {given(kLonC), scale, scale, given(kXC), given(kYC)}, 1, 0,
-                          given(kLatC), 0, 0, kHalfPi, kHalfPi, true);
+  return hotine(given, given(kXC), given(kYC), kHalfPi, kHalfPi, true);
 }
 
 Made make_two_point_oblique(const MethodArguments& given) {
-  const double scale = given.a * given(kLineScale, 1);
+  const double e = given.e;
   const double lon1 = given(kLongitudeOfFirstPoint);
-  return oblique_mercator(given, {lon1, scale, scale, given(kX0), given(kY0)}, 2, 0,
-                          given(kLatitudeOfFirstPoint),
-                          std::remainder(given(kLongitudeOfSecondPoint) - lon1, 2 * kPi),
-                          given(kLatitudeOfSecondPoint), 0, std::nullopt, false);
+  double lat0 = given(kLatC);
+  double alpha = 0;
+  double B, A, E, crossing, gamma0;
+  TWstatus made;
+  TWo_merc_c(2, e, 0, given(kLatitudeOfFirstPoint),
+             std::remainder(given(kLongitudeOfSecondPoint) - lon1, 2 * kPi),
+             given(kLatitudeOfSecondPoint), &lat0, &alpha, &B, &A, &E, &crossing, &gamma0, &made);
+  require(made, given);
+  const double scale = given.a * given(kLineScale, 1);
+  return formula(
+      Plane{lon1, scale, scale, given(kX0), given(kY0)},
+      [=](TW_BLOCK) { TWo_merc_f(e, alpha, gamma0, crossing, E, B, A, count, in, out, status); },
+      [=](TW_BLOCK) { TWo_merc_i(e, alpha, gamma0, crossing, E, B, A, count, in, out, status); });
 }
 
 Made make_laborde(const MethodArguments& given) {

@@ -7,6 +7,7 @@
 #include "formulas/latitudes.hpp"
 #include "makers.hpp"
 #include "tidewater/conformal.h"
+#include "tidewater/lines.hpp"
 #include "tidewater/special.h"
 
 namespace tidewater::detail {
@@ -101,8 +102,22 @@ struct Cassini {
   void forward(TW_BLOCK) const {
     TWcassini_f(e, 0, c0, c2, c4, c6, c8, m0, count, in, out, status);
   }
+  // The inverse series with what they miss put right by the forward ones.
   void inverse(TW_BLOCK) const {
-    TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, count, in, out, status);
+    for (int i = 0; i < count; ++i) {
+      const CoordinateTriple wanted = in[i];
+      CoordinateTriple aim = wanted;
+      for (int pass = 0; pass < 8; ++pass) {
+        CoordinateTriple back;
+        TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, 1, &aim, out + i, status);
+        forward(1, out + i, &back, status);
+        const double dx = wanted.x - back.x;
+        const double dy = wanted.y - back.y;
+        aim.x += dx;
+        aim.y += dy;
+        if (std::fabs(dx) < 1e-15 && std::fabs(dy) < 1e-15) break;
+      }
+    }
   }
 };
 
@@ -210,13 +225,13 @@ Made make_equal_earth(const MethodArguments& given) {
       plane,
       [=](double lon, double lat) {
         Pair answer{};
-        points::EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
+        EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
         answer.plain = true;
         return answer;
       },
       [=](double x, double y) {
         Pair answer{};
-        answer.plain = points::EqualEarth::inverse(x, y, &answer.x, &answer.y);
+        answer.plain = EqualEarth::inverse(x, y, &answer.x, &answer.y);
         answer.y = sphere.to_geodetic(answer.y);
         return answer;
       });
@@ -350,8 +365,25 @@ Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
       [=](TW_BLOCK) { TWaz_eq_i(e, 0, lat0, n1, count, in, out, status); });
 }
 
+// By the geodesics from the origin: distances and azimuths from it are true everywhere.
 Made make_azimuthal_equidistant(const MethodArguments& given) {
-  return make_modified_azimuthal_equidistant(given);
+  const Geodesic lines(given.a, given.f);
+  const double lat0 = given(kLat0) * kDegreesPerRadian;
+  return pointwise(
+      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
+      [=](double lon, double lat) {
+        const LineCourse course =
+            lines.inverse(0, lat0, lon * kDegreesPerRadian, lat * kDegreesPerRadian);
+        const double azimuth = course.azimuth1 * kRadiansPerDegree;
+        return Pair{course.length * std::sin(azimuth), course.length * std::cos(azimuth),
+                    std::isfinite(course.length)};
+      },
+      [=](double x, double y) {
+        const LineEnd end =
+            lines.direct(0, lat0, std::atan2(x, y) * kDegreesPerRadian, std::hypot(x, y));
+        return Pair{end.lon * kRadiansPerDegree, end.lat * kRadiansPerDegree,
+                    std::isfinite(end.lat)};
+      });
 }
 
 // IOGP Publication 373-7-2, method 9831.
@@ -385,7 +417,7 @@ Made make_guam(const MethodArguments& given) {
 }
 
 Made make_colombia_urban(const MethodArguments& given) {
-  const points::ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
+  const ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](double lon, double lat) {

@@ -11,6 +11,7 @@
 #include "text_forms.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/ellipsoid.hpp"
+#include "tidewater/position_text.hpp"
 #include "words.hpp"
 
 namespace tidewater::detail {
@@ -62,21 +63,6 @@ Definition projected_on(const Definition& base, std::string name, int method,
   return result;
 }
 
-// The zone of a position, with the exceptions of Norway and Svalbard (Defense Mapping Agency
-// Technical Manual 8358.2, chapter 2).
-int utm_zone(double lon, double lat) {
-  lon = std::remainder(lon, 360.0);
-  int zone = std::clamp(static_cast<int>(std::floor((lon + 180) / 6)) + 1, 1, 60);
-  if (lat >= 56 && lat < 64 && lon >= 3 && lon < 12) zone = 32;
-  if (lat >= 72 && lat <= 84) {
-    if (lon >= 0 && lon < 9) zone = 31;
-    if (lon >= 9 && lon < 21) zone = 33;
-    if (lon >= 21 && lon < 33) zone = 35;
-    if (lon >= 33 && lon < 42) zone = 37;
-  }
-  return zone;
-}
-
 Definition utm(std::string_view rest, const std::optional<Where>& where, std::string_view text) {
   int zone = 0;
   bool south = false;
@@ -97,14 +83,11 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
     if (!where) {
       throw Error(quoted(text) + " needs a zone, as in \"utm:30N\", or a point to find it from.");
     }
-    if (!(where->latitude >= -80 && where->latitude <= 84)) {
+    zone = utm_zone(where->longitude, where->latitude);
+    if (zone < 1) {
       throw Error(
           "UTM reaches from 80 degrees south to 84 degrees north; \"ups\" serves the poles.");
     }
-    if (!(std::fabs(where->longitude) <= 720)) {
-      throw Error("The longitude of the point lies beyond two turns.");
-    }
-    zone = utm_zone(where->longitude, where->latitude);
     south = where->latitude < 0;
   }
   behind = trimmed(behind);

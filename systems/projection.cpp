@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <limits>
 
 #include "makers.hpp"
 #include "projection_impl.hpp"
@@ -25,6 +26,44 @@ MethodArguments arguments(const Definition& definition) {
                        : 1 / definition.datum.ellipsoid.inverse_flattening;
   const double e2 = f * (2 - f);
   return {definition, a, std::sqrt(e2), e2, f};
+}
+
+// An inverse whose result must lead back: some formulas answer with success beyond their map.
+class CheckedFormula final : public Formula {
+ public:
+  explicit CheckedFormula(std::unique_ptr<const Formula> formula)
+      : Formula(formula->plane), formula_(std::move(formula)) {}
+  TWstatus forward(int count, const CoordinateTriple* in, CoordinateTriple* out) const override {
+    return formula_->forward(count, in, out);
+  }
+  TWstatus inverse(int count, const CoordinateTriple* in, CoordinateTriple* out) const override {
+    const TWstatus word = formula_->inverse(count, in, out);
+    if (word != TW_SUCCESS) return word;
+    CoordinateTriple back[kBlockSize];
+    for (int i = 0; i < count; ++i) {
+      if (!(std::fabs(out[i].x) <= kPi + kPoleRounding)) return TW_RANGE_ERROR;
+      back[i] = {kNotANumber, kNotANumber, 0};
+    }
+    const TWstatus again = formula_->forward(count, out, back);
+    if (!TW_OK(again)) return again;
+    // In units of the semi-major axis: half a metre is not what it guards against.
+    constexpr double kApart = 1e-7;
+    for (int i = 0; i < count; ++i) {
+      if (!(std::fabs(back[i].x - in[i].x) < kApart && std::fabs(back[i].y - in[i].y) < kApart)) {
+        return TW_RANGE_ERROR;
+      }
+    }
+    return TW_SUCCESS;
+  }
+
+ private:
+  std::unique_ptr<const Formula> formula_;
+};
+
+// The methods of our own and those about a point or a parallel, whose maps have an edge.
+bool needs_check(int method) {
+  return method < 0 || method == 9818 || method == 9827 || method == 9828 || method == 9820 ||
+         method == 1027 || method == 9832 || method == 9806 || method == 9840 || method == 1130;
 }
 
 void check_values(const Definition& definition, const Method& method) {
@@ -71,6 +110,9 @@ ProjectionImpl::ProjectionImpl(const Definition& definition)
     definition_.parameters.push_back({parameter.code, usual});
   }
   formula_ = method_->make(arguments(definition_));
+  if (needs_check(method_->code)) {
+    formula_ = std::make_unique<const CheckedFormula>(std::move(formula_));
+  }
   const Plane& plane = formula_->plane;
   if (!(std::isfinite(plane.sx) && std::isfinite(plane.sy) && std::isfinite(plane.x0) &&
         std::isfinite(plane.y0)) ||

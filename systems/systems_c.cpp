@@ -4,7 +4,11 @@
 #include <exception>
 #include <new>
 #include <string>
+#include <variant>
 
+#include "tidewater/lines.hpp"
+#include "tidewater/magnetic_model.hpp"
+#include "tidewater/position_text.hpp"
 #include "tidewater/systems.h"
 #include "tidewater/transformation.hpp"
 
@@ -23,6 +27,12 @@ struct tw_transformation {
 };
 struct tw_projection {
   Projection value;
+};
+struct tw_magnetic_model {
+  tidewater::MagneticModel value;
+};
+struct tw_lines {
+  std::variant<tidewater::Geodesic, tidewater::Rhumb> value;
 };
 struct tw_candidates {
   std::vector<Candidate> value;
@@ -400,4 +410,143 @@ size_t tw_projection_method_count(void) {
 
 size_t tw_projection_method(size_t i, char* text, size_t size) {
   return text_of([&] { return Projection::methods().at(i); }, text, size);
+}
+
+int32_t tw_parse_angle(const char* text, int32_t axis, int32_t decimal_comma, double* degrees) {
+  return guarded(
+      [&]() -> int32_t {
+        const auto parsed = tidewater::parse_angle(given(text), static_cast<tidewater::Axis>(axis),
+                                                   decimal_comma != 0);
+        if (!parsed) throw tidewater::Error(parsed.reason);
+        *degrees = parsed.degrees;
+        return 1;
+      },
+      0);
+}
+
+int32_t tw_parse_position(const char* text, int32_t order, int32_t decimal_comma,
+                          double position[3]) {
+  return guarded(
+      [&]() -> int32_t {
+        const auto parsed = tidewater::parse_position(
+            given(text), static_cast<tidewater::Order>(order), decimal_comma != 0);
+        if (!parsed) throw tidewater::Error(parsed.reason);
+        position[0] = parsed.longitude;
+        position[1] = parsed.latitude;
+        position[2] = parsed.height;
+        return 1;
+      },
+      0);
+}
+
+int32_t tw_parse_mgrs(const char* text, double position[2]) {
+  return guarded(
+      [&]() -> int32_t {
+        const auto grid = tidewater::parse_mgrs(given(text));
+        if (!grid) throw tidewater::Error(grid.reason);
+        const auto place = tidewater::position_of(grid);
+        if (!place) throw tidewater::Error(place.reason);
+        position[0] = place.longitude;
+        position[1] = place.latitude;
+        return 1;
+      },
+      0);
+}
+
+size_t tw_format_mgrs(double longitude, double latitude, int32_t digits, char* text, size_t size) {
+  return text_of([&] { return tidewater::format_mgrs(longitude, latitude, digits); }, text, size);
+}
+
+tw_lines* tw_lines_create(int32_t rhumb, double a, double f) {
+  return guarded(
+      [&] {
+        return rhumb != 0 ? new tw_lines{tidewater::Rhumb(a, f)}
+                          : new tw_lines{tidewater::Geodesic(a, f)};
+      },
+      nullptr);
+}
+
+void tw_lines_destroy(tw_lines* lines) { delete lines; }
+
+size_t tw_lines_direct(const tw_lines* lines, size_t count, const double* lon, const double* lat,
+                       const double* azimuth, const double* length, double* end_lon,
+                       double* end_lat, double* end_azimuth) {
+  if (lines == nullptr) return count;
+  return std::visit(
+             [&](const auto& kind) {
+               return kind.direct(count, {lon, lat, azimuth, length},
+                                  {end_lon, end_lat, end_azimuth, nullptr});
+             },
+             lines->value)
+      .failed;
+}
+
+size_t tw_lines_inverse(const tw_lines* lines, size_t count, const double* lon1, const double* lat1,
+                        const double* lon2, const double* lat2, double* length, double* azimuth1,
+                        double* azimuth2) {
+  if (lines == nullptr) return count;
+  return std::visit(
+             [&](const auto& kind) {
+               return kind.inverse(count, {lon1, lat1, lon2, lat2},
+                                   {length, azimuth1, azimuth2, nullptr});
+             },
+             lines->value)
+      .failed;
+}
+
+void tw_lines_polygon(const tw_lines* lines, size_t count, const double* lon, const double* lat,
+                      double* perimeter, double* area) {
+  const double none = std::numeric_limits<double>::quiet_NaN();
+  tidewater::PolygonMeasure measure = {none, none};
+  if (lines != nullptr) {
+    measure = guarded(
+        [&] {
+          return std::visit([&](const auto& kind) { return kind.polygon(count, lon, lat); },
+                            lines->value);
+        },
+        measure);
+  }
+  if (perimeter != nullptr) *perimeter = measure.perimeter;
+  if (area != nullptr) *area = measure.area;
+}
+
+tw_magnetic_model* tw_magnetic_model_create(const char* name, double year) {
+  return guarded(
+      [&] {
+        return new tw_magnetic_model{tidewater::MagneticModel(name == nullptr ? "" : name, year)};
+      },
+      nullptr);
+}
+
+void tw_magnetic_model_destroy(tw_magnetic_model* model) { delete model; }
+
+size_t tw_magnetic_model_name(const tw_magnetic_model* model, char* text, size_t size) {
+  return text_of([&] { return given(model).value.name(); }, text, size);
+}
+
+size_t tw_magnetic_field(const tw_magnetic_model* model, size_t count, const tw_points* in,
+                         tw_magnetic_value* out, TWstatus* status) {
+  if (count == 0) return 0;
+  if (model == nullptr || in == nullptr || out == nullptr || in->x == nullptr || in->y == nullptr) {
+    return all_fail(count, status);
+  }
+  constexpr std::size_t kAtOnce = 64;
+  std::size_t failed = 0;
+  for (std::size_t begin = 0; begin < count; begin += kAtOnce) {
+    tidewater::MagneticValue some[kAtOnce];
+    const std::size_t points = std::min(kAtOnce, count - begin);
+    const auto first = static_cast<std::ptrdiff_t>(begin) * in->stride;
+    const Coordinates<const double> from = {in->x + first, in->y + first,
+                                            in->z == nullptr ? nullptr : in->z + first, in->stride};
+    TWstatus* words = status == nullptr ? nullptr : status + begin;
+    failed += model->value.field(points, from, some, {words}).failed;
+    for (std::size_t i = 0; i < points; ++i) {
+      const auto& f = some[i].field;
+      const auto& y = some[i].yearly;
+      out[begin + i] = {f.north,       f.east,        f.down,        f.horizontal, f.total,
+                        f.declination, f.inclination, y.north,       y.east,       y.down,
+                        y.horizontal,  y.total,       y.declination, y.inclination};
+    }
+  }
+  return failed;
 }

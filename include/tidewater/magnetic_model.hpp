@@ -18,38 +18,49 @@ namespace detail {
 class MagneticModelImpl;
 }
 
-/** The field at a point: nanotesla and degrees, with the yearly change of each. */
+/** The field at a point, or its change in a year. */
 struct MagneticField {
-  double north, east, down;        /**< components, nanotesla */
-  double horizontal, total;        /**< intensities, nanotesla */
-  double declination, inclination; /**< degrees; declination east positive, inclination downwards */
+  double north, east, down; /**< components, nanotesla */
+  double horizontal;        /**< horizontal intensity, nanotesla */
+  double total;             /**< total intensity, nanotesla */
+  double declination;       /**< degrees, east of true north positive */
+  double inclination;       /**< degrees, downwards positive */
+};
+
+/** The field at a point, and how it changes. */
+struct MagneticValue {
+  MagneticField field;  /**< at the model's date */
+  MagneticField yearly; /**< change in a year */
 };
 
 /**
- * A spherical harmonic model of the geomagnetic field.
+ * A spherical harmonic model of the geomagnetic field at a date.
  *
  * A shared handle: copies are cheap, and any number of threads may use one at once.
  */
 class TW_SYSTEMS_API MagneticModel {
  public:
   /**
-   * @param name  the model's name in the store, "WMM2020", or "igrf"
-   * @throws Error if there is none of that name
+   * @param name  the model's name in the store, "WMM2025"; empty for that of the newest
+   * coefficients
+   * @param year  decimal year
+   * @throws Error if the store has no such model, or the model no field at that date
    */
-  explicit MagneticModel(std::string_view name);
+  MagneticModel(std::string_view name, double year);
 
-  std::string name() const;
-  double first_year() const; /**< first decimal year that the model covers */
-  double last_year() const;  /**< last one */
+  const std::string& name() const;
+  double year() const;
+  double first_year() const; /**< the first year for which the model is published */
+  double last_year() const;  /**< the last one; the model may reach a few years further */
 
   /**
-   * @param in    longitude, latitude in degrees of WGS 84, height in metres above the ellipsoid
-   * @param year  decimal year; outside the model every point fails
-   * @param out   count results
+   * @param count  number of points
+   * @param in     longitude, latitude in degrees on WGS 84, height in metres above the ellipsoid
+   * @param out    count results; not-a-numbers for a point that fails
    */
-  Summary field(std::size_t count, Coordinates<const double> in, double year, MagneticField* out,
+  Summary field(std::size_t count, Coordinates<const double> in, MagneticValue* out,
                 Run run = {}) const noexcept;
-  MagneticField field(Point point, double year) const noexcept;
+  MagneticValue field(Point point) const noexcept;
 
   /** Names of the models of the store. */
   static std::vector<std::string> models();

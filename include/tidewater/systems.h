@@ -233,6 +233,94 @@ TW_SYSTEMS_C_API size_t tw_projection_method_count(void);
 TW_SYSTEMS_C_API size_t tw_projection_method(size_t i, char* text, size_t size);
 /** @} */
 
+/** @name Angles, positions and grid references as people write them
+ *  @{ */
+
+/**
+ * Reads an angle as parse_angle() does.
+ * @param axis           0: longitude or latitude, 1: longitude, 2: latitude
+ * @param decimal_comma  not 0: the comma is a decimal mark
+ * @param degrees        the angle, east and north positive; unwritten on failure
+ * @return 1, or 0 with the reason in tw_last_error()
+ */
+TW_SYSTEMS_C_API int32_t tw_parse_angle(const char* text, int32_t axis, int32_t decimal_comma,
+                                        double* degrees);
+/**
+ * Reads a position as parse_position() does.
+ * @param order     0: refused where the text does not tell, 1: longitude first, 2: latitude first
+ * @param position  longitude, latitude in degrees, height in metres (not-a-number without one);
+ *                  unwritten on failure
+ * @return 1, or 0 with the reason in tw_last_error()
+ */
+TW_SYSTEMS_C_API int32_t tw_parse_position(const char* text, int32_t order, int32_t decimal_comma,
+                                           double position[3]);
+/**
+ * The point of a military grid reference, the centre of its square.
+ * @param position  longitude, latitude in degrees on WGS 84; unwritten on failure
+ * @return 1, or 0 with the reason in tw_last_error()
+ */
+TW_SYSTEMS_C_API int32_t tw_parse_mgrs(const char* text, double position[2]);
+/**
+ * The military grid reference of the square that holds a point.
+ * @param digits  0 to 11 of easting and northing each
+ * @return the length; 0 where the point has none
+ */
+TW_SYSTEMS_C_API size_t tw_format_mgrs(double longitude, double latitude, int32_t digits,
+                                       char* text, size_t size);
+/** @} */
+
+/** @name Lines on the ellipsoid: geodesics and rhumb lines
+ *
+ *  Degrees, and lengths in the unit of a.  What is not wanted may be null.
+ *  @{ */
+
+typedef struct tw_lines tw_lines;
+
+/**
+ * @param rhumb  0: geodesics; else rhumb lines
+ * @param a      semi-major axis
+ * @param f      flattening, from -0.02 to 0.02
+ */
+TW_SYSTEMS_C_API tw_lines* tw_lines_create(int32_t rhumb, double a, double f);
+TW_SYSTEMS_C_API void tw_lines_destroy(tw_lines* lines);
+/** Where lines lead; how many have no end. */
+TW_SYSTEMS_C_API size_t tw_lines_direct(const tw_lines* lines, size_t count, const double* lon,
+                                        const double* lat, const double* azimuth,
+                                        const double* length, double* end_lon, double* end_lat,
+                                        double* end_azimuth);
+/** Lines between points; how many have none. */
+TW_SYSTEMS_C_API size_t tw_lines_inverse(const tw_lines* lines, size_t count, const double* lon1,
+                                         const double* lat1, const double* lon2, const double* lat2,
+                                         double* length, double* azimuth1, double* azimuth2);
+/** Perimeter, and area counterclockwise positive, of a polygon. */
+TW_SYSTEMS_C_API void tw_lines_polygon(const tw_lines* lines, size_t count, const double* lon,
+                                       const double* lat, double* perimeter, double* area);
+/** @} */
+
+/** @name The Earth's magnetic field
+ *  @{ */
+
+typedef struct tw_magnetic_model tw_magnetic_model;
+
+/** @param name  the model's name in the store; null or empty for the newest */
+TW_SYSTEMS_C_API tw_magnetic_model* tw_magnetic_model_create(const char* name, double year);
+TW_SYSTEMS_C_API void tw_magnetic_model_destroy(tw_magnetic_model* model);
+TW_SYSTEMS_C_API size_t tw_magnetic_model_name(const tw_magnetic_model* model, char* text,
+                                               size_t size);
+
+/** Components and intensities in nanotesla, angles in degrees; then the yearly change of each. */
+typedef struct tw_magnetic_value {
+  double north, east, down, horizontal, total, declination, inclination;
+  double yearly_north, yearly_east, yearly_down, yearly_horizontal, yearly_total;
+  double yearly_declination, yearly_inclination;
+} tw_magnetic_value;
+
+/** The field at points of degrees and metres above WGS 84; as tw_transform(). */
+TW_SYSTEMS_C_API size_t tw_magnetic_field(const tw_magnetic_model* model, size_t count,
+                                          const tw_points* in, tw_magnetic_value* out,
+                                          TWstatus* status);
+/** @} */
+
 #ifdef __cplusplus
 }
 #endif

@@ -4,9 +4,9 @@
 
 #include <cmath>
 
-#include "points/elementary.hpp"
+#include "formulas/constants.hpp"
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 struct ColombiaUrban {
   double a, e2, lat0, h0, rho0, A, B;
@@ -50,4 +50,4 @@ struct ColombiaUrban {
   }
 };
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

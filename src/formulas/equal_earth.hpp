@@ -5,9 +5,9 @@
 
 #include <cmath>
 
-#include "points/elementary.hpp"
+#include "formulas/constants.hpp"
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 // Between the authalic sphere of radius 1 and the plane.
 struct EqualEarth {
@@ -47,4 +47,4 @@ struct EqualEarth {
   }
 };
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

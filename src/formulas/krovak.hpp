@@ -4,9 +4,9 @@
 
 #include <cmath>
 
-#include "points/elementary.hpp"
+#include "formulas/constants.hpp"
 
-namespace tidewater::points {
+namespace tidewater::detail {
 
 // Southing and westing in metres without false origin, from the longitude east of the origin.
 struct Krovak {
@@ -101,10 +101,9 @@ struct Krovak {
   }
 
  private:
-  static constexpr double kQuarterPi = 0.785398163397448309616;
   static constexpr double kC[10] = {
       2.946529277e-02, 2.515965696e-02, 1.193845912e-07, -4.668270147e-07, 9.233980362e-12,
       1.523735715e-12, 1.696780024e-18, 4.408314235e-18, -8.331083518e-24, -3.689471323e-24};
 };
 
-}  // namespace tidewater::points
+}  // namespace tidewater::detail

@@ -1,0 +1,75 @@
+// Hotine's oblique Mercator on the ellipsoid by way of the aposphere: M. Hotine, The orthomorphic
+// projection of the spheroid, Empire Survey Review 8-9 (1946-47); IOGP Publication 373-7-2, methods
+// 9812 and 9815.  The constants are arranged so that nothing is lost for a line that runs due east,
+// or for a centre in the south.
+#pragma once
+
+#include <cmath>
+
+#include "formulas/isometric_latitude.hpp"
+
+namespace tidewater::detail {
+
+// Longitudes from the centre; u along the line, v across it, both in units of a.
+struct ObliqueMercator {
+  double e, A, B, log_h, crossing, centre_u, sin_gamma, cos_gamma;
+  ConformalInverse latitudes;
+
+  // The azimuth of the line at the centre.
+  ObliqueMercator(double first_eccentricity, double lat, double azimuth)
+      : e(first_eccentricity), latitudes(first_eccentricity) {
+    const double e2 = e * e;
+    const double s = std::sin(lat);
+    const double c2 = std::cos(lat) * std::cos(lat);
+    const double w = std::sqrt(1 - e2 * s * s);
+    const double slope = std::sqrt(1 - e2);
+    B = std::sqrt(1 + e2 * c2 * c2 / (1 - e2));
+    A = B * slope / (w * w);
+    // D = B slope / (cos(lat) w), of which the square less one is G squared.
+    const double G = std::tan(lat) * slope / w;
+    const double D = std::sqrt(1 + G * G);
+    // ln(G + D) - B psi(lat)
+    log_h = std::asinh(G) - B * isometric_latitude(e, sincos(lat));
+    const double sin_azimuth = std::sin(azimuth);
+    // A right angle's cosine is zero.
+    const double cos_azimuth =
+        std::fabs(std::fabs(sin_azimuth) - 1) < 1e-16 ? 0.0 : std::cos(azimuth);
+    sin_gamma = sin_azimuth / D;
+    cos_gamma = std::sqrt(G * G + cos_azimuth * cos_azimuth) / D;
+    // The line crosses the equator of the aposphere west of the centre by this.
+    crossing = -std::atan2(G * sin_gamma, cos_azimuth) / B;
+    centre_u = A / B * std::atan2(G, cos_azimuth);
+  }
+
+  // False on the line's own poles, where v has no bound.
+  bool forward(double lon, double lat, double* u, double* v) const {
+    const double angle = B * (lon - crossing);
+    double U;
+    if (std::fabs(lat) > kHalfPi - 1e-10) {
+      U = std::copysign(sin_gamma, lat * sin_gamma);
+      *u = A / B * std::copysign(kHalfPi, lat);
+    } else {
+      const double y = B * isometric_latitude(e, sincos(lat)) + log_h;
+      const double S = std::sinh(y);
+      const double V = std::sin(angle);
+      U = (S * sin_gamma - V * cos_gamma) / std::cosh(y);
+      *u = A / B * std::atan2(S * cos_gamma + V * sin_gamma, std::cos(angle));
+    }
+    *v = -A / B * std::atanh(U);
+    return std::fabs(U) < 1 - 1e-14;
+  }
+
+  void inverse(double u, double v, double* lon, double* lat) const {
+    const double q = -B / A * v;
+    const double S = std::sinh(q);
+    const double T = std::cosh(q);
+    const double along = B / A * u;
+    const double V = std::sin(along);
+    const double U = (V * cos_gamma + S * sin_gamma) / T;
+    *lon = crossing - std::atan2(S * cos_gamma - V * sin_gamma, std::cos(along)) / B;
+    *lat = std::fabs(U) >= 1 ? std::copysign(kHalfPi, U)
+                             : latitudes.of_isometric((std::atanh(U) - log_h) / B);
+  }
+};
+
+}  // namespace tidewater::detail
