@@ -69,10 +69,14 @@ class System(_core.System):
         return System, self._made_from
 
     def __eq__(self, other: object) -> bool:
-        return isinstance(other, System) and self._made_from == other._made_from
+        return isinstance(other, System) and self._identity == other._identity
 
     def __hash__(self) -> int:
-        return hash(self._made_from)
+        return hash(self._identity)
+
+    @property
+    def _identity(self) -> Any:
+        return self.code or self._made_from
 
     def __repr__(self) -> str:
         text, at = self._made_from

@@ -34,33 +34,51 @@ def to_system(frame: Any, target: Any, *, threads: int = 0, errors: str = "nan",
     -------
     a new object of the same kind; its ``crs`` is the target's.
     """
-    import shapely
-
     if errors not in ("nan", "raise"):
         raise ValueError('errors is "nan" or "raise" for geometries.')
     if frame.crs is None:
         raise ValueError("The frame has no system; set its crs first.")
     system = System(target)
     transformation = Transformation(System(frame.crs), system, **options)
-    geometries = np.asarray(frame.geometry.values)
-    has_z = shapely.has_z(geometries)
-    moved = geometries.copy()
-    for flag in (False, True):
-        chosen = has_z == flag
-        if not chosen.any():
-            continue
-        points = shapely.get_coordinates(geometries[chosen], include_z=flag)
-        columns = tuple(points[:, k] for k in range(points.shape[1]))
-        transformation(*columns, out=columns, threads=threads, errors=errors)
-        moved[chosen] = shapely.set_coordinates(geometries[chosen].copy(), points)
+    moved = _moved(np.asarray(frame.geometry.values, dtype=object),
+                   lambda *columns: transformation(*columns, threads=threads, errors=errors))
     crs = f"EPSG:{system.code}" if system.code else system.to_wkt()
-    result = frame.copy()
     values = type(frame.geometry.values)(moved, crs=crs)
     if isinstance(frame, pd.DataFrame):
-        result = result.set_geometry(values)
-        return result if frame.geometry.name == result.geometry.name else \
-            result.rename_geometry(frame.geometry.name)
+        return frame.set_geometry(values)
     return type(frame)(values, index=frame.index, name=frame.name)
+
+
+def _moved(geometries: np.ndarray, transform: Any) -> np.ndarray:
+    """The geometries with all their points through one call of each number of axes."""
+    from shapely.ops import transform as each
+
+    calls: list = []  # the columns of each ring, line or point, in order
+
+    def gather(*columns: Any) -> Any:
+        calls.append(columns)
+        return columns
+
+    for geometry in geometries:
+        if geometry is not None:
+            each(gather, geometry)
+    results: list = [None] * len(calls)
+    for axes in (2, 3):
+        chosen = [i for i, columns in enumerate(calls) if len(columns) == axes]
+        if not chosen:
+            continue
+        sizes = [len(calls[i][0]) if np.ndim(calls[i][0]) else 1 for i in chosen]
+        whole = transform(*(np.concatenate([np.atleast_1d(calls[i][k]) for i in chosen])
+                            for k in range(axes)))
+        ends = np.cumsum(sizes)
+        for i, end, size in zip(chosen, ends, sizes):
+            piece = [column[end - size:end].tolist() for column in whole]
+            results[i] = tuple(piece) if np.ndim(calls[i][0]) else tuple(c[0] for c in piece)
+    replay = iter(results)
+    moved = np.empty(len(geometries), dtype=object)
+    for i, geometry in enumerate(geometries):
+        moved[i] = None if geometry is None else each(lambda *_: next(replay), geometry)
+    return moved
 
 
 @pd.api.extensions.register_series_accessor("tidewater")
