@@ -7,7 +7,9 @@
 #include <filesystem>
 #include <fstream>
 #include <limits>
+#include <new>
 #include <numbers>
+#include <stdexcept>
 #include <unordered_map>
 #include <utility>
 
@@ -336,11 +338,11 @@ bool is_file(const std::string& path) {
 }
 
 Bytes read_file(const std::string& path) {
-  constexpr std::uintmax_t kMostBytes = std::uintmax_t{1} << 32;
+  constexpr std::uintmax_t kMostBytes = (std::uintmax_t{1} << 31) - 1;
   std::error_code error;
   const std::uintmax_t size = fs::file_size(path, error);
   if (error) throw Error("The grid file " + path + " cannot be read.");
-  if (size > kMostBytes) refuse(path, "is larger than 4 GB");
+  if (size > kMostBytes) refuse(path, "is larger than 2 GB");
   std::vector<unsigned char> bytes(static_cast<std::size_t>(size));
   std::ifstream file(path, std::ios::binary);
   file.read(reinterpret_cast<char*>(bytes.data()), static_cast<std::streamsize>(size));
@@ -367,7 +369,7 @@ std::string find_grid(const std::string& name, const std::vector<std::string>& f
   }
   std::string looked;
   for (const std::string& folder : folders) {
-    const std::string path = (fs::path(folder) / name).string();
+    std::string path = (fs::path(folder) / name).string();
     if (is_grid(path)) return path;
     looked += (looked.empty() ? "" : ", ") + folder;
   }
@@ -383,7 +385,7 @@ void refuse(const std::string& path, const std::string& why) {
 void set_size(const std::string& path, std::int64_t columns, std::int64_t rows, int bands,
               std::int64_t most_nodes, Lattice* g) {
   constexpr double kQuarter = std::numbers::pi / 2;
-  constexpr std::int64_t kMostNodes = std::int64_t{1} << 29;
+  constexpr std::int64_t kMostNodes = std::int64_t{1} << 28;
   if (columns < 2 || rows < 2) refuse(path, "has fewer than two rows or columns");
   if (columns > kMostNodes / rows) refuse(path, "tells of more nodes than any grid has");
   if (columns * rows > most_nodes) refuse(path, "ends in its nodes");
@@ -441,6 +443,8 @@ GridContent read_grid(const std::string& name, const std::vector<std::string>& f
   for (Lattice& g : content.lattices) close_round(kind == GridKind::shift ? 2 : 1, &g);
   plant(&content);
   return content;
+} catch (const std::length_error&) {
+  throw Error("The grid file " + name + " tells of more nodes than memory holds.");
 } catch (const std::bad_alloc&) {
   throw Error("There is not enough memory for the grid file " + name + ".");
 }

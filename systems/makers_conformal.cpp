@@ -1,5 +1,6 @@
 // Conformal methods.
 #include <optional>
+#include "formulas/isometric_latitude.hpp"
 #include "formulas/krovak.hpp"
 #include "formulas/oblique_mercator.hpp"
 

@@ -159,6 +159,9 @@ bool touches_band(double easting, double y, std::size_t band) {
   const double bottom = mirrored ? -y - kSquare : y;
   const double low = mirrored ? -north : south;
   const double high = mirrored ? -south : north;
+  // A degree of the meridian has 110.5 to 111.7 km, and away from the central meridian latitude
+  // falls by 0.14 degrees at most: far from the band's ends that suffices.
+  if ((bottom + kSquare) / 111'700 - 0.3 > low && bottom / 110'500 < high) return true;
   // Latitude falls away from the central meridian: lowest in the outer corner, highest on the top
   // edge at the inner end.
   const double outer =
@@ -175,6 +178,11 @@ bool touches_band(double easting, double y, std::size_t band) {
 bool near_cell(double easting, double y, int zone, std::size_t band) {
   constexpr double kOverlap = 50'000;
   const Cell cell = cell_of(zone, band);
+  // Roughly, to 15 km, and with 30 km of margin.
+  const double degree = 111'300 * std::cos(std::fabs(y + kSquare / 2) / 111'100 * kDegree);
+  const double middle = easting + kSquare / 2 - kFalseEasting;
+  constexpr double kSure = kSquare / 2 + kOverlap - 30'000;
+  if (middle > cell.west * degree - kSure && middle < cell.east * degree + kSure) return true;
   // The widest place of the square is that nearest to the equator, within the band.
   const double nearest = y < 0 ? std::min(0.0, y + kSquare) : y;
   const double lat = std::clamp(latitude_of(kFalseEasting, nearest), -80.0, 84.0);
@@ -185,26 +193,26 @@ bool near_cell(double easting, double y, int zone, std::size_t band) {
 }
 
 GridPosition parse_utm(std::string_view text, int zone, char band_letter, std::string_view square) {
-  const std::string name = quoted(text);
   const std::size_t band = kBands.find(band_letter);
   if (band == kBands.npos) {
-    return refused(name + " has the band " + band_letter +
+    return refused(quoted(text) + " has the band " + band_letter +
                    "; the bands of zones are C to X without I and O.");
   }
   if (cell_of(zone, band).west == cell_of(zone, band).east) {
-    return refused(name + " has zone " + std::to_string(zone) +
+    return refused(quoted(text) + " has zone " + std::to_string(zone) +
                    ", which has no part in band X; Svalbard is in zones 31, 33, 35 and 37.");
   }
   const std::string_view columns = kColumns[(zone - 1) % 3];
   const std::size_t column = columns.find(square[0]);
   if (column == columns.npos) {
-    return refused(name + " has the column " + square[0] + "; the columns of zone " +
+    return refused(quoted(text) + " has the column " + square[0] + "; the columns of zone " +
                    std::to_string(zone) + " are " + columns.front() + " to " + columns.back() +
                    " without I and O.");
   }
   std::size_t row = kRows.find(square[1]);
   if (row == kRows.npos) {
-    return refused(name + " has the row " + square[1] + "; the rows are A to V without I and O.");
+    return refused(quoted(text) + " has the row " + square[1] +
+                   "; the rows are A to V without I and O.");
   }
   if (zone % 2 == 0) row = (row + kRows.size() - kEvenShift) % kRows.size();
 
@@ -216,11 +224,11 @@ GridPosition parse_utm(std::string_view text, int zone, char band_letter, std::s
   const double from_equator = kSquare * static_cast<double>(row);
   const double y = from_equator + kRowCycle * std::round((middle - from_equator) / kRowCycle);
   if (!touches_band(easting, y, band)) {
-    return refused(name + " names a square that does not lie in band " + band_letter + ".");
+    return refused(quoted(text) + " names a square that does not lie in band " + band_letter + ".");
   }
   if (!near_cell(easting, y, zone, band)) {
-    return refused(name + " names a square that does not lie in zone " + std::to_string(zone) +
-                   ".");
+    return refused(quoted(text) + " names a square that does not lie in zone " +
+                   std::to_string(zone) + ".");
   }
   GridPosition grid;
   grid.zone = zone;
@@ -231,23 +239,22 @@ GridPosition parse_utm(std::string_view text, int zone, char band_letter, std::s
 }
 
 GridPosition parse_polar(std::string_view text, char band_letter, std::string_view square) {
-  const std::string name = quoted(text);
   const std::size_t band = kPolarBands.find(band_letter);
   if (band == kPolarBands.npos) {
-    return refused(name + " has no zone number, and " + band_letter +
+    return refused(quoted(text) + " has no zone number, and " + band_letter +
                    " is none of the polar bands A, B, Y and Z.");
   }
   const bool north = band >= 2;
   const std::size_t column = kPolarColumns[band].find(square[0]);
   const std::size_t row = kPolarRows[north].find(square[1]);
   if (column == std::string_view::npos) {
-    return refused(name + " has the column " + square[0] + "; the columns of band " + band_letter +
-                   " are " + std::string(kPolarColumns[band]) + ".");
+    return refused(quoted(text) + " has the column " + square[0] + "; the columns of band " +
+                   band_letter + " are " + std::string(kPolarColumns[band]) + ".");
   }
   if (row == std::string_view::npos) {
-    return refused(name + " has the row " + square[1] + "; the rows of band " + band_letter +
-                   " are " + kPolarRows[north].front() + " to " + kPolarRows[north].back() +
-                   " without I and O.");
+    return refused(quoted(text) + " has the row " + square[1] + "; the rows of band " +
+                   band_letter + " are " + kPolarRows[north].front() + " to " +
+                   kPolarRows[north].back() + " without I and O.");
   }
   GridPosition grid;
   grid.zone = 0;
@@ -262,7 +269,7 @@ GridPosition parse_polar(std::string_view text, char band_letter, std::string_vi
   PolarGrid::shared(north).inverse(x, y, &longitude, &latitude);
   const double limit = north ? 83.5 : 79.5;
   if (std::fabs(latitude) < limit) {
-    return refused(name + " names a square that does not lie in the polar zone.");
+    return refused(quoted(text) + " names a square that does not lie in the polar zone.");
   }
   return grid;
 }

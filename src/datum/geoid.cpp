@@ -153,9 +153,8 @@ struct Stand {
   float t;
 };
 
-Stand stand_of(double value, double grid_min, std::int64_t window_node, double spacing,
-               int32_t count) {
-  std::int64_t in_grid = cut((value - grid_min) / spacing);
+Stand stand_of(double value, std::int64_t in_grid, double grid_min, std::int64_t window_node,
+               double spacing, int32_t count) {
   std::int64_t node = in_grid - window_node;
   const std::int64_t beyond = std::max<std::int64_t>(node + 3 - count, 0);
   node -= beyond;
@@ -186,6 +185,7 @@ class Call {
   // Column and row of the held window's first node in the grid, once they are known.
   std::int64_t column_ = 0, row_ = 0;
   bool placed_ = false;
+  std::int64_t cell_x_ = 0, cell_y_ = 0;  // of the point at hand, in the grid
 };
 
 TWstatus Call::locate(double x, double y, const GeoidControl& control, GeoidWindow* window,
@@ -207,8 +207,10 @@ TWstatus Call::locate(double x, double y, const GeoidControl& control, GeoidWind
   const double dx = wide(grid.dx);
   const double dy = wide(grid.dy);
   // The point lies beyond the first node, so that the cut is the floor.
-  std::int64_t ix = cut((x - wide(grid.xmin)) / dx);
-  std::int64_t iy = cut((y - wide(grid.ymin)) / dy);
+  cell_x_ = cut((x - wide(grid.xmin)) / dx);
+  cell_y_ = cut((y - wide(grid.ymin)) / dy);
+  std::int64_t ix = cell_x_;
+  std::int64_t iy = cell_y_;
   // Without branches: which points lie near an edge cannot be foreseen.
   const auto held_inside = [](std::int64_t node, int32_t nodes) {
     const std::int64_t last = std::int64_t{nodes} - kHalf - 1;
@@ -264,6 +266,9 @@ TWstatus Call::undulation(double lon, double lat, const GeoidControl& control, d
   if ((inside(x, w.dx, w.xmin, w.xmax) & inside(y, w.dy, w.ymin, w.ymax)) == 0) {
     const TWstatus word = locate(x, y, control, &held.bounds, held.data, &held.grid);
     if (word != TW_SUCCESS) return word;
+  } else {
+    cell_x_ = cut((x - wide(control.grids[held.grid].xmin)) / wide(w.dx));
+    cell_y_ = cut((y - wide(control.grids[held.grid].ymin)) / wide(w.dy));
   }
   // By contract: bounds of the grid that has the window's index in this block, whichever it is.
   const GeoidGrid& grid = control.grids[held.grid];
@@ -272,8 +277,8 @@ TWstatus Call::undulation(double lon, double lat, const GeoidControl& control, d
     row_ = nodes_in(wide(w.ymin) - wide(grid.ymin), wide(w.dy));
     placed_ = true;
   }
-  const Stand column = stand_of(x, wide(grid.xmin), column_, wide(w.dx), w.nc);
-  const Stand row = stand_of(y, wide(grid.ymin), row_, wide(w.dy), w.nr);
+  const Stand column = stand_of(x, cell_x_, wide(grid.xmin), column_, wide(w.dx), w.nc);
+  const Stand row = stand_of(y, cell_y_, wide(grid.ymin), row_, wide(w.dy), w.nr);
   if (column.node < 0 || row.node < 0) {
     // The window gave way to other grids so far that three nodes for the point are not in it.
     return TW_GEOID_READ_ERROR;

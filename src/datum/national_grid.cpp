@@ -7,8 +7,6 @@
 #include <cstring>
 #include <limits>
 #include <new>
-#include <span>
-#include <utility>
 
 #include "datum/grid_file.hpp"
 #include "formulas/wraps.hpp"
@@ -328,18 +326,20 @@ TWstatus shift_at(double lon, double lat, double* lon_shift, double* lat_shift, 
 
 // Gives each sub-grid the range of its children.
 void index_children() {
-  const std::span<Child> children(cnt_children, static_cast<std::size_t>(cnt_num_file));
-  for (int32_t i = 0; i < cnt_num_file; ++i) {
-    children[static_cast<std::size_t>(i)] = {cnt_subgrids[i].parent, i};
-  }
-  std::ranges::sort(children, {}, [](const Child& c) { return std::pair(c.parent, c.grid); });
-  const auto range_of = [&](const Name& parent, int32_t* first, int32_t* last) {
-    // Two searches where one would do: clang 14 does not compile a pair of ends from GCC 12's
-    // library.
-    const auto begin = std::ranges::lower_bound(children, parent, {}, &Child::parent);
-    const auto end = std::ranges::upper_bound(children, parent, {}, &Child::parent);
-    *first = static_cast<int32_t>(begin - children.begin());
-    *last = static_cast<int32_t>(end - children.begin());
+  Child* const end = cnt_children + cnt_num_file;
+  for (int32_t i = 0; i < cnt_num_file; ++i) cnt_children[i] = {cnt_subgrids[i].parent, i};
+  std::sort(cnt_children, end, [](const Child& a, const Child& b) {
+    return a.parent != b.parent ? a.parent < b.parent : a.grid < b.grid;
+  });
+  const auto range_of = [end](const Name& parent, int32_t* first, int32_t* last) {
+    const Child* const begin =
+        std::lower_bound(cnt_children, end, parent,
+                         [](const Child& c, const Name& name) { return c.parent < name; });
+    const Child* const behind =
+        std::upper_bound(cnt_children, end, parent,
+                         [](const Name& name, const Child& c) { return name < c.parent; });
+    *first = static_cast<int32_t>(begin - cnt_children);
+    *last = static_cast<int32_t>(behind - cnt_children);
   };
   range_of(kNoParent, &cnt_first_root, &cnt_last_root);
   for (int32_t i = 0; i < cnt_num_file; ++i) {

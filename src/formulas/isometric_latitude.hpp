@@ -47,13 +47,22 @@ TW_INLINE V isometric_latitude(double e, const SinCos<V>& lat) {
   return copysign(sphere, lat.sin) - eccentric_term(e, lat.sin);
 }
 
-// t(p) = tan(pi/4 - p/2) / ((1 - e sin p) / (1 + e sin p))^(e/2) = exp(-isometric latitude).
+// t(p) = tan(pi/4 - p/2) / ((1 - e sin p) / (1 + e sin p))^(e/2) = exp(-isometric latitude), as the
+// quotient of two sides: half the conformal colatitude is the angle between them.
+template <class V>
+struct ColatitudeSides {
+  V opposite, adjacent;
+};
+template <Number V>
+TW_INLINE ColatitudeSides<V> colatitude_sides(double e, const SinCos<V>& lat) {
+  const auto south = lat.sin < 0.0;
+  return {select(south, 1.0 - lat.sin, lat.cos),
+          select(south, lat.cos, 1.0 + lat.sin) * eccentric_factor(e, lat.sin)};
+}
 template <Number V>
 TW_INLINE V colatitude_tangent(double e, const SinCos<V>& lat) {
-  const auto south = lat.sin < 0.0;
-  const V opposite = select(south, 1.0 - lat.sin, lat.cos);
-  const V adjacent = select(south, lat.cos, 1.0 + lat.sin);
-  return opposite / (adjacent * eccentric_factor(e, lat.sin));
+  const auto sides = colatitude_sides(e, lat);
+  return sides.opposite / sides.adjacent;
 }
 
 // From isometric latitude, or t = exp(-isometric latitude), back to the geodetic latitude.

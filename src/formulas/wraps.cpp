@@ -12,4 +12,11 @@ double turns_above_then_at_or_below(double d) {
   return add_turns_while(d, kTwoPi, [](double v) { return v <= -kPi; });
 }
 
+double turns_about_meridian(double lon0, double lon) {
+  lon = add_turns_while(
+      lon, kTwoPi, [lon0](double v) { return v - lon0 < -kPi; }, lon0);
+  return add_turns_while(
+      lon, -kTwoPi, [lon0](double v) { return v - lon0 > kPi; }, lon0);
+}
+
 }  // namespace tidewater::detail

@@ -54,6 +54,7 @@ double add_turns_while(double value, double turn, Outside outside, double goal =
 // The loops for the lanes that single steps did not bring back.
 double turns_below_then_above(double d);
 double turns_above_then_at_or_below(double d);
+double turns_about_meridian(double lon0, double lon);
 
 // Whole turns, upwards first; -pi and pi stay.
 template <Number V>
@@ -69,6 +70,17 @@ TW_INLINE V wrap_turns_above_then_at_or_below(V d) {
   V result = wrap_above_then_at_or_below(d);
   mend(!(abs(result) <= kPi), result,
        [&](int i) { return turns_above_then_at_or_below(lane(d, i)); });
+  return result;
+}
+
+// Adds whole turns to lon, upwards first, until lon - lon0 lies in [-pi, pi]; a difference of
+// exactly pi or -pi stays.
+template <Number V>
+TW_INLINE V turns_about(double lon0, V lon) {
+  V result = select(lon - lon0 < -kPi, lon + kTwoPi, lon);
+  result = select(result - lon0 > kPi, result - kTwoPi, result);
+  mend(!(abs(result - lon0) <= kPi), result,
+       [&](int i) { return turns_about_meridian(lon0, lane(lon, i)); });
   return result;
 }
 

@@ -14,9 +14,8 @@ constexpr double kPoleMargin = 1e-12;
 // Below this eccentricity the meridian functions take the sphere.
 constexpr double kSphereLimit = 1e-12;
 
-// Third flattening up to which the inverse takes Newton's method; ellipsoids of the earth have
-// 0.0017.
-constexpr double kNewtonLimit = 0.003;
+// Third flattening up to which the inverse takes its series; ellipsoids of the earth have 0.0017.
+constexpr double kSeriesLimit = 0.003;
 
 double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
 
@@ -44,18 +43,33 @@ MeridianArc::MeridianArc(double a, double e) : a_(a), sphere_(e < kSphereLimit) 
   t1_ = 2 * c4 - 4 * c8;
   t2_ = 4 * c6;
   t3_ = 8 * c8;
+  per_radian_ = sphere_ ? a_ : g_ * mean_;
+  if (sphere_) g_ = 0;
+}
+
+MeridianFoot::MeridianFoot(const MeridianArc& arc)
+    : serves_(arc.good() && (arc.sphere_ || arc.n_ < kSeriesLimit)),
+      quarter_(arc.per_radian_ * kHalfPi),
+      over_per_radian_(1 / arc.per_radian_),
+      series_() {
+  if (arc.sphere_) return;
+  const double n = arc.n_;
+  const double n2 = n * n;
+  const double n3 = n2 * n;
+  const double n4 = n2 * n2;
+  const double n5 = n4 * n;
+  const double n6 = n5 * n;
+  // The terms in n^5 of the arc that its series leaves out are added to those of the inverse.
+  series_ = SineSeries<6>::of({3 * n / 2 - 27 * n3 / 32 + (269.0 / 512 + 3.0 / 128) * n5,
+                               21 * n2 / 16 - 55 * n4 / 32 + 6759 * n6 / 4096,
+                               151 * n3 / 96 + (175.0 / 768 - 417.0 / 128) * n5,
+                               1097 * n4 / 512 - 15543 * n6 / 2560,
+                               (8011.0 / 2560 - 693.0 / 1280) * n5, 293393 * n6 / 61440});
 }
 
 double MeridianArc::tail(double lat) const {
   const double c = std::cos(2 * lat);
   return (((t3_ * c + t2_) * c + t1_) * c + t0_) * std::sin(2 * lat);
-}
-
-double MeridianArc::tail_slope(double lat) const {
-  const double c = std::cos(2 * lat);
-  const double s = std::sin(2 * lat);
-  return 2 * c * (((t3_ * c + t2_) * c + t1_) * c + t0_) -
-         2 * s * s * ((3 * t3_ * c + 2 * t2_) * c + t1_);
 }
 
 TWstatus MeridianArc::forward(double lat, double* distance) const {
@@ -66,17 +80,16 @@ TWstatus MeridianArc::forward(double lat, double* distance) const {
     status = TW_I_LATITUDE_LIMITED;
     lat = hold_at_pole(lat);
   }
-  *distance = sphere_ ? a_ * lat : g_ * (mean_ * lat + tail(lat));
+  *distance = sphere_ ? a_ * lat : arc(lat, sincos(lat));
   return status;
 }
 
 TWstatus MeridianArc::inverse(double distance, double* lat) const {
   if (bad_ != TW_SUCCESS) return bad_;
   // The limits are those of the mean term of the arc, not of the arc computed at the pole.
-  const double per_radian = sphere_ ? a_ : g_ * mean_;
   const double size = std::fabs(distance);
-  if (per_radian * (kHalfPi + kPoleMargin) < size) return TW_BAD_LATITUDE;
-  if (per_radian * kHalfPi < size) {
+  if (per_radian_ * (kHalfPi + kPoleMargin) < size) return TW_BAD_LATITUDE;
+  if (per_radian_ * kHalfPi < size) {
     *lat = hold_at_pole(distance);
     return TW_I_LATITUDE_LIMITED;
   }
@@ -86,13 +99,9 @@ TWstatus MeridianArc::inverse(double distance, double* lat) const {
   }
   const double start = distance * (1 + n_) / (mean_ * a_);
   double p = start;
-  if (n_ < kNewtonLimit) {
-    // Where the rounds below come to rest within a few, Newton's method is there in two steps.
-    double step = 0;
-    do {
-      step = (p - start + tail(p) / mean_) / (1 + tail_slope(p) / mean_);
-      p -= step;
-    } while (std::fabs(step) > 1e-6);  // what is left is of the order of its square
+  if (n_ < kSeriesLimit) {
+    // Where the rounds below come to rest within a few, the series is there at once.
+    p = MeridianFoot(*this).latitude(distance);
   } else {
     constexpr int kMostRounds = 50;
     double previous = 0;

@@ -1,22 +1,27 @@
 // Turn of plane points about their origin.
 #pragma once
 
-#include <cmath>
-
-#include "tidewater/frame.h"
+#include "formulas/constants.hpp"
+#include "points/elementary.hpp"
+#include "points/over_points.hpp"
 
 namespace tidewater::detail {
 
+struct Turn {
+  double sin, cos;
+
+  template <Number V>
+  TW_INLINE Answer<V> operator()(V x, V y) const {
+    return {x * cos - y * sin, y * cos + x * sin};
+  }
+};
+
 // Anticlockwise by an angle; z stays.
 inline void turn_points(double angle, int32_t count, CoordinateTriple* points) {
-  const double s = std::sin(angle);
-  const double c = std::cos(angle);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = points[i].x;
-    const double y = points[i].y;
-    points[i].x = x * c - y * s;
-    points[i].y = y * c + x * s;
-  }
+  const auto at = sincos(angle);
+  over_points(Turn{at.sin, at.cos}, count, points, points);
 }
 
 }  // namespace tidewater::detail
+
+TIDEWATER_INSTANCE(tidewater::detail::Turn)

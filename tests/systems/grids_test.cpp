@@ -291,6 +291,23 @@ TEST(GeoidGrids, BiquadraticReturnsAParabola) {
   EXPECT_TRUE(std::isnan(grid.undulation(-20.1, 42)));
 }
 
+TEST(GeoidGrids, RealGeoFilesAgainstTheArrayFunctions) {
+  TIDEWATER_NEED_SHARED_DATA();
+  const std::string folder = (shared_data() / "geoid").string() + "/";
+  GeoidControl control = {};
+  TWstatus status = 0;
+  TWgeo90_c(folder.c_str(), &control, &status);
+  ASSERT_EQ(status, TW_SUCCESS);
+  const GeoidGrid grid("namer96.geo", {folder}, GeoidGrid::Interpolation::biquadratic);
+  const GridBounds b = grid.bounds().front();
+  for (const Point& p : points_in({b.west + 1, b.south + 1, b.east - 1, b.north - 1}, 500)) {
+    double n = 0;
+    TWget_geo90(p.x * kDegree, p.y * kDegree, 0, &control, &n, &status);
+    ASSERT_EQ(status, TW_SUCCESS);
+    EXPECT_NEAR(grid.undulation(p.x, p.y), n, 1e-4);  // those work in single precision
+  }
+}
+
 std::string big(std::string bytes, std::size_t width) {
   for (std::size_t k = 0; k < bytes.size(); k += width) {
     std::reverse(bytes.begin() + static_cast<std::ptrdiff_t>(k),
@@ -534,6 +551,8 @@ void write_tiff(const std::string& path, const std::vector<TiffImage>& images) {
     TIFFSetField(tiff, TIFFTAG_PLANARCONFIG,
                  image.separate ? PLANARCONFIG_SEPARATE : PLANARCONFIG_CONTIG);
     TIFFSetField(tiff, TIFFTAG_COMPRESSION, image.compression);
+    const std::vector<std::uint16_t> extra(static_cast<std::size_t>(samples - 1), 0);
+    if (samples > 1) TIFFSetField(tiff, TIFFTAG_EXTRASAMPLES, samples - 1, extra.data());
     if (image.overview) TIFFSetField(tiff, TIFFTAG_SUBFILETYPE, FILETYPE_REDUCEDIMAGE);
     const double scale[3] = {image.dx, image.from_south ? -image.dy : image.dy, 0};
     const double half = image.areas ? 0.5 : 0;

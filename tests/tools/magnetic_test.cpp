@@ -190,8 +190,7 @@ TEST(Magnetic, StoresWithoutAModelThatCanBeUsed) {
        "few.store: the store has no such model (TW_NO"},
       {"/^WMM2025/s/,2,NOAA/,3,NOAA/' magnetic_models.csv", "WMM2025: unusable harmonic model"},
       {"/^2030/d' magnetic/wmm2025_epochs.csv", "WMM2025: unusable harmonic model"},
-      {"s/,12,/,1,/' magnetic/wmm2025_epochs.csv",
-       "few.store: the parameter store cannot be opened"},
+      {"s/,12,/,1,/' magnetic/wmm2025_epochs.csv", "WMM2025: unusable harmonic model"},
       {"/^IGRF/s/,5$/,0/' magnetic_models.csv", "IGRF-13: unusable harmonic model"},
   };
   for (const auto& store : stores) {

@@ -118,7 +118,8 @@ TEST(AzimuthalEqualArea, Constants) {
   EXPECT_NE(near.m1, kUntouched);
   const EqualArea p(0.1, 0, 0.6);
   EXPECT_NEAR(p.q1, q(0.1, 0.6), 2e-15);
-  EXPECT_NEAR(p.m1, std::cos(0.6) / std::sqrt(1 - std::pow(0.1 * std::sin(0.6), 2)), 1e-16);
+  EXPECT_NEAR(p.m1, std::cos(0.6) / std::sqrt(1 - std::pow(0.1 * std::sin(0.6), 2)),
+              1.2e-16);  // the last place
   EXPECT_NEAR(p.sin_b1, p.q1 / p.qp, 1e-15);
   EXPECT_NEAR(p.sin_b1 * p.sin_b1 + p.cos_b1 * p.cos_b1, 1, 1e-15);
   EXPECT_NEAR(p.D * p.cos_b1 * p.rq, p.m1, 1e-15);
@@ -450,6 +451,36 @@ TEST(AzimuthalEqualArea, AgreesWithProj) {
     }
   }
 #endif
+}
+
+TEST(AzimuthalEqualArea, TakesTheQpThatItIsGiven) {
+  // The latitude is the one whose q is what the geometry gives with that qp, by bisection here.
+  const auto [a, e] = Ellipsoid::grs80();
+  const double e2 = e * e;
+  const auto q_of = [&](double lat) {
+    const double s = std::sin(lat);
+    return (s / (1 - e2 * s * s) - std::log((1 - e * s) / (1 + e * s)) / (2 * e)) * (1 - e2);
+  };
+  const auto latitude = [&](double q) {
+    double low = -kPi / 2, high = kPi / 2;
+    for (int i = 0; i < 200; ++i) (q_of((low + high) / 2) < q ? low : high) = (low + high) / 2;
+    return low;
+  };
+  for (const double factor : {0.9, 0.97, 1 - 1e-10, 1.002}) {
+    EqualArea oblique(e, 0, 0.6);
+    oblique.qp *= factor;
+    for (const double y : {-0.7, 0.2, 0.6}) {
+      const double rho = std::fabs(oblique.D * y);
+      const double ce = 2 * std::asin(rho / (2 * oblique.rq));
+      const double q =
+          (oblique.D * std::sin(ce) * oblique.cos_b1 * y / rho + std::cos(ce) * oblique.sin_b1) *
+          oblique.qp;
+      EXPECT_NEAR(oblique.inverse({0, y, 0}).y, latitude(q), 2e-13);
+    }
+    EqualArea north(e, 0, kPi / 2);
+    north.qp *= factor;
+    EXPECT_NEAR(north.inverse({0.3, 0.8, 0}).y, latitude(north.qp - 0.73), 2e-13);
+  }
 }
 
 }  // namespace

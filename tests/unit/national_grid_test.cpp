@@ -7,6 +7,7 @@
 #include <random>
 
 #include "support/data.hpp"
+#include "support/failing_new.hpp"
 #include "support/grids.hpp"
 #include "support/little_memory.hpp"
 #include "support/points.hpp"
@@ -741,6 +742,26 @@ TEST_F(NationalGrid, OneCallAsOneForEachPoint) {
         },
         // The block outlives the call: other nodes in the file are not seen inside it.
         [&] { overwrite(std::string(bytes.size(), '\0')); });
+  }
+}
+
+TEST_F(NationalGrid, WithoutMemoryForTheFileItIsReadOn) {
+  ASSERT_EQ(open({root()}), TW_SUCCESS);
+  const Points in = scattered(300, -114, -101, 41, 49);
+  Points with = untouched(in.size()), without = untouched(in.size());
+  TWstatus status = 0;
+  const auto n = static_cast<std::int32_t>(in.size());
+  TWcnt_f(n, in.data(), 0, with.data(), &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  {
+    const FailingNew failing;
+    TWcnt_f(n, in.data(), 0, without.data(), &status);
+    EXPECT_GT(failing.asked(), 0);  // the file was wanted whole
+  }
+  EXPECT_EQ(status, TW_SUCCESS);
+  for (std::size_t i = 0; i < in.size(); ++i) {
+    EXPECT_EQ(with[i].x, without[i].x);
+    EXPECT_EQ(with[i].y, without[i].y);
   }
 }
 

@@ -1,8 +1,10 @@
-// Equirectangular projection of the sphere.
+// Equirectangular projection: what the contract says of the points that the formulas do not cover,
+// and the exported functions.
+
+#include "projections/conformal/equirectangular_points.hpp"
 
 #include <cmath>
 
-#include "formulas/wraps.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
@@ -13,46 +15,33 @@ void TWcyl_eqr_c(double lat1, double* cos_lat1, TWstatus* status) {
     *status = TW_BAD_STANDARD_PARALLEL;
     return;
   }
-  *cos_lat1 = std::cos(lat1);
+  *cos_lat1 = sincos(lat1).cos;
+}
+
+Next EquirectangularForward::other(const CoordinateTriple&, CoordinateTriple*,
+                                   TWstatus* status) const {
+  *status = TW_BAD_LATITUDE;
+  return Next::point;  // the failing point stays unwritten, the others are computed
 }
 
 void TWcyl_eqr_f(double lon0, double lat0, double cos_lat1, int32_t count,
                  const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    const double lat = in[i].y;
-    if (std::fabs(lat) > kHalfPi) {
-      *status = TW_BAD_LATITUDE;
-      continue;  // the failing point stays unwritten, the others are computed
-    }
-    out[i].x = wrap_above_then_at_or_below(lon - lon0) * cos_lat1;
-    out[i].y = lat - lat0;
-  }
+  *status = over_points(EquirectangularForward{lon0, lat0, cos_lat1}, count, in, out);
 }
 
 void TWcyl_eqr_i(double lon0, double lat0, double cos_lat1, int32_t count,
                  const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    out[i].x = wrap_above_then_at_or_below(x / cos_lat1 + lon0);
-    out[i].y = y + lat0;
-  }
+  *status = over_points(EquirectangularInverse{lon0, lat0, cos_lat1}, count, in, out);
+}
+
+Next EquirectangularScale::other(const CoordinateTriple&, CoordinateTriple* out,
+                                 TWstatus* status) const {
+  *status = TW_NOT_CONVERGED;  // By contract: this member alone does not say TW_BAD_LATITUDE
+  *out = {k0, k0, k0 * k0};
+  return Next::point;
 }
 
 void TWcyl_eqr_s(double k0, double cos_lat1, int32_t count, const CoordinateTriple* in,
                  CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lat = in[i].y;
-    double k = k0;
-    if (lat > kHalfPi || lat < -kHalfPi) {
-      *status = TW_NOT_CONVERGED;  // wanted: this member alone does not say TW_BAD_LATITUDE
-    } else {
-      k = k0 * cos_lat1 / std::cos(lat);
-    }
-    out[i] = {k, k0, k0 * k};
-  }
+  *status = over_points(EquirectangularScale{k0, cos_lat1}, count, in, out);
 }

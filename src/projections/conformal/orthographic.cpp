@@ -1,37 +1,95 @@
-// Orthographic projection of the ellipsoid by way of geocentric space.
+// Orthographic projection: what the contract says of the points that the formulas do not cover, and
+// the exported functions.
+
+#include "projections/conformal/orthographic_points.hpp"
 
 #include <cmath>
 
-#include "formulas/constants.hpp"
-#include "formulas/pole_hold.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::detail;
 
+namespace tidewater::detail {
+
 namespace {
 
-// A point of the surface as seen from the origin: geocentric differences for the unit ellipsoid.
-struct Offset {
-  double x, y, z;
+// What stands in x of a scale that has still to take over the one before it.
+constexpr double kToBeHeld = 0.0;
 
-  // Along row n of the rotation: 0 east, 1 north, 2 up.
-  double along(const double* r, int n) const {
-    return r[3 * n] * x + r[3 * n + 1] * y + r[3 * n + 2] * z;
-  }
-};
+OrthographicFrame frame_of(double e, double x0, double y0, double z0, const double* r) {
+  return {e * e, {x0, y0, z0}, {r[0], r[1], r[2]}, {r[3], r[4], r[5]}, {r[6], r[7], r[8]}};
+}
 
-struct Origin {
-  double e2, x0, y0, z0;
-
-  Offset offset(double lon, double sin_lat, double cos_lat) const {
-    const double nu = 1 / std::sqrt(1 - sin_lat * sin_lat * e2);
-    return {nu * std::cos(lon) * cos_lat - x0, nu * std::sin(lon) * cos_lat - y0,
-            (1 - e2) * nu * sin_lat - z0};
-  }
-};
+double dot(const Vector3& a, const Vector3& b) { return a.x * b.x + a.y * b.y + a.z * b.z; }
 
 }  // namespace
+
+Next OrthographicForward::other(const CoordinateTriple&, CoordinateTriple*,
+                                TWstatus* status) const {
+  *status = TW_I_LATITUDE_LIMITED;  // beyond the horizon
+  return Next::none;
+}
+
+// Outside the disc, or where the line of sight grazes the surface: z is sought along the local
+// vertical until the point stands on the surface.
+Next OrthographicInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                TWstatus* status) const {
+  constexpr int kMostPasses = 50;
+  constexpr double kTolerance = 1e-9;
+  const double x = in.x;
+  const double y = in.y;
+  const double r2 = x * x + y * y;
+  if (std::sqrt(r2) >= limit) {
+    *status = TW_I_LATITUDE_LIMITED;
+    *stopped = true;  // outside the disc
+    return Next::none;
+  }
+  const auto& [e2, origin, east, north, up] = frame;
+  double z = -r2 / 2;
+  double held_lon = lon0;
+  double held_lat = lat0;
+  CoordinateTriple llh = {};
+  for (int pass = 0;; ++pass) {
+    const CoordinateTriple geocentric = {origin.x + east.x * x + north.x * y + up.x * z,
+                                         origin.y + east.y * x + north.y * y + up.y * z,
+                                         origin.z + east.z * x + north.z * y + up.z * z};
+    TWxyz_to_llh(1.0, e, 1, &geocentric, &llh, status);
+    const double sin_lat = std::sin(llh.y);
+    const double cos_lat = std::cos(llh.y);
+    const double nu = 1 / std::sqrt(1 - e2 * (sin_lat * sin_lat));
+    const Vector3 offset = {nu * std::cos(llh.x) * cos_lat - origin.x,
+                            nu * std::sin(llh.x) * cos_lat - origin.y,
+                            (1 - e2) * nu * sin_lat - origin.z};
+    const double dz = dot(up, offset) - z;
+    const double g2 = llh.z * llh.z;
+    if (pass > 0) {
+      const bool still =
+          std::fabs(llh.y - held_lat) <= kTolerance && std::fabs(llh.x - held_lon) <= kTolerance;
+      if (still || std::fabs(dz / g2) <= kTolerance) break;
+    }
+    held_lon = llh.x;
+    held_lat = llh.y;
+    // A point that stands on the surface to the last bit stays: nothing over nothing is no step.
+    if (dz != 0) z = g2 / dz + z;
+    if (pass > kMostPasses) {
+      *status = TW_I_LATITUDE_LIMITED;  // the values at hand are written
+      break;
+    }
+  }
+  out->x = llh.x;
+  out->y = llh.y;
+  return Next::point;
+}
+
+Next OrthographicScale::other(const CoordinateTriple&, CoordinateTriple* out,
+                              TWstatus* status) const {
+  *status = TW_BAD_LATITUDE;
+  out->x = kToBeHeld;
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
 
 void TWortho_c(double e, double lon0, double lat0, double* x0, double* y0, double* z0, double* r,
                TWstatus* status) {
@@ -59,103 +117,45 @@ void TWortho_c(double e, double lon0, double lat0, double* x0, double* y0, doubl
 void TWortho_f(double /*a*/, double e, double lon0, double lat0, double x0, double y0, double z0,
                const double* r, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                TWstatus* status) {
-  *status = TW_SUCCESS;
-  const Origin origin = {e * e, x0, y0, z0};
-  const double sin_lat0 = std::sin(lat0);
-  const double cos_lat0 = std::cos(lat0);
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    const double lat = in[i].y;
-    if (std::fabs(lon - lon0) < 1e-12 && std::fabs(lat - lat0) < 1e-12) {
-      out[i].x = 0;
-      out[i].y = 0;
-      continue;
-    }
-    const double sin_lat = std::sin(lat);
-    const double cos_lat = std::cos(lat);
-    // The arc cosine decides, but below zero alone it can be more than a quarter turn.
-    const double cc = cos_lat * std::cos(lon - lon0) * cos_lat0 + sin_lat * sin_lat0;
-    if (cc <= 0 && std::acos(cc) > kHalfPi) {  // beyond the horizon
-      *status = TW_I_LATITUDE_LIMITED;
-      return;
-    }
-    const Offset d = origin.offset(lon, sin_lat, cos_lat);
-    out[i].x = d.along(r, 0);
-    out[i].y = d.along(r, 1);
-  }
+  const auto at = sincos(lat0);
+  *status = over_points(OrthographicForward{frame_of(e, x0, y0, z0, r), lon0, lat0, at.sin, at.cos},
+                        count, in, out);
 }
 
 void TWortho_i(double /*a*/, double e, double lon0, double lat0, double x0, double y0, double z0,
                const double* r, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                TWstatus* status) {
-  *status = TW_SUCCESS;
-  constexpr int kMostPasses = 50;
-  constexpr double kTolerance = 1e-9;
-  const Origin origin = {e * e, x0, y0, z0};
-  const double f = 1 - std::sqrt(1 - e * e);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    const double r2 = x * x + y * y;
-    if (std::sqrt(r2) < 1e-9) {
-      out[i].x = lon0;
-      out[i].y = lat0;
-      continue;
-    }
-    if (std::sqrt(r2) >= 1 - f) {  // outside the disc
-      *status = TW_I_LATITUDE_LIMITED;
-      return;
-    }
-    // z is sought along the local vertical until the point stands on the surface.
-    double z = -r2 / 2;
-    double held_lon = lon0;
-    double held_lat = lat0;
-    CoordinateTriple llh = {};
-    for (int pass = 0;; ++pass) {
-      const CoordinateTriple geocentric = {x0 + r[0] * x + r[3] * y + r[6] * z,
-                                           y0 + r[1] * x + r[4] * y + r[7] * z,
-                                           z0 + r[2] * x + r[5] * y + r[8] * z};
-      // By contract: the caller's word, so that one left by an earlier point does not survive.
-      TWxyz_to_llh(1.0, e, 1, &geocentric, &llh, status);
-      const Offset d = origin.offset(llh.x, std::sin(llh.y), std::cos(llh.y));
-      const double dz = d.along(r, 2) - z;
-      const double g2 = llh.z * llh.z;
-      if (pass > 0) {
-        const bool still =
-            std::fabs(llh.y - held_lat) <= kTolerance && std::fabs(llh.x - held_lon) <= kTolerance;
-        if (still || std::fabs(dz / g2) <= kTolerance) break;
-      }
-      held_lon = llh.x;
-      held_lat = llh.y;
-      // A point that stands on the surface to the last bit stays: nothing over nothing is no step.
-      if (dz != 0) z = g2 / dz + z;
-      if (pass > kMostPasses) {
-        *status = TW_I_LATITUDE_LIMITED;  // the values at hand are written
-        break;
-      }
-    }
-    out[i].x = llh.x;
-    out[i].y = llh.y;
+  bool stopped = false;
+  const OrthographicInverse kernel = {frame_of(e, x0, y0, z0, r),
+                                      e,
+                                      lon0,
+                                      lat0,
+                                      std::sqrt(1 - e * e),
+                                      r[6] * r[6] + r[7] * r[7] + r[8] * r[8] / (1 - e * e),
+                                      &stopped};
+  // Read before anything is written: in and out may be the same array.
+  CoordinateTriple last = {0, 0, 0};
+  for (int32_t i = count - 1; i >= 0; --i) {
+    last = in[i];
+    if (!(std::sqrt(last.x * last.x + last.y * last.y) < kOrthographicCentre)) break;
   }
+  *status = over_points(kernel, count, in, out);
+  if (*status == TW_SUCCESS || stopped) return;
+  // By contract: each point that is computed sets the word anew, so that the last one's stands.
+  CoordinateTriple ignored = {};
+  *status = TW_SUCCESS;
+  one_point(kernel, last, &ignored, status);
 }
 
 void TWortho_s(double lon0, double lat0, double /*k0*/, int32_t count, const CoordinateTriple* in,
                CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const double sin_lat0 = std::sin(lat0);
-  const double cos_lat0 = std::cos(lat0);
+  const auto at = sincos(lat0);
+  *status = over_points(OrthographicScale{lon0, at.sin, at.cos}, count, in, out);
+  if (*status == TW_SUCCESS) return;
+  // By contract: at a bad latitude h stays that of the previous point, 0 at the first.
   double h = 0;
   for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    double lat = in[i].y;
-    if (lat > kHalfPi || lat < -kHalfPi) {
-      *status =
-          TW_BAD_LATITUDE;  // By contract: h stays that of the previous point, 0 at the first.
-    } else {
-      lat = hold_off_poles(lat, 1e-10);
-      h = std::cos(lon - lon0) * std::cos(lat) * cos_lat0 + std::sin(lat) * sin_lat0;
-    }
-    // By contract: k0 has no part in it.
-    out[i] = {1.0, h, h};
+    if (out[i].x == kToBeHeld) out[i] = {1.0, h, h};
+    h = out[i].y;
   }
 }

@@ -1,142 +1,68 @@
-// Vertical and tilted perspective projections of the sphere and the ellipsoid.
+// Vertical and tilted perspective projections: what the contract says of the points that the
+// formulas do not cover, and the exported functions.
+
+#include "projections/conformal/perspective_points.hpp"
 
 #include <cmath>
 
-#include "formulas/wraps.hpp"
+#include "projections/turn_points.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
 
-namespace {
+namespace tidewater::detail {
 
-constexpr int kMostPasses = 10;
+namespace {
 
 // The image is turned by rot less half a turn: by nothing for half a turn either way.
 bool turns(double rot) { return std::fabs(std::fabs(rot) - kPi) > 1e-12; }
 
-// Turns points clockwise by w, written over themselves.
-void rotate(double w, int32_t count, CoordinateTriple* points) {
-  const double s = std::sin(w);
-  const double c = std::cos(w);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = points[i].x;
-    const double y = points[i].y;
-    points[i].x = s * y + c * x;
-    points[i].y = -s * x + c * y;
-  }
+PerspectiveForward forward_of(double a, double e, double lon0, double lat0, double h, double p,
+                              double phi_g) {
+  const bool sphere = e == 0;
+  const auto at = sincos(lat0);
+  // On the sphere the geocentric latitude is the geodetic one.
+  const double off = sphere ? 0 : lat0 - phi_g;
+  return {sphere,           a, e * e, lon0, at.sin, at.cos, h / a, 1 / p, std::cos(off) * p,
+          std::sin(off) * p};
 }
 
-struct LonLat {
-  double lon, lat;
-  bool done;
-};
-
-// The line of sight through a plane point, met with an ellipsoid that is grown until it passes
-// through the height of the point.
-class EllipsoidSight {
- public:
-  EllipsoidSight(double a, double e, double lon0, double lat0, double h, double p, double phi_g)
-      : a_(a),
-        lon0_(lon0),
-        h_(h),
-        e2_(e * e),
-        sin0_(std::sin(lat0)),
-        cos0_(std::cos(lat0)),
-        b_(std::cos(lat0 - phi_g) * p),
-        d_(std::sin(lat0 - phi_g) * p),
-        a1_(1 - cos0_ * cos0_ * e2_),
-        a2_(1 - sin0_ * sin0_ * e2_),
-        a3_(2 * cos0_ * sin0_ * e2_),
-        a4_(1 - e2_),
-        from_center_((1 - square(std::cos(phi_g)) * e2_) * p * p) {}
-
-  LonLat meet(double x, double y, double height) const {
-    const double f = -2 * b_ * a1_ * h_ - 2 * d_ * a2_ * y + d_ * h_ * a3_ + b_ * a3_ * y;
-    const double quadratic = a2_ * y * y + a1_ * h_ * h_ - h_ * a3_ * y + a4_ * x * x;
-    double grown = 1.0;
-    double t = 0;
-    double v = 0;
-    LonLat at = {0, 0, false};
-    for (int pass = 0; pass < kMostPasses && !at.done; ++pass) {
-      const double g = from_center_ - a4_ * grown;
-      t = (std::sqrt(f * f - 4 * g * quadratic) - f) / (2 * g);
-      v = y / t - d_;
-      const double u = (b_ - h_ / t) * sin0_ + v * cos0_;
-      if (pass == 0) {
-        if (height == 0) {
-          at.lat = std::atan(u / std::sqrt((a4_ - u * u) * a4_));
-          at.done = true;
-          break;
-        }
-        at.lat = std::asin(u);
-      }
-      const double previous = at.lat;
-      const double s2 = square(std::sin(previous));
-      const double w = 1 - s2 * e2_;
-      at.lat = std::asin(u / (a4_ / std::sqrt(w) + height / a_));
-      at.done = std::fabs(at.lat - previous) < 1e-12;
-      grown = square(1 / std::sqrt(w) + height / a_) -
-              (1 / w - height * height / (a_ * a_ - a_ * a_ * e2_)) * s2 * e2_;
-    }
-    at.lon = std::atan2(a_ * x / t, ((b_ - h_ / t) * cos0_ - v * sin0_) * a_) + lon0_;
-    return at;
-  }
-
- private:
-  double a_, lon0_, h_, e2_, sin0_, cos0_, b_, d_, a1_, a2_, a3_, a4_, from_center_;
-};
-
-// The same with a sphere.
-class SphereSight {
- public:
-  SphereSight(double a, double lon0, double lat0, double h, double p)
-      : a_(a), lon0_(lon0), h_(h), sin0_(std::sin(lat0)), cos0_(std::cos(lat0)), p_(p) {}
-
-  LonLat meet(double x, double y, double height) const {
-    const double f = -2 * p_ * h_;
-    const double quadratic = y * y + x * x + h_ * h_;
-    double grown = 1.0;
-    double t = 0;
-    double v = 0;
-    LonLat at = {0, 0, false};
-    for (int pass = 0; pass < kMostPasses && !at.done; ++pass) {
-      const double g = p_ * p_ - grown;
-      t = (std::sqrt(f * f - 4 * g * quadratic) - f) / (2 * g);
-      v = y / t;
-      const double u = (p_ - h_ / t) * sin0_ + v * cos0_;
-      if (pass == 0) {
-        if (height == 0) {
-          at.lat = std::atan(u / std::sqrt(1 - u * u));
-          at.done = true;
-          break;
-        }
-        at.lat = std::asin(u);
-      }
-      const double previous = at.lat;
-      at.lat = std::asin(u / (height / a_ + 1));
-      at.done = std::fabs(at.lat - previous) < 1e-12;
-      grown = square(height / a_ + 1);
-    }
-    at.lon = std::atan2(a_ * x / t, ((p_ - h_ / t) * cos0_ - v * sin0_) * a_) + lon0_;
-    return at;
-  }
-
- private:
-  double a_, lon0_, h_, sin0_, cos0_, p_;
-};
-
-template <class Sight>
-void meet_all(const Sight& sight, double a, int32_t count, const CoordinateTriple* in,
-              CoordinateTriple* out, TWstatus* status) {
-  for (int32_t i = 0; i < count; ++i) {
-    const auto [x, y, height] = in[i];
-    const LonLat at = sight.meet(x * a, y * a, height);
-    if (!at.done) *status = TW_I_LATITUDE_LIMITED;
-    out[i] = {at.lon, at.lat, height};
-  }
+PerspectiveInverse inverse_of(double a, double e, double lon0, double lat0, double h, double p,
+                              double phi_g) {
+  const double e2 = e * e;
+  const auto at = sincos(lat0);
+  const double off = e == 0 ? 0 : lat0 - phi_g;
+  return {a,
+          e2,
+          lon0,
+          h,
+          at.sin,
+          at.cos,
+          std::cos(off) * p,
+          std::sin(off) * p,
+          1 - at.cos * at.cos * e2,
+          1 - at.sin * at.sin * e2,
+          2 * at.cos * at.sin * e2,
+          1 - e2,
+          (1 - square(std::cos(phi_g)) * e2) * p * p};
 }
 
 }  // namespace
+
+Next PerspectiveForward::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_NOT_CONVERGED;  // beyond the horizon; by contract on the sphere alone
+  return Next::none;
+}
+
+Next PerspectiveInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                               TWstatus* status) const {
+  const auto at = meet(in.x, in.y, in.z);
+  *out = {at.lon, at.lat, in.z};
+  *status = TW_I_LATITUDE_LIMITED;  // the passes were used up
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
 
 void TWpersp_c(double a, double e, double lat0, double h, double h0, double* p, double* phi_g,
                TWstatus* status) {
@@ -155,7 +81,7 @@ void TWpersp_c(double a, double e, double lat0, double h, double h0, double* p, 
   double distance = 0;
   double latitude_step = 0;
   double distance_step = 0;
-  for (int pass = 0; pass < kMostPasses; ++pass) {
+  for (int pass = 0; pass < kPerspectivePasses; ++pass) {
     const double previous_latitude = latitude;
     const double previous_distance = distance;
     distance = cos0 / std::cos(latitude) * (height + n1) / a;
@@ -172,46 +98,13 @@ void TWpersp_c(double a, double e, double lat0, double h, double h0, double* p, 
 void TWpersp_vert_f(double a, double e, double lon0, double lat0, double /*h0*/, double h, double p,
                     double phi_g, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                     TWstatus* status) {
-  *status = TW_SUCCESS;
-  const bool sphere = e == 0;
-  const double e2 = e * e;
-  const double sin0 = std::sin(lat0);
-  const double cos0 = std::cos(lat0);
-  // On the sphere the geocentric latitude is the geodetic one.
-  const double along = sphere ? p : std::cos(lat0 - phi_g) * p;
-  const double across = sphere ? 0 : std::sin(lat0 - phi_g) * p;
-  for (int32_t i = 0; i < count; ++i) {
-    const auto [lon, lat, height] = in[i];
-    const double sin_lat = std::sin(lat);
-    const double cos_lat = std::cos(lat);
-    const double sin_d = std::sin(lon - lon0);
-    const double cos_d = std::cos(lon - lon0);
-    double nu = a;
-    if (sphere) {
-      const double cc = cos_d * cos0 * cos_lat + sin0 * sin_lat;
-      if (1 / p > cc) {  // beyond the horizon; wanted on the sphere alone
-        *status = TW_NOT_CONVERGED;
-        return;
-      }
-    } else {
-      nu = a / std::sqrt(1 - sin_lat * sin_lat * e2);
-    }
-    const double c = (nu + height) / a * cos_lat;
-    const double s = ((1 - e2) * nu + height) / a * sin_lat;
-    const double k = h / (along - sin0 * s - cos_d * cos0 * c);
-    out[i] = {sin_d * c * k / a, (across + cos0 * s - cos_d * c * sin0) * k / a, height};
-  }
+  *status = over_points(forward_of(a, e, lon0, lat0, h, p, phi_g), count, in, out);
 }
 
 void TWpersp_vert_i(double a, double e, double lon0, double lat0, double /*h0*/, double h, double p,
                     double phi_g, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                     TWstatus* status) {
-  *status = TW_SUCCESS;
-  if (e == 0) {
-    meet_all(SphereSight(a, lon0, lat0, h, p), a, count, in, out, status);
-  } else {
-    meet_all(EllipsoidSight(a, e, lon0, lat0, h, p, phi_g), a, count, in, out, status);
-  }
+  *status = over_points(inverse_of(a, e, lon0, lat0, h, p, phi_g), count, in, out);
 }
 
 void TWpersp_f(double a, double e, double lon0, double lat0, double h0, double h, double p,
@@ -220,40 +113,23 @@ void TWpersp_f(double a, double e, double lon0, double lat0, double h0, double h
   TWpersp_vert_f(a, e, lon0, lat0, h0, h, p, phi_g, count, in, out, status);
   if (!TW_OK(*status)) return;
   if (tilt_a != 0 || tilt_b != 0) {
-    const double sa = std::sin(tilt_a);
-    const double ca = std::cos(tilt_a);
-    const double sb = std::sin(tilt_b);
-    const double cb = std::cos(tilt_b);
-    for (int32_t i = 0; i < count; ++i) {
-      const double x = out[i].x;
-      const double y = out[i].y;
-      const double t = x * sa + y * ca;
-      const double dn = t * a * sb / h + cb;
-      out[i].x = (x * ca - y * sa) * cb / dn;
-      out[i].y = t / dn;
-    }
+    const auto at_a = sincos(tilt_a);
+    const auto at_b = sincos(tilt_b);
+    over_points(PerspectiveTilt{at_a.sin, at_a.cos, at_b.cos, a * at_b.sin / h}, count, out, out);
   }
-  if (turns(rot)) rotate(rot - kPi, count, out);
+  if (turns(rot)) turn_points(kPi - rot, count, out);
 }
 
 void TWpersp_i(double a, double e, double lon0, double lat0, double h0, double h, double p,
                double phi_g, double tilt_a, double tilt_b, double rot, int32_t count,
                CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   // By contract: the rotation is undone in the caller's input array.
-  if (turns(rot)) rotate(-(rot - kPi), count, in);
+  if (turns(rot)) turn_points(rot - kPi, count, in);
   const CoordinateTriple* upright = in;
   if (tilt_a != 0 || tilt_b != 0) {
-    const double sa = std::sin(tilt_a);
-    const double ca = std::cos(tilt_a);
-    const double sb = std::sin(tilt_b);
-    const double cb = std::cos(tilt_b);
-    for (int32_t i = 0; i < count; ++i) {
-      const auto [x, y, height] = in[i];
-      const double dn = h - a * y * sb;
-      const double u = x * h / dn;
-      const double v = y * h * cb / dn;
-      out[i] = {u * ca + sa * v, v * ca - sa * u, height};
-    }
+    const auto at_a = sincos(tilt_a);
+    const auto at_b = sincos(tilt_b);
+    over_points(PerspectiveUntilt{at_a.sin, at_a.cos, at_b.cos, a * at_b.sin / h}, count, in, out);
     upright = out;
   }
   TWpersp_vert_i(a, e, lon0, lat0, h0, h, p, phi_g, count, upright, out, status);

@@ -1,204 +1,124 @@
-// Stereographic projection of the ellipsoid: oblique through the conformal latitude, and polar.
+// Stereographic projection of the ellipsoid: what the contract says of the points that the formulas
+// do not cover, the searches for a latitude of true scale, and the exported functions.
 
 #include <cmath>
 #include <utility>
 
-#include "formulas/radii.hpp"
-#include "formulas/wraps.hpp"
-#include "projections/isometric_latitude.hpp"
+#include "projections/conformal/stereographic_points.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::detail;
 
+namespace tidewater::detail {
+
 namespace {
 
-// What takes a point for the origin, ends the polar inverse, and is small on the plane.
-constexpr double kEpsilon = 1e-12;
-
-bool beyond_pole(double lat) { return lat > kHalfPi || lat < -kHalfPi; }
-
-bool at_origin(double lon, double lat, double lon0, double lat0) {
-  return std::fabs(lon - lon0) < kEpsilon && std::fabs(lat - lat0) < kEpsilon;
+ObliqueOrigin oblique_origin(double e, double lon0, double lat0, double m0, double chi0) {
+  const auto chi = sincos(chi0);
+  return {e, lon0, lat0, chi.sin, chi.cos, 2 * m0 / chi.cos};
 }
 
-struct SineCosine {
-  double sin, cos;
-};
-
-// Sine and cosine of the conformal latitude of lat, without the angle: with T its half-angle
-// tangent tan(chi/2 + pi/4), they are (T^2 - 1) / (T^2 + 1) and 2 T / (T^2 + 1).
-SineCosine conformal_sine_cosine(double e, double lat) {
-  const double s = std::sin(lat);
-  const double c = std::cos(lat);
-  // tan(lat/2 + pi/4), in the form that does not cancel
-  const double tangent = lat < 0 ? c / (1 - s) : (1 + s) / c;
-  const double t = tangent * eccentric_factor(e, s);
-  const double t2 = t * t;
-  return {(t2 - 1) / (t2 + 1), 2 * t / (t2 + 1)};
-}
-
-// The oblique road: C is zero, and m0 and chi0 describe the origin.
-class Oblique {
- public:
-  Oblique(double m0, double chi0)
-      : sin_chi0_(std::sin(chi0)), cos_chi0_(std::cos(chi0)), scale_(2 * m0 / cos_chi0_) {}
-
-  // The factor A of both coordinates and of the scale (Snyder 1987, eq. 21-27).
-  double factor(double cos_d, SineCosine chi) const {
-    return scale_ / (cos_d * cos_chi0_ * chi.cos + sin_chi0_ * chi.sin + 1);
-  }
-  double sin_chi0() const { return sin_chi0_; }
-  double cos_chi0() const { return cos_chi0_; }
-
- private:
-  double sin_chi0_, cos_chi0_, scale_;
-};
-
-void oblique_forward(double e, double lon0, double lat0, double m0, double chi0, int32_t count,
-                     const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  const Oblique origin(m0, chi0);
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    const double lat = in[i].y;
-    if (std::fabs(lat) > kHalfPi) {
-      *status = TW_BAD_LATITUDE;
-      continue;
-    }
-    if (at_origin(lon, lat, lon0, lat0)) {
-      out[i].x = 0;
-      out[i].y = 0;
-      continue;
-    }
-    const SineCosine chi = conformal_sine_cosine(e, lat);
-    const double d = lon - lon0;
-    const double cos_d = std::cos(d);
-    const double a = origin.factor(cos_d, chi);
-    out[i].x = std::sin(d) * a * chi.cos;
-    out[i].y = (origin.cos_chi0() * chi.sin - cos_d * origin.sin_chi0() * chi.cos) * a;
-  }
-}
-
-void polar_forward(double e, double lon0, double lat0, double C, int32_t count,
-                   const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  const double sign = C < 0 ? -1 : 1;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    const double lat = in[i].y;
-    if (beyond_pole(lat)) {
-      *status = TW_BAD_LATITUDE;
-      continue;
-    }
-    if (at_origin(lon, lat, lon0, lat0)) {
-      out[i].x = 0;
-      out[i].y = 0;
-      continue;
-    }
-    const double rho = std::fabs(C) * isometric_colatitude_tangent(e, sign * lat);
-    const double d = sign * (lon - lon0);
-    out[i].x = sign * (std::sin(d) * rho);
-    out[i].y = sign * (-std::cos(d) * rho);
-  }
-}
-
-// The latitude of a conformal latitude that is given by its sine.  False where TWconflat_geod
-// refuses it: not a number, or its passes used up.
-bool latitude_of_conformal(double e, double sin_chi, double& lat) {
-  if (std::fabs(e) <= kSeriesEccentricity) {
-    // The passes are never used up there.  The root is tan(pi/4 - chi/2).
-    lat = latitude_at_rest(e, std::sqrt((1 - sin_chi) / (1 + sin_chi)));
-    return !std::isnan(lat);
-  }
-  TWstatus word = TW_SUCCESS;
-  TWconflat_geod(e, std::asin(sin_chi), &lat, &word);
-  return word == TW_SUCCESS;
-}
-
-void oblique_inverse(double e, double lon0, double lat0, double m0, double chi0, int32_t count,
-                     const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  const double sin_chi0 = std::sin(chi0);
-  const double cos_chi0 = std::cos(chi0);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    const double rho = std::sqrt(x * x + y * y);
-    if (rho < kEpsilon) {
-      out[i].x = lon0;
-      out[i].y = lat0;
-      continue;
-    }
-    const double ce = 2 * std::atan(rho * cos_chi0 / (2 * m0));
-    const double sin_ce = std::sin(ce);
-    const double cos_ce = std::cos(ce);
-    double lat = 0;
-    if (!latitude_of_conformal(e, sin_ce * y * cos_chi0 / rho + cos_ce * sin_chi0, lat)) {
-      *status = TW_BAD_LATITUDE;
-      continue;
-    }
-    // By contract: the plain arctangent of the quotient, so that no result lies more than a quarter
-    // turn from lon0, and no wrap.
-    out[i].x = std::atan(sin_ce * x / (cos_ce * rho * cos_chi0 - sin_ce * y * sin_chi0)) + lon0;
-    out[i].y = lat;
-  }
-}
+double side_of(double C) { return C < 0 ? -1 : 1; }
 
 // The latitude p with t(p) = w, by at most ten passes.  False when they were used up.
-bool latitude_of_tangent(double e, double w, double& lat) {
-  if (std::fabs(e) <= kSeriesEccentricity) {
-    // Six passes are enough there: what they come to rest at is found directly.
-    lat = latitude_at_rest(e, w);
-    return !std::isnan(lat);
-  }
+bool latitude_in_ten_passes(double e, double w, double& lat) {
   constexpr int kMostPasses = 10;
   lat = kHalfPi - 2 * std::atan(w);
   double previous = 0;
   int passes = 0;
   do {
     previous = lat;
-    lat = next_latitude(e, w, previous);
+    lat = kHalfPi - 2 * std::atan(w * eccentric_factor(e, std::sin(previous)));
     ++passes;
-  } while (!(std::fabs(lat - previous) <= kEpsilon) && passes < kMostPasses);
+  } while (!(std::fabs(lat - previous) <= kStereographicEpsilon) && passes < kMostPasses);
   // By contract: the count alone decides, also when the last pass did converge.
   return passes < kMostPasses;
 }
 
-// Returns lon0 as the loop leaves it.
-double polar_inverse(double e, double lon0, double lat0, double C, int32_t count,
-                     const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  for (int32_t i = 0; i < count; ++i) {
-    double x = in[i].x;
-    double y = in[i].y;
-    const double rho = std::sqrt(x * x + y * y);
-    if (rho < kEpsilon) {
-      out[i].x = lon0;
-      out[i].y = lat0;
-      continue;
-    }
-    if (C < 0) {
-      // By contract: the one lon0 of the whole call is negated anew at each point of the south, so
-      // that its sign alternates along the array.
-      lon0 = -lon0;
-      x = -x;
-      y = -y;
-    }
-    const double w = rho / std::fabs(C);
-    double lat = 0;
-    if (!latitude_of_tangent(e, w, lat)) {
-      *status = TW_NOT_CONVERGED;
-      continue;
-    }
-    double lon = std::atan2(x, -y) + lon0;
-    if (C < 0) {
-      lat = -lat;
-      lon = -lon;
-    }
-    out[i].x = wrap_above_then_at_or_below(lon);
-    out[i].y = lat;
-  }
-  return lon0;
+Next refuse_latitude(TWstatus* status) {
+  *status = TW_BAD_LATITUDE;
+  return Next::point;  // the failing point stays unwritten, the others are computed
+}
+
+// By contract: points that were skipped are looked at too, with what the output held.
+void hold_pole(double lon0, CoordinateTriple* out) {
+  if (at_stereographic_pole(out->y)) out->x = lon0;
 }
 
 }  // namespace
+
+Next StereographicObliqueForward::other(const CoordinateTriple&, CoordinateTriple*,
+                                        TWstatus* status) const {
+  return refuse_latitude(status);
+}
+
+Next StereographicPolarForward::other(const CoordinateTriple&, CoordinateTriple*,
+                                      TWstatus* status) const {
+  return refuse_latitude(status);
+}
+
+Next StereographicObliqueInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                        TWstatus* status) const {
+  const auto at = on_sphere(in.x, in.y);
+  double lat = lat0;
+  TWstatus word = TW_SUCCESS;
+  if (!at.centre) TWconflat_geod(e, at.chi, &lat, &word);
+  if (word != TW_SUCCESS) {
+    *status = TW_BAD_LATITUDE;
+  } else {
+    out->x = at.centre ? lon0 : at.lon;
+    out->y = lat;
+  }
+  hold_pole(lon0, out);
+  return Next::point;
+}
+
+Next StereographicPolarInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                      TWstatus* status) const {
+  double lat = 0;
+  if (latitude_in_ten_passes(e, std::sqrt(in.x * in.x + in.y * in.y) / size, lat)) {
+    out->x = longitude(in.x, in.y);
+    out->y = side * lat;
+  } else {
+    *status = TW_NOT_CONVERGED;
+  }
+  hold_pole(lon0, out);
+  return Next::point;
+}
+
+Next StereographicObliqueScale::other(const CoordinateTriple&, CoordinateTriple*,
+                                      TWstatus* status) const {
+  return refuse_latitude(status);
+}
+
+Next StereographicPolarScale::other(const CoordinateTriple&, CoordinateTriple*,
+                                    TWstatus* status) const {
+  return refuse_latitude(status);
+}
+
+namespace {
+
+// By contract: the one lon0 of the whole call is negated anew at each point of the south, so that
+// its sign alternates along the array.  So the points cannot be done several at once.
+TWstatus south_polar_inverse(StereographicPolarInverse kernel, int32_t count,
+                             const CoordinateTriple* in, CoordinateTriple* out) {
+  TWstatus status = TW_SUCCESS;
+  double lon0 = kernel.lon0;
+  for (int32_t i = 0; i < count; ++i) {
+    const CoordinateTriple given = in[i];
+    const bool centre = std::sqrt(given.x * given.x + given.y * given.y) < kStereographicEpsilon;
+    if (!centre) lon0 = -lon0;
+    kernel.lon0 = centre ? lon0 : -lon0;  // the sum with it is negated with the result
+    one_point(kernel, given, out + i, &status);
+  }
+  for (int32_t i = 0; i < count; ++i) hold_pole(lon0, out + i);
+  return status;
+}
+
+}  // namespace
+
+}  // namespace tidewater::detail
 
 void TWstereo_c(double e, double lat0, double* C, double* m0, double* chi0, TWstatus* status) {
   *status = TW_SUCCESS;
@@ -214,64 +134,43 @@ void TWstereo_c(double e, double lat0, double* C, double* m0, double* chi0, TWst
 
 void TWstereo_f(double e, double lon0, double lat0, double C, double m0, double chi0, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
   if (C == 0) {
-    oblique_forward(e, lon0, lat0, m0, chi0, count, in, out, status);
+    *status = over_points(StereographicObliqueForward{oblique_origin(e, lon0, lat0, m0, chi0)},
+                          count, in, out);
   } else {
-    polar_forward(e, lon0, lat0, C, count, in, out, status);
+    *status = over_points(StereographicPolarForward{e, lon0, lat0, std::fabs(C), side_of(C)}, count,
+                          in, out);
   }
 }
 
 void TWstereo_i(double e, double lon0, double lat0, double C, double m0, double chi0, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
   if (C == 0) {
-    oblique_inverse(e, lon0, lat0, m0, chi0, count, in, out, status);
-  } else {
-    lon0 = polar_inverse(e, lon0, lat0, C, count, in, out, status);
+    const auto chi = sincos(chi0);
+    *status = over_points(StereographicObliqueInverse{e, lon0, lat0, chi.sin, chi.cos,
+                                                      chi.cos / (2 * m0), ConformalInverse(e)},
+                          count, in, out);
+    return;
   }
-  // By contract: points that were skipped are looked at too, with what the output held.
-  for (int32_t i = 0; i < count; ++i) {
-    if (std::fabs(std::fabs(out[i].y) - kHalfPi) < 2e-12) out[i].x = lon0;
-  }
+  const StereographicPolarInverse kernel = {
+      e, lon0, lat0, std::fabs(C), side_of(C), ConformalInverse(e)};
+  *status = C < 0 && lon0 != 0 ? south_polar_inverse(kernel, count, in, out)
+                               : over_points(kernel, count, in, out);
 }
 
 double TWstereo_s(double e, double k0, double lon0, double lat0, double C, double m0, double chi0,
                   int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                   TWstatus* status) {
-  *status = TW_SUCCESS;
-  const bool oblique = C == 0;
-  const Oblique origin = oblique ? Oblique(m0, chi0) : Oblique(1, 0);
-  double k = k0;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    double lat = in[i].y;
-    if (beyond_pole(lat)) {
-      *status = TW_BAD_LATITUDE;
-      k = k0;  // for the caller that reads the value returned; the point stays unwritten
-      continue;
-    }
-    if (at_origin(lon, lat, lon0, lat0)) {
-      k = k0;
-    } else {
-      // At a pole the cosines of lat and of the conformal latitude are both what is left of pi/2,
-      // and their quotient is finite: the angle itself is formed here.
-      double size = 0;  // of the parallel, drawn over true
-      if (oblique) {
-        double chi = 0;
-        TWstatus word = TW_SUCCESS;
-        TWgeod_conflat(e, lat, &chi, &word);
-        const SineCosine of_chi = {std::sin(chi), std::cos(chi)};
-        size = origin.factor(std::cos(lon - lon0), of_chi) * of_chi.cos;
-      } else {
-        if (C < 0) lat = -lat;
-        size = std::fabs(C) * isometric_colatitude_tangent(e, lat);
-      }
-      k = size * k0 / parallel_radius(e * e, std::sin(lat), std::cos(lat));
-    }
-    out[i] = {k, k, k * k};
+  // Read before anything is written: in and out may be the same array.
+  const bool last_computed = count > 0 && !beyond_pole(in[count - 1].y);
+  if (C == 0) {
+    *status = over_points(StereographicObliqueScale{oblique_origin(e, lon0, lat0, m0, chi0), k0},
+                          count, in, out);
+  } else {
+    *status = over_points(StereographicPolarScale{e, lon0, lat0, std::fabs(C), side_of(C), k0},
+                          count, in, out);
   }
-  return k;
+  return last_computed ? out[count - 1].x : k0;
 }
 
 void TWstereo_latTs(double e, double lon0, double lat0, double C, double m0, double chi0,

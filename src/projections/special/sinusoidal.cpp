@@ -1,23 +1,83 @@
-// Sinusoidal projection of the ellipsoid.
+// Sinusoidal projection: what the contract says of the points that the formulas do not cover, and
+// the exported functions.
+
+#include "projections/special/sinusoidal_points.hpp"
 
 #include <cmath>
 
-#include "formulas/wraps.hpp"
-#include "foundation/meridian_arc.hpp"
-#include "projections/special/turns_about.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;
 
+namespace tidewater::detail {
+
+// Beyond a pole, or on an ellipsoid that cannot be: the words of the meridian arc, and its value.
+Next SinusoidalForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                              TWstatus* status) const {
+  double y = 0;
+  if (!(std::fabs(in.y - lat0) <= kSinusoidalNothing)) {
+    double m = 0;
+    const TWstatus word = arc.forward(in.y, &m);
+    if (word != TW_SUCCESS) *status = word;
+    if (!TW_OK(word)) return Next::none;
+    y = m - m0;
+  }
+  out->x = abscissa(in.x, sincos(in.y));
+  out->y = y;
+  return Next::point;
+}
+
+Next SinusoidalInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                              TWstatus* status) const {
+  double lat = lat0;
+  const TWstatus word = arc.inverse(in.y + m0, &lat);
+  if (word != TW_SUCCESS) *status = word;
+  if (!TW_OK(word)) return Next::none;
+  out->x = longitude(in.x, lat);
+  out->y = lat;
+  return Next::point;
+}
+
+Next SinusoidalScale::other(const CoordinateTriple& in, CoordinateTriple* out,
+                            TWstatus* status) const {
+  const double lat = in.y;
+  if (std::fabs(lat) - kHalfPi > kSinusoidalNothing) {
+    *status = TW_BAD_LATITUDE;
+    return Next::none;
+  }
+  double slope = 0;
+  TWstatus word = TW_SUCCESS;
+  TWdM_dphi(1.0, e2, lat, &slope, &word);
+  if (word != TW_SUCCESS) *status = word;
+  if (!TW_OK(word)) return Next::none;
+  const auto at = scales(wrap_turns_below_then_above(in.x - lon0), std::sin(lat), slope);
+  *out = {at.x, at.y, at.z};
+  return Next::point;
+}
+
 namespace {
 
-// Differences up to this are none.
-constexpr double kNearZero = 1e-12;
-// pi/2 - 1e-12: nearer to a pole every longitude is the central one.
-constexpr double kLongitudeLimit = 1.5707963267938965;
+SinusoidalScale scale_of(double k0, double lon0, double e2) {
+  const double root = std::sqrt(1 - e2);
+  const double n = (1 - root) / (1 + root);
+  const double n2 = n * n;
+  const double g = 1 / (1 + n);
+  // The derivative of the arc's series, term by term.
+  return {k0,
+          lon0,
+          e2,
+          !(e2 >= 1e-12),
+          g * (1 + n2 / 4 + n2 * n2 / 64),
+          -3 * g * (n - n2 * n / 8),
+          3.75 * g * (n2 - n2 * n2 / 4),
+          -4.375 * g * n2 * n,
+          4.921875 * g * n2 * n2};
+}
 
 }  // namespace
+
+}  // namespace tidewater::detail
 
 void TWsinusoidal_c(double e, double lat0, double* e2, double* m0, TWstatus* status) {
   *e2 = e * e;
@@ -26,80 +86,17 @@ void TWsinusoidal_c(double e, double lat0, double* e2, double* m0, TWstatus* sta
 
 void TWsinusoidal_f(double lon0, double lat0, double e, double e2, double m0, int32_t count,
                     const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const MeridianArc arc(1.0, e);
-  for (int32_t i = 0; i < count; ++i) {
-    const double lat = in[i].y;
-    const double d = wrap_turns_below_then_above(in[i].x - lon0);
-    double x = 0;
-    if (std::fabs(d) > kNearZero) {
-      x = std::cos(lat) * d;
-      if (e2 != 0) x /= std::sqrt(1 - e2 * square(std::sin(lat)));
-    }
-    double y = 0;
-    if (!(std::fabs(lat - lat0) <= kNearZero)) {
-      double m = 0;
-      const TWstatus word = arc.forward(lat, &m);
-      if (word != TW_SUCCESS) *status = word;
-      if (!TW_OK(word)) return;
-      y = m - m0;
-    }
-    out[i].x = x;
-    out[i].y = y;
-  }
+  *status = over_points(SinusoidalForward{lon0, lat0, e2, m0, MeridianArc(1.0, e)}, count, in, out);
 }
 
 void TWsinusoidal_i(double lon0, double lat0, double e, double e2, double m0, int32_t count,
                     const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
   const MeridianArc arc(1.0, e);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    double lat = lat0;
-    if (!(std::fabs(y) <= kNearZero)) {
-      const TWstatus word = arc.inverse(y + m0, &lat);
-      if (word != TW_SUCCESS) *status = word;
-      if (!TW_OK(word)) return;
-    }
-    double lon = lon0;
-    if (std::fabs(x) > kNearZero && std::fabs(lat) <= kLongitudeLimit) {
-      const double w = e2 != 0 ? std::sqrt(1 - e2 * square(std::sin(lat))) : 1;
-      lon = turns_about(lon0, x * w / std::cos(lat) + lon0);
-    }
-    out[i].x = lon;
-    out[i].y = lat;
-  }
+  *status =
+      over_points(SinusoidalInverse{lon0, lat0, e2, m0, arc, MeridianFoot(arc)}, count, in, out);
 }
 
 void TWsinusoidal_s(double k0, double lon0, double e2, int32_t count, const CoordinateTriple* in,
                     CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lat = in[i].y;
-    const double d = wrap_turns_below_then_above(in[i].x - lon0);
-    if (std::fabs(lat) - kHalfPi > kNearZero) {
-      *status = TW_BAD_LATITUDE;
-      return;
-    }
-    const double sin_lat = std::sin(lat);
-    double h = 0;
-    double areal = 1;
-    if (e2 >= 1e-12) {
-      const double w2 = 1 - e2 * sin_lat * sin_lat;
-      const double w = w2 * std::sqrt(w2);
-      const double g = sin_lat * d * (e2 - 1) / w;
-      double dm = 0;
-      TWstatus word = TW_SUCCESS;
-      TWdM_dphi(1.0, e2, lat, &dm, &word);
-      if (word != TW_SUCCESS) *status = word;
-      if (!TW_OK(word)) return;
-      h = std::sqrt(dm * dm + g * g) * w / (1 - e2);
-      areal = dm * w / (1 - e2);
-    } else {
-      h = std::sqrt(d * d * sin_lat * sin_lat + 1);
-    }
-    // By contract: the scale along the parallel is k0 everywhere.
-    out[i] = {k0, k0 * h, k0 * k0 * areal};
-  }
+  *status = over_points(scale_of(k0, lon0, e2), count, in, out);
 }

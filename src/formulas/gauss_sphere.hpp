@@ -1,0 +1,82 @@
+// Gauss's conformal mapping of the ellipsoid onto a sphere, by isometric latitudes.
+// C. F. Gauss, Untersuchungen ueber Gegenstaende der hoehern Geodaesie (1844); the latitude of the
+// sphere from its isometric latitude: J. P. Snyder, Map Projections: A Working Manual, USGS
+// Professional Paper 1395 (1987), eq. 7-4.
+#pragma once
+
+#include "formulas/isometric_latitude.hpp"
+#include "formulas/wraps.hpp"
+
+namespace tidewater::detail {
+
+// The value of c that says that ellipsoid and sphere are one.
+inline constexpr double kGaussSphereMark = -1.0;
+
+// Beyond these the pole maps onto itself.  By contract: forward and inverse draw the line
+// differently.
+inline constexpr double kGaussForwardLatLimit = 1.5707963267938965;  // pi/2 - 1e-12
+inline constexpr double kGaussInverseLatLimit = 1.5707963267947966;  // pi/2 - 1e-13
+
+// A latitude of the sphere whose sine and cosine are needed as well or instead: what is not used
+// is not computed.
+template <class V>
+struct SphereLatitude {
+  V half;  // tan(pi/4 - |chi|/2)
+  V sign;
+  V sin, cos;
+
+  TW_INLINE V angle() const { return copysign(kHalfPi - 2.0 * atan(half), sign); }
+};
+
+// Of the sphere's isometric latitude psi = atanh(sin chi).
+template <Number V>
+TW_INLINE SphereLatitude<V> sphere_latitude(V psi) {
+  const V t = exp(-abs(psi));
+  const V q = t * t;
+  const V inverse = 1.0 / (1.0 + q);
+  return {t, psi, copysign((1.0 - q) * inverse, psi), 2.0 * t * inverse};
+}
+
+// psi = atanh(sin chi) of a latitude of the sphere.
+template <Number V>
+TW_INLINE V sphere_isometric(const SinCos<V>& chi) {
+  return copysign(log((1.0 + abs(chi.sin)) / chi.cos), chi.sin);
+}
+
+// The mapping on an ellipsoid of eccentricity e, for c above 0: psi of the sphere is c (psi of the
+// ellipsoid + t), longitudes from lon0 are multiplied by c.
+struct GaussSphere {
+  double e, lon0, c, t, over_c;
+  ConformalInverse inverse;
+
+  GaussSphere(double eccentricity, double origin, double ratio, double shift)
+      : e(eccentricity),
+        lon0(origin),
+        c(ratio),
+        t(shift),
+        over_c(1 / ratio),
+        inverse(eccentricity) {}
+
+  // Latitudes up to kGaussForwardLatLimit.
+  template <Number V>
+  TW_INLINE SphereLatitude<V> forward_latitude(const SinCos<V>& lat) const {
+    return sphere_latitude((isometric_latitude(e, lat) + t) * c);
+  }
+  // By contract: wrapped as TWmerc_f does it, then, after the change of ratio, as TWmerc_i does.
+  template <Number V>
+  TW_INLINE V forward_longitude(V lon) const {
+    return wrap_at_or_below_then_above(c * wrap_above_then_below(lon - lon0));
+  }
+
+  // Latitudes of the sphere up to kGaussInverseLatLimit.
+  template <Number V>
+  TW_INLINE V inverse_latitude(const SinCos<V>& chi) const {
+    return inverse.of_isometric(sphere_isometric(chi) * over_c - t);
+  }
+  template <Number V>
+  TW_INLINE V inverse_longitude(V lon) const {
+    return wrap_at_or_below_then_above(wrap_above_then_below(lon) * over_c + lon0);
+  }
+};
+
+}  // namespace tidewater::detail
