@@ -17,10 +17,17 @@ PG_MODULE_MAGIC;
 
 /* ---- objects of a session ---- */
 
-/* A transformation by the texts of its systems; the latest used stands first. */
+/* A system as it was asked for: by a text, or, without one, by its code. */
+typedef struct SystemName {
+  const char* text; /* null: the code alone */
+  size_t size;
+  int32 code;
+} SystemName;
+
+/* A transformation by the names of its systems; the latest used stands first. */
 typedef struct Known {
-  char* from;
-  char* to;
+  SystemName from;
+  SystemName to;
   tw_transformation* transformation;
   int32 code; /* of the target system, 0 without one */
 } Known;
@@ -40,25 +47,53 @@ static void to_front(int at) {
   known[0] = found;
 }
 
-static bool same_text(const char* kept, const char* text, size_t size) {
-  return strncmp(kept, text, size) == 0 && kept[size] == 0;
+static bool same_name(const SystemName* kept, const SystemName* name) {
+  if (kept->text == NULL || name->text == NULL) {
+    return kept->text == name->text && kept->code == name->code;
+  }
+  return kept->size == name->size && memcmp(kept->text, name->text, name->size) == 0;
 }
 
-static const Known* transformation_between(const char* from, size_t from_size, const char* to,
-                                           size_t to_size) {
+static SystemName by_text(text* given) {
+  SystemName name = {VARDATA_ANY(given), VARSIZE_ANY_EXHDR(given), 0};
+  return name;
+}
+
+static SystemName by_code(int32 code) {
+  SystemName name = {NULL, 0, code};
+  return name;
+}
+
+static tw_system* system_named(const SystemName* name) {
+  char code[32];
+  pg_snprintf(code, sizeof code, "EPSG:%d", name->code);
+  return tw_system_create(name->text == NULL ? code : pnstrdup(name->text, name->size));
+}
+
+/* A name that lives as long as the session. */
+static SystemName kept(SystemName name) {
+  if (name.text != NULL) {
+    char* copy = MemoryContextAlloc(TopMemoryContext, name.size + 1);
+    memcpy(copy, name.text, name.size);
+    name.text = copy;
+  }
+  return name;
+}
+
+static void forget(SystemName name) {
+  if (name.text != NULL) pfree((char*)name.text);
+}
+
+static const Known* transformation_between(SystemName from, SystemName to) {
   for (int i = 0; i < known_count; ++i) {
-    if (same_text(known[i].from, from, from_size) && same_text(known[i].to, to, to_size)) {
+    if (same_name(&known[i].from, &from) && same_name(&known[i].to, &to)) {
       if (i > 0) to_front(i);
       return &known[0];
     }
   }
-  Known made;
-  made.from = MemoryContextStrdup(TopMemoryContext, pnstrdup(from, from_size));
-  made.to = MemoryContextStrdup(TopMemoryContext, pnstrdup(to, to_size));
-  made.transformation = NULL;
-  made.code = 0;
-  tw_system* source = tw_system_create(made.from);
-  tw_system* target = source == NULL ? NULL : tw_system_create(made.to);
+  Known made = {kept(from), kept(to), NULL, 0};
+  tw_system* source = system_named(&from);
+  tw_system* target = source == NULL ? NULL : system_named(&to);
   if (target != NULL) {
     made.transformation = tw_transformation_create(source, target, NULL);
     made.code = tw_system_code(target);
@@ -66,15 +101,15 @@ static const Known* transformation_between(const char* from, size_t from_size, c
   tw_system_destroy(source);
   tw_system_destroy(target);
   if (made.transformation == NULL) {
-    pfree(made.from);
-    pfree(made.to);
+    forget(made.from);
+    forget(made.to);
     refuse();
   }
   if (known_count == MOST_KNOWN) {
     Known* last = &known[--known_count];
     tw_transformation_destroy(last->transformation);
-    pfree(last->from);
-    pfree(last->to);
+    forget(last->from);
+    forget(last->to);
   }
   known[known_count++] = made;
   to_front(known_count - 1);
@@ -82,8 +117,7 @@ static const Known* transformation_between(const char* from, size_t from_size, c
 }
 
 static const Known* transformation_of(text* from, text* to) {
-  return transformation_between(VARDATA_ANY(from), VARSIZE_ANY_EXHDR(from), VARDATA_ANY(to),
-                                VARSIZE_ANY_EXHDR(to));
+  return transformation_between(by_text(from), by_text(to));
 }
 
 /* Geodesics of the ellipsoid of the last system that was asked for. */
@@ -297,37 +331,22 @@ static int32 code_of(const struct varlena* geometry) {
   return (int32)((uint32)code << 11) >> 11; /* 21 bits, with their sign */
 }
 
-static size_t code_text(int32 code, char* out) { return (size_t)pg_sprintf(out, "EPSG:%d", code); }
-
-/* A copy in another system.  Its box is left out: whoever needs one works it out. */
+/* A geometry that is the caller's own, brought to another system where it stands; null where a
+ * point has no result.  Its box is left out: whoever needs one works it out. */
 static struct varlena* transformed(struct varlena* geometry, const Known* way) {
   Shape shape = shape_of(geometry);
   size_t body = (size_t)(shape.end - shape.at);
-  uint8 flags = ((uint8*)geometry)[7];
-  size_t head = (flags & FLAG_SECOND) && (flags & FLAG_MORE) ? 16 : 8;
-  struct varlena* result = palloc(head + body);
-  memcpy(result, geometry, head);
-  SET_VARSIZE(result, head + body);
-  uint8* bytes = (uint8*)result + 4;
+  uint8* bytes = (uint8*)geometry + 4;
+  size_t head = (bytes[3] & FLAG_SECOND) && (bytes[3] & FLAG_MORE) ? 16 : 8;
   bytes[0] = (uint8)(way->code >> 16 & 31);
   bytes[1] = (uint8)(way->code >> 8);
   bytes[2] = (uint8)way->code;
-  bytes[3] = (uint8)(flags & ~FLAG_BOX);
-  memcpy((char*)result + head, shape.at, body);
-  shape.at = (char*)result + head;
+  bytes[3] = (uint8)(bytes[3] & ~FLAG_BOX);
+  memmove((char*)geometry + head, shape.at, body);
+  SET_VARSIZE(geometry, head + body);
+  shape.at = (char*)geometry + head;
   shape.end = shape.at + body;
-  if (!walk(&shape, transform_points, way->transformation)) return NULL;
-  return result;
-}
-
-/* (geometry, from, to) */
-PG_FUNCTION_INFO_V1(tidewater_transform_geometry);
-Datum tidewater_transform_geometry(PG_FUNCTION_ARGS) {
-  struct varlena* geometry = PG_DETOAST_DATUM(PG_GETARG_DATUM(0));
-  struct varlena* result =
-      transformed(geometry, transformation_of(PG_GETARG_TEXT_PP(1), PG_GETARG_TEXT_PP(2)));
-  if (result == NULL) PG_RETURN_NULL();
-  PG_RETURN_POINTER(result);
+  return walk(&shape, transform_points, way->transformation) ? geometry : NULL;
 }
 
 static int32 own_code(const struct varlena* geometry) {
@@ -339,30 +358,34 @@ static int32 own_code(const struct varlena* geometry) {
   return code;
 }
 
+static Datum answer(struct varlena* geometry, FunctionCallInfo fcinfo) {
+  if (geometry == NULL) PG_RETURN_NULL();
+  PG_RETURN_POINTER(geometry);
+}
+
+/* (geometry, from, to) */
+PG_FUNCTION_INFO_V1(tidewater_transform_geometry);
+Datum tidewater_transform_geometry(PG_FUNCTION_ARGS) {
+  const Known* way = transformation_of(PG_GETARG_TEXT_PP(1), PG_GETARG_TEXT_PP(2));
+  return answer(transformed(PG_DETOAST_DATUM_COPY(PG_GETARG_DATUM(0)), way), fcinfo);
+}
+
 /* (geometry, to): from the system of the geometry's own code. */
 PG_FUNCTION_INFO_V1(tidewater_transform_own);
 Datum tidewater_transform_own(PG_FUNCTION_ARGS) {
-  struct varlena* geometry = PG_DETOAST_DATUM(PG_GETARG_DATUM(0));
-  text* to = PG_GETARG_TEXT_PP(1);
-  char from[32];
-  size_t from_size = code_text(own_code(geometry), from);
-  struct varlena* result = transformed(
-      geometry, transformation_between(from, from_size, VARDATA_ANY(to), VARSIZE_ANY_EXHDR(to)));
-  if (result == NULL) PG_RETURN_NULL();
-  PG_RETURN_POINTER(result);
+  struct varlena* geometry = PG_DETOAST_DATUM_COPY(PG_GETARG_DATUM(0));
+  const Known* way =
+      transformation_between(by_code(own_code(geometry)), by_text(PG_GETARG_TEXT_PP(1)));
+  return answer(transformed(geometry, way), fcinfo);
 }
 
 /* (geometry, code) */
 PG_FUNCTION_INFO_V1(tidewater_transform_code);
 Datum tidewater_transform_code(PG_FUNCTION_ARGS) {
-  struct varlena* geometry = PG_DETOAST_DATUM(PG_GETARG_DATUM(0));
-  char from[32], to[32];
-  size_t from_size = code_text(own_code(geometry), from);
-  size_t to_size = code_text(PG_GETARG_INT32(1), to);
-  struct varlena* result =
-      transformed(geometry, transformation_between(from, from_size, to, to_size));
-  if (result == NULL) PG_RETURN_NULL();
-  PG_RETURN_POINTER(result);
+  struct varlena* geometry = PG_DETOAST_DATUM_COPY(PG_GETARG_DATUM(0));
+  const Known* way =
+      transformation_between(by_code(own_code(geometry)), by_code(PG_GETARG_INT32(1)));
+  return answer(transformed(geometry, way), fcinfo);
 }
 
 typedef struct Length {

@@ -22,11 +22,9 @@ CREATE TABLE kinds AS SELECT kind, ST_GeomFromText(kind, 4326) AS shape FROM unn
   'TIN(((0 45, 2 45, 2 47, 0 45)))']) AS kind;
 
 SELECT check_that('as ST_Transform: ' || kind,
-  ST_SnapToGrid(moved, 0.001) IS NOT DISTINCT FROM NULL OR (ST_SRID(moved) = 2154
-    AND ST_AsText(moved, 3) = ST_AsText(ST_Transform(shape, 2154), 3)))
+  ST_SRID(moved) = 2154 AND ST_AsText(moved, 3) = ST_AsText(ST_Transform(shape, 2154), 3))
   FROM (SELECT *, tw_transform(shape, 2154) AS moved FROM kinds) AS all_kinds;
-SELECT check_that('boxes are right', bool_and(box2d(tw_transform(shape, 2154)) IS NOT DISTINCT FROM NULL
-    OR abs(ST_XMax(tw_transform(shape, 2154)) - ST_XMax(ST_Transform(shape, 2154))) < 0.1))
+SELECT check_that('boxes are right', bool_and(ST_IsEmpty(shape) OR abs(ST_XMax(tw_transform(shape, 2154)) - ST_XMax(ST_Transform(shape, 2154))) < 0.001))
   FROM kinds;
 SELECT check_that('the input is left alone', bool_and(shape = ST_GeomFromText(kind, 4326))) FROM kinds;
 SELECT check_that('systems by text', ST_AsText(tw_transform(shape, 'utm:31N'), 3)
@@ -43,8 +41,8 @@ SELECT check_that('a system that is none', failure(
 SELECT check_that('the length of lines', abs(tw_geodesic_length('LINESTRING(0 0, 45 0, 90 0)'::geometry)
   - pi() * 6378137 / 2) < 1e-7);
 SELECT check_that('as ST_Length on the spheroid', bool_and(
-  abs(tw_geodesic_length(shape) - ST_Length(shape::geography)) < 1e-6))
-  FROM kinds WHERE kind LIKE 'LINESTRING%' OR kind LIKE 'MULTILINESTRING%';
+  abs(tw_geodesic_length(shape) - ST_LengthSpheroid(shape, 'SPHEROID["WGS 84",6378137,298.257223563]')) < 1e-3))
+  FROM kinds WHERE kind ~ '^(MULTI)?LINESTRING *\(';
 CREATE TABLE indexed AS SELECT tw_transform(shape, 2154) AS shape FROM kinds;
 CREATE INDEX ON indexed USING gist (shape);
 SET enable_seqscan = off;

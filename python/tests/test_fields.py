@@ -82,8 +82,9 @@ def test_magnetic():
     assert later.total - model.field(2.0, 48.0).total == pytest.approx(yearly.total, abs=0.05)
     assert np.isnan(model.field(0, 91).total)
     assert {"WMM2025", "IGRF-13"} <= set(MagneticModel.models())
-    with pytest.raises(tidewater.Error):
-        MagneticModel("WMM2025", year=1950)
+    for year in (1950, np.nan, np.inf):
+        with pytest.raises(tidewater.Error):
+            MagneticModel("WMM2025", year=year)
     assert pickle.loads(pickle.dumps(model)).field(1, 2) == model.field(1, 2)
 
 
