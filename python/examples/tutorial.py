@@ -76,9 +76,11 @@ def distortion(folder):
     for axis, code in zip(axes, ("EPSG:2154", "EPSG:32631")):
         system = tidewater.System(code)
         scale = system.projection.factors(lon, lat, threads=0).meridional
-        picture = axis.contourf(lon, lat, (scale - 1) * 1e5, levels=15, cmap="RdBu_r")
+        off = (scale - 1) * 1e5
+        limit = np.abs(off).max()
+        picture = axis.contourf(lon, lat, off, levels=np.linspace(-limit, limit, 24), cmap="RdBu_r")
         figure.colorbar(picture, ax=axis, label="cm in a kilometre")
-        lines = axis.contour(lon, lat, (scale - 1) * 1e5, levels=[0], colors="k", linewidths=1)
+        lines = axis.contour(lon, lat, off, levels=[0], colors="k", linewidths=1)
         axis.clabel(lines, fmt="true", fontsize=8)
         axis.set_title(f"{system.name}: scale", fontsize=10)
         axis.set_xlabel("longitude")
