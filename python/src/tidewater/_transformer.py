@@ -3,7 +3,7 @@
 from __future__ import annotations
 
 import enum
-from typing import Any, Iterable, Iterator, Optional, Union
+from typing import Any, Dict, Iterable, Iterator, Optional, Union
 
 import numpy as np
 
@@ -36,7 +36,7 @@ class Transformer:
 
     def __init__(self, source: System, target: System, always_xy: bool, **options: Any) -> None:
         self._source, self._target = source, target
-        self._options = {**options, "own_axes": not always_xy}
+        self._options: Dict[str, Any] = {**options, "own_axes": not always_xy}
         self._degrees = Transformation(source, target, **self._options)
         self._radians: Optional[Transformation] = None
 
@@ -180,8 +180,9 @@ class Transformer:
         columns = [np.array(column, float) for column in zip(*points)]
         if switch:
             columns[:2] = columns[1::-1]
-        for row in zip(*self.transform(*columns, radians=radians, errcheck=errcheck,
-                                       direction=direction)):
+        zz = columns[2] if len(columns) > 2 else None
+        for row in zip(*self.transform(columns[0], columns[1], zz, radians=radians,
+                                       errcheck=errcheck, direction=direction)):
             yield tuple(float(value) for value in row)
 
 

@@ -43,6 +43,7 @@ class System(_core.System):
     """
 
     def __init__(self, text: Any, at: Optional[Tuple[float, float]] = None) -> None:
+        self._made_from: Tuple[str, Optional[Tuple[float, float]]]
         if isinstance(text, System):
             text, at = text._made_from
         elif hasattr(text, "to_wkt"):
@@ -86,13 +87,13 @@ class System(_core.System):
         return self.name
 
 
-def _of_system(system: System) -> "Projection":
+def _of_system(system: System) -> Optional["Projection"]:
     return system.projection
 
 
 # A worker that is sent the same object with every piece of an array makes it once.
 @functools.lru_cache(maxsize=64)
-def _again(kind: type, key: tuple) -> Any:
+def _again(kind: Any, key: tuple) -> Any:
     return kind._from_key(key)
 
 
@@ -157,9 +158,9 @@ class Transformation(_core.Transformation):
         source = source if isinstance(source, System) else System(source)
         target = target if isinstance(target, System) else System(target)
         folders = tuple(str(folder) for folder in grid_folders)
-        area = None if area is None else tuple(float(bound) for bound in area)
-        options = (operation, folders, epoch, area, radians, own_axes)
-        super().__init__(source, target, operation, list(folders), epoch, area, radians, own_axes)
+        bounds = None if area is None else tuple(float(bound) for bound in area)
+        options = (operation, folders, epoch, bounds, radians, own_axes)
+        super().__init__(source, target, operation, list(folders), epoch, bounds, radians, own_axes)
         self._settle(source, target, (source, target, options, False))
 
     def _settle(self, source: System, target: System, key: tuple) -> None:

@@ -2,7 +2,7 @@
 
 from __future__ import annotations
 
-from typing import Any, NamedTuple, Union
+from typing import TYPE_CHECKING, Any, NamedTuple, Optional, Union
 
 import numpy as np
 
@@ -34,9 +34,15 @@ class Polygon(NamedTuple):
     area: float
 
 
-class _Lines:
-    def __init__(self, ellipsoid: Union[str, Ellipsoid] = "WGS 84", *, a: float = None,
-                 f: float = None) -> None:
+if TYPE_CHECKING:
+    _Native = _core._Lines
+else:
+    _Native = object
+
+
+class _Lines(_Native):
+    def __init__(self, ellipsoid: Union[str, Ellipsoid] = "WGS 84", *,
+                 a: Optional[float] = None, f: Optional[float] = None) -> None:
         if a is None:
             if not isinstance(ellipsoid, Ellipsoid):
                 ellipsoid = Ellipsoid(ellipsoid)
