@@ -115,6 +115,13 @@ void words_from(std::size_t count, const double* result, TWstatus* words) {
   }
 }
 
+// A call that is not of plain numbers, handed to a method of the Python class.
+auto handed_to(const char* method) {
+  return [method](const py::object& self, const py::args& args, const py::kwargs& kwargs) {
+    return self.attr(method)(*args, **kwargs);
+  };
+}
+
 // What classes with a way there and back share: one point at a time, and the ufuncs.
 template <class Object, class Class>
 void define_calls(Class& type, const char* name) {
@@ -402,10 +409,7 @@ void define_lines(py::module_& m, const char* name) {
           },
           py::arg("lon1").noconvert(), py::arg("lat1").noconvert(), py::arg("lon2").noconvert(),
           py::arg("lat2").noconvert())
-      .def("inverse",
-           [](const py::object& self, const py::args& args, const py::kwargs& kwargs) {
-             return self.attr("_inverse")(*args, **kwargs);
-           })
+      .def("inverse", handed_to("_inverse"))
       .def(
           "direct",
           [](const Lines& lines, double lon, double lat, double azimuth, double length) {

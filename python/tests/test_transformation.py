@@ -51,6 +51,14 @@ def test_agrees_with_pyproj(france, source, target):
     assert np.abs(back[1] - y).max() < tolerance
 
 
+@pytest.mark.parametrize("system", ["EPSG:2154", "utm:31N", "EPSG:3035", "EPSG:3857", "EPSG:4978"])
+@given(lon=st.floats(-5, 9), lat=st.floats(41, 52), height=st.floats(-1000, 9000))
+def test_there_and_back(system, lon, lat, height):
+    t = Transformation("EPSG:4979" if system == "EPSG:4978" else "EPSG:4326", system)
+    back = t.inverse(*t(lon, lat, height))
+    assert back == pytest.approx((lon, lat, height), abs=1e-8)  # a millimetre in degrees
+
+
 def test_with_a_grid(grid_folder, france):
     lon, lat = np.clip(france[0], -3, 7), np.clip(france[1], 43, 50)
     t = Transformation("EPSG:4275", "EPSG:4171", operation="grid:ntf_r93.gsb",

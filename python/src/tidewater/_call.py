@@ -99,6 +99,11 @@ def run(
     return result
 
 
+# Dask names what is on its way by the function, in letters that a scheduler takes apart.
+def _chunk(again: Callable, *inputs: Array, **keywords: Any) -> Any:
+    return again(*inputs, **keywords)
+
+
 def _run_dask(again, ufunc, inputs, errors, threads):
     import dask.array
 
@@ -108,8 +113,7 @@ def _run_dask(again, ufunc, inputs, errors, threads):
     if errors == "words":
         results[-1] = "uint32"
     signature = ",".join(["()"] * len(inputs)) + "->" + ",".join(["()"] * function.nout)
-    # One chunk at a time: workers have threads of their own.
-    piece = functools.partial(again, errors=errors, threads=threads)
+    piece = functools.partial(_chunk, again, errors=errors, threads=threads)
     if function.nout == 1:
         return dask.array.apply_gufunc(piece, signature, *inputs, output_dtypes=results[0])
     return dask.array.apply_gufunc(piece, signature, *inputs, output_dtypes=results)

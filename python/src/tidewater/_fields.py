@@ -193,9 +193,7 @@ class MagneticModel(_core.MagneticModel):
         MagneticField
             Followed by the words with ``errors="words"``, as a plain tuple.
         """
-        result = run(self.field, lambda words: self._ufuncs(False, words), (lon, lat, height),
-                     **keywords)
-        return MagneticField(*result) if len(result) == 7 else result
+        return self._values(self.field, False, lon, lat, height, keywords)
 
     @with_keywords
     def yearly(self, lon: Array, lat: Array, height: Array = 0.0, **keywords: Any) -> Any:
@@ -209,7 +207,11 @@ class MagneticModel(_core.MagneticModel):
             Metres above the ellipsoid.
         %KEYWORDS%
         """
-        result = run(self.yearly, lambda words: self._ufuncs(True, words), (lon, lat, height),
+        return self._values(self.yearly, True, lon, lat, height, keywords)
+
+    def _values(self, again: Any, yearly: bool, lon: Array, lat: Array, height: Array,
+                keywords: dict) -> Any:
+        result = run(again, lambda words: self._ufuncs(yearly, words), (lon, lat, height),
                      **keywords)
         return MagneticField(*result) if len(result) == 7 else result
 
