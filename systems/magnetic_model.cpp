@@ -179,7 +179,7 @@ class MagneticModelImpl {
                    cosines_.rows(), sines_.rows(), cosine_rates_.rows(), sine_rates_.rows(),
                    &status);
     // The library sums from degree 2 on.
-    if (!TW_OK(status) || rate_degree_ < 2) {
+    if (!TW_OK(status) || rate_degree_ < 2 || !std::isfinite(date)) {
       fail("The magnetic model " + info.name + " has no field at " + shown(date) +
            "; it is published for " + shown(info.first_date) + " to " + shown(info.last_date) +
            ".");
