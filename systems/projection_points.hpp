@@ -3,7 +3,9 @@
 
 #include "formulas/equidistant.hpp"
 #include "formulas/geodesic.hpp"
+#include "formulas/mollweide.hpp"
 #include "formulas/transverse_mercator.hpp"
+#include "formulas/van_der_grinten.hpp"
 #include "points/over_points.hpp"
 
 namespace tidewater::detail {
@@ -33,7 +35,7 @@ struct TransverseMercatorInverse {
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
 };
 
-// A map with forward() and inverse() of its own, in metres from its origin.
+// A map with forward() and inverse() of its own, in metres or units of the plane from its origin.
 template <class Map>
 struct MapForward {
   Map map;
@@ -102,6 +104,8 @@ TIDEWATER_MAP(Cassini)
 TIDEWATER_MAP(Polyconic)
 TIDEWATER_MAP(EquidistantConic)
 TIDEWATER_MAP(PolarEquidistant)
+TIDEWATER_MAP(VanDerGrinten)
+TIDEWATER_MAP(Mollweide)
 #undef TIDEWATER_MAP
 TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantForward)
 TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantInverse)

@@ -101,17 +101,20 @@ INSTANTIATE_TEST_SUITE_P(
              109, 0, 120, 8, 1e-6, 1e-6},
         Case{"+proj=stere +lat_0=-90 +lat_ts=-71 +lon_0=0 +ellps=WGS84", -180, -90, 179, -20, 1e-6,
              1e-6},
-        Case{"+proj=moll +lon_0=11 +R=6371000", -168, -90, 190, 90, 1e-6, 1e-6},
+        Case{"+proj=moll +lon_0=11 +R=6371000", -168, -89, 190, 89, 1e-6, 3e-8},
         // Another interpolation of Robinson's table.
         Case{"+proj=robin +lon_0=11 +R=6371000", -168, -90, 190, 90, 4e3, 1e-7},
-        Case{"+proj=moll +lon_0=11 +R=6371000", -168, 89.5, 190, 90, 1e-6, 1e-6},
-        Case{"+proj=moll +lon_0=11 +R=6371000", -168, -90, 190, -89.999, 1e-6, 1e-6},
-        Case{"+proj=robin +lon_0=11 +R=6371000", -168, 84, 190, 90, 4e3, 1e-7},
-        Case{"+proj=vandg +lon_0=11 +R=6371000", -168, 88, 190, 90, 1e-3, 1e-3},
-        Case{"+proj=vandg +lon_0=11 +R=6371000", -168, -1e-3, 190, 1e-3, 1e-3, 1e-3},
+        // At the poles the peer's iteration stops a hundred metres short; the ordinate keeps few of
+        // the latitude's digits there.
+        Case{"+proj=moll +lon_0=11 +R=6371000", -168, 89.5, 190, 90, 150, 3e-5},
+        Case{"+proj=moll +lon_0=11 +R=6371000", -168, -90, 190, -89.999, 150, 1e-3},
+        Case{"+proj=robin +lon_0=11 +R=6371000", -168, 84, 190, 90, 2e4, 1e-7},
+        Case{"+proj=vandg +lon_0=11 +R=6371000", -168, 88, 190, 90, 1e-6, 3e-8},
+        // The peer's formula cancels close to the equator.
+        Case{"+proj=vandg +lon_0=11 +R=6371000", -168, -1e-3, 190, 1e-3, 1, 3e-8},
         Case{"+proj=poly +lat_0=0 +lon_0=0 +ellps=GRS80", -90, -89.9, 90, 89.9, 1e-4, 1e-6},
         Case{"+proj=cass +lat_0=0 +lon_0=0 +ellps=GRS80", -30, -89.9, 30, 89.9, 1e-4, 1e-6},
-        Case{"+proj=vandg +lon_0=11 +R=6371000", -168, -90, 190, 90, 1e-3, 1e-3}));
+        Case{"+proj=vandg +lon_0=11 +R=6371000", -168, -90, 190, 90, 1e-4, 3e-8}));
 
 #endif
 
