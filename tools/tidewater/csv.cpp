@@ -107,8 +107,13 @@ std::string Table::new_name(const std::string& name) const {
 }
 
 std::string Table::all_names() const {
+  constexpr std::size_t kShown = 200;
   std::string text;
   for (const std::string& name : names) text += (text.empty() ? "" : ", ") + name;
+  if (text.size() > kShown) text = text.substr(0, kShown) + "...";
+  for (char& c : text) {
+    if (static_cast<unsigned char>(c) < ' ' || c == 127) c = '?';
+  }
   return text;
 }
 

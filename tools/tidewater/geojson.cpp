@@ -134,7 +134,7 @@ class Converter {
       return true;
     }
     separate();
-    if (key_ == "coordinates" && properties_depth_ == 0) {
+    if (key_ == "coordinates" && properties_depth_ == 0 && geometry_depth_ > 0) {
       in_coordinates_ = true;
       coordinate_depth_ = 1;
     }
@@ -418,6 +418,8 @@ int convert_geojson(const ConvertOptions& given) {
   std::vector<std::string> files = options.files;
   if (files.empty()) files.emplace_back("-");
   Counts counts;
+  // Reading would flush standard output unseen, and a full disk with it.
+  std::cin.tie(nullptr);
   for (const std::string& file : files) {
     const std::string name = file == "-" ? "standard input" : file;
     std::ifstream opened;

@@ -529,7 +529,7 @@ std::unique_ptr<Worker> LineSolving::worker() const { return std::make_unique<Li
 class Areas : public Job {
  public:
   explicit Areas(const Options& options)
-      : options_(options), lines_(options), reader_(Kind::angles, options.in, Heights::never) {}
+      : lines_(options), reader_(Kind::angles, options.in, Heights::never) {}
 
   std::unique_ptr<Worker> worker() const override;
   std::string ending() const override {
@@ -559,7 +559,6 @@ class Areas : public Job {
     lat_.clear();
   }
 
-  const Options& options_;
   Lines lines_;
   PositionReader reader_;
   // One thread alone is at work.

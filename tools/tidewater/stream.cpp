@@ -52,7 +52,7 @@ class Source {
     chunk.first = first_;
     if (buffer.size() < kChunk) buffer.resize(kChunk);
     std::size_t filled = carry_.size();
-    std::memcpy(buffer.data(), carry_.data(), filled);
+    if (filled > 0) std::memcpy(buffer.data(), carry_.data(), filled);
     carry_.clear();
     std::size_t whole = 0;
     while (!ended_) {
