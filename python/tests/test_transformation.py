@@ -1,5 +1,6 @@
 """Transformations: values, the laws of ufuncs, errors."""
 
+import os
 import pickle
 import subprocess
 import sys
@@ -303,7 +304,8 @@ def test_brings_all_it_needs(tmp_path):
             "maps = open('/proc/self/maps').read();"
             "print(all('/tidewater/lib' in path for path in re.findall("
             "r'\\S+lib(?:tidewater|tabdll|tiff)\\S*', maps)))")
-    environment = {"PATH": "/usr/bin", "PYTHONPATH": ":".join(p for p in sys.path if p)}
+    environment = {name: value for name, value in os.environ.items()
+                   if name not in ("TIDEWATER_STORE", "LD_LIBRARY_PATH")}
     done = subprocess.run([sys.executable, "-c", code], cwd=tmp_path, env=environment,
                           capture_output=True, text=True, check=True)
     assert done.stdout.strip() == "True"
