@@ -52,54 +52,19 @@ class Step {
   virtual void run(Block& block, bool inverse) const = 0;
 };
 
-// Runs a chain over an array: load(begin, block) fills block.now, store(begin, block) takes it.
-// Each range of points is one thread's.
-template <class Load, class Chain, class Store>
-Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Chain& chain,
-                   const Store& store) noexcept {
-  const auto range = [&](std::size_t begin, std::size_t end) {
-    CoordinateTriple one[kBlockSize];
-    CoordinateTriple other[kBlockSize];
-    TWstatus words[kBlockSize];
-    std::fill_n(words, kBlockSize, TW_SUCCESS);
-    Summary summary;
-    for (std::size_t at = begin; at < end; at += kBlockSize) {
-      Block block = {static_cast<int>(std::min<std::size_t>(kBlockSize, end - at)), one, other,
-                     words};
-      load(at, block);
-      chain(block);
-      bool odd = block.failed;
-      for (int i = 0; i < block.count; ++i) {
-        odd |= !(std::fabs(block.now[i].x) <= std::numeric_limits<double>::max()) |
-               !(std::fabs(block.now[i].y) <= std::numeric_limits<double>::max());
-      }
-      if (odd) {
-        for (int i = 0; i < block.count; ++i) {
-          const bool good = std::isfinite(block.now[i].x) && std::isfinite(block.now[i].y) &&
-                            words[i] == TW_SUCCESS;
-          if (good) continue;
-          block.fail(i, TW_RANGE_ERROR);
-          if (summary.failed++ == 0) summary.word = words[i];
-        }
-      }
-      store(at, block);
-      if (run.status != nullptr) std::copy_n(words, block.count, run.status + at);
-      if (odd) std::fill_n(words, kBlockSize, TW_SUCCESS);
-    }
-    return summary;
-  };
-
+// Runs range(begin, end) over an array, each range one thread's and of whole blocks.
+template <class Range>
+Summary run_ranges(std::size_t count, const Run& run, std::size_t block,
+                   const Range& range) noexcept {
   std::size_t threads = run.threads == 0 ? std::thread::hardware_concurrency() : run.threads;
-  constexpr std::size_t kWorthAThread = 16 * kBlockSize;
-  threads = std::min(threads, count / kWorthAThread);
+  const std::size_t worth_a_thread = 16 * block;
+  threads = std::min(threads, count / worth_a_thread);
   if (threads <= 1) return range(0, count);
 
   std::vector<Summary> summaries;
   std::vector<std::thread> workers;
-  const std::size_t blocks = (count + kBlockSize - 1) / kBlockSize;
-  const auto border = [&](std::size_t k) {
-    return std::min(count, blocks * k / threads * kBlockSize);
-  };
+  const std::size_t blocks = (count + block - 1) / block;
+  const auto border = [&](std::size_t k) { return std::min(count, blocks * k / threads * block); };
   try {
     summaries.resize(threads);
     workers.reserve(threads - 1);
@@ -121,6 +86,44 @@ Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Ch
     total.failed += part.failed;
   }
   return total;
+}
+
+// Runs a chain over an array: load(begin, block) fills block.now, store(begin, block) takes it.
+template <class Load, class Chain, class Store>
+Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Chain& chain,
+                   const Store& store) noexcept {
+  const auto range = [&](std::size_t begin, std::size_t end) {
+    CoordinateTriple one[kBlockSize];
+    CoordinateTriple other[kBlockSize];
+    TWstatus words[kBlockSize];
+    std::fill_n(words, kBlockSize, TW_SUCCESS);
+    Summary summary;
+    for (std::size_t at = begin; at < end; at += kBlockSize) {
+      Block block = {static_cast<int>(std::min<std::size_t>(kBlockSize, end - at)), one, other,
+                     words};
+      load(at, block);
+      chain(block);
+      bool odd = block.failed;
+      for (int i = 0; i < block.count; ++i) {
+        odd |= !(std::fabs(block.now[i].x) <= std::numeric_limits<double>::max());
+        odd |= !(std::fabs(block.now[i].y) <= std::numeric_limits<double>::max());
+      }
+      if (odd) {
+        for (int i = 0; i < block.count; ++i) {
+          const bool good = std::isfinite(block.now[i].x) && std::isfinite(block.now[i].y) &&
+                            words[i] == TW_SUCCESS;
+          if (good) continue;
+          block.fail(i, TW_RANGE_ERROR);
+          if (summary.failed++ == 0) summary.word = words[i];
+        }
+      }
+      store(at, block);
+      if (run.status != nullptr) std::copy_n(words, block.count, run.status + at);
+      if (odd) std::fill_n(words, kBlockSize, TW_SUCCESS);
+    }
+    return summary;
+  };
+  return run_ranges(count, run, kBlockSize, range);
 }
 
 }  // namespace tidewater::detail

@@ -30,14 +30,15 @@ std::string found(const std::string& name, const std::vector<std::string>& folde
   return "";
 }
 
-// "fr_ign_ntf_r93.tif" was "ntf_r93.gsb" before PROJ's grids became GeoTIFF files.
-std::string older_name(const std::string& name) {
+// "fr_ign_ntf_r93.tif" was "ntf_r93.gsb" before PROJ's grids became GeoTIFF files, and
+// "us_nga_egm96_15.tif" was "egm96_15.gtx".
+std::string older_name(const std::string& name, const char* extension) {
   const auto country = name.find('_');
   const auto agency = name.find('_', country + 1);
   if (country == std::string::npos || agency == std::string::npos || !name.ends_with(".tif")) {
     return "";
   }
-  return name.substr(agency + 1, name.size() - agency - 5) + ".gsb";
+  return name.substr(agency + 1, name.size() - agency - 5) + extension;
 }
 
 // The registry's grid, or PROJ's form of it, which may hold the shifts the other way.
@@ -48,7 +49,7 @@ struct GridFile {
 GridFile grid_of(const OperationRecord& operation, const std::vector<std::string>& folders) {
   for (const GridName& grid : operation.grids) {
     if (auto path = found(grid.name, folders); !path.empty()) return {std::move(path)};
-    for (const std::string& name : {grid.proj_name, older_name(grid.proj_name)}) {
+    for (const std::string& name : {grid.proj_name, older_name(grid.proj_name, ".gsb")}) {
       if (auto path = found(name, folders); !path.empty()) {
         return {std::move(path), grid.proj_reversed};
       }
@@ -108,6 +109,24 @@ std::string shift_grid_file(const OperationRecord& operation,
   return grid_of(operation, folders).path;
 }
 
+// The registry's own files are of many forms, of which the object reads one.
+std::string geoid_grid_file(const OperationRecord& operation,
+                            const std::vector<std::string>& folders) {
+  for (const GridName& grid : operation.grids) {
+    for (const std::string& name :
+         {grid.name, grid.proj_name, older_name(grid.proj_name, ".gtx")}) {
+      if (!name.ends_with(".gtx") && !name.ends_with(".tif")) continue;
+      if (auto path = found(name, folders); !path.empty()) return path;
+    }
+  }
+  return "";
+}
+
+std::vector<std::string> folders_for(const std::string& file,
+                                     const std::vector<std::string>& folders) {
+  return file.find('/') != std::string::npos ? std::vector<std::string>{} : all_folders(folders);
+}
+
 std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& source,
                                                  const Frame& target,
                                                  const std::vector<std::string>& folders) {
@@ -121,9 +140,7 @@ std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& 
 std::unique_ptr<const DatumStep> shift_grid_step(const std::string& file, bool reversed,
                                                  const Frame& source, const Frame& target,
                                                  const std::vector<std::string>& folders) {
-  // A path is taken as it is; a bare name is looked for.
-  const bool path = file.find('/') != std::string::npos;
-  ShiftGrid grid = path ? ShiftGrid(file) : ShiftGrid(file, all_folders(folders));
+  ShiftGrid grid(file, folders_for(file, folders));
   std::string words = (reversed ? "inverse of " : "") + grid.describe() + " " + grid.path();
   return std::make_unique<ShiftGridStep>(std::move(grid), reversed, reversed ? target : source,
                                          reversed ? source : target, std::move(words));

@@ -20,13 +20,6 @@ constexpr int kTranslationRate = 1040, kRotationRate = 1043, kScaleRate = 1046,
 constexpr int kPivot[3] = {8617, 8618, 8667};
 constexpr int kLatitudeOffset = 8601, kLongitudeOffset = 8602, kHeightOffset = 8603;
 
-double value_of(const OperationRecord& operation, int code) {
-  for (const Parameter& parameter : operation.parameters) {
-    if (parameter.code == code) return Registry::shared().base_value(parameter);
-  }
-  return 0;
-}
-
 enum class Family {
   none,
   translation,
@@ -215,6 +208,13 @@ Frame frame_of(const DatumDefinition& datum) {
   const double rf = datum.ellipsoid.inverse_flattening;
   const double f = rf == 0 ? 0 : 1 / rf;
   return {datum.ellipsoid.a, std::sqrt(f * (2 - f)), datum.meridian.longitude};
+}
+
+double value_of(const OperationRecord& operation, int code) {
+  for (const Parameter& parameter : operation.parameters) {
+    if (parameter.code == code) return Registry::shared().base_value(parameter);
+  }
+  return 0;
 }
 
 std::string in_words(const Link& link) {

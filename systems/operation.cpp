@@ -134,6 +134,17 @@ std::vector<Link> expanded(const Link& link) {
   return links;
 }
 
+std::string grid_names(const OperationRecord& operation) {
+  std::string names;
+  for (const GridName& grid : operation.grids) {
+    names += (names.empty() ? "the grid " : ", ") + grid.name;
+    if (!grid.proj_name.empty() && grid.proj_name != grid.name) {
+      names += " (or " + grid.proj_name + ")";
+    }
+  }
+  return names;
+}
+
 std::string hindrance(const OperationRecord& operation, const TransformationOptions& options) {
   if (is_similarity_or_offset(operation.method)) {
     if (depends_on_time(operation.method) && !std::isfinite(options.epoch)) {
@@ -143,14 +154,7 @@ std::string hindrance(const OperationRecord& operation, const TransformationOpti
   }
   if (is_shift_grid(operation.method)) {
     if (!shift_grid_file(operation, options.grid_folders).empty()) return "";
-    std::string names;
-    for (const GridName& grid : operation.grids) {
-      names += (names.empty() ? "the grid " : ", ") + grid.name;
-      if (!grid.proj_name.empty() && grid.proj_name != grid.name) {
-        names += " (or " + grid.proj_name + ")";
-      }
-    }
-    return names;
+    return grid_names(operation);
   }
   return "the method " + Registry::shared().method_name(operation.method);
 }
@@ -328,9 +332,72 @@ std::vector<Way> ways(const Definition& source, const Definition& target,
   const int from = registered_system(source);
   const int to = registered_system(target);
   if (from == 0 || to == 0) return {};
-  const Area wanted = options.area ? *options.area : common(area_of(source), area_of(target));
+  const Area wanted = area_of_both(source, target, options);
   std::vector<Way> list = ways_between(from, to, wanted, options);
   rank(list, wanted);
+  std::erase_if(list, [&](const Way& way) { return !(coverage(wanted, way.area) > 0); });
+  return list;
+}
+
+Area area_of_both(const Definition& source, const Definition& target,
+                  const TransformationOptions& options) {
+  return options.area ? *options.area : common(area_of(source), area_of(target));
+}
+
+int geographic_of(const Link& link) { return link.operation.source; }
+
+std::vector<Way> height_ways(int source, int target, const Definition& own, const Area& wanted,
+                             const TransformationOptions& options) {
+  const Registry& registry = Registry::shared();
+  const int vertical = datum_of(source != 0 ? source : target);
+  const bool both = source != 0 && target != 0;
+  std::vector<Way> list;
+  const auto append = [&](const OperationRecord& operation, bool reversed) {
+    if (operation.replaced_by != 0) return;
+    Way way;
+    way.links = {{operation, reversed}};
+    way.name = (reversed ? "inverse of " : "") + operation.name;
+    way.accuracy = operation.accuracy;
+    way.area = area_of(operation);
+    const int read_in = operation.interpolation;
+    if (is_height_offset(operation.method)) {
+      way.missing = "";
+    } else if (both || !is_geoid_grid(operation.method)) {
+      way.missing = "the method " + registry.method_name(operation.method);
+    } else if (read_in != 0 && datum_of(read_in) != datum_of(operation.source)) {
+      way.missing = "a grid that is read in another datum";
+    } else if (geoid_grid_file(operation, options.grid_folders).empty()) {
+      way.missing = grid_names(operation);
+    }
+    list.push_back(std::move(way));
+  };
+  if (both) {
+    for (const OperationRecord& operation : registry.operations(source, target)) {
+      append(operation, datum_of(operation.source) != vertical);
+    }
+  } else {
+    const auto from_heights = [&](const std::vector<OperationRecord>& operations) {
+      for (const OperationRecord& operation : operations) {
+        if (is_geoid_grid(operation.method)) append(operation, source != 0);
+      }
+    };
+    from_heights(registry.operations(source + target));
+    if (!usable(list, wanted)) {
+      // Newer entries lead to compound systems.
+      for (const int code : registry.systems()) {
+        const auto record = registry.system(code);
+        if (record->kind == SystemKind::compound && datum_of(record->vertical) == vertical) {
+          from_heights(registry.operations(code));
+        }
+      }
+    }
+  }
+  rank(list, wanted);
+  // An operation on the positions' own datum needs no other step.
+  std::stable_partition(list.begin(), list.end(), [&](const Way& way) {
+    return way.missing.empty() && coverage(wanted, way.area) > 0.98 &&
+           datum_of(way.links[0].operation.source) == own.datum.code;
+  });
   std::erase_if(list, [&](const Way& way) { return !(coverage(wanted, way.area) > 0); });
   return list;
 }

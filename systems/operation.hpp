@@ -53,6 +53,9 @@ Frame frame_of(const DatumDefinition& datum);
 // "EPSG:1671 RGF93 to WGS 84 (1)", "inverse of ...".
 std::string in_words(const Link& link);
 
+// A parameter in radians, metres or one; 0 where the operation has none.
+double value_of(const OperationRecord& operation, int code);
+
 // Methods by parameters.
 bool is_similarity_or_offset(int method);
 bool depends_on_time(int method);
@@ -71,6 +74,35 @@ std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& 
 std::unique_ptr<const DatumStep> shift_grid_step(const std::string& file, bool reversed,
                                                  const Frame& source, const Frame& target,
                                                  const std::vector<std::string>& folders);
+
+// Where a grid of the caller's is looked for: a path is taken as it is.
+std::vector<std::string> folders_for(const std::string& file,
+                                     const std::vector<std::string>& folders);
+
+// Methods by grids of undulations, from heights above the ellipsoid to those above the geoid.
+bool is_geoid_grid(int method);
+// The file that serves an operation, empty where there is none in the folders.
+std::string geoid_grid_file(const OperationRecord& operation,
+                            const std::vector<std::string>& folders);
+std::unique_ptr<const DatumStep> geoid_step(const Link& link,
+                                            const std::vector<std::string>& folders);
+// A grid of the caller's.
+std::unique_ptr<const DatumStep> geoid_step(const std::string& file, bool to_geoid,
+                                            const std::vector<std::string>& folders);
+
+// Offsets between two vertical datums; the frame is that of the positions.
+bool is_height_offset(int method);
+std::unique_ptr<const DatumStep> height_offset_step(const Link& link, const Frame& frame);
+
+// The ways by one operation from a source to a target, of which either or both are vertical systems
+// and 0 stands for heights above an ellipsoid: the best first, those that cannot be used last.
+std::vector<Way> height_ways(int source, int target, const Definition& own, const Area& wanted,
+                             const TransformationOptions& options);
+// The geographic system on whose ellipsoid the heights of a link by geoid stand.
+int geographic_of(const Link& link);
+// Where points of both systems lie.
+Area area_of_both(const Definition& source, const Definition& target,
+                  const TransformationOptions& options);
 
 // What carries out one operation; null where it changes nothing.  `flat` takes every position to
 // lie on the ellipsoid.  Throws an Error where it cannot be carried out.

@@ -397,58 +397,61 @@ Summary Projection::factors(std::size_t count, Coordinates<const double> in, Fac
   const auto& ellipsoid = impl_->definition().datum.ellipsoid;
   const double f = ellipsoid.inverse_flattening == 0 ? 0 : 1 / ellipsoid.inverse_flattening;
   const double e2 = f * (2 - f);
-  Summary summary;
-  for (std::size_t begin = 0; begin < count; begin += kFactorsAtOnce) {
-    const int points = static_cast<int>(std::min<std::size_t>(kFactorsAtOnce, count - begin));
-    CoordinateTriple one[detail::kBlockSize];
-    CoordinateTriple other[detail::kBlockSize];
-    TWstatus words[detail::kBlockSize];
-    std::fill_n(words, detail::kBlockSize, TW_SUCCESS);
-    detail::Block block = {points * kNeighbours, one, other, words};
-    double lats[kFactorsAtOnce];
-    for (int p = 0; p < points; ++p) {
-      const auto k = static_cast<std::ptrdiff_t>(begin + static_cast<std::size_t>(p)) * in.stride;
-      const double lon = in.x[k] * kDegree;
-      const double lat = in.y[k] * kDegree;
-      lats[p] = lat;
-      for (int j = 0; j < 3; ++j) {
-        const double step = (j + 1) * kDifferenceStep;
-        CoordinateTriple* at = one + p * kNeighbours + 4 * j;
-        at[0] = {lon + step, lat, 0};
-        at[1] = {lon - step, lat, 0};
-        at[2] = {lon, lat + step, 0};
-        at[3] = {lon, lat - step, 0};
+  const auto range = [&](std::size_t first, std::size_t last) {
+    Summary summary;
+    for (std::size_t begin = first; begin < last; begin += kFactorsAtOnce) {
+      const int points = static_cast<int>(std::min<std::size_t>(kFactorsAtOnce, last - begin));
+      CoordinateTriple one[detail::kBlockSize];
+      CoordinateTriple other[detail::kBlockSize];
+      TWstatus words[detail::kBlockSize];
+      std::fill_n(words, detail::kBlockSize, TW_SUCCESS);
+      detail::Block block = {points * kNeighbours, one, other, words};
+      double lats[kFactorsAtOnce];
+      for (int p = 0; p < points; ++p) {
+        const auto k = static_cast<std::ptrdiff_t>(begin + static_cast<std::size_t>(p)) * in.stride;
+        const double lon = in.x[k] * kDegree;
+        const double lat = in.y[k] * kDegree;
+        lats[p] = lat;
+        for (int j = 0; j < 3; ++j) {
+          const double step = (j + 1) * kDifferenceStep;
+          CoordinateTriple* at = one + p * kNeighbours + 4 * j;
+          at[0] = {lon + step, lat, 0};
+          at[1] = {lon - step, lat, 0};
+          at[2] = {lon, lat + step, 0};
+          at[3] = {lon, lat - step, 0};
+        }
+      }
+      impl_->run(block, false);
+      for (int p = 0; p < points; ++p) {
+        double slope[4] = {};
+        TWstatus word = TW_SUCCESS;
+        for (int j = 0; j < kNeighbours; ++j) {
+          if (words[p * kNeighbours + j] != TW_SUCCESS) word = words[p * kNeighbours + j];
+        }
+        for (int j = 0; j < 3; ++j) {
+          const CoordinateTriple* at = block.now + p * kNeighbours + 4 * j;
+          const double by = kDifference[j] / kDifferenceStep;
+          slope[0] += by * (at[0].x - at[1].x);
+          slope[1] += by * (at[0].y - at[1].y);
+          slope[2] += by * (at[2].x - at[3].x);
+          slope[3] += by * (at[2].y - at[3].y);
+        }
+        Factors result = factors_of(slope, ellipsoid.a, e2, lats[p]);
+        const std::size_t k = begin + static_cast<std::size_t>(p);
+        if (word == TW_SUCCESS && !std::isfinite(result.areal + result.convergence)) {
+          word = TW_RANGE_ERROR;
+        }
+        if (word != TW_SUCCESS) {
+          result = kNone;
+          if (summary.failed++ == 0) summary.word = word;
+        }
+        out[k] = result;
+        if (run.status != nullptr) run.status[k] = word;
       }
     }
-    impl_->run(block, false);
-    for (int p = 0; p < points; ++p) {
-      double slope[4] = {};
-      TWstatus word = TW_SUCCESS;
-      for (int j = 0; j < kNeighbours; ++j) {
-        if (words[p * kNeighbours + j] != TW_SUCCESS) word = words[p * kNeighbours + j];
-      }
-      for (int j = 0; j < 3; ++j) {
-        const CoordinateTriple* at = block.now + p * kNeighbours + 4 * j;
-        const double by = kDifference[j] / kDifferenceStep;
-        slope[0] += by * (at[0].x - at[1].x);
-        slope[1] += by * (at[0].y - at[1].y);
-        slope[2] += by * (at[2].x - at[3].x);
-        slope[3] += by * (at[2].y - at[3].y);
-      }
-      Factors result = factors_of(slope, ellipsoid.a, e2, lats[p]);
-      const std::size_t k = begin + static_cast<std::size_t>(p);
-      if (word == TW_SUCCESS && !std::isfinite(result.areal + result.convergence)) {
-        word = TW_RANGE_ERROR;
-      }
-      if (word != TW_SUCCESS) {
-        result = kNone;
-        if (summary.failed++ == 0) summary.word = word;
-      }
-      out[k] = result;
-      if (run.status != nullptr) run.status[k] = word;
-    }
-  }
-  return summary;
+    return summary;
+  };
+  return detail::run_ranges(count, run, kFactorsAtOnce, range);
 }
 
 Factors Projection::factors(Point point) const noexcept {

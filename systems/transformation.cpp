@@ -16,9 +16,47 @@ namespace {
 
 constexpr double kDegree = kPi / 180;
 
-bool has_height(SystemKind kind) {
-  return kind == SystemKind::geographic3d || kind == SystemKind::geocentric ||
-         kind == SystemKind::compound;
+using Steps = std::vector<std::shared_ptr<const Step>>;
+
+void run_steps(const Steps& steps, Block& block, bool inverse) {
+  if (inverse) {
+    for (auto step = steps.rbegin(); step != steps.rend(); ++step) (*step)->run(block, true);
+  } else {
+    for (const auto& step : steps) step->run(block, false);
+  }
+}
+
+// Steps that move positions and leave heights, which are not above the ellipsoid, as they are.
+class FlatSteps final : public Step {
+ public:
+  explicit FlatSteps(Steps steps) : steps_(std::move(steps)) {}
+  void run(Block& block, bool inverse) const override {
+    double heights[kBlockSize];
+    for (int i = 0; i < block.count; ++i) heights[i] = block.now[i].z;
+    run_steps(steps_, block, inverse);
+    for (int i = 0; i < block.count; ++i) block.now[i].z = heights[i];
+  }
+
+ private:
+  Steps steps_;
+};
+
+bool has_ellipsoidal_height(const Definition& definition) {
+  return definition.kind == SystemKind::geographic3d || definition.kind == SystemKind::geocentric;
+}
+
+bool has_height(const Definition& definition) {
+  return has_ellipsoidal_height(definition) || definition.kind == SystemKind::compound;
+}
+
+// Are the heights of two systems above the same surface?
+bool same_heights(const Definition& one, const Definition& other) {
+  if (one.vertical_code == 0 || other.vertical_code == 0) {
+    return one.vertical_code == other.vertical_code && one.vertical_name == other.vertical_name;
+  }
+  const auto a = Registry::shared().system(one.vertical_code);
+  const auto b = Registry::shared().system(other.vertical_code);
+  return a && b && a->datum == b->datum;
 }
 
 // Geocentric coordinates to longitude from Greenwich, latitude and height, and back.
@@ -85,6 +123,10 @@ struct End {
     if (kind == SystemKind::compound && definition.vertical_unit.factor > 0) {
       sz = definition.vertical_unit.factor;
     }
+    // Inside, heights count upwards.
+    if (kind == SystemKind::compound && definition.axes.size() > 2 && definition.axes[2] == 'D') {
+      sz = -sz;
+    }
   }
 
   template <class T>
@@ -100,7 +142,8 @@ struct End {
       const double py = static_cast<double>(y[i * stride]) * sy;
       block.now[i].x = px;
       block.now[i].y = py;
-      odd |= !(std::fabs(px) <= limit_x) | !(std::fabs(py) <= limit_y);
+      odd |= !(std::fabs(px) <= limit_x);
+      odd |= !(std::fabs(py) <= limit_y);
     }
     if (in.z == nullptr) {
       for (int i = 0; i < block.count; ++i) block.now[i].z = 0;
@@ -162,36 +205,20 @@ class TransformationImpl {
         target_end(to.impl().definition, options) {
     const Definition& one = from.impl().definition;
     const Definition& other = to.impl().definition;
-    check_heights(one, other, options);
-    keeps_heights = !has_height(one.kind) && !has_height(other.kind);
-    flat = keeps_heights;
     area = options.area ? *options.area : Area{};
 
     enter(from, chain, describe);
-    choose(one, other, options);
+    choose_with_heights(one, other, options);
     enter(to, back, leaving);
     close_meridians();
-    // Projections hand heights through by themselves.
-    keeps_heights = keeps_heights && !middle.empty();
   }
 
   void run(Block& block, bool inverse) const {
-    double heights[kBlockSize];
-    if (keeps_heights) {
-      for (int i = 0; i < block.count; ++i) heights[i] = block.now[i].z;
-    }
     const auto& first = inverse ? back : chain;
     const auto& last = inverse ? chain : back;
     for (const auto& step : first) step->run(block, false);
-    if (inverse) {
-      for (auto step = middle.rbegin(); step != middle.rend(); ++step) (*step)->run(block, true);
-    } else {
-      for (const auto& step : middle) step->run(block, false);
-    }
+    run_steps(middle, block, inverse);
     for (auto step = last.rbegin(); step != last.rend(); ++step) (*step)->run(block, true);
-    if (keeps_heights) {
-      for (int i = 0; i < block.count; ++i) block.now[i].z = heights[i];
-    }
   }
 
   template <class From, class To>
@@ -213,26 +240,155 @@ class TransformationImpl {
   Area area;
 
  private:
-  using Steps = std::vector<std::shared_ptr<const Step>>;
+  // Positions from one datum to the other; heights go along or, not above the ellipsoid, stay.
+  void move(const Definition& one, const Definition& other, const TransformationOptions& options,
+            bool on_ellipsoid) {
+    flat = on_ellipsoid;
+    const std::size_t before = middle.size();
+    choose(one, other, options);
+    if (!flat || middle.size() == before) return;
+    const auto first = middle.begin() + static_cast<std::ptrdiff_t>(before);
+    auto steps = std::make_shared<const FlatSteps>(Steps(first, middle.end()));
+    middle.erase(first, middle.end());
+    middle.push_back(std::move(steps));
+  }
 
-  static void check_heights(const Definition& one, const Definition& other,
-                            const TransformationOptions& options) {
-    if (one.kind == SystemKind::vertical || other.kind == SystemKind::vertical) {
-      throw Error("A height alone is no position: give " +
-                  (one.kind == SystemKind::vertical ? one.name : other.name) +
-                  " together with a horizontal system, as in \"EPSG:2154+5720\".");
+  void choose_with_heights(const Definition& one, const Definition& other,
+                           const TransformationOptions& options) {
+    for (const Definition* end : {&one, &other}) {
+      if (end->kind == SystemKind::vertical) {
+        throw Error("A height alone is no position: give " + end->name +
+                    " together with a horizontal system, as in \"EPSG:2154+5720\".");
+      }
     }
-    const bool both = has_height(one.kind) && has_height(other.kind);
-    const bool vertical_changes = both && (one.vertical_code != other.vertical_code ||
-                                           one.vertical_name != other.vertical_name);
-    if (vertical_changes && options.operation != "no shift") {
-      const auto heights = [](const Definition& definition) {
-        return definition.vertical_name.empty() ? std::string("heights above the ellipsoid")
-                                                : definition.vertical_name;
-      };
-      throw Error("There is no operation between " + heights(one) + " and " + heights(other) +
-                  "; \"no shift\" leaves heights as they are.");
+    const bool above_ellipsoid = has_ellipsoidal_height(one) || has_ellipsoidal_height(other);
+    if (!has_height(one) || !has_height(other) || same_heights(one, other) ||
+        trimmed(options.operation) == "no shift") {
+      // Heights of a compound system stay.
+      const bool compound = one.kind == SystemKind::compound || other.kind == SystemKind::compound;
+      move(one, other, options, compound || !above_ellipsoid);
+      return;
     }
+    // What the caller has named, of heights and of positions.
+    TransformationOptions rest = options;
+    rest.operation.clear();
+    std::vector<std::string> named_heights;
+    for (const std::string& word : words_of(trimmed(options.operation))) {
+      if (names_heights(word)) {
+        named_heights.push_back(word);
+      } else {
+        rest.operation += (rest.operation.empty() ? "" : " ") + word;
+      }
+    }
+    const Area wanted = area_of_both(one, other, options);
+    const auto go = [&](const Definition& from, const Definition& to, bool on_ellipsoid) {
+      if (same_datum(from.datum, to.datum)) return;
+      move(from, to, rest, on_ellipsoid);
+      rest.operation.clear();
+    };
+
+    const auto offsets =
+        has_ellipsoidal_height(one) || has_ellipsoidal_height(other)
+            ? std::vector<Way>{}
+            : height_ways(one.vertical_code, other.vertical_code, one, wanted, options);
+    if (const Way* way = picked(offsets, named_heights); way && way->missing.empty()) {
+      go(one, other, true);
+      note(*way);
+      add(height_offset_step(way->links[0], frame_of(other.datum)));
+    } else {
+      // Over heights above the ellipsoid.
+      std::optional<Leg> first;
+      std::optional<Leg> last;
+      if (!has_ellipsoidal_height(one)) first = leg(one, false, wanted, options, named_heights);
+      if (!has_ellipsoidal_height(other)) last = leg(other, true, wanted, options, named_heights);
+      if (first) {
+        go(one, first->geographic, true);
+        note(first->way);
+        add(std::move(first->step));
+      }
+      go(first ? first->geographic : one, last ? last->geographic : other, false);
+      if (last) {
+        note(last->way);
+        add(std::move(last->step));
+        go(last->geographic, other, true);
+      }
+    }
+    if (!rest.operation.empty()) {
+      throw Error("There is no change of datum for \"" + rest.operation + "\" between " + one.name +
+                  " and " + other.name + ".");
+    }
+  }
+
+  // From heights above the ellipsoid of a geographic system to those of a vertical one, or back.
+  struct Leg {
+    Definition geographic;
+    Way way;
+    std::unique_ptr<const DatumStep> step;
+  };
+
+  static bool names_heights(std::string_view word) {
+    if (word.starts_with("geoid:")) return true;
+    const auto code = registry_code(word.starts_with('-') ? word.substr(1) : word);
+    const auto operation_named = code ? Registry::shared().operation(*code) : std::nullopt;
+    return operation_named &&
+           (is_geoid_grid(operation_named->method) || is_height_offset(operation_named->method));
+  }
+
+  // The best way, or the one that the caller has named; null without one.
+  static const Way* picked(const std::vector<Way>& list, const std::vector<std::string>& named) {
+    for (const Way& way : list) {
+      for (const std::string& word : named) {
+        const auto code = registry_code(word.starts_with('-') ? word.substr(1) : word);
+        if (code == way.links[0].operation.code) return &way;
+      }
+      if (named.empty()) return &way;
+    }
+    return nullptr;
+  }
+
+  static Leg leg(const Definition& end, bool to_geoid, const Area& wanted,
+                 const TransformationOptions& options, const std::vector<std::string>& named) {
+    for (const std::string& word : named) {
+      if (!word.starts_with("geoid:")) continue;
+      Way way;
+      way.accuracy = kNotANumber;
+      return {end, way, geoid_step(word.substr(6), to_geoid, options.grid_folders)};
+    }
+    std::vector<Way> list;
+    if (end.vertical_code != 0) {
+      list = height_ways(to_geoid ? 0 : end.vertical_code, to_geoid ? end.vertical_code : 0, end,
+                         wanted, options);
+    }
+    const Way* way = picked(list, named);
+    if (way != nullptr && way->missing.empty()) {
+      return {definition_from_registry(geographic_of(way->links[0])), *way,
+              geoid_step(way->links[0], options.grid_folders)};
+    }
+    std::string sentence = "No way is known between heights above the ellipsoid and " +
+                           (end.vertical_name.empty() ? "those of " + end.name : end.vertical_name);
+    if (way == nullptr && !list.empty()) sentence += " by the operation that was named";
+    if (way != nullptr) {
+      sentence = "The ways between heights above the ellipsoid and " + end.vertical_name +
+                 " need what is not there: ";
+      const std::size_t shown = named.empty() ? std::min<std::size_t>(3, list.size()) : 1;
+      for (std::size_t i = 0; i < shown; ++i) {
+        const Way& lacking = named.empty() ? list[i] : *way;
+        sentence += (i == 0 ? "" : "; ") + lacking.name + " needs " + lacking.missing;
+      }
+    }
+    throw Error(sentence +
+                "; name a grid as \"geoid:file.gtx\", or say \"no shift\" to leave heights and "
+                "positions as they are.");
+  }
+
+  // Tells of an operation on heights.
+  void note(const Way& way) {
+    for (const Link& link : way.links) {
+      if (!operation.empty()) operation += " ";
+      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
+    }
+    accuracy += way.accuracy;
+    if (area.name.empty() && !way.area.name.empty()) area = way.area;
   }
 
   // From a system's coordinates to longitude and latitude from its own prime meridian (from
@@ -289,7 +445,7 @@ class TransformationImpl {
       }
     }
     if (way.links.empty()) datum_words.push_back(way.name);
-    accuracy = way.accuracy;
+    accuracy += way.accuracy;
     if (!way.area.name.empty()) area = way.area;
   }
 
@@ -389,10 +545,7 @@ class TransformationImpl {
 
   void take_named(const OperationRecord& record, bool reversed, const Definition& one,
                   const Definition& other, const TransformationOptions& options) {
-    auto list = operation_ways(record, one, other, reversed, options);
-    const double before = accuracy;
-    take(list, options);
-    accuracy += before;
+    take(operation_ways(record, one, other, reversed, options), options);
   }
 
   static Way operation_ways(const OperationRecord& record, const Definition& one,
@@ -417,11 +570,10 @@ class TransformationImpl {
     return way;
   }
 
-  bool keeps_heights = false;
-  bool flat = false;
-  Steps chain;   // from the source to longitude and latitude from Greenwich
-  Steps middle;  // datum steps
-  Steps back;    // from the target to the same
+  bool flat = false;  // positions are taken to lie on the ellipsoid
+  Steps chain;        // from the source to longitude and latitude from Greenwich
+  Steps middle;       // datum steps
+  Steps back;         // from the target to the same
 
  public:
   std::vector<std::string> datum_words;

@@ -197,4 +197,32 @@ TEST(Methods, RefusalsAreSentences) {
   EXPECT_NE(refused("albers", {{"lat1", 30}, {"lat2", -30}}).find("cone"), std::string::npos);
 }
 
+TEST(Methods, FactorsAreTheSameOnAnyNumberOfThreads) {
+  const auto map = System("2154").projection();
+  constexpr std::size_t kPoints = 5000;
+  std::vector<double> lon(kPoints), lat(kPoints);
+  for (std::size_t i = 0; i < kPoints; ++i) {
+    lon[i] = -4 + 0.002 * static_cast<double>(i);
+    lat[i] = i % 1000 == 999 ? 95 : 42 + 0.0015 * static_cast<double>(i);
+  }
+  const Coordinates<const double> in = {lon.data(), lat.data()};
+  std::vector<Factors> one(kPoints), several(kPoints);
+  std::vector<TWstatus> words(kPoints), words_of_several(kPoints);
+  const Summary alone = map->factors(kPoints, in, one.data(), {words.data(), 1});
+  const Summary together = map->factors(kPoints, in, several.data(), {words_of_several.data(), 3});
+  EXPECT_EQ(alone.failed, 5u);
+  EXPECT_EQ(together.failed, 5u);
+  EXPECT_EQ(together.word, alone.word);
+  EXPECT_EQ(words_of_several, words);
+  for (std::size_t i = 0; i < kPoints; ++i) {
+    ASSERT_EQ(words[i] != TW_SUCCESS, i % 1000 == 999);
+    if (words[i] != TW_SUCCESS) {
+      ASSERT_TRUE(std::isnan(several[i].areal));
+    } else {
+      ASSERT_EQ(several[i].convergence, one[i].convergence);
+      ASSERT_EQ(several[i].areal, one[i].areal);
+    }
+  }
+}
+
 }  // namespace tidewater::test

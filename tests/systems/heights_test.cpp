@@ -1,0 +1,150 @@
+// Transformations between heights: above the ellipsoid, above geoids, between tide gauges.
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <filesystem>
+#include <memory>
+#include <numbers>
+#include <string>
+
+#include "registry.hpp"
+#include "tidewater/transformation.hpp"
+
+#ifdef TIDEWATER_HAVE_PROJ
+#include <proj.h>
+#endif
+
+namespace tidewater::test {
+
+namespace {
+
+constexpr const char* kGeoid = "/usr/share/proj/egm96_15.gtx";
+
+bool has(const std::string& text, const char* part) { return text.find(part) != std::string::npos; }
+
+Transformation between(const char* source, const char* target, const char* operation = "") {
+  TransformationOptions options;
+  options.operation = operation;
+  return Transformation{System(source), System(target), options};
+}
+
+std::string refusal(const char* source, const char* target, const char* operation = "") {
+  try {
+    return "not refused: " + between(source, target, operation).describe();
+  } catch (const Error& error) {
+    return error.what();
+  }
+}
+
+}  // namespace
+
+#ifdef TIDEWATER_HAVE_PROJ
+
+namespace {
+
+struct Free {
+  void operator()(PJ* p) const { proj_destroy(p); }
+  void operator()(PJ_CONTEXT* c) const { proj_context_destroy(c); }
+};
+using Peer = std::unique_ptr<PJ, Free>;
+using Context = std::unique_ptr<PJ_CONTEXT, Free>;
+
+// Points around the Earth, in the source's first system, against PROJ both ways, in millimetres and
+// in degrees of the same size.
+void agree(const char* source, const char* target, double west, double south, double east,
+           double north) {
+  SCOPED_TRACE(std::string(source) + " to " + target);
+  TransformationOptions options;
+  options.own_axes = true;
+  const Transformation ours{System(source), System(target), options};
+  const Context context(proj_context_create());
+  const Peer peer(proj_create_crs_to_crs(context.get(), source, target, nullptr));
+  ASSERT_TRUE(peer);
+  const double near_source = proj_degree_output(peer.get(), PJ_INV) != 0 ? 1e-8 : 1e-3;
+  const double near_target = proj_degree_output(peer.get(), PJ_FWD) != 0 ? 1e-8 : 1e-3;
+  double worst = 0;
+  for (int i = 0; i <= 20; ++i) {
+    for (int j = 0; j <= 20; ++j) {
+      const double x = west + (east - west) * i / 20;
+      const double y = south + (north - south) * j / 20;
+      const double z = 100.0 * i - 300;
+      const Point there = ours.forward({x, y, z});
+      const PJ_COORD expected = proj_trans(peer.get(), PJ_FWD, proj_coord(x, y, z, HUGE_VAL));
+      ASSERT_NEAR(there.x, expected.xyz.x, near_target) << x << " " << y;
+      ASSERT_NEAR(there.y, expected.xyz.y, near_target) << x << " " << y;
+      ASSERT_NEAR(there.z, expected.xyz.z, 1e-3) << x << " " << y;
+      worst = std::max(worst, std::fabs(there.z - expected.xyz.z));
+      const Point back = ours.inverse(there);
+      ASSERT_NEAR(back.x, x, near_source);
+      ASSERT_NEAR(back.y, y, near_source);
+      // Similarities there and back leave the squares of their rotations.
+      ASSERT_NEAR(back.z, z, 1e-4);
+    }
+  }
+  std::printf("%s to %s: heights within %.2g m\n", source, target, worst);
+}
+
+}  // namespace
+
+TEST(Heights, ByGeoidAgreeWithThePeer) {
+  if (!std::filesystem::exists(kGeoid)) GTEST_SKIP() << "PROJ's " << kGeoid << " is not installed";
+  agree("EPSG:4979", "EPSG:4326+5773", -89.9, -180, 89.9, 180);
+  agree("EPSG:4326+5773", "EPSG:4979", -89.9, -180, 89.9, 180);
+  agree("EPSG:32631+5773", "EPSG:4979", 200000, -5e6, 800000, 9e6);
+  agree("EPSG:32631+5773", "EPSG:4978", 200000, 1000, 800000, 9e6);
+  // Another datum on the way, whose heights are above its own ellipsoid.
+  agree("EPSG:4985", "EPSG:4326+5773", -80, -179, 80, 179);
+}
+
+TEST(Heights, ByOffsetsAgreeWithThePeer) {
+  agree("EPSG:4167+4440", "EPSG:4167+5767", -38, 173.5, -35, 175);
+  agree("EPSG:4167+5767", "EPSG:4167+4440", -38, 173.5, -35, 175);
+  // With a slope
+  agree("EPSG:4258+5728", "EPSG:4258+5730", 46, 6, 47.5, 10);
+}
+
+#endif
+
+// Guidance note 7-2 of the registry, example of method 1046: LN02 height 473 m at 47 20 N, 9 40 E
+// is EVRF2000 height 472.69 m.
+TEST(Heights, OffsetAndSlopeOfTheGuidanceNote) {
+  const Transformation map = between("EPSG:4258+5728", "EPSG:4258+5730");
+  const Point there = map.forward({9 + 40.0 / 60, 47 + 20.0 / 60, 473});
+  EXPECT_DOUBLE_EQ(there.x, 9 + 40.0 / 60);
+  EXPECT_NEAR(there.z, 472.69, 0.005);
+  EXPECT_EQ(map.inverse(there).z, 473);
+}
+
+TEST(Heights, ByGridOfTheCallers) {
+  if (!std::filesystem::exists(kGeoid)) GTEST_SKIP() << "PROJ's " << kGeoid << " is not installed";
+  const Point at = {8, 46, 100};
+  const Point chosen = between("EPSG:4979", "EPSG:4326+5773").forward(at);
+  const Point named = between("EPSG:4979", "EPSG:4326+5773", "EPSG:10084").forward(at);
+  EXPECT_EQ(chosen.z, named.z);
+  const Transformation own = between("EPSG:4937", "EPSG:2154+5720", "geoid:egm96_15.gtx");
+  EXPECT_NEAR(own.forward(at).z, chosen.z, 1e-6);
+  EXPECT_TRUE(has(own.describe(), "egm96_15.gtx"));
+  EXPECT_TRUE(std::isnan(own.accuracy()));
+  EXPECT_TRUE(has(refusal("EPSG:4979", "EPSG:4326+5773", "geoid:none.gtx"), "none.gtx"));
+  EXPECT_TRUE(has(refusal("EPSG:4979", "EPSG:4326+5773", "EPSG:4441"), "that was named"));
+}
+
+// Heights that stand above the same surface stay, whatever their unit and sense; positions change
+// datum without them.
+TEST(Heights, UnitsAndDepthsOfOneSurface) {
+  const Point feet = between("EPSG:4269+5703", "EPSG:4269+6360").forward({-100, 40, 120});
+  EXPECT_NEAR(feet.z, 120 * 39.37 / 12, 1e-9);  // US survey feet
+  const Point depth = between("EPSG:4269+5703", "EPSG:4269+6357").forward({-100, 40, 120});
+  EXPECT_NEAR(depth.z, -120, 1e-12);
+  const Transformation map = between("EPSG:27572+5720", "EPSG:2154+5720");
+  EXPECT_EQ(map.forward({600000, 2200000, 77}).z, 77);
+  EXPECT_EQ(map.inverse(map.forward({600000, 2200000, 77})).z, 77);
+}
+
+TEST(Heights, RefusalsNameWhatIsMissing) {
+  EXPECT_TRUE(has(refusal("EPSG:4979", "EPSG:2154+5720"), "needs the grid RAF20.tac"));
+  EXPECT_TRUE(has(refusal("EPSG:5720", "EPSG:4979"), "A height alone is no position"));
+  EXPECT_TRUE(has(between("EPSG:4979", "EPSG:4326+5720", "no shift").describe(), "nothing"));
+}
+
+}  // namespace tidewater::test
