@@ -64,11 +64,24 @@ const area = (ring) =>
     return sum + a[0] * b[1] - b[0] * a[1];
   }, 0);
 
+// A ring whose longitudes go on across the 180th meridian instead of leaping back.
+function unwrapped(ring) {
+  const out = [ring[0]];
+  for (let i = 1; i < ring.length; ++i) {
+    const [lon, lat] = ring[i];
+    const last = out[i - 1];
+    const pole = lat < -89.9 && last[1] < -89.9;
+    out.push([pole ? lon : lon - 360 * Math.round((lon - last[0]) / 360), lat]);
+  }
+  // Around the pole and not back: as it was given.
+  return Math.abs(out.at(-1)[0] - out[0][0]) < 1e-6 ? out : ring;
+}
+
 function cells(rings) {
   const pieces = [];
   for (const ring of rings) {
     const open = ring.slice(0, -1);
-    let [west, east] = [180, -180];
+    let [west, east] = [Infinity, -Infinity];
     for (const p of open) [west, east] = [Math.min(west, p[0]), Math.max(east, p[0])];
     for (let x = Math.floor(west / CELL) * CELL; x < east; x += CELL) {
       const strip = keep(keep(open, 0, 1, x), 0, -1, x + CELL);
@@ -87,7 +100,7 @@ function cells(rings) {
 // Coastlines without the edges that only close a polygon at the 180th meridian and the pole.
 function coasts(rings) {
   const lines = [];
-  const edge = (p) => Math.abs(p[0]) > 179.99 || p[1] < -89.9;
+  const edge = (p) => Math.abs(Math.abs(p[0]) - 180) < 0.01 || p[1] < -89.9;
   for (const ring of rings) {
     let line = [];
     for (let i = 0; i + 1 < ring.length; ++i) {
@@ -98,7 +111,7 @@ function coasts(rings) {
       }
       if (line.length === 0) line.push(ring[i]);
       line.push(ring[i + 1]);
-      if (line.length === 60) {
+      if (line.length === 60 || Math.abs(Math.abs(ring[i + 1][0]) - 180) < 0.01) {
         lines.push(dense(line, false));
         line = [ring[i + 1]];
       }
@@ -117,8 +130,11 @@ function write(path, pieces, lines) {
   let at = 8;
   for (const part of all) at = bytes.writeUInt16LE(part.length, at);
   for (const part of all) {
+    const middle = part.reduce((sum, p) => sum + p[0], 0) / part.length;
+    const turn = 360 * Math.round(middle / 360);
     for (const [x, y] of part) {
-      at = bytes.writeInt16LE(Math.round((x / 180) * 32767), at);
+      const lon = Math.max(-180, Math.min(180, x - turn));
+      at = bytes.writeInt16LE(Math.round((lon / 180) * 32767), at);
       at = bytes.writeInt16LE(Math.round((y / 180) * 32767), at);
     }
   }
@@ -134,7 +150,7 @@ for (const scale of [110, 50]) {
   for (const { geometry } of feature(topology, topology.objects.land).features) {
     const polygons = geometry.type === "Polygon" ? [geometry.coordinates] : geometry.coordinates;
     // Outer rings and holes turn against each other, which the map's filling rule goes by.
-    for (const polygon of polygons) rings.push(...polygon);
+    for (const polygon of polygons) rings.push(...polygon.map(unwrapped));
   }
   write(`${folder}/land-${scale}.bin`, cells(rings), coasts(rings));
 }

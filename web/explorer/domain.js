@@ -16,6 +16,7 @@ const vector = (lon, lat) => {
 const dot = (a, b) => a[0] * b[0] + a[1] * b[1] + a[2] * b[2];
 const cross = (a, b) => [
   a[1] * b[2] - a[2] * b[1], a[2] * b[0] - a[0] * b[2], a[0] * b[1] - a[1] * b[0]];
+const clamped = (x) => Math.max(-1, Math.min(1, x));
 const unit = (v) => {
   const r = Math.hypot(v[0], v[1], v[2]);
   return [v[0] / r, v[1] / r, v[2] / r];
@@ -77,6 +78,12 @@ class Band {
 
   contains(lon, lat) {
     return Math.abs(wrapped(lon - this.lon0)) <= this.reach && lat >= this.south && lat <= this.north;
+  }
+
+  // Whether a point is at least so far from the edges, degrees.
+  inside(lon, lat, margin) {
+    return Math.abs(wrapped(lon - this.lon0)) <= this.reach - margin &&
+      lat >= this.south + margin && lat <= this.north - margin;
   }
 
   border() {
@@ -201,6 +208,11 @@ class Cut {
     return this.planes.every(({ n, d }) => dot(v, n) >= d);
   }
 
+  inside(lon, lat, margin) {
+    const v = vector(lon, lat);
+    return this.planes.every(({ n, d }) => Math.asin(clamped(dot(v, n))) >= Math.asin(d) + margin * RAD);
+  }
+
   border() {
     return this.points;
   }
@@ -270,7 +282,7 @@ function beyond(vectors, { n, d }) {
     const foot = n.map((x) => x * d);
     const [p, q] = [left, to].map((v) => [v[0] - foot[0], v[1] - foot[1], v[2] - foot[2]]);
     const radius = Math.hypot(...p);
-    const angle = Math.acos(Math.max(-1, Math.min(1, dot(p, q) / (radius * Math.hypot(...q)))));
+    const angle = Math.acos(clamped(dot(p, q) / (radius * Math.hypot(...q))));
     const steps = Math.ceil(angle / (4 * RAD));
     for (let i = 1; i < steps; ++i) {
       const m = unit(mix(p, q, i / steps));

@@ -289,7 +289,8 @@ export class MapView {
     const image = new ImageData(columns, rows);
     for (let i = 0; i < count; ++i) {
       const value = of(factors, i);
-      if (!Number.isFinite(value)) continue;
+      // Differences across an edge of the map say nothing.
+      if (!Number.isFinite(value) || !this.domain.inside(lon[i], lat[i], 0.5)) continue;
       const [red, green, blue] = colour(stops, place(value));
       image.data.set([red, green, blue, 205], 4 * i);
     }

@@ -117,7 +117,7 @@ export const PROJECTIONS = [
     use: "A cone whose axis leans, for a region along a curved belt." },
   { id: "bipolar-conic", name: "Bipolar oblique conformal conic", method: "bipolar conic",
     family: "Conic", keeps: "conformal", controls: [], fixed: () => ({}),
-    domain: region(-92, 14, 62),
+    domain: region(-90, 12, 58),
     use: "Both Americas in one conformal map, of two cones that meet in the middle." },
 
   // Azimuthal and perspective.
@@ -130,7 +130,7 @@ export const PROJECTIONS = [
   { id: "azimuthal-equidistant", name: "Azimuthal equidistant", method: "azimuthal equidistant",
     family: "Azimuthal and perspective", keeps: "equidistant", controls: centre(0, 90),
     domain: around(165), use: "Distances and bearings from one place: radio, flights, earthquakes." },
-  { id: "stereographic", name: "Stereographic", method: "stereographic",
+  { id: "stereographic", name: "Stereographic", method: "oblique stereographic",
     family: "Azimuthal and perspective", keeps: "conformal", controls: centre(-30, 40),
     domain: around(89.5), use: "Conformal maps of round regions; circles stay circles." },
   { id: "polar-stereographic", name: "Polar stereographic", method: "polar stereographic (variant b)",
