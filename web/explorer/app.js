@@ -3,7 +3,7 @@
 import { load } from "./package/tidewater.js";
 import { convert } from "./convert.js";
 import { band, cap } from "./domain.js";
-import { DISTORTIONS, MapView, gradient, graticule, indicatrices, readLand } from "./map.js";
+import { DISTORTIONS, MapView, gradient, graticule, readLand } from "./map.js";
 import { FAMILIES, PROJECTIONS, parametersOf } from "./projections.js";
 
 const $ = (id) => document.getElementById(id);
@@ -469,8 +469,8 @@ function showFigures() {
       rows.push([system.found.name, `${y.toFixed(8)}, ${x.toFixed(8)}`]);
     }
     if (factors && Number.isFinite(factors.areal)) {
-      rows.push(["Scale along the meridian", factors.meridional.toFixed(6)],
-        ["Scale along the parallel", factors.parallel.toFixed(6)],
+      rows.push(["Scale, meridian", factors.meridional.toFixed(6)],
+        ["Scale, parallel", factors.parallel.toFixed(6)],
         ["Scale of areas", factors.areal.toFixed(6)],
         ["Angular distortion", `${factors.angular.toFixed(4)}°`],
         ["Convergence", `${factors.convergence.toFixed(5)}°`]);
@@ -520,7 +520,7 @@ function search() {
       if (s.kind === "vertical" || s.kind === "geocentric") continue;
       const button = element("button", { type: "button" },
         element("span", { textContent: s.name }), element("code", { textContent: c }),
-        element("small", { textContent: [s.method, /area(?: of use)?:\s*(.*)/i.exec(s.describe())?.[1]].filter(Boolean).join(" · ") }));
+        element("small", { textContent: [s.method, areaName(s)].filter(Boolean).join(" · ") }));
       button.addEventListener("click", () => pick(c));
       items.push(element("li", {}, button));
     } catch {
@@ -530,6 +530,9 @@ function search() {
   if (items.length === 0) items.push(element("li", {}, element("p", { textContent: "Nothing in the registry has that name." })));
   found.replaceChildren(...items);
 }
+
+// The area's name without its bounds.
+const areaName = (s) => /area(?: of use)?:\s*(.*?)(?: \([-\d][^()]*\))?$/im.exec(s.describe())?.[1];
 
 function pick(code) {
   $("found").hidden = true;
@@ -628,7 +631,7 @@ async function begin() {
   tw = library;
   geodesics = tw.geodesics();
   rhumbs = tw.rhumbLines();
-  const layers = { land: coarse, graticule: graticule(), indicatrices: indicatrices(geodesics) };
+  const layers = { land: coarse, graticule: graticule(15), graticuleFine: graticule(5), geodesics };
   view = new MapView($("map"), layers);
   const { width, height } = $("stage").getBoundingClientRect();
   view.margin = width < 500 ? 12 : 28;

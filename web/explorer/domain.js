@@ -38,6 +38,26 @@ export function cap(lon, lat, radius) {
   return new Cut([{ n: centre, d: Math.cos(radius * RAD) }], capBorder(centre, radius));
 }
 
+// The same without what lies within another radius of a second point.
+export function capWithout(lon, lat, radius, lon2, lat2, radius2) {
+  const centre = vector(lon, lat);
+  const away = vector(lon2, lat2).map((x) => -x);
+  const planes = [
+    { n: centre, d: Math.cos(radius * RAD) }, { n: away, d: -Math.cos(radius2 * RAD) }];
+  // Along every bearing from the centre as far as all planes allow.
+  const rims = Array.from({ length: 200 }, (_, i) => capBorder(centre, (radius * (i + 1)) / 200));
+  const border = rims[0].map((_, bearing) => {
+    let last = [lon, lat];
+    for (const rim of rims) {
+      const v = vector(...rim[bearing]);
+      if (!planes.every(({ n, d }) => dot(v, n) >= d - 1e-12)) break;
+      last = rim[bearing];
+    }
+    return last;
+  });
+  return new Cut(planes, border);
+}
+
 // The belt along a central meridian: `along` degrees to the south and north of the equator, `aside`
 // to the west and east.
 export function across(lon0, along, aside) {

@@ -1,8 +1,10 @@
 // The map: what is drawn, cut by the domain, projected by the library in one call for each layer,
 // and put on a canvas.
 
-const GRATICULE = 15;
-const TISSOT_RADIUS = 400000;
+// Indicatrices of a world's map and of a region's: between centres, degrees; radius, metres.
+const WORLD_CIRCLES = { step: 30, radius: 400000 };
+const REGION_CIRCLES = { step: 5, radius: 90000 };
+const REGION_SIZE = 8e6;
 
 // The coastlines as build.mjs writes them.
 export function readLand(buffer) {
@@ -23,7 +25,7 @@ export function readLand(buffer) {
   return { pieces: parts[0], lines: parts[1] };
 }
 
-export function graticule(step = GRATICULE) {
+export function graticule(step) {
   const lines = [];
   for (let lon = -180; lon < 180; lon += step) {
     const top = lon % 90 === 0 ? 90 : 90 - step;
@@ -39,14 +41,16 @@ export function graticule(step = GRATICULE) {
   return lines;
 }
 
-// Circles on the ground around points of a grid.
-export function indicatrices(geodesics, step = 30) {
+// Circles on the ground around points of a grid, as far as a domain has them.
+function indicatrices(geodesics, { step, radius }, domain) {
   const circles = [];
-  for (let lat = -60; lat <= 60; lat += step) {
+  const last = Math.floor(80 / step) * step;
+  for (let lat = -last; lat <= last; lat += step) {
     for (let lon = -180; lon < 180; lon += step) {
+      if (domain && !domain.contains(lon, lat)) continue;
       const circle = [];
       for (let azimuth = 0; azimuth < 360; azimuth += 7.5) {
-        const end = geodesics.direct(lon, lat, azimuth, TISSOT_RADIUS);
+        const end = geodesics.direct(lon, lat, azimuth, radius);
         circle.push(end.longitude, end.latitude);
       }
       circles.push(circle);
@@ -104,7 +108,7 @@ export class MapView {
   constructor(canvas, layers) {
     this.canvas = canvas;
     this.context = canvas.getContext("2d");
-    this.layers = layers; // land, landFine, graticule, indicatrices
+    this.layers = layers; // land, landFine, graticule, graticuleFine, geodesics
     this.zoom = 1;
     this.panX = 0;
     this.panY = 0;
@@ -202,7 +206,7 @@ export class MapView {
       this.distortion(show.distortion, moving);
     }
     if (show.graticule) {
-      this.path(this.layers.graticule, line, false, (path) => {
+      this.path(this.regional ? this.layers.graticuleFine : this.layers.graticule, line, false, (path) => {
         context.strokeStyle = show.distortion ? style.graticuleOver : style.graticule;
         context.lineWidth = 0.7;
         context.stroke(path);
@@ -214,7 +218,7 @@ export class MapView {
       context.stroke(path);
     });
     if (show.indicatrices) {
-      this.path(this.layers.indicatrices, area, true, (path) => {
+      this.path(this.circles(), area, true, (path) => {
         context.fillStyle = style.indicatrix;
         context.fill(path);
         context.strokeStyle = style.indicatrixEdge;
@@ -236,6 +240,26 @@ export class MapView {
     context.lineWidth = 1.2;
     context.stroke(outline);
     for (const mark of show.marks ?? []) this.mark(mark, style);
+  }
+
+  // Whether the map is of a region, in plane coordinates of metres; degrees are a world's.
+  get regional() {
+    const [x0, y0, x1, y1] = this.box;
+    const size = Math.max(x1 - x0, y1 - y0);
+    return size > 400 && size < REGION_SIZE;
+  }
+
+  circles() {
+    const { layers, domain } = this;
+    if (this.regional) {
+      if (this.circled !== domain) {
+        this.regionCircles = indicatrices(layers.geodesics, REGION_CIRCLES, domain);
+        this.circled = domain;
+      }
+      return this.regionCircles;
+    }
+    this.worldCircles ??= indicatrices(layers.geodesics, WORLD_CIRCLES);
+    return this.worldCircles;
   }
 
   path(parts, cut, closed, paint) {

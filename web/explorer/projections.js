@@ -1,7 +1,7 @@
 // The projections of the explorer: the library's methods, what may be changed about them, and the
 // part of the Earth that each shows.
 
-import { band, cap, across } from "./domain.js";
+import { across, band, cap, capWithout } from "./domain.js";
 
 const lon0 = (value = 0) => ({ key: "lon0", label: "Central meridian", min: -180, max: 180, value });
 const lat0 = (value = 0) => ({ key: "lat0", label: "Latitude of origin", min: -90, max: 90, value });
@@ -54,7 +54,7 @@ export const PROJECTIONS = [
     keeps: "equal area", controls: [lon0()], domain: world,
     use: "Raster grids of satellite data: true areas, and every parallel at its true length." },
   { id: "van-der-grinten", name: "Van der Grinten", method: "van der grinten", family: "World",
-    keeps: "compromise", controls: [lon0()], domain: upTo(89),
+    keeps: "compromise", controls: [lon0()], domain: world,
     use: "The world in a circle, with the look of older political maps." },
   { id: "bonne", name: "Bonne", method: "bonne", family: "World", keeps: "equal area",
     controls: [lon0(), { ...lat0(45), label: "Standard parallel", min: 5, max: 88, parallel: true }],
@@ -117,7 +117,7 @@ export const PROJECTIONS = [
     use: "A cone whose axis leans, for a region along a curved belt." },
   { id: "bipolar-conic", name: "Bipolar oblique conformal conic", method: "bipolar conic",
     family: "Conic", keeps: "conformal", controls: [], fixed: () => ({}),
-    domain: region(-90, 12, 58),
+    domain: () => capWithout(-88, 12, 60, -145, -18, 40),
     use: "Both Americas in one conformal map, of two cones that meet in the middle." },
 
   // Azimuthal and perspective.
