@@ -1,15 +1,19 @@
 #include "harness.hpp"
 
 #include <algorithm>
+#include <chrono>
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
+#include <functional>
 #include <random>
 #include <regex>
+#include <thread>
 
 #include "points/over_points.hpp"
+#include "tidewater/conformal.h"
 #include "tidewater/foundation.h"
 
 #ifdef TIDEWATER_HAVE_PROJ
@@ -221,6 +225,40 @@ void print_head(const std::vector<LevelColumn>& columns, bool markdown) {
   }
 }
 
+// How much more two threads do than one in the same time, each on an array of its own.
+void measure_two_threads() {
+  constexpr int kRuns = 9;
+  constexpr int32_t kCount = 1000000;
+  const auto work = [] {
+    std::vector<CoordinateTriple> in(kCount, {0.1, 0.7, 0}), out = in;
+    return [in, out]() mutable {
+      TWstatus status = 0;
+      for (int pass = 0; pass < 10; ++pass) {
+        TWmerc_f(0.0818191910428158, 0, 0, kCount, in.data(), out.data(), &status);
+      }
+    };
+  };
+  auto first = work(), second = work();
+  const auto wall = [](auto run) {
+    const auto start = std::chrono::steady_clock::now();
+    run();
+    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+  };
+  std::vector<double> ratios;
+  for (int run = 0; run < kRuns; ++run) {
+    const double one = wall(first);
+    const double two = wall([&] {
+      std::thread other(std::ref(second));
+      first();
+      other.join();
+    });
+    ratios.push_back(2 * one / two);
+  }
+  std::printf(
+      "\ntwo threads on arrays of their own do %.2f times the work of one (Mercator forward)\n",
+      median(ratios));
+}
+
 }  // namespace
 
 int32_t points() { return point_count; }
@@ -399,4 +437,5 @@ int main(int argc, char** argv) {
     if (std::regex_search(row.operation, wanted)) measure(row, columns, markdown);
     std::fflush(stdout);
   }
+  if (filter.empty()) measure_two_threads();
 }

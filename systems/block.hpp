@@ -24,11 +24,13 @@ struct Block {
   CoordinateTriple* now;
   CoordinateTriple* spare;
   TWstatus* words;  // of points that have failed, TW_SUCCESS for the others
+  bool failed = false;
 
   void swap() { std::swap(now, spare); }
 
   // The first word of a point stands.
   void fail(int i, TWstatus word) {
+    failed = true;
     if (words[i] == TW_SUCCESS) words[i] = word;
     now[i] = {kNotANumber, kNotANumber, kNotANumber};
   }
@@ -59,19 +61,18 @@ Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Ch
     CoordinateTriple one[kBlockSize];
     CoordinateTriple other[kBlockSize];
     TWstatus words[kBlockSize];
+    std::fill_n(words, kBlockSize, TW_SUCCESS);
     Summary summary;
     for (std::size_t at = begin; at < end; at += kBlockSize) {
       Block block = {static_cast<int>(std::min<std::size_t>(kBlockSize, end - at)), one, other,
                      words};
-      std::fill_n(words, block.count, TW_SUCCESS);
       load(at, block);
       chain(block);
-      bool odd = false;
+      bool odd = block.failed;
       for (int i = 0; i < block.count; ++i) {
         odd |= !(std::fabs(block.now[i].x) <= std::numeric_limits<double>::max()) |
                !(std::fabs(block.now[i].y) <= std::numeric_limits<double>::max());
       }
-      for (int i = 0; i < block.count; ++i) odd |= words[i] != TW_SUCCESS;
       if (odd) {
         for (int i = 0; i < block.count; ++i) {
           const bool good = std::isfinite(block.now[i].x) && std::isfinite(block.now[i].y) &&
@@ -83,6 +84,7 @@ Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Ch
       }
       store(at, block);
       if (run.status != nullptr) std::copy_n(words, block.count, run.status + at);
+      if (odd) std::fill_n(words, kBlockSize, TW_SUCCESS);
     }
     return summary;
   };

@@ -68,7 +68,7 @@ double checked_axis(double a) {
 
 double checked_flattening(double f) {
   if (std::fabs(f) <= Geodesics::kLargestFlattening) return f;
-  throw Error("Lines are served on ellipsoids of flattening -0.02 to 0.02, not " +
+  throw Error("Lines are served on ellipsoids of flattening -0.01 to 0.01, not " +
               std::to_string(f) + ".");
 }
 

@@ -6,8 +6,8 @@
 #include "formulas/equal_earth.hpp"
 #include "formulas/latitudes.hpp"
 #include "makers.hpp"
+#include "projection_points.hpp"
 #include "tidewater/conformal.h"
-#include "tidewater/lines.hpp"
 #include "tidewater/special.h"
 
 namespace tidewater::detail {
@@ -72,13 +72,13 @@ Made polar_equal_area(const MethodArguments& given) {
       plane,
       [=](double lon, double lat) {
         const double rho = 2 * std::sin((kHalfPi - pole * sphere.to_authalic(lat)) / 2);
-        return Pair{rho * std::sin(lon), -pole * rho * std::cos(lon)};
+        return PointAnswer{rho * std::sin(lon), -pole * rho * std::cos(lon)};
       },
       [=](double x, double y) {
         const double rho = std::hypot(x, y);
-        if (!(rho <= 2)) return Pair{0, 0, false};
+        if (!(rho <= 2)) return PointAnswer{0, 0, false};
         const double beta = pole * (kHalfPi - 2 * std::asin(rho / 2));
-        return Pair{rho == 0 ? 0 : std::atan2(x, -pole * y), sphere.to_geodetic(beta)};
+        return PointAnswer{rho == 0 ? 0 : std::atan2(x, -pole * y), sphere.to_geodetic(beta)};
       });
 }
 
@@ -92,34 +92,6 @@ Made bonne(const MethodArguments& given, const Plane& plane) {
       plane, [=](TW_BLOCK) { TWbonne_f(0, lat1, e, e2, c1, r0, count, in, out, status); },
       [=](TW_BLOCK) { TWbonne_i(0, lat1, e, e2, c1, r0, count, in, out, status); });
 }
-
-struct Cassini {
-  double e, c0, c2, c4, c6, c8, m0, d2, d4, d6, d8;
-
-  Cassini(double eccentricity, double lat0) : e(eccentricity) {
-    TWcassini_c(e, 0, lat0, &c0, &c2, &c4, &c6, &c8, &m0, &d2, &d4, &d6, &d8);
-  }
-  void forward(TW_BLOCK) const {
-    TWcassini_f(e, 0, c0, c2, c4, c6, c8, m0, count, in, out, status);
-  }
-  // The inverse series with what they miss put right by the forward ones.
-  void inverse(TW_BLOCK) const {
-    for (int i = 0; i < count; ++i) {
-      const CoordinateTriple wanted = in[i];
-      CoordinateTriple aim = wanted;
-      for (int pass = 0; pass < 8; ++pass) {
-        CoordinateTriple back;
-        TWcassini_i(e, 0, c0, m0, d2, d4, d6, d8, 1, &aim, out + i, status);
-        forward(1, out + i, &back, status);
-        const double dx = wanted.x - back.x;
-        const double dy = wanted.y - back.y;
-        aim.x += dx;
-        aim.y += dy;
-        if (std::fabs(dx) < 1e-15 && std::fabs(dy) < 1e-15) break;
-      }
-    }
-  }
-};
 
 struct Orthographic {
   double e, lat0, x0, y0, z0;
@@ -195,11 +167,11 @@ Made make_cylindrical_equal_area(const MethodArguments& given) {
   return pointwise(
       plane,
       [=](double lon, double lat) {
-        return Pair{lon, std::sin(sphere.to_authalic(lat))};
+        return PointAnswer{lon, std::sin(sphere.to_authalic(lat))};
       },
       [=](double x, double y) {
-        if (!(std::fabs(y) <= 1 + 1e-12)) return Pair{0, 0, false};
-        return Pair{x, sphere.to_geodetic(std::asin(std::clamp(y, -1.0, 1.0)))};
+        if (!(std::fabs(y) <= 1 + 1e-12)) return PointAnswer{0, 0, false};
+        return PointAnswer{x, sphere.to_geodetic(std::asin(std::clamp(y, -1.0, 1.0)))};
       });
 }
 
@@ -210,11 +182,11 @@ Made make_cylindrical_equal_area_spherical(const MethodArguments& given) {
   return pointwise(
       plane,
       [](double lon, double lat) {
-        return Pair{lon, std::sin(lat)};
+        return PointAnswer{lon, std::sin(lat)};
       },
       [](double x, double y) {
-        if (!(std::fabs(y) <= 1 + 1e-12)) return Pair{0, 0, false};
-        return Pair{x, std::asin(std::clamp(y, -1.0, 1.0))};
+        if (!(std::fabs(y) <= 1 + 1e-12)) return PointAnswer{0, 0, false};
+        return PointAnswer{x, std::asin(std::clamp(y, -1.0, 1.0))};
       });
 }
 
@@ -224,13 +196,13 @@ Made make_equal_earth(const MethodArguments& given) {
   return pointwise(
       plane,
       [=](double lon, double lat) {
-        Pair answer{};
+        PointAnswer answer{};
         EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
         answer.plain = true;
         return answer;
       },
       [=](double x, double y) {
-        Pair answer{};
+        PointAnswer answer{};
         answer.plain = EqualEarth::inverse(x, y, &answer.x, &answer.y);
         answer.y = sphere.to_geodetic(answer.y);
         return answer;
@@ -256,35 +228,89 @@ Made make_sinusoidal(const MethodArguments& given) {
       [=](TW_BLOCK) { TWsinusoidal_i(0, 0, e, e2, m0, count, in, out, status); });
 }
 
-Made make_mollweide(const MethodArguments& given) {
-  return formula(
-      natural_plane(given, 1), [](TW_BLOCK) { TWmollweide_f(0, 0, count, in, out, status); },
-      [](TW_BLOCK) { TWmollweide_i(0, 0, count, in, out, status); });
-}
-
 Made make_eckert4(const MethodArguments& given) {
   return formula(
       natural_plane(given, 1), [](TW_BLOCK) { TWeckertIV_f(0, 0, count, in, out, status); },
       [](TW_BLOCK) { TWeckertIV_i(0, 0, count, in, out, status); });
 }
 
-Made make_cassini(const MethodArguments& given) {
-  const Cassini map(given.e, given(kLat0));
+namespace {
+
+// The block functions of a map, and the plane of one that works in metres.
+template <class Map>
+Made map_formula(const Plane& plane, const Map& map) {
+  const MapForward<Map> forward{map};
+  const MapInverse<Map> inverse{map};
   return formula(
-      natural_plane(given, 1), [=](TW_BLOCK) { map.forward(count, in, out, status); },
-      [=](TW_BLOCK) { map.inverse(count, in, out, status); });
+      plane, [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
+      [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
+}
+
+Plane metric_plane(const MethodArguments& given) {
+  return {given(kLon0), 1, 1, given(kX0), given(kY0)};
+}
+
+}  // namespace
+
+template <class Map>
+Next MapForward<Map>::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
+template <class Map>
+Next MapInverse<Map>::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
+// The level sources call these.
+template struct MapForward<Cassini>;
+template struct MapInverse<Cassini>;
+template struct MapForward<Polyconic>;
+template struct MapInverse<Polyconic>;
+template struct MapForward<EquidistantConic>;
+template struct MapInverse<EquidistantConic>;
+template struct MapForward<PolarEquidistant>;
+template struct MapInverse<PolarEquidistant>;
+template struct MapForward<VanDerGrinten>;
+template struct MapInverse<VanDerGrinten>;
+template struct MapForward<Mollweide>;
+template struct MapInverse<Mollweide>;
+
+// The lines that the many do not cover, one by one.
+Next GeodesicEquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                       TWstatus* status) const {
+  const auto arc = lines.any_line(lat0, 0, in.y * kDegreesPerRadian, in.x * kDegreesPerRadian);
+  if (!arc.plain) {
+    *status = TW_BAD_LATITUDE;
+    return Next::point;
+  }
+  out->x = arc.length * arc.azimuth1.sin;
+  out->y = arc.length * arc.azimuth1.cos;
+  return Next::point;
+}
+
+Next GeodesicEquidistantInverse::other(const CoordinateTriple&, CoordinateTriple*,
+                                       TWstatus* status) const {
+  *status = TW_RANGE_ERROR;
+  return Next::point;
+}
+
+Made make_cassini(const MethodArguments& given) {
+  return map_formula(metric_plane(given), Cassini(given.a, given.f, given(kLat0)));
 }
 
 // The northing less its own cube: IOGP Publication 373-7-2, method 9833.
 Made make_hyperbolic_cassini(const MethodArguments& given) {
-  const Cassini map(given.e, given(kLat0));
   const double lat0 = given(kLat0);
-  const double cube =
-      given.a * given.a / (6 * meridional_radius(given, lat0) * transverse_radius(given, lat0));
+  const MapForward<Cassini> forward{Cassini(given.a, given.f, lat0)};
+  const MapInverse<Cassini> inverse{forward.map};
+  const double cube = 1 / (6 * meridional_radius(given, lat0) * transverse_radius(given, lat0));
   return formula(
-      natural_plane(given, 1),
+      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](TW_BLOCK) {
-        map.forward(count, in, out, status);
+        *status = over_points(forward, count, in, out);
         for (int i = 0; i < count; ++i) out[i].y -= cube * out[i].y * out[i].y * out[i].y;
       },
       [=](TW_BLOCK) {
@@ -292,24 +318,19 @@ Made make_hyperbolic_cassini(const MethodArguments& given) {
           double y = in[i].y;
           for (int pass = 0; pass < 30; ++pass) {
             const double next = in[i].y + cube * y * y * y;
-            const bool rest = std::fabs(next - y) < 1e-16;
+            const bool rest = std::fabs(next - y) < 1e-9;
             y = next;
             if (rest) break;
           }
           out[i].x = in[i].x;
           out[i].y = y;
         }
-        map.inverse(count, out, out, status);
+        *status = over_points(inverse, count, out, out);
       });
 }
 
 Made make_polyconic(const MethodArguments& given) {
-  const double e = given.e;
-  double m0;
-  TWpolycon_c(e, given(kLat0), &m0);
-  return formula(
-      natural_plane(given, 1), [=](TW_BLOCK) { TWpolycon_f(e, 0, m0, count, in, out, status); },
-      [=](TW_BLOCK) { TWpolycon_i(e, 0, m0, count, in, out, status); });
+  return map_formula(metric_plane(given), Polyconic(given.a, given.f, given(kLat0)));
 }
 
 // IOGP Publication 373-7-2, method 1028.
@@ -322,11 +343,11 @@ Made make_equidistant_cylindrical(const MethodArguments& given) {
   return pointwise(
       Plane{given(kLon0), parallel, 1, given(kX0), given(kY0) - origin},
       [=](double lon, double lat) {
-        return Pair{lon, arc.arc(lat)};
+        return PointAnswer{lon, arc.arc(lat)};
       },
       [=](double x, double y) {
         const double lat = arc.latitude(y);
-        return Pair{x, hold(lat), within(lat)};
+        return PointAnswer{x, hold(lat), within(lat)};
       });
 }
 
@@ -343,15 +364,9 @@ Made make_equidistant_cylindrical_spherical(const MethodArguments& given) {
 }
 
 Made make_equidistant_conic(const MethodArguments& given) {
-  double n, G, rho0, C0, C2, C4, C6, C8, D2, D4, D6, D8;
-  TWstatus made;
-  TWconic_c(given.e, given(kLatF), given(kLat1), given(kLat2), &n, &G, &rho0, &C0, &C2, &C4, &C6,
-            &C8, &D2, &D4, &D6, &D8, &made);
-  require(std::isfinite(rho0) && n != 0, given, "its standard parallels make no cone");
-  return formula(
-      false_origin_plane(given, 1),
-      [=](TW_BLOCK) { TWconic_f(0, n, G, rho0, C0, C2, C4, C6, C8, count, in, out, status); },
-      [=](TW_BLOCK) { TWconic_i(0, n, G, rho0, C0, D2, D4, D6, D8, count, in, out, status); });
+  const EquidistantConic map(given.a, given.f, given(kLatF), given(kLat1), given(kLat2));
+  require(std::isfinite(map.rho0) && map.n != 0, given, "its standard parallels make no cone");
+  return map_formula(Plane{given(kLonF), 1, 1, given(kXF), given(kYF)}, map);
 }
 
 Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
@@ -365,25 +380,19 @@ Made make_modified_azimuthal_equidistant(const MethodArguments& given) {
       [=](TW_BLOCK) { TWaz_eq_i(e, 0, lat0, n1, count, in, out, status); });
 }
 
-// By the geodesics from the origin: distances and azimuths from it are true everywhere.
 Made make_azimuthal_equidistant(const MethodArguments& given) {
-  const Geodesic lines(given.a, given.f);
-  const double lat0 = given(kLat0) * kDegreesPerRadian;
-  return pointwise(
-      Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
-      [=](double lon, double lat) {
-        const LineCourse course =
-            lines.inverse(0, lat0, lon * kDegreesPerRadian, lat * kDegreesPerRadian);
-        const double azimuth = course.azimuth1 * kRadiansPerDegree;
-        return Pair{course.length * std::sin(azimuth), course.length * std::cos(azimuth),
-                    std::isfinite(course.length)};
-      },
-      [=](double x, double y) {
-        const LineEnd end =
-            lines.direct(0, lat0, std::atan2(x, y) * kDegreesPerRadian, std::hypot(x, y));
-        return Pair{end.lon * kRadiansPerDegree, end.lat * kRadiansPerDegree,
-                    std::isfinite(end.lat)};
-      });
+  const double lat0 = given(kLat0);
+  if (kHalfPi - std::fabs(lat0) < 1e-12) {
+    return map_formula(metric_plane(given),
+                       PolarEquidistant(given.a, given.f, std::copysign(1, lat0)));
+  }
+  require(given.f <= Geodesics::kLargestFlattening, given,
+          "geodesics are served up to a flattening of 0.01");
+  const GeodesicEquidistantForward forward{Geodesics(given.a, given.f), lat0 * kDegreesPerRadian};
+  const GeodesicEquidistantInverse inverse{forward.lines, forward.lat0};
+  return formula(
+      metric_plane(given), [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
+      [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
 }
 
 // IOGP Publication 373-7-2, method 9831.
@@ -401,7 +410,7 @@ Made make_guam(const MethodArguments& given) {
       [=](double lon, double lat) {
         const double s = std::sin(lat);
         const double x = a * lon * std::cos(lat) / std::sqrt(1 - e2 * s * s);
-        return Pair{x, arc.arc(lat) - origin + bend(x, lat)};
+        return PointAnswer{x, arc.arc(lat) - origin + bend(x, lat)};
       },
       [=](double x, double y) {
         double lat = arc.latitude(origin + y);
@@ -412,7 +421,7 @@ Made make_guam(const MethodArguments& given) {
           if (rest) break;
         }
         const double s = std::sin(lat);
-        return Pair{x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat)), lat, within(lat)};
+        return PointAnswer{x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat)), lat, within(lat)};
       });
 }
 
@@ -421,13 +430,13 @@ Made make_colombia_urban(const MethodArguments& given) {
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](double lon, double lat) {
-        Pair answer{};
+        PointAnswer answer{};
         map.forward(lon, lat, &answer.x, &answer.y);
         answer.plain = std::isfinite(answer.y);
         return answer;
       },
       [=](double x, double y) {
-        Pair answer{};
+        PointAnswer answer{};
         map.inverse(x, y, &answer.x, &answer.y);
         answer.plain = within(answer.y) && std::fabs(answer.x) <= kPi;
         return answer;
@@ -444,11 +453,11 @@ Made make_tunisia_mining(const MethodArguments& given) {
   return pointwise(
       Plane{given(kLonF), 1, 1, given(kXF), given(kYF)},
       [=](double lon, double lat) {
-        return Pair{lon / kEast, (lat - lat0) / (lat > lat0 ? kNorth : kSouth)};
+        return PointAnswer{lon / kEast, (lat - lat0) / (lat > lat0 ? kNorth : kSouth)};
       },
       [=](double x, double y) {
         const double lat = lat0 + y * (y > 0 ? kNorth : kSouth);
-        return Pair{x * kEast, lat, within(lat)};
+        return PointAnswer{x * kEast, lat, within(lat)};
       });
 }
 
@@ -471,7 +480,7 @@ Made make_lambert_near_conformal(const MethodArguments& given) {
         const double r = r0 - M;
         const double theta = lon * s0;
         const double x = r * std::sin(theta);
-        return Pair{x, M + x * std::tan(theta / 2)};
+        return PointAnswer{x, M + x * std::tan(theta / 2)};
       },
       [=](double x, double y) {
         const double theta = r0 < 0 ? std::atan2(-x, -(r0 - y)) : std::atan2(x, r0 - y);
@@ -484,7 +493,7 @@ Made make_lambert_near_conformal(const MethodArguments& given) {
           if (std::fabs(step) < 1e-10) break;
         }
         const double lat = arc.latitude(origin + m);
-        return Pair{theta / s0, lat, within(lat)};
+        return PointAnswer{theta / s0, lat, within(lat)};
       });
 }
 
@@ -514,10 +523,12 @@ Made make_miller(const MethodArguments& given) {
       [](TW_BLOCK) { TWmiller_cyl_i(in, count, 0, 0, out, status); });
 }
 
+Made make_mollweide(const MethodArguments& given) {
+  return map_formula(natural_plane(given, 1), Mollweide());
+}
+
 Made make_van_der_grinten(const MethodArguments& given) {
-  return formula(
-      natural_plane(given, 1), [](TW_BLOCK) { TWvdg_f(0, 0, count, in, out, status); },
-      [](TW_BLOCK) { TWvdg_i(0, 0, count, in, out, status); });
+  return map_formula(natural_plane(given, 1), VanDerGrinten());
 }
 
 Made make_gnomonic(const MethodArguments& given) {
@@ -589,13 +600,13 @@ Made perspective(const MethodArguments& given, double tilt_a, double tilt_b, dou
       plane,
       [=](double lon, double lat) {
         CoordinateTriple point = {lon, lat, 0};
-        if (!map.seen(lon, lat) || !run(false, &point)) return Pair{0, 0, false};
-        return Pair{point.x, point.y};
+        if (!map.seen(lon, lat) || !run(false, &point)) return PointAnswer{0, 0, false};
+        return PointAnswer{point.x, point.y};
       },
       [=](double x, double y) {
         CoordinateTriple point = {x, y, 0};
-        if (!run(true, &point) || !map.seen(point.x, point.y)) return Pair{0, 0, false};
-        return Pair{point.x, point.y};
+        if (!run(true, &point) || !map.seen(point.x, point.y)) return PointAnswer{0, 0, false};
+        return PointAnswer{point.x, point.y};
       });
 }
 

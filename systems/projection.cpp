@@ -162,11 +162,10 @@ void ProjectionImpl::inverse(Block& block) const {
   const Plane& plane = formula_->plane;
   const double by_x = 1 / plane.sx;
   const double by_y = 1 / plane.sy;
-  bool odd = false;
+  bool odd = block.failed;
   for (int i = 0; i < block.count; ++i) {
     block.now[i].x = (block.now[i].x - plane.x0) * by_x;
     block.now[i].y = (block.now[i].y - plane.y0) * by_y;
-    odd |= block.words[i] != TW_SUCCESS;
   }
   if (odd || formula_->inverse(block.count, block.now, block.spare) != TW_SUCCESS) {
     one_by_one(block, true);
@@ -214,6 +213,7 @@ void ProjectionImpl::one_by_one(Block& block, bool inverse_way) const {
       }
     }
     block.words[i] = word;
+    block.failed = true;
     out = {kNotANumber, kNotANumber, kNotANumber};
   }
 }

@@ -171,6 +171,8 @@ class TransformationImpl {
     choose(one, other, options);
     enter(to, back, leaving);
     close_meridians();
+    // Projections hand heights through by themselves.
+    keeps_heights = keeps_heights && !middle.empty();
   }
 
   void run(Block& block, bool inverse) const {

@@ -79,10 +79,10 @@ struct LineCourses {
  * Geodesics: the shortest lines.
  *
  * After C. F. F. Karney, Algorithms for geodesics, Journal of Geodesy 87 (2013), 43-55.  On the
- * earth's ellipsoids, measured against lines worked out at 40 digits: lengths within 4 nm, ends
- * within 6 nm for lines of up to half the earth's circumference, nearly antipodal points, poles,
- * meridians and the equator included; areas within 0.2 square metres below a line, 2 where its ends
- * are nearly antipodal.
+ * earth's ellipsoids, measured against lines worked out at 40 digits: lengths and ends within 8 nm
+ * for lines between any two points, nearly antipodal ones, poles, meridians and the equator
+ * included (to a flattening of 0.01: 15 nm); areas below a line within 0.2 square metres, or as far
+ * as the azimuths carry where the ends are nearly antipodal.
  *
  * Latitudes beyond 90 degrees and numbers that are not finite give not-a-numbers, counted as
  * failed.
@@ -91,7 +91,7 @@ class TW_SYSTEMS_API Geodesic {
  public:
   /**
    * @param a  semi-major axis, above zero
-   * @param f  flattening, from -0.02 to 0.02; 0 for a sphere
+   * @param f  flattening, from -0.01 to 0.01; 0 for a sphere
    * @throws Error for other figures
    */
   Geodesic(double a, double f);

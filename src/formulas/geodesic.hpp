@@ -28,7 +28,7 @@ struct GeodesicArc {
 };
 
 struct Geodesics {
-  static constexpr double kLargestFlattening = 0.02;
+  static constexpr double kLargestFlattening = 0.01;
   static constexpr double kTiny = 1.4916681462400413e-154;  // its square is normal
 
   double a, f, b, f1, e2, ep2, authalic2;
@@ -402,7 +402,7 @@ struct Geodesics {
     const auto first = spherical_start(beta1, beta2, given.lambda12);
     const V sine = plain_hypot(first.sin, first.cos);
     const V cosine = beta1.sin * beta2.sin + beta1.cos * beta2.cos * given.lambda12.cos;
-    Mask<V> plain = (given.lambda12.sin > 1e-9) & (beta1.cos > 1e-9) & (beta1.sin < -1e-6) &
+    Mask<V> plain = (given.lambda12.sin > 1e-9) & (beta1.cos > 1e-9) & (beta1.sin < -1e-3) &
                     (sine > 1e-7) & ((cosine > -0.99) | (sine > 0.1));
     const V harmless = select(plain, sine, 1.0);
     const V distance = atan2(harmless, select(plain, cosine, 0.0));

@@ -3,6 +3,7 @@
 // pp. 118-120.
 #pragma once
 
+#include "formulas/complex.hpp"
 #include "formulas/constants.hpp"
 #include "points/elementary.hpp"
 
@@ -49,12 +50,6 @@ TW_INLINE V cosine_series(const C (&c)[N], SinCos<V> x) {
   }
   return sum * x.cos - next;
 }
-
-// A complex number of several points.
-template <Number V>
-struct ComplexOf {
-  V re, im;
-};
 
 template <Number V>
 struct ComplexSums {

@@ -1,22 +1,14 @@
-// A local rectangular frame on a point of the ellipsoid.
+// A local rectangular frame on a point of the ellipsoid: its constants and the exported functions.
+
+#include "foundation/local_space_points.hpp"
 
 #include <cmath>
 
-#include "formulas/constants.hpp"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::detail;
 
 namespace {
-
-// Geocentric position in units of the semi-major axis.
-CoordinateTriple normalised_xyz(double e2, double lon, double lat, double h) {
-  const double sin_lat = std::sin(lat);
-  const double cos_lat = std::cos(lat);
-  const double nu = 1 / std::sqrt(1 - e2 * square(sin_lat));
-  return {(nu + h) * cos_lat * std::cos(lon), (nu + h) * cos_lat * std::sin(lon),
-          ((1 - e2) * nu + h) * sin_lat};
-}
 
 // Lengths and azimuth components below this count as zero.
 constexpr double kTiny = 1e-15;
@@ -28,7 +20,7 @@ void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double 
              double lat2, double h2, double* matrix, TWstatus* status) {
   *status = TW_SUCCESS;
   const double e2 = e * e;
-  const CoordinateTriple origin = normalised_xyz(e2, lon0, lat0, h0 / a);
+  const auto origin = geocentric_position(1.0, e2, lon0, lat0, h0 / a);
   *x0 = origin.x;
   *y0 = origin.y;
   *z0 = origin.z;
@@ -51,8 +43,8 @@ void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double 
     m[5] = s * cos_lat;
     return;
   }
-  const CoordinateTriple from = normalised_xyz(e2, lon1, lat1, h1 / a);
-  const CoordinateTriple to = normalised_xyz(e2, lon2, lat2, h2 / a);
+  const auto from = geocentric_position(1.0, e2, lon1, lat1, h1 / a);
+  const auto to = geocentric_position(1.0, e2, lon2, lat2, h2 / a);
   const double dx = to.x - from.x;
   const double dy = to.y - from.y;
   const double dz = to.z - from.z;
@@ -78,34 +70,6 @@ void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double 
   }
 }
 
-void TWlsr_f(double a, double e, double x0, double y0, double z0, const double* matrix,
-             int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const double e2 = e * e;
-  const double* m = matrix;
-  for (int32_t i = 0; i < count; ++i) {
-    const auto [lon, lat, height] = in[i];
-    const auto [x, y, z] = normalised_xyz(e2, lon, lat, height / a);
-    const double dx = x - x0;
-    const double dy = y - y0;
-    const double dz = z - z0;
-    out[i] = {m[0] * dx + m[1] * dy + m[2] * dz, m[3] * dx + m[4] * dy + m[5] * dz,
-              m[6] * dx + m[7] * dy + m[8] * dz};
-  }
-}
-
-void TWlsr_i(double a, double e, double x0, double y0, double z0, const double* matrix,
-             int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const double* m = matrix;
-  for (int32_t i = 0; i < count; ++i) {
-    const auto [x, y, z] = in[i];
-    out[i] = {a * (x0 + m[0] * x + m[3] * y + m[6] * z), a * (y0 + m[1] * x + m[4] * y + m[7] * z),
-              a * (z0 + m[2] * x + m[5] * y + m[8] * z)};
-  }
-  TWxyz_to_llh(a, e, count, out, out, status);
-}
-
 namespace {
 
 // The frame with x east, y north, z up.
@@ -117,26 +81,39 @@ struct EastNorthUp {
     double azimuth = kHalfPi;
     TWlsr_c(1, a, e, lon0, lat0, h0, &azimuth, &x0, &y0, &z0, 0, 0, 0, 0, 0, 0, matrix, status);
   }
+
+  LocalFrame frame() const { return {x0, y0, z0, matrix}; }
 };
 
 }  // namespace
 
+void TWlsr_f(double a, double e, double x0, double y0, double z0, const double* matrix,
+             int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+  *status = over_points(GeodeticToLocal{e * e, 1 / a, {x0, y0, z0, matrix}, 1}, count, in, out);
+}
+
+Next LocalToGeodetic::other(const CoordinateTriple& in, CoordinateTriple* out,
+                            TWstatus* status) const {
+  const auto at = position(in.x, in.y, in.z);
+  return geocentric.other({at.x, at.y, at.z}, out, status);
+}
+
+void TWlsr_i(double a, double e, double x0, double y0, double z0, const double* matrix,
+             int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+  *status = over_points(LocalToGeodetic{a, {x0, y0, z0, matrix}, {GeodeticPosition(a, e)}}, count,
+                        in, out);
+}
+
 void TWllh_to_lsr(double a, double e, double scale, double lon0, double lat0, double h0,
                   int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                   TWstatus* status) {
-  const EastNorthUp frame(a, e, lon0, lat0, h0, status);
-  TWlsr_f(a, e, frame.x0, frame.y0, frame.z0, frame.matrix, count, in, out, status);
-  const double unit = a * scale;
-  for (int32_t i = 0; i < count; ++i) {
-    out[i].x *= unit;
-    out[i].y *= unit;
-    out[i].z *= unit;
-  }
+  const EastNorthUp local(a, e, lon0, lat0, h0, status);
+  *status = over_points(GeodeticToLocal{e * e, 1 / a, local.frame(), a * scale}, count, in, out);
 }
 
 void TWlsr_to_llh(double a, double e, double scale, double lon0, double lat0, double h0,
                   int32_t count, CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  const EastNorthUp frame(a, e, lon0, lat0, h0, status);
+  const EastNorthUp local(a, e, lon0, lat0, h0, status);
   const double unit = a * scale;
   // By contract: the caller's input array is normalised in place and stays so.
   for (int32_t i = 0; i < count; ++i) {
@@ -144,5 +121,6 @@ void TWlsr_to_llh(double a, double e, double scale, double lon0, double lat0, do
     in[i].y /= unit;
     in[i].z /= unit;
   }
-  TWlsr_i(a, e, frame.x0, frame.y0, frame.z0, frame.matrix, count, in, out, status);
+  *status =
+      over_points(LocalToGeodetic{a, local.frame(), {GeodeticPosition(a, e)}}, count, in, out);
 }

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "formulas/constants.hpp"
+#include "foundation/plane_points.hpp"
 #include "formulas/interpolation.hpp"
 #include "tidewater/foundation.h"
 
@@ -10,24 +10,12 @@ using namespace tidewater::detail;
 
 void TWab_to_en(double s1, double s2, double false_easting, double false_northing, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    out[i].x = x * s2 * s1 + false_easting;
-    out[i].y = y * s2 * s1 + false_northing;
-  }
+  *status = over_points(UnitsToGrid{s1, s2, false_easting, false_northing}, count, in, out);
 }
 
 void TWen_to_ab(double s1, double s2, double false_easting, double false_northing, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    out[i].x = (x - false_easting) / s1 / s2;
-    out[i].y = (y - false_northing) / s1 / s2;
-  }
+  *status = over_points(GridToUnits{s1, s2, false_easting, false_northing}, count, in, out);
 }
 
 void TWpt_line_dist(const CoordinateTriple* points, int32_t count, double* distance,

@@ -276,6 +276,15 @@ TW_INLINE void mend(LanesMask<N> m, Lanes<N>& result, F f) {
   }
 }
 
+// The doubles that stand at whole offsets from one place.
+TW_INLINE double gather(const double* from, int64_t offset) { return from[offset]; }
+template <int N>
+TW_INLINE Lanes<N> gather(const double* from, LanesBits<N> offset) {
+  typename Lanes<N>::Vector r{};
+  for (int i = 0; i < N; ++i) r[i] = from[offset.v[i]];
+  return r;
+}
+
 // --- Two registers -----------------------------------------------------------------------------
 
 template <class T>
@@ -368,6 +377,10 @@ TW_INLINE Pair<T> copysign(Pair<T> p, Pair<T> sign) {
 template <class T>
 TW_INLINE Pair<T> sqrt(Pair<T> p) {
   return Pair<T>(sqrt(p.a), sqrt(p.b));
+}
+template <class B>
+TW_INLINE auto gather(const double* from, Pair<B> offset) {
+  return Pair(gather(from, offset.a), gather(from, offset.b));
 }
 template <class T>
 TW_INLINE auto lane(Pair<T> p, int i) {

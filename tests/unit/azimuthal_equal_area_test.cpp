@@ -453,4 +453,34 @@ TEST(AzimuthalEqualArea, AgreesWithProj) {
 #endif
 }
 
+TEST(AzimuthalEqualArea, TakesTheQpThatItIsGiven) {
+  // The latitude is the one whose q is what the geometry gives with that qp, by bisection here.
+  const auto [a, e] = Ellipsoid::grs80();
+  const double e2 = e * e;
+  const auto q_of = [&](double lat) {
+    const double s = std::sin(lat);
+    return (s / (1 - e2 * s * s) - std::log((1 - e * s) / (1 + e * s)) / (2 * e)) * (1 - e2);
+  };
+  const auto latitude = [&](double q) {
+    double low = -kPi / 2, high = kPi / 2;
+    for (int i = 0; i < 200; ++i) (q_of((low + high) / 2) < q ? low : high) = (low + high) / 2;
+    return low;
+  };
+  for (const double factor : {0.9, 0.97, 1 - 1e-10, 1.002}) {
+    EqualArea oblique(e, 0, 0.6);
+    oblique.qp *= factor;
+    for (const double y : {-0.7, 0.2, 0.6}) {
+      const double rho = std::fabs(oblique.D * y);
+      const double ce = 2 * std::asin(rho / (2 * oblique.rq));
+      const double q =
+          (oblique.D * std::sin(ce) * oblique.cos_b1 * y / rho + std::cos(ce) * oblique.sin_b1) *
+          oblique.qp;
+      EXPECT_NEAR(oblique.inverse({0, y, 0}).y, latitude(q), 2e-13);
+    }
+    EqualArea north(e, 0, kPi / 2);
+    north.qp *= factor;
+    EXPECT_NEAR(north.inverse({0.3, 0.8, 0}).y, latitude(north.qp - 0.73), 2e-13);
+  }
+}
+
 }  // namespace

@@ -242,7 +242,7 @@ void add_line(CLI::App& app, int& exit_status) {
       "--direct it begins with a position, an azimuth and a distance in metres; written are the "
       "end and the azimuth back.  The rest of it is passed through, as are blank lines and lines "
       "that begin with #.  A line that cannot be solved is written with * in place of the figures "
-      "and told on standard error; so are nearly antipodal points, whose geodesic is not found.");
+      "and told on standard error.");
   command->add_option("files", options->files, "files to read; - or none: standard input");
   add_angle_options(*command, options->in, "", "Input");
   command

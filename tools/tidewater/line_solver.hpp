@@ -1,11 +1,11 @@
-// Geodesic and rhumb lines as the line command solves them: the library's problems, with the cases
-// that they leave to the caller.
+// Geodesic and rhumb lines as the line command solves them: in radians, with its own refusals.
 #pragma once
 
 #include <cstdint>
 
 #include "ellipsoid.hpp"
 #include "tidewater/frame.h"
+#include "tidewater/lines.hpp"
 
 namespace tidewater::command {
 
@@ -29,10 +29,10 @@ struct Refusal {
 
 class LineSolver {
  public:
+  // Throws tidewater::Error for an ellipsoid whose lines are not served.
   LineSolver(const Ellipsoid& ellipsoid, bool rhumb);
 
-  // From start and end, the short way round.  The library's inverse problem gives a false distance
-  // where it finds no solution; such a line is refused with TW_NOT_CONVERGED.
+  // From start and end, the short way round.
   Refusal inverse(SolvedLine& line) const;
 
   // From start, azimuth and distance, of which a negative one goes the other way.
@@ -45,37 +45,10 @@ class LineSolver {
   CoordinateTriple point(const SolvedLine& line, double distance) const;
 
  private:
-  // End and back azimuth of the line from start.
-  struct Reached {
-    CoordinateTriple end = {};
-    double back_azimuth = 0;
-  };
-  Reached along_geodesic(CoordinateTriple start, double azimuth, double distance) const;
-  Reached along_short(const CoordinateTriple& start, double azimuth, double distance) const;
-  Reached along_meridian(CoordinateTriple start, bool north, double distance) const;
-  Reached along_rhumb(const CoordinateTriple& start, double azimuth, double distance) const;
-  Reached along(const CoordinateTriple& start, double azimuth, double distance) const;
+  LineEnd reached(const CoordinateTriple& start, double azimuth, double distance) const;
 
-  struct Offset {
-    double north = 0;
-    double east = 0;
-  };
-  Offset offset(const SolvedLine& line, const Reached& reached) const;
-  double misclosure(const SolvedLine& line) const;
-  double loss_at_start(const CoordinateTriple& start, double azimuth) const;
-  bool is_short(const CoordinateTriple& start, double distance) const;
-
-  void improve(SolvedLine& line) const;
-  // False, with line as it was, where the line is not short.
-  bool solve_short(SolvedLine& line) const;
-  void solve_geodesic(SolvedLine& line) const;
-  void solve_rhumb(SolvedLine& line) const;
-  double arc(double lat) const;
-  double parallel_radius(double lat) const;
-
-  double a_;
-  double e_;
-  double f_;
+  Geodesic geodesic_;
+  Rhumb rhumb_line_;
   bool rhumb_;
   double quarter_;  // meridian arc from the equator to a pole
 };

@@ -1,13 +1,15 @@
-// Lambert azimuthal equal-area projection of the sphere and the ellipsoid.
+// Lambert azimuthal equal-area projection: what the contract says of the points that the formulas
+// do not cover, and the exported functions.
+
+#include "projections/conformal/azimuthal_equal_area_points.hpp"
 
 #include <cmath>
 
-#include "formulas/radii.hpp"
-#include "formulas/wraps.hpp"
-#include "projections/isometric_latitude.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
+
+namespace tidewater::detail {
 
 namespace {
 
@@ -18,16 +20,14 @@ constexpr double kTightLimit = 1.000000000001;
 // By contract: looser in the inverse on the ellipsoid.
 constexpr double kLooseLimit = 1.0005;
 
-// Where 1 and the cosine of the distance from the origin sum to less than this, nearly all their
-// digits cancel.
-constexpr double kNearAntipode = 1e-6;
-
 bool is_polar(double lat0) { return std::fabs(std::fabs(lat0) - kHalfPi) < kAspectMargin; }
+bool is_equatorial(double lat0) { return std::fabs(lat0) < kAspectMargin; }
+double side_of(double lat0) { return lat0 >= 0 ? 1 : -1; }
 
 // q(p) = (1 - e^2) (sin p / (1 - e^2 sin^2 p) - ln((1 - e sin p) / (1 + e sin p)) / 2e)
-// (Snyder 1987, eq. 3-12).  By contract: in this plain form, to the bit, and not by authalic_q.
-// Callers hold its value at the pole, which may have been worked out elsewhere, and near the pole
-// one more or less in its last digit decides whether a point is held.
+// (Snyder 1987, eq. 3-12).  By contract: in this plain form near a pole, and not by authalic_q.
+// Callers hold its value at the pole, which may have been worked out elsewhere, and one more or
+// less in its last digit decides whether a point is held.
 double q_of(double e, double e2, double s) {
   return (s / (1 - e2 * s * s) - std::log((1 - e * s) / (1 + e * s)) / (2 * e)) * (1 - e2);
 }
@@ -47,7 +47,7 @@ bool hold_sine(double limit, double& u, TWstatus* status) {
 
 // Moves a point off the antipode of the origin, where the projection has no value.
 void leave_antipode(bool polar, double lat0, double& lat, double& d) {
-  constexpr double kStep = 1e-7;
+  constexpr double kStep = kAntipodeStep;
   if (!(std::fabs(lat + lat0) < kStep)) return;
   if (polar) {
     lat += lat <= 0 ? kStep : -kStep;
@@ -57,84 +57,178 @@ void leave_antipode(bool polar, double lat0, double& lat, double& d) {
   }
 }
 
-// From q back to the geodetic latitude, by Newton's rule (Snyder 1987, eq. 3-16).
-class LatitudeOfQ {
- public:
-  LatitudeOfQ(double e, double e2, double qp)
-      : e_(e), e2_(e2), qp_(qp), series_(std::fabs(e) <= kSeriesEccentricity) {
-    const double e4 = e2 * e2;
-    const double e6 = e4 * e2;
-    p2_ = e2 / 3 + 31 * e4 / 180 + 517 * e6 / 5040;
-    p4_ = 23 * e4 / 360 + 251 * e6 / 3780;
-    p6_ = 761 * e6 / 45360;
-  }
+// Whether qp is that of e, to a few units in the last place.
+bool is_q_of_pole(double e, double e2, double qp) {
+  return std::fabs(qp - q_of(e, e2, 1)) <= 8 * 0x1p-52;
+}
 
-  // u is half of q, held at 1.  False when the passes were used up.
-  bool find(double q, double u, double& lat) const {
-    constexpr int kMostPasses = 50;
-    double tolerance = 1e-13;
-    lat = std::asin(u);
-    if (series_) {
-      const double sin_beta = q / qp_;
-      // Beyond the pole by more than rounding there is no root, and the passes would be used up.
-      if (std::fabs(sin_beta) > kTightLimit) return false;
-      if (std::fabs(sin_beta) >= 1) {
-        lat = std::copysign(kHalfPi, sin_beta);
-        return true;
+// (q - q(lat)) w^2 / (2 (1 - e^2) cos lat), Newton's step from lat.  Near a pole both q are taken
+// off that of the pole where qp is that: so the difference keeps its digits where q hardly changes
+// any more.
+double newton_step(double e, double e2, double qp, bool from_pole, double q, double lat) {
+  constexpr double kNearPole = 0.9;
+  const double sin_lat = std::sin(lat);
+  const double c = std::cos(lat);
+  const double w = 1 - e2 * (sin_lat * sin_lat);
+  double t = 0;
+  if (!from_pole || std::fabs(sin_lat) < kNearPole) {
+    t = std::log((1 - e * sin_lat) / (1 + e * sin_lat)) / (2 * e) + q / (1 - e2) - sin_lat / w;
+  } else {
+    const double side = lat < 0 ? -1 : 1;
+    const double s = side * sin_lat;
+    const double u = c * c / (1 + s);  // 1 - sin
+    const double rest = u * (1 + e2 * s) / (w * (1 - e2)) + std::atanh(e * u / (1 - e2 * s)) / e;
+    t = side * ((side * q - qp) / (1 - e2) + rest);
+  }
+  return t * (w * w) / (2 * c);
+}
+
+// The latitude whose q is given, by Newton's rule (Snyder 1987, eq. 3-16) from the arc sine of u,
+// half of q held at 1.  False when the passes were used up.
+bool latitude_of_q(const EqualAreaOrigin& o, double q, double u, double& lat) {
+  constexpr int kMostPasses = 50;
+  const bool from_pole = is_q_of_pole(o.e, o.e2, o.qp);
+  lat = std::asin(u);
+  if (from_pole) {
+    // Beyond the pole by more than rounding there is no root, and the passes would be used up.
+    const double sine = q / o.qp;
+    if (std::fabs(sine) > kTightLimit) return false;
+    if (std::fabs(sine) >= 1) {
+      lat = std::copysign(kHalfPi, sine);
+      return true;
+    }
+  }
+  double difference = 1;
+  int passes = 0;
+  while (!(difference <= 1e-13)) {
+    if (++passes == kMostPasses) return false;
+    const double step = newton_step(o.e, o.e2, o.qp, from_pole, q, lat);
+    difference = std::fabs(step);
+    lat += step;
+  }
+  return true;
+}
+
+// The stated inverse, word for word.
+Next inverse_as_stated(const EqualAreaOrigin& o, const CoordinateTriple& in, CoordinateTriple* out,
+                       TWstatus* status) {
+  constexpr double kLatLimit = 1.5707963267958966;  // pi/2 and 1e-12
+  const double x = in.x;
+  const double y = in.y;
+  double lon = o.lon0;
+  double lat = o.lat0;
+  const auto fail = [&] {
+    *status = TW_NOT_CONVERGED;
+    return Next::none;
+  };
+  if (o.e == 0) {
+    const double rho = std::sqrt(x * x + y * y);
+    if (rho != 0) {
+      double u = rho / 2;
+      if (!hold_sine(kTightLimit, u, status)) return Next::none;
+      const double c = 2 * std::asin(u);
+      const double sin_c = std::sin(c);
+      const double cos_c = std::cos(c);
+      if (o.polar) {
+        lon = std::atan2(x, o.lat0 < 0 ? y : -y) + o.lon0;
+      } else {
+        lon = std::atan2(x * sin_c, o.cos_lat0 * cos_c * rho - o.sin_lat0 * sin_c * y) + o.lon0;
       }
-      lat = near(sin_beta);
-      // So near to the root, what a pass leaves is of the order of the square of its step.
-      tolerance = 1e-8;
+      lat = std::asin(o.cos_lat0 * sin_c * y / rho + o.sin_lat0 * cos_c);
     }
-    double difference = 1;
-    int passes = 0;
-    while (!(difference <= tolerance)) {
-      if (++passes == kMostPasses) return false;
-      const double step = correction(q, lat);
-      difference = std::fabs(step);
-      lat += step;
-    }
-    return true;
-  }
-
- private:
-  // By the authalic latitude beta to 1e-9 (Snyder 1987, eq. 3-18).
-  double near(double sin_beta) const {
-    const double cos_beta = std::sqrt((1 - sin_beta) * (1 + sin_beta));
-    const double s2 = 2 * sin_beta * cos_beta;
-    const double c2 = 1 - 2 * sin_beta * sin_beta;
-    // sin 4b = 2 s2 c2, sin 6b = s2 (4 c2^2 - 1)
-    return std::asin(sin_beta) + s2 * (p2_ + 2 * c2 * p4_ + (4 * c2 * c2 - 1) * p6_);
-  }
-
-  // (q - q(lat)) w^2 / (2 (1 - e^2) cos lat).  Near a pole both q are taken off that of the pole:
-  // so the difference keeps its digits where q hardly changes any more.
-  double correction(double q, double lat) const {
-    constexpr double kNearPole = 0.9;
-    const double sin_lat = std::sin(lat);
-    const double c = std::cos(lat);
-    const double w = 1 - e2_ * (sin_lat * sin_lat);
-    double t = 0;
-    if (std::fabs(sin_lat) < kNearPole) {
-      t = std::log((1 - e_ * sin_lat) / (1 + e_ * sin_lat)) / (2 * e_) + q / (1 - e2_) -
-          sin_lat / w;
+  } else {
+    double q = 0;
+    if (o.polar) {
+      const double rho = std::sqrt(x * x + y * y);
+      q = std::fabs(o.qp - rho * rho);
+      if (o.lat0 < 0) q = -q;
+      lon = std::atan2(x, o.lat0 < 0 ? y : -y) + o.lon0;
     } else {
-      const double side = lat < 0 ? -1 : 1;
-      const double s = side * sin_lat;
-      const double u = c * c / (1 + s);  // 1 - sin
-      const double from_pole =
-          u * (1 + e2_ * s) / (w * (1 - e2_)) + std::atanh(e_ * u / (1 - e2_ * s)) / e_;
-      t = side * ((side * q - qp_) / (1 - e2_) + from_pole);
+      const double rho = std::sqrt(square(x / o.D) + square(o.D * y));
+      if (rho == 0) {
+        q = o.sin_b1 * o.qp;
+      } else {
+        double u = rho / (2 * o.rq);
+        if (!hold_sine(kLooseLimit, u, status)) return Next::none;
+        const double ce = 2 * std::asin(u);
+        const double sin_ce = std::sin(ce);
+        const double cos_ce = std::cos(ce);
+        q = (o.D * sin_ce * o.cos_b1 * y / rho + cos_ce * o.sin_b1) * o.qp;
+        lon = std::atan2(x * sin_ce,
+                         o.D * cos_ce * o.cos_b1 * rho - o.D * o.D * sin_ce * o.sin_b1 * y) +
+              o.lon0;
+      }
     }
-    return t * (w * w) / (2 * c);
+    double u = q / 2;
+    if (!hold_sine(kLooseLimit, u, status)) return Next::none;
+    if (!latitude_of_q(o, q, u, lat)) return fail();
   }
-
-  double e_, e2_, qp_;
-  bool series_;
-  double p2_ = 0, p4_ = 0, p6_ = 0;
-};
+  if (lat < -kLatLimit || lat > kLatLimit) return fail();
+  out->x = wrap_above_then_at_or_below(lon);
+  out->y = lat;
+  return Next::point;
+}
 
 }  // namespace
+
+Next EqualAreaForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                             TWstatus* status) const {
+  double d = in.x - lon0;
+  double lat = in.y;
+  leave_antipode(false, lat0, lat, d);
+  const auto at_d = sincos(d);
+  double s = std::sin(lat);
+  double c = std::cos(lat);
+  if (!sphere) {
+    s = q_of(e, e2, s) * over_qp;
+    if (!hold_sine(kTightLimit, s, status)) return Next::none;
+    c = std::sqrt((1 - s) * (1 + s));
+    if (sum(at_d.cos, s, c) < kNearAntipode) {
+      // What is left of the sum hangs on the last bit of c, so the angle itself is taken.
+      const double beta = std::asin(s);
+      s = std::sin(beta);
+      c = std::cos(beta);
+    }
+  }
+  const auto answer = place(at_d, s, c);
+  out->x = answer.x;
+  out->y = answer.y;
+  return Next::point;
+}
+
+Next EqualAreaPolarForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                  TWstatus*) const {
+  double lat = in.y;
+  double d = 0;
+  leave_antipode(true, lat0, lat, d);
+  const double w = kQuarterPi - lat / 2;
+  const double r = sphere ? 2 * (side > 0 ? std::sin(w) : std::cos(w))
+                          : std::sqrt(qp - side * q_of(e, e2, std::sin(lat)));
+  const auto answer = place(in.x, r);
+  out->x = answer.x;
+  out->y = answer.y;
+  return Next::point;
+}
+
+Next EqualAreaInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                             TWstatus* status) const {
+  return inverse_as_stated(origin, in, out, status);
+}
+
+Next EqualAreaPolarInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                  TWstatus* status) const {
+  return inverse_as_stated(origin, in, out, status);
+}
+
+Next EqualAreaScale::other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus*) const {
+  const double s = std::sin(in.y);
+  const auto at =
+      triple(std::sqrt(qp - side * q_of(e, e2, s)) / parallel_radius(e2, s, std::cos(in.y)));
+  *out = {at.x, at.y, at.z};
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
 
 void TWlam_az_eq_c(double e, double /*lon0*/, double lat0, double* e2, double* q1, double* qp,
                    double* rq, double* m1, double* sin_b1, double* cos_b1, double* sin_lat0,
@@ -166,156 +260,57 @@ void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, double l
                    double e2, double /*q1*/, double qp, double rq, double /*m1*/, double sin_b1,
                    double cos_b1, double sin_lat0, double cos_lat0, double D, CoordinateTriple* out,
                    TWstatus* status) {
-  *status = TW_SUCCESS;
   const bool sphere = e == 0;
-  const bool polar = is_polar(lat0);
-  const bool equatorial = std::fabs(lat0) < kAspectMargin;
-  // Sine and cosine of the latitude of the origin on the sphere.
-  const double s0 = equatorial ? 0 : sphere ? sin_lat0 : sin_b1;
-  const double c0 = equatorial ? 1 : sphere ? cos_lat0 : cos_b1;
-  for (int32_t i = 0; i < count; ++i) {
-    double d = in[i].x - lon0;
-    double lat = in[i].y;
-    leave_antipode(polar, lat0, lat, d);
-    const double sin_d = std::sin(d);
-    const double cos_d = std::cos(d);
-
-    if (polar) {
-      double r = 0;
-      if (sphere) {
-        const double w = kQuarterPi - lat / 2;
-        r = 2 * (lat0 >= 0 ? std::sin(w) : std::cos(w));
-      } else {
-        const double q = q_of(e, e2, std::sin(lat));
-        r = std::sqrt(lat0 >= 0 ? qp - q : qp + q);
-      }
-      out[i].x = r * sin_d;
-      out[i].y = lat0 >= 0 ? -r * cos_d : r * cos_d;
-      continue;
-    }
-
-    // Sine and cosine of the latitude on the sphere: the authalic one on the ellipsoid.
-    double s = std::sin(lat);
-    double c = 0;
-    if (sphere) {
-      c = std::cos(lat);
-    } else {
-      s = q_of(e, e2, s) / qp;
-      if (!hold_sine(kTightLimit, s, status)) return;
-      c = std::sqrt((1 - s) * (1 + s));
-      if (c * c0 * cos_d + s * s0 + 1 < kNearAntipode) {
-        // What is left of the sum hangs on the last bit of c, so the angle itself is taken.
-        const double beta = std::asin(s);
-        s = std::sin(beta);
-        c = std::cos(beta);
-      }
-    }
-    const double b = std::sqrt(2 / (c * c0 * cos_d + s * s0 + 1));
-    if (equatorial) {
-      out[i].x = b * c * sin_d;
-      out[i].y = sphere ? b * s : rq * rq * b * s;
-    } else if (sphere) {
-      out[i].x = b * c * sin_d;
-      out[i].y = (c0 * s - c * s0 * cos_d) * b;
-    } else {
-      out[i].x = c * D * sin_d * (b * rq);
-      out[i].y = (s * c0 - c * cos_d * s0) * (b * rq) / D;
-    }
+  if (is_polar(lat0)) {
+    *status = over_points(EqualAreaPolarForward{sphere, e, e2, lon0, lat0, qp, side_of(lat0)},
+                          count, in, out);
+    return;
   }
+  const bool equatorial = is_equatorial(lat0);
+  EqualAreaForward kernel = {sphere, e, e2, lon0, lat0, 1 / qp, sin_b1, cos_b1, rq * D, rq / D};
+  if (sphere) {
+    kernel.over_qp = kernel.x_scale = kernel.y_scale = 1;
+    kernel.sin1 = sin_lat0;
+    kernel.cos1 = cos_lat0;
+  }
+  if (equatorial) {
+    kernel.sin1 = 0;
+    kernel.cos1 = 1;
+    kernel.x_scale = 1;
+    kernel.y_scale = sphere ? 1 : rq * rq;
+  }
+  *status = over_points(kernel, count, in, out);
 }
 
 void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double lon0, double lat0,
                    double e2, double qp, double rq, double sin_b1, double cos_b1, double sin_lat0,
                    double cos_lat0, double D, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  constexpr double kLatLimit = 1.5707963267958966;  // pi/2 and 1e-12
   const bool sphere = e == 0;
   const bool polar = is_polar(lat0);
-  const LatitudeOfQ latitude_of(e, e2, qp);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    double lon = lon0;
-    double lat = lat0;
-    if (sphere) {
-      const double rho = std::sqrt(x * x + y * y);
-      if (rho != 0) {
-        double u = rho / 2;
-        if (!hold_sine(kTightLimit, u, status)) return;
-        const double c = 2 * std::asin(u);
-        const double sin_c = std::sin(c);
-        const double cos_c = std::cos(c);
-        if (polar) {
-          lon = std::atan2(x, lat0 < 0 ? y : -y) + lon0;
-        } else {
-          lon = std::atan2(x * sin_c, cos_lat0 * cos_c * rho - sin_lat0 * sin_c * y) + lon0;
-        }
-        lat = std::asin(cos_lat0 * sin_c * y / rho + sin_lat0 * cos_c);
-      }
-    } else {
-      double q = 0;
-      if (polar) {
-        const double rho = std::sqrt(x * x + y * y);
-        // By contract: without its sign, so that a point past the equator comes out mirrored in it.
-        q = std::fabs(qp - rho * rho);
-        if (lat0 < 0) q = -q;
-        lon = std::atan2(x, lat0 < 0 ? y : -y) + lon0;
-      } else {
-        const double rho = std::sqrt(square(x / D) + square(D * y));
-        if (rho == 0) {
-          q = sin_b1 * qp;
-        } else {
-          double u = rho / (2 * rq);
-          if (!hold_sine(kLooseLimit, u, status)) return;
-          const double ce = 2 * std::asin(u);
-          const double sin_ce = std::sin(ce);
-          const double cos_ce = std::cos(ce);
-          q = (D * sin_ce * cos_b1 * y / rho + cos_ce * sin_b1) * qp;
-          lon = std::atan2(x * sin_ce, D * cos_ce * cos_b1 * rho - D * D * sin_ce * sin_b1 * y) +
-                lon0;
-        }
-      }
-      double u = q / 2;
-      if (!hold_sine(kLooseLimit, u, status)) return;
-      if (!latitude_of.find(q, u, lat)) {
-        *status = TW_NOT_CONVERGED;
-        return;
-      }
-    }
-    if (lat < -kLatLimit || lat > kLatLimit) {
-      *status = TW_NOT_CONVERGED;
-      return;
-    }
-    out[i].x = wrap_above_then_at_or_below(lon);
-    out[i].y = lat;
+  const EqualAreaOrigin origin = {e,      e2,     lon0,     lat0,     qp, rq,
+                                  sin_b1, cos_b1, sin_lat0, cos_lat0, D,  polar};
+  const bool series = sphere || (std::fabs(e) <= kSeriesEccentricity && is_q_of_pole(e, e2, qp));
+  const AuthalicInverse inverse(series ? e : 0);
+  if (polar) {
+    // On the sphere a polar origin has the latitude formula of the others.
+    *status = over_points(EqualAreaPolarInverse{origin, sphere, series, sphere ? 0.5 : 1 / qp,
+                                                lat0 < 0 ? -1.0 : 1.0, inverse},
+                          count, in, out);
+  } else if (sphere) {
+    *status = over_points(EqualAreaInverse{origin, series, 1, 1, sin_lat0, cos_lat0, inverse},
+                          count, in, out);
+  } else {
+    *status = over_points(EqualAreaInverse{origin, series, D, 1 / rq, sin_b1, cos_b1, inverse},
+                          count, in, out);
   }
 }
 
 void TWlam_az_eq_s(const CoordinateTriple* in, int32_t count, double lon0, double lat0, double e,
                    double e2, double qp, double k0, double sin_lat0, double cos_lat0,
                    CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const bool sphere = e == 0;
-  const bool polar = is_polar(lat0);
-  const bool equatorial = std::fabs(lat0) < kAspectMargin;
-  for (int32_t i = 0; i < count; ++i) {
-    const double d = in[i].x - lon0;
-    const double lat = in[i].y;
-    double k = 0;
-    if (!polar) {
-      // By contract: the form of the sphere, also on the ellipsoid.
-      k = equatorial ? std::sqrt(2 / (std::cos(lat) * std::cos(d) + 1))
-                     : std::sqrt(2 / (cos_lat0 * std::cos(d) * std::cos(lat) +
-                                      sin_lat0 * std::sin(lat) + 1));
-    } else if (sphere) {
-      const double w = kQuarterPi - lat / 2;
-      k = 1 / (lat0 >= 0 ? std::cos(w) : std::sin(w));
-    } else {
-      const double s = std::sin(lat);
-      const double q = q_of(e, e2, s);
-      k = std::sqrt(lat0 >= 0 ? qp - q : q + qp) / parallel_radius(e2, s, std::cos(lat));
-    }
-    const double h = 1 / k;
-    out[i] = {k * k0, h * k0, h * k * k0 * k0};
-  }
+  const bool equatorial = is_equatorial(lat0);
+  *status = over_points(
+      EqualAreaScale{e == 0, is_polar(lat0), e, e2, lon0, qp, k0, equatorial ? 0 : sin_lat0,
+                     equatorial ? 1 : cos_lat0, side_of(lat0)},
+      count, in, out);
 }

@@ -1,8 +1,7 @@
 // Transverse Mercator projection of the ellipsoid: constants, what the contract says of the points
 // that the formulas do not cover, and the exported functions.
 
-#include <algorithm>
-
+#include "points/over_heights.hpp"
 #include "projections/conformal/transverse_mercator_points.hpp"
 #include "tidewater/conformal.h"
 
@@ -64,19 +63,10 @@ void TWt_merc_s(double e, double k0, double lon0, int32_t count, const Coordinat
   *status = over_points(TransverseScale{e2 / (1 - e2), k0, lon0}, count, in, out);
 }
 
+// By contract: the scale multiplies what stands in the output.
 void TWt_merc_xyk(double e, double lon0, double A0, double A2, double A4, double A6, double A8,
                   double M0, double k0, int32_t count, const CoordinateTriple* in,
                   CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const TransverseForwardAndScale kernel = {{e, lon0, {A0, A2, A4, A6, A8}, M0}, k0};
-  // The scale multiplies what stands in the output, so that the points take a detour.
-  constexpr int32_t kMany = 256;
-  CoordinateTriple found[kMany];
-  for (int32_t done = 0; done < count;) {
-    const int32_t some = std::min(kMany, count - done);
-    over_points(kernel, some, in + done, found);
-    for (int32_t i = 0; i < some; ++i, ++done) {
-      out[done] = {found[i].x, found[i].y, out[done].z * found[i].z};
-    }
-  }
+  *status = over_points_and_heights(
+      TransverseForwardAndScale{{e, lon0, {A0, A2, A4, A6, A8}, M0}, k0}, count, in, out);
 }

@@ -98,13 +98,13 @@ struct TransverseForward {
   }
 };
 
-// With the point scale as the third element.
+// The third element is multiplied by the point scale.
 struct TransverseForwardAndScale {
   TransverseGrid grid;
   double k0;
 
   template <Number V>
-  TW_INLINE Answer3<V> operator()(V lon, V lat, V /*height*/) const {
+  TW_INLINE Answer3<V> operator()(V lon, V lat, V height) const {
     const auto at = sincos(lat);
     const V m = grid.meridian.arc(lat, at) - grid.M0;
     const TransverseTerms<V> terms(grid.ep2, at);
@@ -112,7 +112,7 @@ struct TransverseForwardAndScale {
     const V k = k0 * transverse_scale(grid.ep2, terms, d);  // By contract: before the wrap
     const auto plane = transverse_series(grid.e2, terms, m, wrap_above_then_at_or_below(d));
     const auto polar = near_transverse_pole(lat);
-    return {select(polar, 0.0, plane.x), select(polar, m, plane.y), select(polar, k0, k)};
+    return {select(polar, 0.0, plane.x), select(polar, m, plane.y), height * select(polar, k0, k)};
   }
 };
 
@@ -238,8 +238,12 @@ class TransverseInverse {
     const V xr = x * over_R;
     const V yr = y * over_R + lat0_;
     const V off = yr - foot.lat;
-    const auto in_domain = everywhere<V>(e2_ <= 0.01) & (abs(off) < 0.02) & (abs(xr) < 0.2 * cos) &
-                           (abs(foot.lat) < 1.47) & (abs(y) < 3.0);
+    const auto small_e = everywhere<V>(e2_ <= 0.01);
+    const auto small_off = abs(off) < 0.02;
+    const auto small_lon = abs(xr) < 0.2 * cos;
+    const auto off_poles = abs(foot.lat) < 1.47;
+    const auto in_reach = abs(y) < 3.0;
+    const auto in_domain = small_e & small_off & small_lon & off_poles & in_reach;
     const V half_square = square(off) * 0.5;
     const V s = sin + cos * off - sin * half_square;
     const V c = cos - sin * off - cos * half_square;

@@ -1,20 +1,16 @@
-// Bonne projection of the ellipsoid.
+// Bonne projection: constants, what the contract says of the points that the formulas do not cover,
+// and the exported functions.
+
+#include "projections/special/bonne_points.hpp"
 
 #include <cmath>
 
-#include "formulas/wraps.hpp"
-#include "foundation/meridian_arc.hpp"
-#include "projections/special/turns_about.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;
 
 namespace {
 
-// Differences up to this are none.
-constexpr double kNearZero = 1e-12;
-// pi/2 - 1e-12: nearer to a pole every longitude is the central one.
-constexpr double kLongitudeLimit = 1.5707963267938965;
 // Nearest that the standard parallel comes to the equator, and least eccentricity of an ellipsoid.
 constexpr double kLeast = 1.6e-8;
 
@@ -35,103 +31,61 @@ void TWbonne_c(double e, double* lat1, double* e2, double* c1, double* r0, TWsta
     return;
   }
   *e2 = e * e;
-  const double s = std::sin(*lat1);
-  *c1 = std::cos(*lat1) / std::sqrt(1 - *e2 * s * s) / s;
+  const auto at = sincos(*lat1);
+  *c1 = parallel_radius(*e2, at.sin, at.cos) / at.sin;
   double arc = 0;
   *status = MeridianArc(1.0, e).forward(*lat1, &arc);
   if (TW_OK(*status)) *r0 = *c1 + arc;
 }
 
+// A latitude that the arc's function refuses, or holds at a pole.
+Next BonneForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                         TWstatus* status) const {
+  double distance = 0;
+  const TWstatus word = meridian.forward(in.y, &distance);
+  if (word != TW_SUCCESS) *status = word;
+  if (!TW_OK(word)) return Next::none;
+  const auto at = sincos(in.y);
+  const double r = r0 - distance;
+  const double d = wrap_turns_below_then_above(in.x - lon0);
+  const auto turn = sincos(d * parallel_radius(e2, at.sin, at.cos) / r);
+  out->x = r * turn.sin;
+  out->y = c1 - r * turn.cos;
+  return Next::point;
+}
+
 void TWbonne_f(double lon0, double lat1, double e, double e2, double c1, double r0, int32_t count,
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const MeridianArc arc(1.0, e);
-  for (int32_t i = 0; i < count; ++i) {
-    const double lat = in[i].y;
-    const double d = wrap_turns_below_then_above(in[i].x - lon0);
-    const double dp = std::fabs(lat - lat1);
-    if (std::fabs(d) <= kNearZero && dp <= kNearZero) {
-      out[i].x = 0;
-      out[i].y = 0;
-      continue;
-    }
-    double r = c1;
-    double angle = 0;
-    if (e2 == 0) {
-      r = r0 - lat;
-      angle = std::cos(lat) * d / r;
-    } else if (dp <= kNearZero) {
-      angle = std::sin(lat) * d;
-    } else {
-      const double m = std::cos(lat) / std::sqrt(1 - e2 * square(std::sin(lat)));
-      double distance = 0;
-      const TWstatus word = arc.forward(lat, &distance);
-      if (word != TW_SUCCESS) *status = word;
-      if (!TW_OK(word)) return;
-      r = r0 - distance;
-      angle = d * m / r;
-    }
-    out[i].x = r * std::sin(angle);
-    out[i].y = c1 - r * std::cos(angle);
-  }
+  *status = over_points(BonneForward{lon0, lat1, e2, c1, r0, MeridianArc(1, e)}, count, in, out);
+}
+
+// An arc that its function refuses, or holds at a pole, or an ellipsoid beyond the series.
+Next BonneInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                         TWstatus* status) const {
+  const double r = radius(in.x, in.y);
+  double lat = 0;
+  const TWstatus word = meridian.inverse(r0 - r, &lat);
+  if (word != TW_SUCCESS) *status = word;
+  if (!TW_OK(word)) return Next::none;
+  out->x = longitude(in.x, in.y, r, lat);
+  out->y = lat;
+  return Next::point;
 }
 
 void TWbonne_i(double lon0, double lat1, double e, double e2, double c1, double r0, int32_t count,
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const MeridianArc arc(1.0, e);
-  for (int32_t i = 0; i < count; ++i) {
-    double x = in[i].x;
-    const double y = in[i].y;
-    if (std::fabs(y) <= kNearZero && std::fabs(x) <= kNearZero) {
-      out[i].x = lon0;
-      out[i].y = lat1;
-      continue;
-    }
-    double dy = c1 - y;
-    double r = std::sqrt(x * x + dy * dy);
-    if (lat1 < 0) {
-      r = -r;
-      x = -x;
-      dy = -dy;
-    }
-    double lat = r0 - r;
-    if (e2 != 0) {
-      const TWstatus word = arc.inverse(r0 - r, &lat);
-      if (word != TW_SUCCESS) *status = word;
-      if (!TW_OK(word)) return;
-    }
-    double lon = lon0;
-    if (std::fabs(lat) <= kLongitudeLimit) {
-      double m = std::cos(lat);
-      if (e2 != 0) m /= std::sqrt(1 - e2 * square(std::sin(lat)));
-      lon = turns_about(lon0, std::atan2(x, dy) * r / m + lon0);
-    }
-    out[i].x = lon;
-    out[i].y = lat;
-  }
+  *status = over_points(BonneInverse(lon0, lat1, e, e2, c1, r0), count, in, out);
+}
+
+Next BonneScale::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_BAD_LATITUDE;
+  return Next::none;
 }
 
 void TWbonne_s(double k0, double lat1, double lon0, double e2, double r0, int32_t count,
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
   // By contract: on the ellipsoid, too, the scale is that of the sphere, and the argument is
   // discarded.
   if (e2 != 0) r0 = 1 / std::tan(lat1) + lat1;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lat = in[i].y;
-    const double d = wrap_turns_below_then_above(in[i].x - lon0);
-    double h = 1;
-    // By contract: a latitude is tested only off the central meridian and the standard parallel.
-    if (std::fabs(d) > kNearZero && std::fabs(lat - lat1) > kNearZero) {
-      if (std::fabs(lat) - kHalfPi > kNearZero) {
-        *status = TW_BAD_LATITUDE;
-        return;
-      }
-      const double r = r0 - lat;
-      const double g = (std::cos(lat) - r * std::sin(lat)) / r * d;
-      h = std::sqrt(g * g + 1);
-    }
-    out[i] = {k0, k0 * h, k0 * k0};
-  }
+  *status = over_points(BonneScale{k0, lat1, lon0, r0}, count, in, out);
 }

@@ -1,21 +1,18 @@
-// Grid of Malaya as a pair of bivariate polynomials.
+// Grid of Malaya: its coefficients and the exported functions.
+
+#include "projections/special/malaya_points.hpp"
 
 #include <algorithm>
 #include <iterator>
 
-#include "formulas/constants.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;
 
 namespace {
 
-constexpr int kRow = 21;
-constexpr double kMetresPerChain = 20.1167824946;
-constexpr double kRadiansPerSecond = 4.84813681109536e-6;
-
 // Rows 0 and 1 go forward, rows 2 and 3 back.
-constexpr double kTable[4 * kRow] = {
+constexpr double kTable[4 * kMalayaRow] = {
     -5070.0,   -32370.0,     -75.0,       -52440.0,  -3506.0,  -8047.3,     //
     41570.0,   -17650.0,     -34705.3,    131.22,    36030.0,  -1917.0,     //
     120624.9,  -17547.62,    189383.1095, -4200.0,   3685.0,   11456.8,     //
@@ -33,28 +30,6 @@ constexpr double kTable[4 * kRow] = {
     710.5339,  397.9187,     52115.1603,  -15.7918,  -21.2579, -846.2316,   //
     -691.5037, -39234.8231,  0.0};
 
-struct Pair {
-  double E, N;
-};
-
-// Two polynomials of degree five in p and q: by powers of q, each coefficient by Horner in p.
-Pair evaluate(const double* R, const double* S, double p, double q) {
-  Pair sum = {R[0], S[0]};
-  int i = 1;
-  for (int m = 0; m < 5; ++m) {
-    double a = R[i];
-    double b = S[i];
-    ++i;
-    for (int k = 0; k <= m; ++k, ++i) {
-      a = a * p + R[i];
-      b = b * p + S[i];
-    }
-    sum.E = sum.E * q + a;
-    sum.N = sum.N * q + b;
-  }
-  return sum;
-}
-
 }  // namespace
 
 void TWmalaya_param(double* lon_c, double* lat_c, double* false_easting, double* false_northing,
@@ -70,26 +45,10 @@ void TWmalaya_c(double* table, TWstatus* status) {
 
 void TWmalaya_f(const double* table, double lon0, double lat0, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const auto [E, N] = evaluate(table, table + kRow, in[i].x - lon0, in[i].y - lat0);
-    out[i].x = (0.8 * E - 0.6 * N) * kMetresPerChain / 6377304.063 / 0.99984;
-    out[i].y = (0.6 * E + 0.8 * N) * kMetresPerChain / 6377304.063 / 0.99984;
-  }
+  *status = over_points(MalayaForward{table, lon0, lat0}, count, in, out);
 }
 
 void TWmalaya_i(const double* table, double lon0, double lat0, int32_t count,
                 const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    // By contract: metres, not units of the semi-major axis.
-    const double x = in[i].x / kMetresPerChain;
-    const double y = in[i].y / kMetresPerChain;
-    const double X = 0.8 * y - 0.6 * x + 24000.0;
-    const double Y = 0.6 * y + 0.8 * x - 32000.0;
-    const auto [E, N] =
-        evaluate(table + 2 * kRow, table + 3 * kRow, (X - 27490.8082) * 1e-5, Y * 1e-5);
-    out[i].x = N * kRadiansPerSecond + lon0;
-    out[i].y = E * kRadiansPerSecond + lat0;
-  }
+  *status = over_points(MalayaInverse{table, lon0, lat0}, count, in, out);
 }

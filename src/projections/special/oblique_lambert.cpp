@@ -1,5 +1,7 @@
 // Oblique Lambert conformal projection: the ellipsoid on a conformal sphere, the graticule of the
 // sphere turned about a pole, and a Lambert conic on it; with the constants of the Krovak case.
+// Each stage goes through the whole array, several points at once: where one fails, what the
+// earlier ones have written is seen.
 
 #include <cmath>
 

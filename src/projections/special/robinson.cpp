@@ -1,9 +1,10 @@
-// Robinson projection of the sphere by two clamped cubic splines through its table.
+// Robinson projection: its table, what the contract says of the points that the formulas do not
+// cover, and the exported functions.
+
+#include "projections/special/robinson_points.hpp"
 
 #include <cmath>
 
-#include "formulas/wraps.hpp"
-#include "projections/special/turns_about.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"
 
@@ -11,16 +12,12 @@ using namespace tidewater::detail;
 
 namespace {
 
-constexpr int32_t kKnots = 19;
+constexpr int32_t kKnots = kRobinsonKnots;
 constexpr double kSpacing = 0.08726646259971647;  // 5 degrees
-constexpr double kYScale = 1.3523319842835606;
-constexpr double kXScale = 0.8487;
 // How far beyond a pole a latitude is held there instead of refused.
 constexpr double kPoleMargin = 0.0001;
 
 // Distance of the parallels from the equator, and their length, every 5 degrees.
-// Robinson, A New Map Projection: Its Development and Characteristics, International Yearbook of
-// Cartography 14 (1974), pp. 145-155.
 constexpr double kDistance[kKnots] = {0.0,    0.062,  0.124,  0.186,  0.248,  0.31,   0.372,
                                       0.434,  0.4958, 0.5571, 0.6176, 0.6769, 0.7346, 0.7903,
                                       0.8435, 0.8936, 0.9394, 0.9761, 1.0};
@@ -54,92 +51,99 @@ void TWrobin_c(double* knots, double* y_coef, double* x_coef, double* y0, double
   form(knots, kLength, 0, -0.43430550824143654, x_coef, status);
   if (*status != TW_SUCCESS) return;
   uint32_t flag = 0;
-  *y0 = signed_distance(lat0, knots, y_coef, &flag) * kYScale;
+  *y0 = signed_distance(lat0, knots, y_coef, &flag) * kRobinsonYScale;
   if (flag != 1) *status = TW_BAD_LATITUDE;
 }
+
+namespace tidewater::detail {
+
+// A latitude beyond a pole or the table, or that is not a number.
+Next RobinsonForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                            TWstatus* status) const {
+  const auto& [knots, y_coef, x_coef] = table;
+  double lat = in.y;
+  if (std::fabs(lat) > kHalfPi) {
+    if (lat > kHalfPi && lat < kHalfPi + kPoleMargin) {
+      lat = kHalfPi;
+    } else if (lat < -kHalfPi && lat > -kHalfPi - kPoleMargin) {
+      lat = -kHalfPi;
+    } else {
+      *status = TW_BAD_LATITUDE;
+      return Next::none;
+    }
+    *status = TW_I_LATITUDE_LIMITED;
+  }
+  uint32_t flag = 0;
+  const double distance = signed_distance(lat, knots, y_coef, &flag);
+  if (flag == 2) *status = TW_I_LATITUDE_LIMITED;
+  const double length = TWrobin_cseval(std::fabs(lat), knots, x_coef, kKnots, &flag);
+  out->x = length * (turns_about(lon0, in.x) - lon0) * kRobinsonXScale;
+  out->y = distance * kRobinsonYScale - y0;
+  return Next::point;
+}
+
+// A distance beyond the table, or that is not a number.
+Next RobinsonInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                            TWstatus* status) const {
+  const auto& [knots, y_coef, x_coef] = table;
+  const double distance = (in.y + y0) / kRobinsonYScale;
+  uint32_t flag = 0;
+  const double lat = TWrobin_csinv(std::fabs(distance), knots, y_coef, kKnots, &flag);
+  // By contract: a distance beyond the table fails also where it gives a latitude short of the
+  // pole.
+  if (!(kHalfPi < lat && lat < kHalfPi + kPoleMargin)) {
+    *status = TW_BAD_LATITUDE;
+    return Next::none;
+  }
+  *status = TW_I_LATITUDE_LIMITED;
+  const double length = TWrobin_cseval(kHalfPi, knots, x_coef, kKnots, &flag);
+  out->x = in.x / (length * kRobinsonXScale) + lon0;
+  out->y = std::copysign(kHalfPi, distance);
+  return Next::point;
+}
+
+// At the last knot and beyond the table.
+Next RobinsonScale::other(const CoordinateTriple& in, CoordinateTriple* out,
+                          TWstatus* status) const {
+  const auto& [knots, y_coef, x_coef] = table;
+  const double lat = std::fabs(in.y);
+  uint32_t flags[3] = {};
+  const double length = TWrobin_cseval(lat, knots, x_coef, kKnots, &flags[0]);
+  const double dy = TWrobin_csderv(lat, knots, y_coef, kKnots, &flags[1]);
+  const double dx = TWrobin_csderv(lat, knots, x_coef, kKnots, &flags[2]);
+  if (flags[0] != 1 || flags[1] != 1 || flags[2] != 1) {
+    *status = TW_BAD_LATITUDE;
+    *out = {k0, k0, k0 * k0};
+    return Next::point;
+  }
+  if (lat > kHalfPi) {  // in a table that reaches further: the word of the radii
+    *status = TW_BAD_LATITUDE;
+    return Next::none;
+  }
+  const auto at = scales(turns_about(lon0, in.x) - lon0, lat, length, dx, dy);
+  *out = {at.x, at.y, at.z};
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
 
 void TWrobin_f(const double* knots, const double* y_coef, const double* x_coef, double lon0,
                double y0, int32_t count, CoordinateTriple* out, const CoordinateTriple* in,
                TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = turns_about(lon0, in[i].x);
-    double lat = in[i].y;
-    if (std::fabs(lat) > kHalfPi) {
-      if (lat > kHalfPi && lat < kHalfPi + kPoleMargin) {
-        lat = kHalfPi;
-      } else if (lat < -kHalfPi && lat > -kHalfPi - kPoleMargin) {
-        lat = -kHalfPi;
-      } else {
-        *status = TW_BAD_LATITUDE;
-        return;
-      }
-      *status = TW_I_LATITUDE_LIMITED;
-    }
-    uint32_t flag = 0;
-    const double distance = signed_distance(lat, knots, y_coef, &flag);
-    if (flag == 2) *status = TW_I_LATITUDE_LIMITED;
-    const double length = TWrobin_cseval(std::fabs(lat), knots, x_coef, kKnots, &flag);
-    out[i].x = length * (lon - lon0) * kXScale;
-    out[i].y = distance * kYScale - y0;
-  }
+  *status = over_points(RobinsonForward{{knots, y_coef, x_coef}, lon0, y0}, count, in, out);
 }
 
 void TWrobin_i(const double* knots, const double* y_coef, const double* x_coef, double lon0,
                double y0, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double distance = (in[i].y + y0) / kYScale;
-    uint32_t flag = 0;
-    double lat = TWrobin_csinv(std::fabs(distance), knots, y_coef, kKnots, &flag);
-    if (flag == 2) {
-      // By contract: a distance beyond the table fails also where it gives a latitude short of the
-      // pole.
-      if (!(kHalfPi < lat && lat < kHalfPi + kPoleMargin)) {
-        *status = TW_BAD_LATITUDE;
-        return;
-      }
-      lat = kHalfPi;
-      *status = TW_I_LATITUDE_LIMITED;
-    }
-    const double length = TWrobin_cseval(lat, knots, x_coef, kKnots, &flag);
-    out[i].x = x / (length * kXScale) + lon0;
-    out[i].y = distance >= 0 ? lat : -lat;
-  }
+  *status = over_points(RobinsonInverse{{knots, y_coef, x_coef}, lon0, y0}, count, in, out);
 }
 
 void TWrobin_s(const double* knots, const double* y_coef, const double* x_coef, double lon0,
                double radius, double a, double e, double k0, int32_t count,
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const double f = k0 * radius * kXScale;
-  for (int32_t i = 0; i < count; ++i) {
-    const double lat = std::fabs(in[i].y);
-    uint32_t flags[3] = {};
-    const double length = TWrobin_cseval(lat, knots, x_coef, kKnots, &flags[0]);
-    const double dy = TWrobin_csderv(lat, knots, y_coef, kKnots, &flags[1]);
-    const double dx = TWrobin_csderv(lat, knots, x_coef, kKnots, &flags[2]);
-    if (flags[0] != 1 || flags[1] != 1 || flags[2] != 1) {
-      *status = TW_BAD_LATITUDE;
-      out[i] = {k0, k0, k0 * k0};
-      continue;
-    }
-    TWstatus word = TW_SUCCESS;
-    double parallel = 0;
-    double meridian = 0;
-    TWRparal(a, e, lat, &parallel, &word);
-    if (TW_OK(word)) TWRmerid(a, e, lat, &meridian, &word);
-    if (!TW_OK(word)) {
-      *status = word;
-      return;
-    }
-    const double k = f / parallel * length;
-    const double d = turns_about(lon0, in[i].x) - lon0;
-    const double h = f / meridian * std::sqrt(d * d * dx * dx + dy * dy * 2.5389738922523355);
-    // By contract: k0 does not enter the areal scale.
-    const double areal = square(radius) * 1.147724155061458 / meridian / parallel * dy * length;
-    out[i] = {k, h, areal};
-  }
+  *status = over_points(
+      RobinsonScale{
+          {knots, y_coef, x_coef}, lon0, radius, a, e * e, k0, k0 * radius * kRobinsonXScale},
+      count, in, out);
 }
