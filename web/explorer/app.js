@@ -717,7 +717,12 @@ window.explorer = {
   projections: PROJECTIONS,
   get view() { return view; },
   get library() { return tw; },
-  drawNow: () => { remap(); draw(false); showFigures(); showLegend(); },
+  drawNow: (moving = false) => {
+    remap();
+    draw(moving);
+    if (!moving) showFigures();
+    showLegend();
+  },
 };
 
 begin().catch((error) => {

@@ -6,15 +6,14 @@
 // Little-endian.
 
 import { readFileSync, writeFileSync, mkdirSync } from "node:fs";
-import { fileURLToPath } from "node:url";
+import { createRequire } from "node:module";
 import { feature } from "topojson-client";
 
 const CELL = 5;
 const STEP = 2.5; // edges are this long at most, and of the same points on both sides of a cell's edge
 
-const atlas = (name) =>
-  JSON.parse(
-    readFileSync(fileURLToPath(import.meta.resolve(`world-atlas/${name}.json`)), "utf8"));
+const { resolve } = createRequire(import.meta.url);
+const atlas = (name) => JSON.parse(readFileSync(resolve(`world-atlas/${name}.json`), "utf8"));
 
 // One side of a straight cut, after Sutherland and Hodgman (1974).
 function keep(ring, axis, sign, limit) {

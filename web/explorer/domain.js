@@ -294,20 +294,22 @@ class Cut {
   }
 }
 
+// The point of the circle in which a plane cuts the Earth that a vector points to.
+function onRim(v, n, d) {
+  const height = dot(v, n);
+  const aside = unit(v.map((x, k) => x - height * n[k]));
+  const radius = Math.sqrt(Math.max(0, 1 - d * d));
+  return aside.map((x, k) => x * radius + d * n[k]);
+}
+
 // What lies on the inner side of a plane; new edges follow the circle in which it cuts the Earth.
 function beyond(vectors, { n, d }) {
   const out = [];
   let left;
   const join = (to) => {
-    const foot = n.map((x) => x * d);
-    const [p, q] = [left, to].map((v) => [v[0] - foot[0], v[1] - foot[1], v[2] - foot[2]]);
-    const radius = Math.hypot(...p);
-    const angle = Math.acos(clamped(dot(p, q) / (radius * Math.hypot(...q))));
-    const steps = Math.ceil(angle / (4 * RAD));
-    for (let i = 1; i < steps; ++i) {
-      const m = unit(mix(p, q, i / steps));
-      out.push(unit(m.map((x, k) => x * radius + foot[k])));
-    }
+    const [p, q] = [left, to].map((v) => unit(v.map((x, k) => x - d * n[k])));
+    const steps = Math.ceil(Math.acos(clamped(dot(p, q))) / (4 * RAD));
+    for (let i = 1; i < steps; ++i) out.push(onRim(mix(p, q, i / steps), n, d));
     left = undefined;
   };
   let firstIn;
@@ -316,7 +318,7 @@ function beyond(vectors, { n, d }) {
     const [p, q] = [dot(a, n) - d, dot(b, n) - d];
     if (p >= 0) out.push(a);
     if (p >= 0 !== q >= 0) {
-      const at = unit(mix(a, b, p / (p - q)));
+      const at = onRim(mix(a, b, p / (p - q)), n, d);
       if (p >= 0) {
         out.push(at);
         left = at;
