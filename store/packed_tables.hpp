@@ -1,12 +1,12 @@
-// All tables of a store in one compact run of bytes, which packs well: columns one behind the other,
-// integers as differences from row to row, numbers as the shortest decimals that lead back to them.
-// For places that have no SQLite.
+// All tables of a store in one compact run of bytes, which packs well: columns one behind the
+// other, integers as differences from row to row, numbers as the shortest decimals that lead back
+// to them. For places that have no SQLite.
 //
-//   "TWTABLES" and the number of tables; for each its name, its fields (column, type, offset, size),
-//   its number of rows, and the fields' values one field behind the other
+//   "TWTABLES" and the number of tables; for each its name, its fields (column, type, offset,
+//   size), its number of rows, and the fields' values one field behind the other
 //
-// Whole numbers have seven bits a byte, the lowest first, the high bit where more follow; signed ones
-// count 0, -1, 1, -2, 2.  Texts and decimals end with a zero byte; zero is the empty decimal.
+// Whole numbers have seven bits a byte, the lowest first, the high bit where more follow; signed
+// ones count 0, -1, 1, -2, 2.  Texts and decimals end with a zero byte; zero is the empty decimal.
 #pragma once
 
 #include <cstddef>

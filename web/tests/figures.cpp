@@ -1,5 +1,5 @@
-// The native library's figures that the tests of the WebAssembly package and of the explorer are held
-// against: a line for each, numbers in hexadecimal so that no digit is lost.
+// The native library's figures that the tests of the WebAssembly package and of the explorer are
+// held against: a line for each, numbers in hexadecimal so that no digit is lost.
 
 #include <cstdio>
 #include <string>
