@@ -2,8 +2,8 @@
 //   node build.mjs FOLDER   writes land-110.bin and land-50.bin
 //
 // A file: the number of pieces, then of lines, as 32-bit words; the number of points of each piece
-// and of each line, 16-bit; their points, longitude and latitude, 16-bit, a half turn to 32767.
-// Little-endian.
+// and of each line, 16-bit; their points, longitude and latitude, 16-bit: 32767 is a half turn of longitude, a
+// quarter of latitude.  Little-endian.
 
 import { readFileSync, writeFileSync, mkdirSync } from "node:fs";
 import { createRequire } from "node:module";
@@ -134,7 +134,7 @@ function write(path, pieces, lines) {
     for (const [x, y] of part) {
       const lon = Math.max(-180, Math.min(180, x - turn));
       at = bytes.writeInt16LE(Math.round((lon / 180) * 32767), at);
-      at = bytes.writeInt16LE(Math.round((y / 180) * 32767), at);
+      at = bytes.writeInt16LE(Math.round((y / 90) * 32767), at);
     }
   }
   writeFileSync(path, bytes);

@@ -17,7 +17,9 @@ export function readLand(buffer) {
     for (let i = 0; i < count; ++i, at += 2) {
       const n = view.getUint16(at, true);
       const part = new Float64Array(2 * n);
-      for (let k = 0; k < 2 * n; ++k, points += 2) part[k] = (view.getInt16(points, true) / 32767) * 180;
+      for (let k = 0; k < 2 * n; ++k, points += 2) {
+        part[k] = (view.getInt16(points, true) / 32767) * (k % 2 === 0 ? 180 : 90);
+      }
       out.push(part);
     }
     return out;
