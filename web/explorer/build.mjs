@@ -2,8 +2,8 @@
 //   node build.mjs FOLDER   writes land-110.bin and land-50.bin
 //
 // A file: the number of pieces, then of lines, as 32-bit words; the number of points of each piece
-// and of each line, 16-bit; their points, longitude and latitude, 16-bit: 32767 is a half turn of longitude, a
-// quarter of latitude.  Little-endian.
+// and of each line, 16-bit; their points, longitude and latitude, 16-bit: 32767 is a half turn of
+// longitude, a quarter of latitude.  Little-endian.
 
 import { readFileSync, writeFileSync, mkdirSync } from "node:fs";
 import { createRequire } from "node:module";
@@ -13,6 +13,8 @@ const CELL = 5;
 const STEP = 2.5; // edges are this long at most, and of the same points on both sides of a cell's edge
 
 const { resolve } = createRequire(import.meta.url);
+// Where maps are stretched most, the only land being in the south.
+const NEAR_THE_POLE = [-88.4, -89, -89.4, -89.7, -89.85, -89.95, -89.99];
 const atlas = (name) => JSON.parse(readFileSync(resolve(`world-atlas/${name}.json`), "utf8"));
 
 // One side of a straight cut, after Sutherland and Hodgman (1974).
@@ -50,6 +52,13 @@ function dense(points, closed) {
       const t = (v - a[axis]) / (b[axis] - a[axis]);
       between.push([a[0] + t * (b[0] - a[0]), a[1] + t * (b[1] - a[1])]);
     }
+    if (axis === 1) {
+      for (const v of NEAR_THE_POLE) {
+        if (v <= low || v >= high) continue;
+        const t = (v - a[1]) / (b[1] - a[1]);
+        between.unshift([a[0] + t * (b[0] - a[0]), v]);
+      }
+    }
     if (b[axis] < a[axis]) between.reverse();
     out.push(...between);
   }
@@ -63,17 +72,17 @@ const area = (ring) =>
     return sum + a[0] * b[1] - b[0] * a[1];
   }, 0);
 
-// A ring whose longitudes go on across the 180th meridian instead of leaping back.
+// A ring whose longitudes go on across the 180th meridian instead of leaping back; one that goes
+// around the south pole is closed along it.
 function unwrapped(ring) {
   const out = [ring[0]];
   for (let i = 1; i < ring.length; ++i) {
-    const [lon, lat] = ring[i];
-    const last = out[i - 1];
-    const pole = lat < -89.9 && last[1] < -89.9;
-    out.push([pole ? lon : lon - 360 * Math.round((lon - last[0]) / 360), lat]);
+    const last = out[i - 1][0];
+    out.push([ring[i][0] - 360 * Math.round((ring[i][0] - last) / 360), ring[i][1]]);
   }
-  // Around the pole and not back: as it was given.
-  return Math.abs(out.at(-1)[0] - out[0][0]) < 1e-6 ? out : ring;
+  const [first, last] = [out[0], out.at(-1)];
+  if (Math.abs(last[0] - first[0]) > 1) out.push([last[0], -90], [first[0], -90], first);
+  return out;
 }
 
 function cells(rings) {
@@ -99,11 +108,12 @@ function cells(rings) {
 // Coastlines without the edges that only close a polygon at the 180th meridian and the pole.
 function coasts(rings) {
   const lines = [];
-  const edge = (p) => Math.abs(Math.abs(p[0]) - 180) < 0.01 || p[1] < -89.9;
+  const edge = (p) => Math.abs(Math.abs(p[0]) - 180) < 0.01;
   for (const ring of rings) {
     let line = [];
     for (let i = 0; i + 1 < ring.length; ++i) {
-      if (edge(ring[i]) && edge(ring[i + 1])) {
+      const pole = Math.min(ring[i][1], ring[i + 1][1]) < -89.9;
+      if (pole || (edge(ring[i]) && edge(ring[i + 1]))) {
         if (line.length > 1) lines.push(dense(line, false));
         line = [];
         continue;

@@ -109,9 +109,16 @@ class Band {
   border() {
     const { lon0, reach, south, north } = this;
     const out = [];
-    for (let y = south; y < north; y += 2) out.push([lon0 - reach, y]);
+    // Ever closer towards the poles, where some maps are stretched most.
+    const steps = [];
+    for (let y = south; y < north; ) {
+      steps.push(y);
+      y += Math.min(2, Math.max(0.01, 0.2 * (y - south)), Math.max(0.01, 0.2 * (north - y)));
+    }
+    steps.push(north);
+    for (const y of steps) out.push([lon0 - reach, y]);
     for (let x = -reach; x < reach; x += 2) out.push([lon0 + x, north]);
-    for (let y = north; y > south; y -= 2) out.push([lon0 + reach, y]);
+    for (const y of steps.reverse()) out.push([lon0 + reach, y]);
     for (let x = reach; x > -reach; x -= 2) out.push([lon0 + x, south]);
     out.push([lon0 - reach, south]);
     return out;

@@ -32,7 +32,7 @@ export function graticule(step) {
   for (let lon = -180; lon < 180; lon += step) {
     const top = lon % 90 === 0 ? 90 : 90 - step;
     const line = [];
-    for (let lat = -top; lat <= top; lat += 1.5) line.push(lon, lat);
+    for (let lat = -top; lat <= top; lat += Math.abs(lat) < 88 ? 1.5 : 0.25) line.push(lon, lat);
     lines.push(line);
   }
   for (let lat = -90 + step; lat < 90; lat += step) {
