@@ -4,16 +4,12 @@
 #include <sqlite3.h>
 
 #include <memory>
-#include <stdexcept>
 #include <string>
 #include <string_view>
 
-namespace tabdll {
+#include "store_error.hpp"
 
-// A file that is no store, a table or a column that is not there, a cell that does not pack.
-class StoreError : public std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
+namespace tabdll {
 
 // A name as it stands in a statement, whatever characters it has.
 std::string identifier(std::string_view name);

@@ -7,10 +7,11 @@
 #include <mutex>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
-#include "database.hpp"
 #include "layout.hpp"
+#include "store_error.hpp"
 
 namespace tabdll {
 
@@ -72,6 +73,8 @@ class Walk {
   std::size_t next_ = 0;
 };
 
+using Tables = std::map<std::string, Table, std::less<>>;
+
 // A store file comes from anywhere.  It opens whole or not at all: an SQLite database whose pages
 // are sound, that holds nothing but plain tables, each with a layout that all its cells fit.
 class TableStore {
@@ -79,12 +82,13 @@ class TableStore {
   explicit TableStore(const char* path);
   // From the bytes of a file.
   explicit TableStore(std::vector<unsigned char> file);
+  explicit TableStore(Tables tables) : tables_(std::move(tables)) {}
 
-  const std::map<std::string, Table, std::less<>>& tables() const { return tables_; }
+  const Tables& tables() const { return tables_; }
   const Table& table(std::string_view name) const;
 
  private:
-  std::map<std::string, Table, std::less<>> tables_;
+  Tables tables_;
 };
 
 }  // namespace tabdll

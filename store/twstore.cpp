@@ -1,17 +1,20 @@
-// twstore: builds, lists and checks parameter stores.
+// twstore: builds, lists, checks and packs parameter stores.
 
 #include <CLI/CLI.hpp>
 #include <array>
 #include <charconv>
 #include <cstring>
 #include <exception>
+#include <fstream>
 #include <functional>
 #include <iostream>
 #include <string>
+#include <vector>
 
 #include "builder.hpp"
 #include "checker.hpp"
 #include "csv.hpp"
+#include "packed_tables.hpp"
 #include "table_store.hpp"
 
 namespace {
@@ -78,12 +81,23 @@ int check(const TableStore& store) {
   return faults.empty() ? 0 : 1;
 }
 
+int pack(const TableStore& store, const std::string& file) {
+  const std::vector<unsigned char> bytes = pack_tables(store);
+  std::ofstream out(file, std::ios::binary);
+  out.write(reinterpret_cast<const char*>(bytes.data()),
+            static_cast<std::streamsize>(bytes.size()));
+  if (out.flush()) return 0;
+  std::cerr << "twstore: " << file << " cannot be written\n";
+  return 1;
+}
+
 int run(int argc, char** argv) {
-  CLI::App app{"Builds, lists and checks parameter stores."};
+  CLI::App app{"Builds, lists, checks and packs parameter stores."};
   app.require_subcommand(1);
   std::string store;
   std::string folder;
   std::string table;
+  std::string file;
 
   CLI::App* build = app.add_subcommand("build", "Build a store from a folder of CSV files");
   build->add_option("STORE", store, "The file to write")->required();
@@ -94,6 +108,10 @@ int run(int argc, char** argv) {
   list->add_option("TABLE", table, "The table whose rows to list");
   CLI::App* checked = app.add_subcommand("check", "Hold a store against what the library reads");
   checked->add_option("STORE", store, "The store")->required();
+  CLI::App* packed =
+      app.add_subcommand("pack", "Write a store's tables as one compact run of bytes");
+  packed->add_option("STORE", store, "The store")->required();
+  packed->add_option("FILE", file, "The file to write")->required();
   CLI11_PARSE(app, argc, argv);
 
   try {
@@ -103,6 +121,7 @@ int run(int argc, char** argv) {
     }
     const TableStore opened(store.c_str());
     if (checked->parsed()) return check(opened);
+    if (packed->parsed()) return pack(opened, file);
     return table.empty() ? list_tables(opened) : list_rows(opened, table);
   } catch (const SourceError& e) {
     std::cerr << "twstore: " << e.what() << '\n';

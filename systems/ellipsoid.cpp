@@ -88,6 +88,13 @@ Ellipsoid::Ellipsoid(double a, double inverse_flattening)
   }
 }
 
+std::vector<std::string> Ellipsoid::names() {
+  const detail::Registry& registry = detail::Registry::shared();
+  std::vector<std::string> list;
+  for (const int code : registry.ellipsoids()) list.push_back(registry.ellipsoid(code)->name);
+  return list;
+}
+
 double Ellipsoid::b() const { return a_ * (1 - flattening()); }
 
 double Ellipsoid::eccentricity() const { return std::sqrt(flattening() * (2 - flattening())); }

@@ -53,7 +53,7 @@ std::unique_ptr<const Formula> formula(const Plane& plane, F forward, I inverse)
 }
 
 // A value of the plane or a position; `plain` is false where the formula has none.
-struct Pair {
+struct PointAnswer {
   double x, y;
   bool plain = true;
 };
@@ -64,7 +64,7 @@ std::unique_ptr<const Formula> pointwise(const Plane& plane, F forward, I invers
   const auto loop = [](const auto& map) {
     return [map](int count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
       for (int i = 0; i < count; ++i) {
-        const Pair answer = map(in[i].x, in[i].y);
+        const PointAnswer answer = map(in[i].x, in[i].y);
         if (answer.plain) {
           out[i].x = answer.x;
           out[i].y = answer.y;

@@ -280,7 +280,8 @@ void refuse_overlaps(const GridContent& content, std::vector<std::int32_t> sibli
   const auto lattice = [&](std::int32_t i) -> const Lattice& {
     return content.lattices[static_cast<std::size_t>(i)];
   };
-  std::ranges::sort(siblings, {}, [&](std::int32_t i) { return lattice(i).west; });
+  std::sort(siblings.begin(), siblings.end(),
+            [&](std::int32_t a, std::int32_t b) { return lattice(a).west < lattice(b).west; });
   for (std::size_t a = 0; a < siblings.size(); ++a) {
     const Lattice& g = lattice(siblings[a]);
     for (std::size_t b = a + 1; b < siblings.size(); ++b) {

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstdio>
 #include <optional>
 
 #include "block.hpp"
@@ -62,6 +63,16 @@ struct Sums {
 
 [[noreturn]] void fail(const std::string& sentence) { throw Error(sentence); }
 
+void need_store(const std::string& store, TWstatus status) {
+  if (status == TW_PF_OPEN_ERROR) fail("The parameter store \"" + store + "\" cannot be opened.");
+}
+
+std::string shown(double year) {
+  char text[40];
+  std::snprintf(text, sizeof text, "%.10g", year);
+  return text;
+}
+
 // The row of a model and those of its epochs.
 struct Info {
   Info(const std::string& store, const std::string& model_name) : name(model_name) {
@@ -74,6 +85,7 @@ struct Info {
     int32_t epoch_count = 0;
     TWmagmdl_info(store.c_str(), key.data(), &number, 1, table, &radius, &normalisation, publisher,
                   &first_date, &last_date, &interval, &epoch_count, &status);
+    need_store(store, status);
     if (!TW_OK(status)) {
       fail("The store \"" + store + "\" has no magnetic model \"" + name +
            "\"; MagneticModel::models() lists those it has.");
@@ -108,6 +120,7 @@ std::vector<std::string> model_names(const std::string& store) {
   TWstatus status = TW_SUCCESS;
   int32_t count = 0;
   TWmag_mdl_cnt(store.c_str(), &count, &status);
+  need_store(store, status);
   if (!TW_OK(status)) fail("The store \"" + store + "\" has no magnetic models.");
   std::vector<char> names(static_cast<std::size_t>(std::max(count, 0)) * kModelName + kTextField);
   TWmagmdl_names(store.c_str(), names.data(), &status);
@@ -166,10 +179,10 @@ class MagneticModelImpl {
                    cosines_.rows(), sines_.rows(), cosine_rates_.rows(), sine_rates_.rows(),
                    &status);
     // The library sums from degree 2 on.
-    if (!TW_OK(status) || rate_degree_ < 2) {
-      fail("The magnetic model " + info.name + " has no field at " + std::to_string(date) +
-           "; it is published for " + std::to_string(info.first_date) + " to " +
-           std::to_string(info.last_date) + ".");
+    if (!TW_OK(status) || rate_degree_ < 2 || !std::isfinite(date)) {
+      fail("The magnetic model " + info.name + " has no field at " + shown(date) +
+           "; it is published for " + shown(info.first_date) + " to " + shown(info.last_date) +
+           ".");
     }
   }
 

@@ -99,11 +99,11 @@ Made krovak(const MethodArguments& given, bool modified, double sign) {
       plane,
       [map](double lon, double lat) {
         const auto grid = map.forward(lon, lat);
-        return Pair{grid.westing, grid.southing, std::isfinite(grid.westing)};
+        return PointAnswer{grid.westing, grid.southing, std::isfinite(grid.westing)};
       },
       [map](double x, double y) {
         const auto at = map.inverse({y, x});
-        return Pair{at.lon, at.lat, std::isfinite(at.lat)};
+        return PointAnswer{at.lon, at.lat, std::isfinite(at.lat)};
       });
 }
 
@@ -242,10 +242,10 @@ Made hotine(const MethodArguments& given, double x0, double y0, double azimuth, 
         double u, v;
         const bool plain = map.forward(lon, lat_of_point, &u, &v);
         u -= u0;
-        return Pair{v * c + u * s, u * c - v * s, plain};
+        return PointAnswer{v * c + u * s, u * c - v * s, plain};
       },
       [=](double x, double y) {
-        Pair answer{};
+        PointAnswer answer{};
         map.inverse(y * c + x * s + u0, x * c - y * s, &answer.x, &answer.y);
         answer.plain = std::isfinite(answer.x) && std::isfinite(answer.y);
         return answer;

@@ -72,13 +72,13 @@ Made polar_equal_area(const MethodArguments& given) {
       plane,
       [=](double lon, double lat) {
         const double rho = 2 * std::sin((kHalfPi - pole * sphere.to_authalic(lat)) / 2);
-        return Pair{rho * std::sin(lon), -pole * rho * std::cos(lon)};
+        return PointAnswer{rho * std::sin(lon), -pole * rho * std::cos(lon)};
       },
       [=](double x, double y) {
         const double rho = std::hypot(x, y);
-        if (!(rho <= 2)) return Pair{0, 0, false};
+        if (!(rho <= 2)) return PointAnswer{0, 0, false};
         const double beta = pole * (kHalfPi - 2 * std::asin(rho / 2));
-        return Pair{rho == 0 ? 0 : std::atan2(x, -pole * y), sphere.to_geodetic(beta)};
+        return PointAnswer{rho == 0 ? 0 : std::atan2(x, -pole * y), sphere.to_geodetic(beta)};
       });
 }
 
@@ -167,11 +167,11 @@ Made make_cylindrical_equal_area(const MethodArguments& given) {
   return pointwise(
       plane,
       [=](double lon, double lat) {
-        return Pair{lon, std::sin(sphere.to_authalic(lat))};
+        return PointAnswer{lon, std::sin(sphere.to_authalic(lat))};
       },
       [=](double x, double y) {
-        if (!(std::fabs(y) <= 1 + 1e-12)) return Pair{0, 0, false};
-        return Pair{x, sphere.to_geodetic(std::asin(std::clamp(y, -1.0, 1.0)))};
+        if (!(std::fabs(y) <= 1 + 1e-12)) return PointAnswer{0, 0, false};
+        return PointAnswer{x, sphere.to_geodetic(std::asin(std::clamp(y, -1.0, 1.0)))};
       });
 }
 
@@ -182,11 +182,11 @@ Made make_cylindrical_equal_area_spherical(const MethodArguments& given) {
   return pointwise(
       plane,
       [](double lon, double lat) {
-        return Pair{lon, std::sin(lat)};
+        return PointAnswer{lon, std::sin(lat)};
       },
       [](double x, double y) {
-        if (!(std::fabs(y) <= 1 + 1e-12)) return Pair{0, 0, false};
-        return Pair{x, std::asin(std::clamp(y, -1.0, 1.0))};
+        if (!(std::fabs(y) <= 1 + 1e-12)) return PointAnswer{0, 0, false};
+        return PointAnswer{x, std::asin(std::clamp(y, -1.0, 1.0))};
       });
 }
 
@@ -196,13 +196,13 @@ Made make_equal_earth(const MethodArguments& given) {
   return pointwise(
       plane,
       [=](double lon, double lat) {
-        Pair answer{};
+        PointAnswer answer{};
         EqualEarth::forward(lon, sphere.to_authalic(lat), &answer.x, &answer.y);
         answer.plain = true;
         return answer;
       },
       [=](double x, double y) {
-        Pair answer{};
+        PointAnswer answer{};
         answer.plain = EqualEarth::inverse(x, y, &answer.x, &answer.y);
         answer.y = sphere.to_geodetic(answer.y);
         return answer;
@@ -343,11 +343,11 @@ Made make_equidistant_cylindrical(const MethodArguments& given) {
   return pointwise(
       Plane{given(kLon0), parallel, 1, given(kX0), given(kY0) - origin},
       [=](double lon, double lat) {
-        return Pair{lon, arc.arc(lat)};
+        return PointAnswer{lon, arc.arc(lat)};
       },
       [=](double x, double y) {
         const double lat = arc.latitude(y);
-        return Pair{x, hold(lat), within(lat)};
+        return PointAnswer{x, hold(lat), within(lat)};
       });
 }
 
@@ -410,7 +410,7 @@ Made make_guam(const MethodArguments& given) {
       [=](double lon, double lat) {
         const double s = std::sin(lat);
         const double x = a * lon * std::cos(lat) / std::sqrt(1 - e2 * s * s);
-        return Pair{x, arc.arc(lat) - origin + bend(x, lat)};
+        return PointAnswer{x, arc.arc(lat) - origin + bend(x, lat)};
       },
       [=](double x, double y) {
         double lat = arc.latitude(origin + y);
@@ -421,7 +421,7 @@ Made make_guam(const MethodArguments& given) {
           if (rest) break;
         }
         const double s = std::sin(lat);
-        return Pair{x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat)), lat, within(lat)};
+        return PointAnswer{x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat)), lat, within(lat)};
       });
 }
 
@@ -430,13 +430,13 @@ Made make_colombia_urban(const MethodArguments& given) {
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](double lon, double lat) {
-        Pair answer{};
+        PointAnswer answer{};
         map.forward(lon, lat, &answer.x, &answer.y);
         answer.plain = std::isfinite(answer.y);
         return answer;
       },
       [=](double x, double y) {
-        Pair answer{};
+        PointAnswer answer{};
         map.inverse(x, y, &answer.x, &answer.y);
         answer.plain = within(answer.y) && std::fabs(answer.x) <= kPi;
         return answer;
@@ -453,11 +453,11 @@ Made make_tunisia_mining(const MethodArguments& given) {
   return pointwise(
       Plane{given(kLonF), 1, 1, given(kXF), given(kYF)},
       [=](double lon, double lat) {
-        return Pair{lon / kEast, (lat - lat0) / (lat > lat0 ? kNorth : kSouth)};
+        return PointAnswer{lon / kEast, (lat - lat0) / (lat > lat0 ? kNorth : kSouth)};
       },
       [=](double x, double y) {
         const double lat = lat0 + y * (y > 0 ? kNorth : kSouth);
-        return Pair{x * kEast, lat, within(lat)};
+        return PointAnswer{x * kEast, lat, within(lat)};
       });
 }
 
@@ -480,7 +480,7 @@ Made make_lambert_near_conformal(const MethodArguments& given) {
         const double r = r0 - M;
         const double theta = lon * s0;
         const double x = r * std::sin(theta);
-        return Pair{x, M + x * std::tan(theta / 2)};
+        return PointAnswer{x, M + x * std::tan(theta / 2)};
       },
       [=](double x, double y) {
         const double theta = r0 < 0 ? std::atan2(-x, -(r0 - y)) : std::atan2(x, r0 - y);
@@ -493,7 +493,7 @@ Made make_lambert_near_conformal(const MethodArguments& given) {
           if (std::fabs(step) < 1e-10) break;
         }
         const double lat = arc.latitude(origin + m);
-        return Pair{theta / s0, lat, within(lat)};
+        return PointAnswer{theta / s0, lat, within(lat)};
       });
 }
 
@@ -600,13 +600,13 @@ Made perspective(const MethodArguments& given, double tilt_a, double tilt_b, dou
       plane,
       [=](double lon, double lat) {
         CoordinateTriple point = {lon, lat, 0};
-        if (!map.seen(lon, lat) || !run(false, &point)) return Pair{0, 0, false};
-        return Pair{point.x, point.y};
+        if (!map.seen(lon, lat) || !run(false, &point)) return PointAnswer{0, 0, false};
+        return PointAnswer{point.x, point.y};
       },
       [=](double x, double y) {
         CoordinateTriple point = {x, y, 0};
-        if (!run(true, &point) || !map.seen(point.x, point.y)) return Pair{0, 0, false};
-        return Pair{point.x, point.y};
+        if (!run(true, &point) || !map.seen(point.x, point.y)) return PointAnswer{0, 0, false};
+        return PointAnswer{point.x, point.y};
       });
 }
 

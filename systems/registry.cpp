@@ -794,6 +794,12 @@ std::vector<int> Registry::systems() const {
   return out;
 }
 
+std::vector<int> Registry::ellipsoids() const {
+  std::vector<int> out;
+  for (const EllipsoidRow& row : tables_->ellipsoids) out.push_back(row.code);
+  return out;
+}
+
 std::vector<int> Registry::operations() const {
   std::vector<int> out;
   for (const OperationRow& row : tables_->operations) out.push_back(row.code);

@@ -163,6 +163,7 @@ class Registry {
   // All codes, ascending.
   std::vector<int> systems() const;
   std::vector<int> operations() const;
+  std::vector<int> ellipsoids() const;
 
   // The operations between the datums of two systems, in both directions: an operation stands for
   // all systems of its datums, geographic (2D, 3D) and geocentric, and for those projected from

@@ -176,4 +176,15 @@ std::vector<FoundSystem> System::search(std::string_view words, std::size_t limi
   return list;
 }
 
+std::vector<FoundSystem> System::all() {
+  const detail::Registry& registry = detail::Registry::shared();
+  std::vector<FoundSystem> list;
+  for (const int code : registry.systems()) {
+    if (auto record = registry.system(code)) {
+      list.push_back({code, std::move(record->name), record->kind});
+    }
+  }
+  return list;
+}
+
 }  // namespace tidewater

@@ -953,7 +953,8 @@ TW_API void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, d
  * @param count              number of points
  * @param e                  first eccentricity
  * @param lon0,lat0          origin
- * @param e2,qp,rq           constants of TWlam_az_eq_c(); q1 and m1 are not in the list
+ * @param e2,qp,rq           constants of TWlam_az_eq_c(); q1 and m1 are not in the list.  A qp that
+ *                           is not that of e gives the latitude whose q the geometry finds with it
  * @param sin_b1,cos_b1      constants of TWlam_az_eq_c()
  * @param sin_lat0,cos_lat0  constants of TWlam_az_eq_c()
  * @param D                  constant of TWlam_az_eq_c()
@@ -1082,8 +1083,10 @@ TW_API void TWortho_f(double a, double e, double lon0, double lat0, double x0, d
                       CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse, by iteration along the local vertical to 1e-9 radians.  An inner call sets the word
- * anew, so a word of an earlier point does not outlast a later point that is computed.
+ * Inverse: the local vertical met with the ellipsoid, a quadratic equation, to 1e-15 radians of the
+ * surface; within three degrees of the rim, and above e = 0.1, by iteration along the vertical to
+ * 1e-9 radians.  An inner call sets the word anew, so a word of an earlier point does not outlast a
+ * later point that is computed.
  * @param a          not read
  * @param e          first eccentricity
  * @param lon0,lat0  origin

@@ -152,7 +152,7 @@ TW_API void TWmol_std_i(double a, double e, double da, double df, double dx, dou
  *  @{ */
 
 /**
- * Forward.
+ * Forward (the general polynomial of IOGP Guidance Note 7-2, methods 9645 to 9648).
  * @param coefs   two blocks of coefficients
  * @param d       degree, 0 or more
  * @param count   number of points
@@ -219,7 +219,8 @@ TW_API void TWpoly2deg_i(double x0, double y0, double sx, double sy, double a0, 
  *  @{ */
 
 /**
- * Forward: y' + i x' = c_0 + c_1 z + ... + c_order z^order.
+ * Forward: y' + i x' = c_0 + c_1 z + ... + c_order z^order (IOGP Guidance Note 7-2, methods 9652
+ * and 9653; Snyder 1987, eq. 26-1).
  * @param order        order, 0 or more
  * @param y0,x0,sy,sx  normalising origin and scales, northing FIRST
  * @param coefs        order + 1 pairs

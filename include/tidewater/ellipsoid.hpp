@@ -7,6 +7,7 @@
 
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "tidewater/error.hpp"
 
@@ -35,6 +36,9 @@ class TW_SYSTEMS_API Ellipsoid {
   double inverse_flattening() const { return inverse_flattening_; } /**< 0 for a sphere */
   double flattening() const { return inverse_flattening_ == 0 ? 0 : 1 / inverse_flattening_; }
   double eccentricity() const; /**< first eccentricity */
+
+  /** The names of the registry's ellipsoids. */
+  static std::vector<std::string> names();
 
  private:
   std::string name_;

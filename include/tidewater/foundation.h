@@ -19,7 +19,8 @@ extern "C" {
  *  @{ */
 
 /**
- * Radius of the parallel at a latitude, a cos(lat) / sqrt(1 - e^2 sin^2 lat).
+ * Radius of the parallel at a latitude, a cos(lat) / sqrt(1 - e^2 sin^2 lat) (Snyder 1987, eq.
+ * 14-15).
  * @param a,e     ellipsoid
  * @param lat     latitude, radians, at most pi/2 in size (no tolerance)
  * @param radius  radius, in the unit of a
@@ -28,7 +29,8 @@ extern "C" {
 TW_API void TWRparal(double a, double e, double lat, double* radius, TWstatus* status);
 
 /**
- * Radius of curvature in the meridian, a (1 - e^2) / (1 - e^2 sin^2 lat)^(3/2).
+ * Radius of curvature in the meridian, a (1 - e^2) / (1 - e^2 sin^2 lat)^(3/2) (Snyder 1987, eq.
+ * 4-18).
  * @param a,e     ellipsoid
  * @param lat     latitude, radians, at most pi/2 in size (no tolerance)
  * @param radius  radius, in the unit of a
@@ -37,7 +39,8 @@ TW_API void TWRparal(double a, double e, double lat, double* radius, TWstatus* s
 TW_API void TWRmerid(double a, double e, double lat, double* radius, TWstatus* status);
 
 /**
- * Gaussian mean radius, the geometric mean of the two radii of curvature.
+ * Gaussian mean radius, the geometric mean of the two radii of curvature (IOGP Guidance Note 7-2,
+ * radius of the conformal sphere).
  * @param a,e     ellipsoid
  * @param lat     latitude, radians; not tested
  * @param radius  radius, in the unit of a
@@ -55,7 +58,8 @@ TW_API void TWgaussian_R(double a, double e, double lat, double* radius, TWstatu
 TW_API void TWeq_surf_R(double a, double e, double* radius, TWstatus* status);
 
 /**
- * Radius of the sphere of equal volume, a (1 - e^2)^(1/6).
+ * Radius of the sphere of equal volume, a (1 - e^2)^(1/6) (Moritz, Geodetic Reference System 1980,
+ * R3).
  * @param a,e     ellipsoid
  * @param radius  radius, in the unit of a
  * @param status  #TW_BAD_ECCENTRICITY for e^2 of one or more; radius unwritten
@@ -75,7 +79,7 @@ TW_API void TWeq_vol_R(double a, double e, double* radius, TWstatus* status);
 TW_API void TWmerid_dist_f(double a, double e, double lat, double* distance, TWstatus* status);
 
 /**
- * Latitude at a meridian arc, by iteration to 1e-12 radians.
+ * Latitude at a meridian arc, by iteration of the series of TWmerid_dist_f() to 1e-12 radians.
  * @param a,e       ellipsoid
  * @param distance  signed arc from the equator, in the unit of a
  * @param lat       latitude, radians
@@ -87,7 +91,7 @@ TW_API void TWmerid_dist_f(double a, double e, double lat, double* distance, TWs
 TW_API void TWmerid_dist_i(double a, double e, double distance, double* lat, TWstatus* status);
 
 /**
- * Derivative of the meridian arc by latitude.
+ * Derivative of the meridian arc by latitude: the series of TWmerid_dist_f() term by term.
  * @param a           semi-major axis
  * @param e2          the SQUARE of the first eccentricity; a negative one is not refused
  * @param lat         latitude, radians
@@ -116,7 +120,8 @@ TW_API void TWgeod_conflat(double e, double lat, double* conformal_lat, TWstatus
 TW_API void TWconflat_geod(double e, double conformal_lat, double* lat, TWstatus* status);
 
 /**
- * Normal gravity at a height: Somigliana's formula with a constant free-air gradient of 3.086e-6
+ * Normal gravity at a height: Somigliana's formula (Heiskanen and Moritz, Physical Geodesy, 1967,
+ * eq. 2-78) with a constant free-air gradient of 3.086e-6
  * per second squared.
  * @param a,e            ellipsoid
  * @param gamma_equator  normal gravity at the equator, m/s^2
@@ -140,7 +145,8 @@ TW_API int32_t TWnormal_grav(double a, double e, double gamma_equator, double ga
  *  @{ */
 
 /**
- * Geodetic to geocentric coordinates.
+ * Geodetic to geocentric coordinates (Heiskanen and Moritz, Physical Geodesy, 1967, eq. 5-3); to
+ * the rounding, 3 nm near the earth's surface.
  * @param a,e     ellipsoid
  * @param count   number of points
  * @param in      longitude, latitude (radians), height (in the unit of a)
@@ -164,7 +170,8 @@ TW_API void TWxyz_to_llh(double a, double e, int32_t count, const CoordinateTrip
                          CoordinateTriple* out, TWstatus* status);
 
 /**
- * Sets up a local frame on a point.
+ * Sets up a local frame on a point (the topocentric frame of IOGP Guidance Note 7-2, method 9837,
+ * turned about its z axis).
  *
  * In mode 1 the x axis points along azimuth, clockwise from north, and y lies 90 degrees to its
  * left. In any other mode the axes follow the line from a first to a second point; rows 0 and 1 are
@@ -214,7 +221,7 @@ TW_API void TWlsr_i(double a, double e, double x0, double y0, double z0, const d
                     TWstatus* status);
 
 /**
- * Geodetic to east, north, up on a point.
+ * Geodetic to east, north, up on a point (IOGP Guidance Note 7-2, method 9837).
  * @param a,e           ellipsoid
  * @param scale         user units in one unit of a
  * @param lon0,lat0,h0  the origin
@@ -228,7 +235,8 @@ TW_API void TWllh_to_lsr(double a, double e, double scale, double lon0, double l
                          TWstatus* status);
 
 /**
- * East, north, up on a point to geodetic.
+ * East, north, up on a point to geodetic, the inverse of TWllh_to_lsr() (IOGP Guidance Note 7-2,
+ * method 9837).
  * @param a,e           ellipsoid
  * @param scale         user units in one unit of a; zero is not caught
  * @param lon0,lat0,h0  the origin

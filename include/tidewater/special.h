@@ -837,8 +837,8 @@ TW_API void TWsinusoidal_s(double k0, double lon0, double e2, int32_t count,
 TW_API void TWmollweide_c(double lat0, double* y0, TWstatus* status);
 
 /**
- * Forward (Snyder 1987, eq. 31-1 to 31-4), by iteration to 1e-12 radians, or to rounding where
- * that is the coarser.  No latitude is tested.
+ * Forward (Snyder 1987, eq. 31-1 to 31-4), within 1e-15 of the exact plane point.  No latitude is
+ * tested.
  * @param lon0    central meridian
  * @param y0      constant of TWmollweide_c()
  * @param count   number of points
@@ -879,7 +879,8 @@ TW_API void TWmollweide_i(double lon0, double y0, int32_t count, const Coordinat
 TW_API void TWeckertIV_c(double lat0, double* y0, TWstatus* status);
 
 /**
- * Forward (Snyder 1987, eq. 32-1 to 32-5), by iteration to 1e-12 radians.
+ * Forward (Snyder 1987, eq. 32-1 to 32-5), within 1e-15 of the exact plane point; within 5e-4 radians of
+ * a pole by iteration to 1e-12 radians.
  * @param lon0    central meridian
  * @param y0      constant of TWeckertIV_c()
  * @param count   number of points
@@ -999,7 +1000,9 @@ TW_API void TWvdg_f(double lon0, double y0, int32_t count, const CoordinateTripl
                     CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse, by iteration to 1e-12 radians.  The longitude is not wrapped.
+ * Inverse, in closed form (Rubincam, The American Cartographer 8, 1981), within 1e-11 radians of the
+ * iteration to 1e-12 radians that serves within 0.01 radians of a pole and at the outer circle.  The
+ * longitude is not wrapped.
  * @param lon0    central meridian
  * @param y0      constant of TWvdg_c()
  * @param count   number of points

@@ -90,6 +90,8 @@ class TW_SYSTEMS_API System {
    * @param limit  how many at most
    */
   static std::vector<FoundSystem> search(std::string_view words, std::size_t limit = 20);
+  /** All systems of the registry, by code. */
+  static std::vector<FoundSystem> all();
 
   /** @private */
   const detail::SystemImpl& impl() const { return *impl_; }

@@ -1,6 +1,6 @@
 // Formulas of the standard Molodensky shift of geodetic coordinates between two ellipsoids.
 // IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2 (2022), section 4.4.2; Defense
-// Mapping Agency Technical Report 8350.2 (1987), section 7.4.1.
+// Mapping Agency Technical Report 8350.2 (1991), section 7.
 #pragma once
 
 #include "formulas/radii.hpp"

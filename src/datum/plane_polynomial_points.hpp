@@ -101,7 +101,9 @@ class PlanePolynomialInverse {
       const V dy = select(regular, g * (p.x * over) - f * (q.x * over), 0.0);
       x = select(moving, x - dx, x);
       y = select(moving, y - dy, y);
-      moving = moving & !((abs(dx) < 1e-12) & (abs(dy) < 1e-12));
+      const auto close_x = abs(dx) < 1e-12;
+      const auto close_y = abs(dy) < 1e-12;
+      moving = moving & !(close_x & close_y);
     }
     return {x, y, z};
   }

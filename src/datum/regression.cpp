@@ -4,6 +4,7 @@
 #include "datum/regression_points.hpp"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 
 #include "formulas/wraps.hpp"
@@ -19,13 +20,41 @@ bool tabled(const RegressionSum& s) {
   });
 }
 
-double sum_of(const RegressionSum& s, double u, double v) {
+class Powers {
+ public:
+  explicit Powers(double base) : base_(base) {
+    power_[0] = 1;
+    for (std::size_t k = 1; k < power_.size(); ++k) power_[k] = power_[k - 1] * base;
+  }
+
+  // Powers beyond the table have no place in a model; they are still answered.
+  double operator[](int16_t k) const {
+    return k >= 0 && k < Regression::kPowers ? power_[static_cast<std::size_t>(k)]
+                                             : std::pow(base_, k);
+  }
+
+ private:
+  double base_;
+  std::array<double, Regression::kPowers> power_;
+};
+
+double sum_of(const RegressionSum& s, const Powers& u, const Powers& v) {
   double sum = 0;
   for (int32_t i = 0; i < s.count; ++i) {
-    sum +=
-        s.terms[i].coefficient * std::pow(u, s.terms[i].power_u) * std::pow(v, s.terms[i].power_v);
+    sum += s.terms[i].coefficient * u[s.terms[i].power_u] * v[s.terms[i].power_v];
   }
   return sum;
+}
+
+// A point by itself, with a look at each power; the bits are those of several at once.
+CoordinateTriple term_by_term(const Regression::Parameters& of, const CoordinateTriple& in) {
+  constexpr double kSecondsPerRadian = kDegreesPerRadian * 3600;
+  const double lon = regression_longitude(in.x * kDegreesPerRadian, of.from_zero);
+  const Powers u(of.k * (in.y * kDegreesPerRadian + of.lat_offset));
+  const Powers v(of.k * (lon + of.lon_offset));
+  const double seconds = of.sign / kSecondsPerRadian;
+  return {in.x + seconds * sum_of(of.lon, u, v), in.y + seconds * sum_of(of.lat, u, v),
+          in.z + of.sign * sum_of(of.height, u, v)};
 }
 
 }  // namespace
@@ -40,15 +69,8 @@ Regression::Regression(const Parameters& parameters)
     : of_(parameters),
       tabled_(tabled(parameters.lon) && tabled(parameters.lat) && tabled(parameters.height)) {}
 
-// Powers beyond the table have no place in a model; they are still answered.
 Next Regression::other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus*) const {
-  constexpr double kSecondsPerRadian = kDegreesPerRadian * 3600;
-  const double lon = regression_longitude(in.x * kDegreesPerRadian, of_.from_zero);
-  const double u = of_.k * (in.y * kDegreesPerRadian + of_.lat_offset);
-  const double v = of_.k * (lon + of_.lon_offset);
-  const double seconds = of_.sign / kSecondsPerRadian;
-  *out = {in.x + seconds * sum_of(of_.lon, u, v), in.y + seconds * sum_of(of_.lat, u, v),
-          in.z + of_.sign * sum_of(of_.height, u, v)};
+  *out = term_by_term(of_, in);
   return Next::point;
 }
 
@@ -56,13 +78,19 @@ void TWmre(int32_t count, int16_t direction, int16_t lon_range, int32_t lon_coun
            int32_t lat_count, int32_t height_count, double k, double lon_offset, double lat_offset,
            const MreTerm* lon_terms, const MreTerm* lat_terms, const MreTerm* height_terms,
            const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  const Regression regression({direction == 0 ? -1.0 : 1.0,
-                               lon_range == 1,
-                               k,
-                               lon_offset,
-                               lat_offset,
-                               {lon_terms, lon_count},
-                               {lat_terms, lat_count},
-                               {height_terms, height_count}});
-  *status = over_points(regression, count, in, out);
+  const Regression::Parameters parameters = {direction == 0 ? -1.0 : 1.0,
+                                             lon_range == 1,
+                                             k,
+                                             lon_offset,
+                                             lat_offset,
+                                             {lon_terms, lon_count},
+                                             {lat_terms, lat_count},
+                                             {height_terms, height_count}};
+  if (count <= kFew) {
+    // A look through all terms beforehand would cost as much as their sum.
+    *status = TW_SUCCESS;
+    for (int32_t i = 0; i < count; ++i) out[i] = term_by_term(parameters, in[i]);
+    return;
+  }
+  *status = over_points(Regression(parameters), count, in, out);
 }

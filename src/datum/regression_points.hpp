@@ -1,5 +1,5 @@
 // Datum shift by multiple regression equations.
-// Defense Mapping Agency Technical Report 8350.2 (1987), section 7.4.3 and appendix D.
+// Defense Mapping Agency Technical Report 8350.2 (1991), appendix D.
 #pragma once
 
 #include "formulas/constants.hpp"
@@ -57,7 +57,7 @@ class Regression {
   template <Number V>
   TW_INLINE V sum(const RegressionSum& s, const V (&u)[kPowers], const V (&v)[kPowers]) const {
     V total = 0.0;
-    // The first pass is safe where a power lies outside the table, too; its sum is not used.
+    // Where a power lies outside the table the sum is not used.
     const int32_t count = tabled_ ? s.count : 0;
     for (int32_t i = 0; i < count; ++i) {
       const MreTerm& term = s.terms[i];

@@ -30,8 +30,8 @@ struct ComplexOf {
     const V e = r * select(real, q.im, q.re) + large;
     const V a = select(real, p.re, p.im);
     const V b = select(real, p.im, p.re);
-    const V across = b - a * r;
-    return {(b * r + a) / e, select(real, across, -across) / e};
+    const V turned = b - a * r;
+    return {(b * r + a) / e, select(real, turned, -turned) / e};
   }
 };
 

@@ -25,7 +25,7 @@ struct SphereLatitude {
   V sign;
   V sin, cos;
 
-  TW_INLINE V angle() const { return copysign(kHalfPi - 2.0 * atan(half), sign); }
+  TW_INLINE V angle() const { return copysign(kHalfPi - 2.0 * octant_angle(half, V(1.0)), sign); }
 };
 
 // Of the sphere's isometric latitude psi = atanh(sin chi).

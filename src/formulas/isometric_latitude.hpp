@@ -119,7 +119,8 @@ class ConformalInverse {
     if (series_) {
       const V q = t * t;
       const V inverse = 1.0 / (1.0 + q);
-      return of_conformal(kHalfPi - 2.0 * atan(t), (1.0 - q) * inverse, 2.0 * t * inverse);
+      return of_conformal(kHalfPi - 2.0 * octant_angle(t, V(1.0)), (1.0 - q) * inverse,
+                          2.0 * t * inverse);
     }
     return by_newton(t);
   }

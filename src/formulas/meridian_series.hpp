@@ -41,7 +41,11 @@ struct ArcSeries {
     return c0 * lat + sines.sum(2.0 * at.cos * at.sin, square(at.cos) - square(at.sin));
   }
 
-  double arc(double lat) const { return arc(lat, sincos(lat)); }
+  template <Number V>
+  TW_INLINE V arc(V lat) const {
+    const auto twice = sincos(2.0 * lat);
+    return c0 * lat + sines.sum(twice.sin, twice.cos);
+  }
 };
 
 // Latitude at the rectifying latitude u: u + b2 sin 2u + b4 sin 4u + b6 sin 6u + b8 sin 8u.

@@ -2,7 +2,6 @@
 
 #include "foundation/local_space_points.hpp"
 
-#include <algorithm>
 #include <cmath>
 
 #include "tidewater/foundation.h"
@@ -73,28 +72,24 @@ void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double 
 
 namespace {
 
-LocalFrame frame_of(double x0, double y0, double z0, const double* matrix) {
-  LocalFrame frame = {x0, y0, z0, {}};
-  std::copy_n(matrix, 9, frame.m);
-  return frame;
-}
-
 // The frame with x east, y north, z up.
-LocalFrame east_north_up(double a, double e, double lon0, double lat0, double h0,
-                         TWstatus* status) {
-  LocalFrame frame = {};
-  double azimuth = kHalfPi;
-  TWlsr_c(1, a, e, lon0, lat0, h0, &azimuth, &frame.x0, &frame.y0, &frame.z0, 0, 0, 0, 0, 0, 0,
-          frame.m, status);
-  return frame;
-}
+struct EastNorthUp {
+  double x0 = 0, y0 = 0, z0 = 0;
+  double matrix[9] = {};
+
+  EastNorthUp(double a, double e, double lon0, double lat0, double h0, TWstatus* status) {
+    double azimuth = kHalfPi;
+    TWlsr_c(1, a, e, lon0, lat0, h0, &azimuth, &x0, &y0, &z0, 0, 0, 0, 0, 0, 0, matrix, status);
+  }
+
+  LocalFrame frame() const { return {x0, y0, z0, matrix}; }
+};
 
 }  // namespace
 
 void TWlsr_f(double a, double e, double x0, double y0, double z0, const double* matrix,
              int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status =
-      over_points(GeodeticToLocal{e * e, 1 / a, frame_of(x0, y0, z0, matrix), 1}, count, in, out);
+  *status = over_points(GeodeticToLocal{e * e, 1 / a, {x0, y0, z0, matrix}, 1}, count, in, out);
 }
 
 Next LocalToGeodetic::other(const CoordinateTriple& in, CoordinateTriple* out,
@@ -105,20 +100,20 @@ Next LocalToGeodetic::other(const CoordinateTriple& in, CoordinateTriple* out,
 
 void TWlsr_i(double a, double e, double x0, double y0, double z0, const double* matrix,
              int32_t count, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  *status = over_points(LocalToGeodetic{a, frame_of(x0, y0, z0, matrix), {GeodeticPosition(a, e)}},
-                        count, in, out);
+  *status = over_points(LocalToGeodetic{a, {x0, y0, z0, matrix}, {GeodeticPosition(a, e)}}, count,
+                        in, out);
 }
 
 void TWllh_to_lsr(double a, double e, double scale, double lon0, double lat0, double h0,
                   int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                   TWstatus* status) {
-  const LocalFrame frame = east_north_up(a, e, lon0, lat0, h0, status);
-  *status = over_points(GeodeticToLocal{e * e, 1 / a, frame, a * scale}, count, in, out);
+  const EastNorthUp local(a, e, lon0, lat0, h0, status);
+  *status = over_points(GeodeticToLocal{e * e, 1 / a, local.frame(), a * scale}, count, in, out);
 }
 
 void TWlsr_to_llh(double a, double e, double scale, double lon0, double lat0, double h0,
                   int32_t count, CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
-  const LocalFrame frame = east_north_up(a, e, lon0, lat0, h0, status);
+  const EastNorthUp local(a, e, lon0, lat0, h0, status);
   const double unit = a * scale;
   // By contract: the caller's input array is normalised in place and stays so.
   for (int32_t i = 0; i < count; ++i) {
@@ -126,5 +121,6 @@ void TWlsr_to_llh(double a, double e, double scale, double lon0, double lat0, do
     in[i].y /= unit;
     in[i].z /= unit;
   }
-  *status = over_points(LocalToGeodetic{a, frame, {GeodeticPosition(a, e)}}, count, in, out);
+  *status =
+      over_points(LocalToGeodetic{a, local.frame(), {GeodeticPosition(a, e)}}, count, in, out);
 }

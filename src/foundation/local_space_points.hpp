@@ -5,10 +5,10 @@
 
 namespace tidewater::detail {
 
-// The frame in units of the semi-major axis; the rows of the matrix are its axes.
+// The frame in units of the semi-major axis; the rows of the matrix, nine doubles, are its axes.
 struct LocalFrame {
   double x0, y0, z0;
-  double m[9];
+  const double* m;
 };
 
 struct GeodeticToLocal {

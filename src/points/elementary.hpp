@@ -136,17 +136,14 @@ TW_INLINE V exp(V x) {
   return result;
 }
 
-// The angle of (x, y), from -pi to pi.  1.9 ulp; extremes, two zeros, infinities and not-a-numbers
-// by the standard library.
+// The arc tangent of low / top for 0 <= low <= top, from pi/4 on where upper.
+template <class V>
+struct OctantArc {
+  V arc;
+  Mask<V> upper;
+};
 template <Number V>
-TW_INLINE V atan2(V y, V x) {
-  constexpr double kPi = 0x1.921fb54442d18p+1, kPiLow = 0x1.1a62633145c07p-53;
-  const V ay = abs(y);
-  const V ax = abs(x);
-  const V most = greater(ax, ay);
-  const auto odd = !((most >= 1e-290) & (most <= 1e290) & (ax <= most));
-  const V top = select(odd, 1.0, most);
-  const V low = select(odd, 0.0, lesser(ax, ay));
+TW_INLINE OctantArc<V> octant_arc(V low, V top) {
   // atan(low / top) = pi/4 + atan((low - top) / (low + top)) in the upper half
   const auto upper = low > 0.5 * top;
   const V u = select(upper, low - top, low) / select(upper, low + top, top);
@@ -159,7 +156,29 @@ TW_INLINE V atan2(V y, V x) {
   const V a6 = -0x1.110e5047ee47fp-4 + z * 0x1.e1a203df2d4a2p-5;
   const V a8 = -0x1.ad23c9a7dca3ap-5 + z * 0x1.7aa00a40040e8p-5;
   const V a10 = (-0x1.3696a5427a0e3p-5 + z * 0x1.96179443e6092p-6) + z2 * -0x1.296419f601268p-7;
-  const V arc = u + u * (z * ((a0 + z2 * a2) + z4 * ((a4 + z2 * a6) + z4 * (a8 + z2 * a10))));
+  return {u + u * (z * ((a0 + z2 * a2) + z4 * ((a4 + z2 * a6) + z4 * (a8 + z2 * a10)))), upper};
+}
+
+// The angle of (top, low) for 0 <= low <= top, from 0 to pi/4; the bits of atan2.  1.8 ulp.
+template <Number V>
+TW_INLINE V octant_angle(V low, V top) {
+  constexpr double kQuarter = 0x1.921fb54442d18p-1, kQuarterLow = 0x1.1a62633145c07p-55;
+  const auto octant = octant_arc(low, top);
+  return select(octant.upper, kQuarter + (octant.arc + kQuarterLow), octant.arc);
+}
+
+// The angle of (x, y), from -pi to pi.  1.9 ulp; extremes, two zeros, infinities and not-a-numbers
+// by the standard library.
+template <Number V>
+TW_INLINE V atan2(V y, V x) {
+  constexpr double kPi = 0x1.921fb54442d18p+1, kPiLow = 0x1.1a62633145c07p-53;
+  const V ay = abs(y);
+  const V ax = abs(x);
+  const V most = greater(ax, ay);
+  const auto odd = !((most >= 1e-290) & (most <= 1e290) & (ax <= most));
+  const V top = select(odd, 1.0, most);
+  const V low = select(odd, 0.0, lesser(ax, ay));
+  const auto [arc, upper] = octant_arc(low, top);
   // The arc stands in one of eight sectors: sector + arc or sector - arc.
   const auto steep = ay > ax;
   const auto back = not_zero(bits(x) & Bits<V>(INT64_MIN));

@@ -32,7 +32,8 @@ enum class Form { decimal, colon, packed };
 // A format without a terminator ends with its field.
 Form form_of(const AngleUnit& unit) {
   const auto* end = std::find(std::begin(unit.wide_format), std::end(unit.wide_format), u'\0');
-  const std::u16string_view format(unit.wide_format, end);
+  const std::u16string_view format(unit.wide_format,
+                                   static_cast<std::size_t>(end - unit.wide_format));
   if (format.find(u':') != format.npos) return Form::colon;
   return format == u"dd.mmss" ? Form::packed : Form::decimal;
 }
@@ -193,7 +194,8 @@ std::string angle_text(double value, const AngleUnit& unit, int16_t axis) {
 
 AngleUnit tidewater::detail::with_wide_format(const AngleUnit& unit) {
   const auto* end = std::find(std::begin(unit.format), std::end(unit.format), '\0');
-  const std::u16string format = widen({unit.format, end}, std::size(unit.wide_format) - 1);
+  const std::string_view narrow(unit.format, static_cast<std::size_t>(end - unit.format));
+  const std::u16string format = widen(narrow, std::size(unit.wide_format) - 1);
   AngleUnit wide = unit;
   copy_whole(format, wide.wide_format);
   return wide;

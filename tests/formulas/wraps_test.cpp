@@ -2,8 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include "formulas/isometric_latitude.hpp"
 #include "formulas/pole_hold.hpp"
-#include "projections/isometric_latitude.hpp"
 #include "support/points.hpp"
 
 using namespace tidewater::detail;

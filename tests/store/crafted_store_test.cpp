@@ -10,6 +10,7 @@
 #include <fstream>
 #include <iterator>
 
+#include "database.hpp"
 #include "source_folder.hpp"
 #include "table_store.hpp"
 #include "tidewater/catalogue.h"

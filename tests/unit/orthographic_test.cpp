@@ -1,11 +1,14 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cmath>
 #include <random>
 
 #include "support/numeric_scale.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
 #include "tidewater/conformal.h"
+#include "tidewater/foundation.h"
 
 using namespace tidewater::test;
 
@@ -241,6 +244,79 @@ TEST(Orthographic, AgreesWithProj) {
     }
   }
 #endif
+}
+
+// The inverse as it is stated: the height over the origin's tangent plane by iteration.
+CoordinateTriple stated_inverse(const Orthographic& p, double x, double y) {
+  double z = -(x * x + y * y) / 2, held_lon = p.lon0, held_lat = p.lat0;
+  CoordinateTriple llh = {};
+  for (int pass = 0; pass < 50; ++pass) {
+    const CoordinateTriple w = {p.x0 + p.r[0] * x + p.r[3] * y + p.r[6] * z,
+                                p.y0 + p.r[1] * x + p.r[4] * y + p.r[7] * z,
+                                p.z0 + p.r[2] * x + p.r[5] * y + p.r[8] * z};
+    TWstatus status = 0;
+    TWxyz_to_llh(1, p.e, 1, &w, &llh, &status);
+    const double n = 1 / std::sqrt(1 - std::pow(p.e * std::sin(llh.y), 2));
+    const double up = p.r[6] * (n * std::cos(llh.x) * std::cos(llh.y) - p.x0) +
+                      p.r[7] * (n * std::sin(llh.x) * std::cos(llh.y) - p.y0) +
+                      p.r[8] * ((1 - p.e * p.e) * n * std::sin(llh.y) - p.z0);
+    const double still = std::max(std::fabs(llh.x - held_lon), std::fabs(llh.y - held_lat));
+    if (pass > 0 && still <= 1e-9) break;
+    held_lon = llh.x;
+    held_lat = llh.y;
+    if (up != z) z += llh.z * llh.z / (up - z);
+  }
+  return llh;
+}
+
+TEST(Orthographic, QuadraticBesideTheStatedIteration) {
+  for (const double e : {0.0, 0.01, kE, 0.1}) {
+    for (const double lat0 : {-kPi / 2, -0.9, 0.0, 0.4, 1.3}) {
+      const Orthographic p(e, 0.3, lat0);
+      for (double r = 1e-6; r < 0.98; r += 0.07) {
+        for (double azimuth = 0.05; azimuth < 6.3; azimuth += 0.4) {
+          const double x = r * std::sin(azimuth), y = r * std::cos(azimuth);
+          const CoordinateTriple out = p.inverse({x, y, 0});
+          const CoordinateTriple expected = stated_inverse(p, x, y);
+          // its tolerance, and what the convergence of the meridians makes of it
+          EXPECT_NEAR(out.y, expected.y, 4e-9) << r << " " << azimuth;
+          EXPECT_NEAR(std::remainder(out.x - expected.x, 2 * kPi) * std::cos(out.y), 0, 4e-9);
+        }
+      }
+    }
+  }
+}
+
+TEST(Orthographic, LaterPointClearsTheWordOfTheRim) {
+  // On the ellipsoid the disc of radius 1 - f reaches past the rim on one side: the line of sight
+  // misses the surface, and the passes are used up.
+  const Orthographic p(kE, 0.3, -1.08);
+  const double r = std::sqrt(1 - kE * kE) * (1 - 1e-7);
+  Points out = untouched(1);
+  CoordinateTriple missing = {};
+  for (double azimuth = 0; azimuth < 6.3 && missing.x == 0; azimuth += 0.01) {
+    const CoordinateTriple in = {r * std::sin(azimuth), r * std::cos(azimuth), 0};
+    if (p.inverse({in}, out) == TW_I_LATITUDE_LIMITED) missing = in;
+  }
+  ASSERT_NE(missing.x, 0);
+  const CoordinateTriple plain = {0.1, 0.2, 0}, centre = {0, 0, 0}, outside = {1, 1, 0};
+  out = untouched(3);
+  EXPECT_EQ(p.inverse({missing, plain}, out), TW_SUCCESS);
+  EXPECT_EQ(p.inverse({plain, missing}, out), TW_I_LATITUDE_LIMITED);
+  EXPECT_EQ(p.inverse({missing, centre}, out),
+            TW_I_LATITUDE_LIMITED);  // the centre is not computed
+  EXPECT_EQ(p.inverse({missing, plain, centre}, out), TW_SUCCESS);
+  EXPECT_NE(out[2].x, kUntouched);
+  out = untouched(3);
+  EXPECT_EQ(p.inverse({plain, outside, plain}, out), TW_I_LATITUDE_LIMITED);
+  EXPECT_NE(out[0].x, kUntouched);
+  expect_untouched(out[1]);
+  expect_untouched(out[2]);
+  // In place too, where the last point is overwritten before the word is known.
+  Points both = {missing, plain};
+  EXPECT_EQ(p.inverse(both, both), TW_SUCCESS);
+  both = {plain, missing, centre};
+  EXPECT_EQ(p.inverse(both, both), TW_I_LATITUDE_LIMITED);
 }
 
 }  // namespace

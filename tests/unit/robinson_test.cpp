@@ -289,4 +289,29 @@ TEST(Robinson, NothingToDoAndManyPoints) {
   EXPECT_EQ(many.back().x, many.front().x);
 }
 
+TEST(Robinson, FarFromAHugeCentralMeridian) {
+  // The wrap ends, and gives what single steps give.
+  double knots[19], y_coef[76], x_coef[76], y0 = 0;
+  TWstatus status = 0;
+  TWrobin_c(knots, y_coef, x_coef, &y0, 0, &status);
+  ASSERT_EQ(status, TW_SUCCESS);
+  for (const double lon0 : {1e9, -1e9, 1e13}) {
+    for (const double lon : {lon0 + 100, lon0 - 100, lon0 + 1e5, lon0 + 1}) {
+      double stepped = lon;
+      while (stepped - lon0 < -kPi) stepped += 2 * kPi;
+      while (stepped - lon0 > kPi) stepped -= 2 * kPi;
+      const CoordinateTriple in = {lon, 0, 0};
+      CoordinateTriple out = {};
+      TWrobin_f(knots, y_coef, x_coef, lon0, y0, 1, &out, &in, &status);
+      EXPECT_EQ(status, TW_SUCCESS);
+      EXPECT_DOUBLE_EQ(out.x, 0.8487 * (stepped - lon0)) << lon0 << " " << lon;
+    }
+    const CoordinateTriple in = {0, 0, 0};
+    CoordinateTriple out = {};
+    TWrobin_f(knots, y_coef, x_coef, lon0, y0, 1, &out, &in, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    EXPECT_LE(std::fabs(out.x), 0.8487 * kPi * (1 + 1e-3));
+  }
+}
+
 }  // namespace

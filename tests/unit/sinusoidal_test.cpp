@@ -217,4 +217,21 @@ TEST(Sinusoidal, NothingToDo) {
   expect_untouched(guard[0]);
 }
 
+TEST(Sinusoidal, FarFromAHugeCentralMeridian) {
+  // The wrap ends, and gives what single steps give.
+  for (const double lon0 : {1e9, -1e9, 1e13}) {
+    for (const double x : {100.0, -100.0, 1e5, 1.0}) {
+      double stepped = x + lon0;
+      while (stepped - lon0 < -kPi) stepped += 2 * kPi;
+      while (stepped - lon0 > kPi) stepped -= 2 * kPi;
+      const CoordinateTriple in = {x, 0, 0};
+      CoordinateTriple out = {};
+      TWstatus status = 0;
+      TWsinusoidal_i(lon0, 0, 0, 0, 0, 1, &in, &out, &status);
+      EXPECT_EQ(status, TW_SUCCESS);
+      EXPECT_EQ(out.x, stepped) << lon0 << " " << x;
+    }
+  }
+}
+
 }  // namespace

@@ -13,5 +13,10 @@ inline constexpr int kUsageError = 2;
 void add_convert(CLI::App& app, int& exit_status);
 void add_line(CLI::App& app, int& exit_status);
 void add_magnetic(CLI::App& app, int& exit_status);
+void add_factors(CLI::App& app, int& exit_status);
+void add_geoid(CLI::App& app, int& exit_status);
+void add_systems(CLI::App& app, int& exit_status);
+void add_doctor(CLI::App& app, int& exit_status);
+void add_documents(CLI::App& app, int& exit_status);
 
 }  // namespace tidewater::command

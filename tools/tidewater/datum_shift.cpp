@@ -6,8 +6,6 @@
 #include <stdexcept>
 #include <string_view>
 
-#include "grid_folder.hpp"
-#include "status_name.hpp"
 #include "tidewater/datum.h"
 #include "tidewater/foundation.h"
 
@@ -18,50 +16,6 @@ namespace {
 constexpr double kPi = 3.141592653589793;
 constexpr double kHalfPi = kPi / 2;
 constexpr double kArcSecond = 4.84813681109536e-06;
-
-class NadconShift : public DatumShift {
- public:
-  NadconShift(const std::string& directory, bool inverse) : inverse_(inverse) {
-    TWstatus status = TW_SUCCESS;
-    TWnadcon_c(directory.c_str(), &control_, &status);
-    require(status, directory);
-  }
-
-  TWstatus run(int32_t count, CoordinateTriple* points) override {
-    TWstatus status = TW_SUCCESS;
-    (inverse_ ? TWnadcon_i : TWnadcon_f)(count, points, &control_, points, &status);
-    return status;
-  }
-
- private:
-  NadconControl control_ = {};
-  bool inverse_;
-};
-
-class NationalShift : public DatumShift {
- public:
-  NationalShift(const std::string& directory, bool inverse) : inverse_(inverse) {
-    TWstatus status = TW_SUCCESS;
-    TWcnt_c(directory.c_str(), 0, &status);
-    require(status, directory);
-  }
-
-  TWstatus run(int32_t count, CoordinateTriple* points) override {
-    TWstatus status = TW_SUCCESS;
-    (inverse_ ? TWcnt_i : TWcnt_f)(count, points, 0, points, &status);
-    return status;
-  }
-
-  // The grid is searched by the size of the longitude: a point in the east would be given the shift
-  // of its mirror image in the west.
-  const char* refusal(const CoordinateTriple& point) const override {
-    return point.x > 0 ? "east of Greenwich, and national grids serve the western hemisphere"
-                       : nullptr;
-  }
-
- private:
-  bool inverse_;
-};
 
 // The formulas check nothing: parameters or heights out of all proportion give figures that are no
 // positions.  Longitudes come out a little beyond 180 degrees beside that meridian.
@@ -82,11 +36,12 @@ class MolodenskyShift : public DatumShift {
       // turned round, the points come from the ellipsoid that the parameters lead to
       : d_(d), source_(inverse ? to : from), target_(inverse ? from : to), inverse_(inverse) {}
 
-  TWstatus run(int32_t count, CoordinateTriple* points) override {
+  TWstatus run(int32_t count, CoordinateTriple* points) const override {
     TWstatus status = TW_SUCCESS;
-    (inverse_ ? TWmol_std_i : TWmol_std_f)(source_.a, source_.e(), target_.a - source_.a,
-                                           target_.f - source_.f, d_[0], d_[1], d_[2], count,
-                                           points, points, &status);
+    (inverse_ ? TWmol_std_i : TWmol_std_f)(source_.a(), source_.eccentricity(),
+                                           target_.a() - source_.a(),
+                                           target_.flattening() - source_.flattening(), d_[0],
+                                           d_[1], d_[2], count, points, points, &status);
     return status == TW_SUCCESS ? checked(count, points) : status;
   }
 
@@ -108,13 +63,13 @@ class HelmertShift : public DatumShift {
     if (!(scale_ > -1)) throw std::runtime_error("a scale of zero or less cannot be shifted by");
   }
 
-  TWstatus run(int32_t count, CoordinateTriple* points) override {
+  TWstatus run(int32_t count, CoordinateTriple* points) const override {
     TWstatus status = TW_SUCCESS;
-    TWllh_to_xyz(from_.a, from_.e(), count, points, points, &status);
+    TWllh_to_xyz(from_.a(), from_.eccentricity(), count, points, points, &status);
     (inverse_ ? TWbw_i : TWbw_f)(count, points, scale_, rotation_.data(), t_[0], t_[1], t_[2],
                                  points, &status);
     if (status != TW_SUCCESS) return status;
-    TWxyz_to_llh(to_.a, to_.e(), count, points, points, &status);
+    TWxyz_to_llh(to_.a(), to_.eccentricity(), count, points, points, &status);
     return checked(count, points);
   }
 
@@ -169,16 +124,9 @@ std::unique_ptr<DatumShift> make_datum_shift(const ShiftRequest& request) {
   if (kind == "helmert") {
     return by_formulas<HelmertShift, 7>(request, what, "helmert:DX,DY,DZ,RX,RY,RZ,PPM");
   }
-  if ((kind == "nadcon" || kind == "ntv2") && !what.empty()) {
-    if (request.from) throw std::runtime_error("a shift by grids takes no --from-ellipsoid");
-    if (kind == "nadcon") {
-      return std::make_unique<NadconShift>(grid_directory(what), request.inverse);
-    }
-    return std::make_unique<NationalShift>(grid_directory(what), request.inverse);
-  }
-  throw std::runtime_error("no such shift: " + request.text +
-                           " (nadcon:DIR, ntv2:DIR, molodensky:DX,DY,DZ or "
-                           "helmert:DX,DY,DZ,RX,RY,RZ,PPM)");
+  throw std::runtime_error(
+      "no such shift: " + request.text +
+      " (molodensky:DX,DY,DZ or helmert:DX,DY,DZ,RX,RY,RZ,PPM; nadcon:DIR or ntv2:DIR)");
 }
 
 }  // namespace tidewater::command

@@ -1,11 +1,11 @@
-// The datum shift that --shift names.
+// Datum shifts by formulas of the caller's own.
 #pragma once
 
 #include <memory>
 #include <optional>
 #include <string>
 
-#include "ellipsoid.hpp"
+#include "tidewater/ellipsoid.hpp"
 #include "tidewater/frame.h"
 
 namespace tidewater::command {
@@ -14,13 +14,11 @@ class DatumShift {
  public:
   virtual ~DatumShift() = default;
   // Shifts geodetic points in place, like the library's array calls.
-  virtual TWstatus run(int32_t count, CoordinateTriple* points) = 0;
-  // Why a point must not be given to the shift at all; null when it may.
-  virtual const char* refusal(const CoordinateTriple&) const { return nullptr; }
+  virtual TWstatus run(int32_t count, CoordinateTriple* points) const = 0;
 };
 
 struct ShiftRequest {
-  std::string text;  // nadcon:DIR, ntv2:DIR, molodensky:DX,DY,DZ, helmert:DX,DY,DZ,RX,RY,RZ,PPM
+  std::string text;  // molodensky:DX,DY,DZ, helmert:DX,DY,DZ,RX,RY,RZ,PPM
   bool inverse = false;
   // Of the points before and after they are shifted, in whichever direction; for a shift by
   // formulas, which needs both.

@@ -53,7 +53,7 @@ constexpr Word kWords[] = {
     TIDEWATER_WORD(TW_I_LATITUDE_LIMITED, "a value was held at its limit"),
     TIDEWATER_WORD(TW_I_OUTSIDE_NADCON, "outside the shift grids"),
     TIDEWATER_WORD(TW_I_OUTSIDE_GEOID, "outside the geoid grids"),
-    TIDEWATER_WORD(TW_I_OUTSIDE_CNT, "outside the national grid"),
+    TIDEWATER_WORD(TW_I_OUTSIDE_CNT, "outside the shift grids"),
 };
 #undef TIDEWATER_WORD
 

@@ -50,13 +50,17 @@ class AlbersInverse {
     const V rho2 = square(x) + square(from_apex);
     const V d = atan2(sign * x, sign * from_apex) / n_;
     const V q = (C_ - rho2 * (n_ * n_)) * (1 / n_);
-    Mask<V> plain = (rho2 > 1e-290) & (abs(d) <= kPi);
+    const auto in_fan = abs(d) <= kPi;
+    Mask<V> plain = (rho2 > 1e-290) & in_fan;
     V lat;
     if (sphere_) {
-      plain = plain & (abs(q) <= 2.0);
+      const auto in_range = abs(q) <= 2.0;
+      plain = plain & in_range;
       lat = hold_at_poles_of_sphere(asin(select(plain, q, 0.0) * 0.5));
     } else {
-      plain = plain & everywhere<V>(series_) & (abs(q) < kAwayFromPole * latitude_.q_of_pole());
+      const auto away = abs(q) < kAwayFromPole * latitude_.q_of_pole();
+      const auto served = everywhere<V>(series_);
+      plain = plain & served & away;
       lat = latitude_.of_q(select(plain, q, 0.0));
     }
     return {d + lon0_, lat, plain};  // not wrapped
@@ -90,7 +94,9 @@ struct AlbersScale {
     const auto at = sincos(select(plain, lat, 0.0));
     const V rho_n = sqrt(C - authalic_q(e, at.sin) * n);
     const V m = parallel_radius(e * e, at.sin, at.cos);
-    const auto at_apex = everywhere<V>(abs(n) > 0.9999999999999) & (abs(rho_n / n) < 1e-5);
+    const auto polar = everywhere<V>(abs(n) > 0.9999999999999);
+    const auto close = abs(rho_n / n) < 1e-5;
+    const auto at_apex = polar & close;
     // By contract: -1 marks a pole without a scale.
     const V away = select(abs(m) >= 1e-13, rho_n / m, -1.0);
     const V k = select(at_apex, 1.0, away);

@@ -31,8 +31,8 @@ double beyond_quarter(double s) {
 }  // namespace
 
 // At a pole, and along the meridian of the origin.
-Next EquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
-                               TWstatus* status) const {
+Next AzimuthalEquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                                        TWstatus* status) const {
   const double d = in.x - lon0;
   const double lat = in.y;
   const bool polar = std::fabs(std::fabs(lat0) - kHalfPi) < kEquidistantNothing;
@@ -99,8 +99,8 @@ Next EquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out
   return Next::point;
 }
 
-Next EquidistantScale::other(const CoordinateTriple&, CoordinateTriple* out,
-                             TWstatus* status) const {
+Next AzimuthalEquidistantScale::other(const CoordinateTriple&, CoordinateTriple* out,
+                                      TWstatus* status) const {
   *status = TW_BAD_LATITUDE;
   *out = {k0, k0, k0 * k0};  // filled with the caller's scale
   return Next::point;
@@ -117,9 +117,10 @@ void TWaz_eq_c(double e, double lat0, double* n1, double* g) {
 void TWaz_eq_f(double e, double lon0, double lat0, double n1, double g, int32_t count,
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   const auto at = sincos(lat0);
-  *status = over_points(EquidistantForward{e, e * e, lon0, lat0, n1, g, at.sin, at.cos,
-                                           e * at.cos / std::sqrt(1 - e * e), MeridianArc(1.0, e)},
-                        count, in, out);
+  *status = over_points(
+      AzimuthalEquidistantForward{e, e * e, lon0, lat0, n1, g, at.sin, at.cos,
+                                  e * at.cos / std::sqrt(1 - e * e), MeridianArc(1.0, e)},
+      count, in, out);
 }
 
 void TWaz_eq_i(double e, double lon0, double lat0, double n1, int32_t count,
@@ -128,13 +129,13 @@ void TWaz_eq_i(double e, double lon0, double lat0, double n1, int32_t count,
   const auto at = sincos(lat0);
   const bool north = std::fabs(at.sin - 1) < kNearPole;
   const bool south = std::fabs(at.sin + 1) < kNearPole;
-  *status =
-      over_points(EquidistantInverse{north, north || south, e * e, lon0, lat0, n1, at.sin, at.cos},
-                  count, in, out);
+  *status = over_points(
+      AzimuthalEquidistantInverse{north, north || south, e * e, lon0, lat0, n1, at.sin, at.cos},
+      count, in, out);
 }
 
 void TWaz_eq_s(double lon0, double lat0, double k0, int32_t count, const CoordinateTriple* in,
                CoordinateTriple* out, TWstatus* status) {
   const auto at = sincos(lat0);
-  *status = over_points(EquidistantScale{lon0, lat0, k0, at.sin, at.cos}, count, in, out);
+  *status = over_points(AzimuthalEquidistantScale{lon0, lat0, k0, at.sin, at.cos}, count, in, out);
 }

@@ -14,7 +14,7 @@ inline constexpr double kEquidistantNothing = 1e-12;
 // A plane point this close to the centre is the origin.
 inline constexpr double kEquidistantCentre = 1e-9;
 
-struct EquidistantForward {
+struct AzimuthalEquidistantForward {
   double e, e2, lon0, lat0, n1, g;
   double sin0, cos0;
   double h0;  // e cos lat0 / sqrt(1 - e^2)
@@ -64,7 +64,7 @@ struct EquidistantForward {
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
 };
 
-struct EquidistantInverse {
+struct AzimuthalEquidistantInverse {
   bool north, polar;
   double e2, lon0, lat0, n1;
   double sin0, cos0;
@@ -109,7 +109,7 @@ struct EquidistantInverse {
   }
 };
 
-struct EquidistantScale {
+struct AzimuthalEquidistantScale {
   double lon0, lat0, k0;
   double sin0, cos0;
 
@@ -135,6 +135,6 @@ struct EquidistantScale {
 
 }  // namespace tidewater::detail
 
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantForward)
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantInverse)
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantScale)
+TIDEWATER_INSTANCE(tidewater::detail::AzimuthalEquidistantForward)
+TIDEWATER_INSTANCE(tidewater::detail::AzimuthalEquidistantInverse)
+TIDEWATER_INSTANCE(tidewater::detail::AzimuthalEquidistantScale)

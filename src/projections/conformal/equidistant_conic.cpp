@@ -41,8 +41,8 @@ void TWconic_c(double e, double lat0, double lat1, double lat2, double* n, doubl
 void TWconic_f(double lon0, double n, double G, double rho0, double C0, double C2, double C4,
                double C6, double C8, int32_t count, const CoordinateTriple* in,
                CoordinateTriple* out, TWstatus* status) {
-  *status =
-      over_points(EquidistantForward{lon0, n, G, rho0, {C0, {{C2, C4, C6, C8}}}}, count, in, out);
+  *status = over_points(EquidistantConicForward{lon0, n, G, rho0, {C0, {{C2, C4, C6, C8}}}}, count,
+                        in, out);
 }
 
 void TWconic_i(double lon0, double n, double G, double rho0, double C0, double D2, double D4,
@@ -50,13 +50,13 @@ void TWconic_i(double lon0, double n, double G, double rho0, double C0, double D
                CoordinateTriple* out, TWstatus* status) {
   const double sign = n >= 0 ? 1 : -1;
   const FootSeries foot(SineSeries<4>{{D2, D4, D6, D8}});
-  *status =
-      over_points(EquidistantInverse{lon0, 1 / n, sign, G, rho0, 1 / C0, foot}, count, in, out);
+  *status = over_points(EquidistantConicInverse{lon0, 1 / n, sign, G, rho0, 1 / C0, foot}, count,
+                        in, out);
 }
 
 void TWconic_s(double e, double k0, double n, double G, double C0, double C2, double C4, double C6,
                double C8, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                TWstatus* status) {
   *status =
-      over_points(EquidistantScale{e * e, k0, n, G, {C0, {{C2, C4, C6, C8}}}}, count, in, out);
+      over_points(EquidistantConicScale{e * e, k0, n, G, {C0, {{C2, C4, C6, C8}}}}, count, in, out);
 }

@@ -10,19 +10,19 @@
 
 namespace tidewater::detail {
 
-struct EquidistantForward {
+struct EquidistantConicForward {
   double lon0, n, G, rho0;
   ArcSeries meridian;
 
   template <Number V>
   TW_INLINE Answer<V> operator()(V lon, V lat) const {
     const auto theta = sincos(wrap_turns_below_then_above(lon - lon0) * n);
-    const V r = G - meridian.arc(lat, sincos(lat));
+    const V r = G - meridian.arc(lat);
     return {theta.sin * r, rho0 - theta.cos * r};
   }
 };
 
-struct EquidistantInverse {
+struct EquidistantConicInverse {
   double lon0, over_n, sign, G, rho0, over_c0;
   FootSeries foot;
 
@@ -36,7 +36,7 @@ struct EquidistantInverse {
   }
 };
 
-struct EquidistantScale {
+struct EquidistantConicScale {
   double e2, k0, n, G;
   ArcSeries meridian;
 
@@ -51,6 +51,6 @@ struct EquidistantScale {
 
 }  // namespace tidewater::detail
 
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantForward)
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantInverse)
-TIDEWATER_INSTANCE(tidewater::detail::EquidistantScale)
+TIDEWATER_INSTANCE(tidewater::detail::EquidistantConicForward)
+TIDEWATER_INSTANCE(tidewater::detail::EquidistantConicInverse)
+TIDEWATER_INSTANCE(tidewater::detail::EquidistantConicScale)

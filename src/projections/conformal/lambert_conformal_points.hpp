@@ -15,8 +15,9 @@ struct LambertForward {
 
   template <Number V>
   TW_INLINE Answer<V> operator()(V lon, V lat) const {
-    const auto plain =
-        !((lat > kHalfPi) | (lat < -kHalfPi) | at_north_pole(lat) | at_south_pole(lat));
+    const auto north = at_north_pole(lat);
+    const auto south = at_south_pole(lat);
+    const auto plain = !((lat > kHalfPi) | (lat < -kHalfPi) | north | south);
     const V psi = isometric_latitude(e, sincos(select(plain, lat, 0.0)));
     const V rho = exp(-n * psi) * C;
     const auto theta = sincos(wrap_above_then_at_or_below(lon - lon0) * n);
@@ -85,8 +86,8 @@ struct LambertScale {
 
   template <Number V>
   TW_INLINE Answer3<V> operator()(V /*lon*/, V given) const {
-    Mask<V> plain =
-        !((given > kHalfPi) | (given < -kHalfPi) | (abs(given + kHalfPi) < kPoleMargin));
+    const auto south = abs(given + kHalfPi) < kPoleMargin;
+    Mask<V> plain = !((given > kHalfPi) | (given < -kHalfPi) | south);
     const V lat = select(abs(given - kHalfPi) < kPoleMargin, V(kHalfPi - kPoleMargin), given);
     const auto at = sincos(select(plain, lat, 0.0));
     const V m = parallel_radius(e * e, at.sin, at.cos);

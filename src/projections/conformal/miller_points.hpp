@@ -32,7 +32,7 @@ struct MillerInverse {
     const auto plain = !(abs(v) > 700.0);
     // atan(sinh v) = 2 atan(tanh(v / 2))
     const V m = expm1(abs(select(plain, v, 0.0)));
-    return {x + lon0, copysign(2.5 * atan2(m, m + 2.0), v), plain};
+    return {x + lon0, copysign(2.5 * octant_angle(m, m + 2.0), v), plain};
   }
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
 };

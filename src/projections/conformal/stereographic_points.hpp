@@ -4,6 +4,7 @@
 // 160-163, eq. 21-24 to 21-40.
 #pragma once
 
+#include "formulas/arc_tangent.hpp"
 #include "formulas/isometric_latitude.hpp"
 #include "formulas/radii.hpp"
 #include "formulas/wraps.hpp"
@@ -115,7 +116,7 @@ struct StereographicObliqueInverse {
     const V inverse_sum = 1.0 / (1.0 + w2);
     // By contract: the plain arctangent of the quotient, so that no result lies more than a quarter
     // turn from lon0, and no wrap.
-    const V lon = atan2(select(along < 0.0, -u, u), abs(along)) + lon0;
+    const V lon = atan_of_quotient(u, along) + lon0;
     return {lon, atan2(sine, cosine), sine * inverse_sum, cosine * inverse_sum,
             sqrt(r2) < kStereographicEpsilon};
   }

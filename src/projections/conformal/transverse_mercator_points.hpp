@@ -238,8 +238,12 @@ class TransverseInverse {
     const V xr = x * over_R;
     const V yr = y * over_R + lat0_;
     const V off = yr - foot.lat;
-    const auto in_domain = everywhere<V>(e2_ <= 0.01) & (abs(off) < 0.02) & (abs(xr) < 0.2 * cos) &
-                           (abs(foot.lat) < 1.47) & (abs(y) < 3.0);
+    const auto small_e = everywhere<V>(e2_ <= 0.01);
+    const auto small_off = abs(off) < 0.02;
+    const auto small_lon = abs(xr) < 0.2 * cos;
+    const auto off_poles = abs(foot.lat) < 1.47;
+    const auto in_reach = abs(y) < 3.0;
+    const auto in_domain = small_e & small_off & small_lon & off_poles & in_reach;
     const V half_square = square(off) * 0.5;
     const V s = sin + cos * off - sin * half_square;
     const V c = cos - sin * off - cos * half_square;

@@ -1,48 +1,68 @@
-// Bipolar oblique conic conformal projection of the sphere: two oblique conics, with poles A and B,
-// joined along the great circle through the poles.
+// Bipolar oblique conic conformal projection: its constants, what the contract says of the points
+// that the formulas do not cover, and the exported functions.
+
+#include "projections/special/bipolar_conic_points.hpp"
 
 #include <cmath>
 
-#include "formulas/constants.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;
 
 namespace {
 
-// The cosine of the largest arc that the projection reaches from its pole.
-constexpr double kReach = -0.27531253;
-
 constexpr double kDegree = kPi / 180;
 
 // What the cone makes of a half-angle.
 double tan_power(double half_angle, double n) { return std::pow(std::tan(half_angle), n); }
 
-// A point as seen from one of the two poles.
-class Pole {
- public:
-  Pole(double lon, double lat) : lon_(lon), sin_(std::sin(lat)), cos_(std::cos(lat)) {}
+}  // namespace
 
-  double lon() const { return lon_; }
-  double sin() const { return sin_; }
-  double cos() const { return cos_; }
+namespace tidewater::detail {
 
-  double cos_arc(double d, double sin_lat, double cos_lat) const {
-    return cos_lat * std::cos(d) * cos_ + sin_lat * sin_;
-  }
+namespace {
 
-  // Azimuth at the pole of a point d of longitude away.
-  double azimuth(double d, double tan_lat) const {
-    const double east = std::sin(d);
-    const double north = tan_lat * cos_ - std::cos(d) * sin_;
-    return east == 0 && north == 0 ? 0 : std::atan2(east, north);
-  }
+BipolarPole pole_at(double lon, double lat) {
+  const auto at = sincos(lat);
+  return {lon, at.sin, at.cos};
+}
 
- private:
-  double lon_, sin_, cos_;
-};
+BipolarCone cone_of(double lon_a, double lat_a, double lon_b, double lat_b, double az_ab,
+                    double az_ba, double az_c, double n, double t, double rho_c, double ab,
+                    double f) {
+  const auto at = sincos(az_c);
+  return {pole_at(lon_a, lat_a),
+          pole_at(lon_b, lat_b),
+          az_ab,
+          az_ba,
+          n,
+          t,
+          rho_c,
+          f,
+          std::tan(ab / 2),
+          at.sin,
+          at.cos};
+}
 
 }  // namespace
+
+Next BipolarForward::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_NOT_CONVERGED;  // beyond the reach of both poles
+  return Next::none;
+}
+
+Next BipolarInverse::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
+  *status = TW_NOT_CONVERGED;  // an arc's cosine beyond 1 either way
+  return Next::none;
+}
+
+Next BipolarScale::other(const CoordinateTriple&, CoordinateTriple* out, TWstatus* status) const {
+  *status = TW_I_LATITUDE_LIMITED;
+  *out = {k0, k0, k0 * k0};  // filled with the caller's scale
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
 
 void TWbipocc_param(double* lon_a, double* lat_a, double* lat_b, double* ab, double* z1, double* z2,
                     double* false_easting, double* false_northing, double* lon_c, double* lat_c,
@@ -95,117 +115,24 @@ void TWbipocc_f(double lon_a, double lat_a, double lon_b, double lat_b, double a
                 double az_c, double n, double, double, double t, double rho_c, double ab, double f,
                 int32_t count, CoordinateTriple* out, const CoordinateTriple* in,
                 TWstatus* status) {
-  *status = TW_SUCCESS;
-  const Pole pole_a(lon_a, lat_a);
-  const Pole pole_b(lon_b, lat_b);
-  const double sin_c = std::sin(az_c);
-  const double cos_c = std::cos(az_c);
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    const double lat = in[i].y;
-    const double sin_lat = std::sin(lat);
-    const double cos_lat = std::cos(lat);
-    const double tan_lat = std::tan(lat);
-    const double db = pole_b.lon() - lon;
-    const double azimuth = pole_b.azimuth(db, tan_lat);
-    const bool b_side = azimuth <= az_ba;
-    const double da = lon - pole_a.lon();
-    const double cos_z =
-        b_side ? pole_b.cos_arc(db, sin_lat, cos_lat) : pole_a.cos_arc(da, sin_lat, cos_lat);
-    if (cos_z < kReach) {
-      *status = TW_NOT_CONVERGED;
-      return;
-    }
-    const double z = std::acos(cos_z);
-    const double tz = tan_power(z / 2, n);
-    double r = f * tz;
-    const double al = std::acos((tan_power(std::fabs(ab - z) / 2, n) + tz) / t);
-    double x1 = 0;
-    double y1 = 0;
-    if (b_side) {
-      const double w = (az_ba - azimuth) * n;
-      if (std::fabs(w) < al) r /= std::cos(al - w);
-      x1 = r * std::sin(w);
-      y1 = r * std::cos(w) - rho_c;
-    } else {
-      const double w = (az_ab - pole_a.azimuth(da, tan_lat)) * n;
-      if (std::fabs(w) < al) r /= std::cos(w + al);
-      x1 = r * std::sin(w);
-      y1 = -(r * std::cos(w)) + rho_c;
-    }
-    out[i].x = -(cos_c * x1) - sin_c * y1;
-    out[i].y = -(cos_c * y1) + sin_c * x1;
-  }
+  *status = over_points(
+      BipolarForward{cone_of(lon_a, lat_a, lon_b, lat_b, az_ab, az_ba, az_c, n, t, rho_c, ab, f)},
+      count, in, out);
 }
 
 void TWbipocc_i(double lon_a, double lat_a, double lon_b, double lat_b, double az_ab, double az_ba,
                 double az_c, double n, double t, double rho_c, double ab, double f, double lon_c,
                 int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                 TWstatus* status) {
-  *status = TW_SUCCESS;
-  constexpr int kMostPasses = 30;
-  constexpr double kSecondOfArc = 4.848136811e-6;
-  const Pole pole_a(lon_a, lat_a);
-  const Pole pole_b(lon_b, lat_b);
-  const double sin_c = std::sin(az_c);
-  const double cos_c = std::cos(az_c);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    const double x1 = -(cos_c * x) + sin_c * y;
-    const double y1 = -(sin_c * x) - cos_c * y;
-    const bool a_side = x1 < 0;
-    const double u = a_side ? rho_c - y1 : rho_c + y1;
-    const double r0 = std::sqrt(u * u + x1 * x1);
-    const double w = std::atan2(x1, u);
-    double r = r0;
-    double z = 0;
-    for (int pass = 0; pass < kMostPasses; ++pass) {
-      z = 2 * std::atan(std::pow(r / f, 1 / n));
-      const double g = (tan_power(std::fabs(ab - z) / 2, n) + tan_power(z / 2, n)) / t;
-      if (g < -1 || g > 1) {
-        *status = TW_NOT_CONVERGED;
-        return;
-      }
-      const double al = std::acos(g);
-      if (std::fabs(w) >= al) break;
-      const double previous = r;
-      r = (a_side ? std::cos(w + al) : std::cos(al - w)) * r0;
-      if (std::fabs(r - previous) <= 1e-10) break;
-    }
-    const Pole& pole = a_side ? pole_a : pole_b;
-    const double azimuth = (a_side ? az_ab : az_ba) - w / n;
-    const double cos_az = std::cos(azimuth);
-    const double d = std::atan2(std::sin(azimuth), pole.cos() / std::tan(z) - cos_az * pole.sin());
-    const double lat = std::asin(cos_az * std::sin(z) * pole.cos() + std::cos(z) * pole.sin());
-    const bool at_pole = std::fabs(std::fabs(lat) - kHalfPi) <= kSecondOfArc;
-    out[i].x = at_pole ? lon_c : a_side ? d + pole.lon() : pole.lon() - d;
-    out[i].y = lat;
-  }
+  *status = over_points(
+      BipolarInverse{cone_of(lon_a, lat_a, lon_b, lat_b, az_ab, az_ba, az_c, n, t, rho_c, ab, f),
+                     lon_c},
+      count, in, out);
 }
 
 void TWbipocc_s(double, double, double k0, double lon_a, double lat_a, double lon_b, double lat_b,
                 double n, double f, double az_ba, int32_t count, const CoordinateTriple* in,
                 CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const Pole pole_a(lon_a, lat_a);
-  const Pole pole_b(lon_b, lat_b);
-  for (int32_t i = 0; i < count; ++i) {
-    const double lon = in[i].x;
-    const double lat = in[i].y;
-    const double db = pole_b.lon() - lon;
-    const bool b_side = pole_b.azimuth(db, std::tan(lat)) <= az_ba;
-    const double sin_lat = std::sin(lat);
-    const double cos_lat = std::cos(lat);
-    const double cos_z = b_side ? pole_b.cos_arc(db, sin_lat, cos_lat)
-                                : pole_a.cos_arc(lon - pole_a.lon(), sin_lat, cos_lat);
-    double k = k0;
-    if (cos_z < kReach) {
-      *status = TW_I_LATITUDE_LIMITED;  // the point is filled with the caller's scale
-    } else {
-      const double z = std::acos(cos_z);
-      k = f * tan_power(z / 2, n) * n * k0 / std::sin(z);
-    }
-    out[i] = {k, k, k * k};
-  }
+  *status = over_points(BipolarScale{pole_at(lon_a, lat_a), pole_at(lon_b, lat_b), az_ba, n, f, k0},
+                        count, in, out);
 }

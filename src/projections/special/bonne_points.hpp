@@ -25,8 +25,10 @@ struct BonneForward {
     const auto on_parallel = abs(lat - lat1) <= kBonneNothing;
     const auto at_origin = on_parallel & (abs(d) <= kBonneNothing);
     const auto at = sincos(lat);
-    const Mask<V> plain = everywhere<V>(e2 == 0) | on_parallel |
-                          (everywhere<V>(meridian.good()) & !(abs(lat) > kHalfPi));
+    const auto sphere = everywhere<V>(e2 == 0);
+    const auto good = everywhere<V>(meridian.good());
+    const auto short_of_poles = !(abs(lat) > kHalfPi);
+    const Mask<V> plain = sphere | on_parallel | (good & short_of_poles);
     V r = r0 - lat;
     V angle = at.cos * d / r;
     if (e2 != 0) {
@@ -64,14 +66,19 @@ struct BonneInverse {
 
   template <Number V>
   TW_INLINE Answer<V> operator()(V x, V y) const {
-    const auto at_origin = (abs(y) <= kBonneNothing) & (abs(x) <= kBonneNothing);
+    const auto no_x = abs(x) <= kBonneNothing;
+    const auto no_y = abs(y) <= kBonneNothing;
+    const Mask<V> at_origin = no_x & no_y;
     const V r = radius(x, y);
     V lat = r0 - r;
     Mask<V> plain = everywhere<V>(true);
     if (e2 != 0) {
-      plain = everywhere<V>(foot.serves()) & (abs(lat) <= foot.quarter());
+      const auto served = everywhere<V>(foot.serves());
+      const auto in_reach = abs(lat) <= foot.quarter();
+      plain = served & in_reach;
       lat = foot.latitude(select(plain, lat, 0.0));
-      plain = at_origin | (plain & (abs(lat) <= kHalfPi));
+      const auto on_earth = abs(lat) <= kHalfPi;
+      plain = at_origin | (plain & on_earth);
     }
     return {select(at_origin, lon0, longitude(x, y, r, lat)), select(at_origin, lat1, lat), plain};
   }
@@ -85,8 +92,11 @@ struct BonneScale {
   TW_INLINE Answer3<V> operator()(V lon, V lat) const {
     const V d = wrap_turns_below_then_above(lon - lon0);
     // By contract: a latitude is tested only off the central meridian and the standard parallel.
-    const auto off = (abs(d) > kBonneNothing) & (abs(lat - lat1) > kBonneNothing);
-    const Mask<V> plain = !(off & (abs(lat) - kHalfPi > kBonneNothing));
+    const auto off_meridian = abs(d) > kBonneNothing;
+    const auto off_parallel = abs(lat - lat1) > kBonneNothing;
+    const Mask<V> off = off_meridian & off_parallel;
+    const auto beyond = abs(lat) - kHalfPi > kBonneNothing;
+    const Mask<V> plain = !(off & beyond);
     const auto at = sincos(lat);
     const V r = r0 - lat;
     const V g = (at.cos - r * at.sin) / r * d;

@@ -123,6 +123,7 @@ void TWchamtri_f(double e, const CoordinateTriple* control, const double* sides,
     ux[j] = (to.x - plane[j].x) / sides[j];
     uy[j] = (to.y - plane[j].y) / sides[j];
   }
+  // One by one: each of a point's three geodesics sets the caller's word anew.
   for (int32_t i = 0; i < count; ++i) {
     const CoordinateTriple p = in[i];
     double azimuth[3] = {};

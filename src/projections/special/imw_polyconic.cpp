@@ -1,9 +1,10 @@
-// Modified polyconic projection of the International Map of the World, sheet by sheet.
+// Modified polyconic projection of the International Map of the World: its constants, what the
+// contract says of the points that the formulas do not cover, and the exported functions.
+
+#include "projections/special/imw_polyconic_points.hpp"
 
 #include <cmath>
 
-#include "formulas/constants.hpp"
-#include "foundation/meridian_arc.hpp"
 #include "tidewater/frame.h"
 #include "tidewater/special.h"
 
@@ -12,9 +13,8 @@ using namespace tidewater::detail;
 namespace {
 
 constexpr double kTwoDegrees = 2 * kPi / 180;
-constexpr double kFourDegrees = kTwoDegrees * 2;
+constexpr double kFourDegrees = kSheetHeight;
 constexpr double kEightDegrees = kTwoDegrees * 4;
-constexpr double kNone = 1e-13;  // what counts as zero
 
 // Half the width of a sheet: it grows towards the poles.
 double half_width(double lat) {
@@ -33,35 +33,25 @@ double arc_radius(double e2, double lat) {
 
 double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
 
-struct Sheet {
-  double e2, lon0, lat1, r1, r2, c, p, q, s, t;
-  double sin1, sin2;
-  MeridianArc meridian;
+}  // namespace
 
-  Sheet(double e, double lon0_, double lat1_, double r1_, double r2_, double c_, double p_,
-        double q_, double s_, double t_)
-      : e2(e * e),
-        lon0(lon0_),
-        lat1(lat1_),
-        r1(r1_),
-        r2(r2_),
-        c(c_),
-        p(p_),
-        q(q_),
-        s(s_),
-        t(t_),
-        sin1(std::sin(lat1)),
-        sin2(std::sin(lat1 + kFourDegrees)),
-        meridian(1, e) {}
+namespace tidewater::detail {
 
-  // Northing of the bounding parallel in the south at a longitude difference.
-  double south_edge_y(double d) const {
-    return std::fabs(sin1) < kNone ? 0 : (1 - std::cos(sin1 * d)) * r1;
-  }
-
-  // The plane point; nothing is written on a failure.
-  TWstatus forward(double lon, double lat, double* x, double* y) const;
-};
+Sheet::Sheet(double e, double lon0_, double lat1_, double r1_, double r2_, double c_, double p_,
+             double q_, double s_, double t_)
+    : e2(e * e),
+      lon0(lon0_),
+      lat1(lat1_),
+      r1(r1_),
+      r2(r2_),
+      c(c_),
+      p(p_),
+      q(q_),
+      s(s_),
+      t(t_),
+      sin1(std::sin(lat1)),
+      sin2(std::sin(lat1 + kFourDegrees)),
+      meridian(1, e) {}
 
 TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
   TWstatus status = TW_SUCCESS;
@@ -75,14 +65,14 @@ TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
   if (!TW_OK(arc_status)) return arc_status;
   const double xb_mid = t * m + s;
   const double yb_mid = q * m + p;
-  const bool curved = std::fabs(lat) >= kNone;
+  const bool curved = std::fabs(lat) >= kSheetNothing;
   double r = 0;
   double yc = yb_mid;
   if (curved) {
     const double g = lat >= 0 ? 1 : -1;
     if (std::fabs(lat) <= 1.5707963267947966) r = arc_radius(e2, lat);
     yc = 0;
-    if (std::fabs(lat - lat1) >= kNone) {
+    if (std::fabs(lat - lat1) >= kSheetNothing) {
       const double under = r * r - xb_mid * xb_mid;
       if (under < 0) return TW_RANGE_ERROR;
       yc = g * std::sqrt(under) + yb_mid - r;
@@ -100,11 +90,11 @@ TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
   // The meridian is the straight line between its points on the two bounding parallels.
   double xb = d;
   double yb = c;
-  if (!(std::fabs(sin2) < kNone)) {
+  if (!(std::fabs(sin2) < kSheetNothing)) {
     xb = std::sin(sin2 * d) * r2;
     yb = (1 - std::cos(sin2 * d)) * r2 + c;
   }
-  const double xa = std::fabs(sin1) < kNone ? d : std::sin(sin1 * d) * r1;
+  const double xa = std::fabs(sin1) < kSheetNothing ? d : std::sin(sin1 * d) * r1;
   const double ya = south_edge_y(d);
   const double slope = (xb - xa) / (yb - ya);
   const double b = (yc + r - ya) * slope + xa;
@@ -120,7 +110,45 @@ TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
   return status;
 }
 
-}  // namespace
+Next SheetForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                         TWstatus* status) const {
+  const TWstatus word = sheet.forward(in.x, in.y, &out->x, &out->y);
+  if (word != TW_SUCCESS) *status = word;
+  return TW_OK(word) ? Next::point : Next::none;
+}
+
+Next SheetInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                         TWstatus* status) const {
+  const double x = in.x;
+  const double y = in.y;
+  double lon = x * over_cos2 + sheet.lon0;
+  double lat = lat2;
+  int passes = 0;
+  for (; passes < kSheetPasses; ++passes) {
+    const double d = lon - sheet.lon0;
+    double xc = 0;
+    double yc = 0;
+    if (!TW_OK(sheet.forward(lon, lat, &xc, &yc))) {
+      *status = TW_I_LATITUDE_LIMITED;
+      break;
+    }
+    if (std::fabs(x - xc) < kSheetNothing && std::fabs(y - yc) < kSheetNothing) break;
+    const double w = sheet.south_edge_y(d);
+    lat = std::fabs(yc - w) <= kSheetNothing ? sheet.lat1
+                                             : (lat - sheet.lat1) * (y - w) / (yc - w) + sheet.lat1;
+    lon = std::fabs(xc) <= kSheetNothing ? sheet.lon0 : d * x / xc + sheet.lon0;
+  }
+  if (passes == kSheetPasses) *status = TW_I_LATITUDE_LIMITED;
+  if (std::fabs(lat) > kHalfPi) {
+    lat = hold_at_pole(lat);
+    *status = TW_I_LATITUDE_LIMITED;
+  }
+  out->x = lon;
+  out->y = lat;
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
 
 void TWIMWmodP_stp(double lon0, double lat, double* lon_w, double* lon_e, double* lat1,
                    double* lat2, TWstatus* status) {
@@ -152,7 +180,7 @@ void TWIMWmodPoly_c(double e, double, double lat1, double* r1, double* r2, doubl
   for (int i = 0; i < 2; ++i) {
     const double lat = i == 0 ? lat1 : lat1 + kFourDegrees;
     double angle = 0;
-    if (std::fabs(std::tan(lat)) >= kNone) {
+    if (std::fabs(std::tan(lat)) >= kSheetNothing) {
       r[i] = arc_radius(e * e, lat);
       angle = std::sin(lat) * dl;
       x[i] = std::sin(angle) * r[i];
@@ -178,48 +206,14 @@ void TWIMWmodPoly_c(double e, double, double lat1, double* r1, double* r2, doubl
 void TWIMWmodPoly_f(double e, double lon0, double lat1, double r1, double r2, double c, double p,
                     double q, double s, double t, int32_t count, const CoordinateTriple* in,
                     CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const Sheet sheet(e, lon0, lat1, r1, r2, c, p, q, s, t);
-  for (int32_t i = 0; i < count; ++i) {
-    const TWstatus word = sheet.forward(in[i].x, in[i].y, &out[i].x, &out[i].y);
-    if (word != TW_SUCCESS) *status = word;
-    if (!TW_OK(word)) return;
-  }
+  *status = over_points(SheetForward{Sheet(e, lon0, lat1, r1, r2, c, p, q, s, t)}, count, in, out);
 }
 
 void TWIMWmodPoly_i(double e, double lon0, double lat1, double r1, double r2, double c, double p,
                     double q, double s, double t, int32_t count, const CoordinateTriple* in,
                     CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  constexpr int kMostPasses = 15;
-  const Sheet sheet(e, lon0, lat1, r1, r2, c, p, q, s, t);
   const double lat2 = lat1 + kFourDegrees;
-  const double cos2 = std::cos(lat2);
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    double lon = x / cos2 + lon0;
-    double lat = lat2;
-    int passes = 0;
-    for (; passes < kMostPasses; ++passes) {
-      const double d = lon - lon0;
-      double xc = 0;
-      double yc = 0;
-      if (!TW_OK(sheet.forward(lon, lat, &xc, &yc))) {
-        *status = TW_I_LATITUDE_LIMITED;
-        break;
-      }
-      if (std::fabs(x - xc) < kNone && std::fabs(y - yc) < kNone) break;
-      const double w = sheet.south_edge_y(d);
-      lat = std::fabs(yc - w) <= kNone ? lat1 : (lat - lat1) * (y - w) / (yc - w) + lat1;
-      lon = std::fabs(xc) <= kNone ? lon0 : d * x / xc + lon0;
-    }
-    if (passes == kMostPasses) *status = TW_I_LATITUDE_LIMITED;
-    if (std::fabs(lat) > kHalfPi) {
-      lat = hold_at_pole(lat);
-      *status = TW_I_LATITUDE_LIMITED;
-    }
-    out[i].x = lon;
-    out[i].y = lat;
-  }
+  *status = over_points(
+      SheetInverse{Sheet(e, lon0, lat1, r1, r2, c, p, q, s, t), lat2, 1 / std::cos(lat2)}, count,
+      in, out);
 }

@@ -1,8 +1,10 @@
-// Polyhedric projection of the Indian quarter-inch sheets: a short power series about an origin.
+// Polyhedric projection of the Indian quarter-inch sheets: what the contract says of the points
+// that the formulas do not cover, and the exported functions.
+
+#include "projections/special/indian_polyhedric_points.hpp"
 
 #include <cmath>
 
-#include "formulas/wraps.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;
@@ -46,45 +48,42 @@ void TWind_phed_c(double e, double lat0, double* c1, double* c2, double* c3, dou
   *c6 = (e2 + 1 - 2 * e2 * e2) / 6;
 }
 
+namespace tidewater::detail {
+
+Next PolyhedricInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                              TWstatus* status) const {
+  double d = (in.x - lon0) * w;
+  double p = (in.y - lat0) * w;
+  double r = 1e10;
+  int passes = 0;
+  ResidualWatch watch;
+  while (r > kPolyhedricTolerance && passes <= kPolyhedricPasses) {
+    ++passes;
+    const double ey = in.y - series.y(d, p);
+    const double ex = in.x - series.x(d, p);
+    d += w * ex;
+    p += w * ey;
+    r = std::sqrt(ex * ex + ey * ey);
+    // The residual of the first pass is that of the odd start, and is not watched.
+    if (passes > 1 && watch.diverges(r)) passes = kPolyhedricPasses + 1;
+  }
+  if (passes > kPolyhedricPasses) *status = TW_NOT_CONVERGED;  // the point is written all the same
+  out->x = d + lon0;
+  out->y = p + lat0;
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
+
 void TWind_phed_f(double lon0, double lat0, double c1, double c2, double c3, double c4, double c5,
                   double c6, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                   TWstatus* status) {
-  *status = TW_SUCCESS;
-  for (int32_t i = 0; i < count; ++i) {
-    const double d = wrap_above_then_at_or_below(in[i].x - lon0);
-    const double p = in[i].y - lat0;
-    out[i].x = (c1 - p * c3) * d;
-    out[i].y = (p * c5 * c4 + p * p * c6 + c2) * p + d * d * c4;
-  }
+  *status = over_points(PolyhedricForward{lon0, lat0, {c1, c2, c3, c4, c5, c6}}, count, in, out);
 }
 
 void TWind_phed_i(double a, double lon0, double lat0, double c1, double c2, double c3, double c4,
                   double c5, double c6, int32_t count, const CoordinateTriple* in,
                   CoordinateTriple* out, TWstatus* status) {
-  *status = TW_SUCCESS;
-  constexpr int kMostPasses = 30;
-  const double w = a * kStepPerLength;
-  for (int32_t i = 0; i < count; ++i) {
-    const double x = in[i].x;
-    const double y = in[i].y;
-    // By contract: the origin's angles are taken off plane values for the start.
-    double d = (x - lon0) * w;
-    double p = (y - lat0) * w;
-    double r = 1e10;
-    int passes = 0;
-    ResidualWatch watch;
-    while (r > 1e-09 && passes <= kMostPasses) {
-      ++passes;
-      const double ey = y - ((p * p * c6 + p * c5 * c4 + c2) * p + d * d * c4);
-      const double ex = x - (c1 - p * c3) * d;
-      d += w * ex;
-      p += w * ey;
-      r = std::sqrt(ex * ex + ey * ey);
-      // The residual of the first pass is that of the odd start, and is not watched.
-      if (passes > 1 && watch.diverges(r)) passes = kMostPasses + 1;
-    }
-    if (passes > kMostPasses) *status = TW_NOT_CONVERGED;  // the point is written all the same
-    out[i].x = d + lon0;
-    out[i].y = p + lat0;
-  }
+  *status = over_points(PolyhedricInverse{lon0, lat0, a * kStepPerLength, {c1, c2, c3, c4, c5, c6}},
+                        count, in, out);
 }

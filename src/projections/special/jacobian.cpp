@@ -1,4 +1,5 @@
-// Local distortion of any transformation of points, by finite differences.
+// Local distortion of any transformation of points, by finite differences.  Points go one by one:
+// the time is the caller's transformation's, and the records of nine are not points.
 
 #include <cmath>
 

@@ -59,7 +59,9 @@ struct LabordeRefinedInverse {
       const auto [u, v] = laborde_cubic(X, Y);
       const V next_x = x - start.A * u - start.B * v;
       const V next_y = start.B * u + y - start.A * v;
-      const auto close = (abs(next_x - X) <= 1e-14) & (abs(next_y - Y) <= 1e-14);
+      const auto close_x = abs(next_x - X) <= 1e-14;
+      const auto close_y = abs(next_y - Y) <= 1e-14;
+      const auto close = close_x & close_y;
       X = select(moving, next_x, X);
       Y = select(moving, next_y, Y);
       if (passes == kMostPasses - 1) break;

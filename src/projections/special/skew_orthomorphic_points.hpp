@@ -3,6 +3,7 @@
 // paras. 17-25.
 #pragma once
 
+#include "formulas/arc_tangent.hpp"
 #include "formulas/isometric_latitude.hpp"
 #include "points/over_points.hpp"
 
@@ -16,12 +17,6 @@ TW_INLINE V half_log_ratio(V g) {
   return log((g + 1.0) / (1.0 - g)) * 0.5;
 }
 
-// The plain arc tangent of a quotient.
-template <Number V>
-TW_INLINE V arc_tangent_of(V numerator, V denominator) {
-  return atan2(select(denominator < 0.0, -numerator, numerator), abs(denominator));
-}
-
 struct SkewForward {
   double lon0, sin_g, cos_g, A, B, C, e;
 
@@ -31,7 +26,7 @@ struct SkewForward {
     const V W = isometric_latitude(e, sincos(lat)) * B + C;
     const Mask<V> plain = !(abs(W) > kHyperbolicLimit);
     const auto h = sinhcosh(select(plain, W, 0.0));
-    const V u = arc_tangent_of(cos_g * h.sinh - d.sin * sin_g, d.cos) * (A / B);
+    const V u = atan_of_quotient(cos_g * h.sinh - d.sin * sin_g, d.cos) * (A / B);
     const V v = half_log_ratio((-(cos_g * d.sin) - h.sinh * sin_g) / h.cosh) * (A / B);
     return {v * cos_g + u * sin_g, cos_g * u - sin_g * v, plain};
   }
@@ -48,7 +43,7 @@ struct SkewInverse {
     const V v = (cos_g * x - sin_g * y) * (B / A);
     const Mask<V> plain = !(abs(v) > kHyperbolicLimit);
     const auto h = sinhcosh(select(plain, v, 0.0));
-    const V lon = lon0 - arc_tangent_of(-(cos_g * h.sinh) - u.sin * sin_g, u.cos) * (1 / B);
+    const V lon = lon0 - atan_of_quotient(-(cos_g * h.sinh) - u.sin * sin_g, u.cos) * (1 / B);
     const V W = half_log_ratio((cos_g * u.sin - h.sinh * sin_g) / h.cosh);
     return {lon, inverse.of_isometric((W - C) * (1 / B)), plain};
   }

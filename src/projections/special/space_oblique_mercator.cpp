@@ -1,4 +1,7 @@
-// Space oblique Mercator projection of the ellipsoid for a satellite on an elliptical orbit.
+// Space oblique Mercator projection: its constants by integration along an orbit, what the contract
+// says of the points that the formulas do not cover, and the exported functions.
+
+#include "projections/special/space_oblique_mercator_points.hpp"
 
 #include <array>
 #include <cmath>
@@ -6,42 +9,11 @@
 #include <memory>
 #include <new>
 
-#include "formulas/wraps.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::detail;
 
 namespace {
-
-// An a0 smaller than this is zero but for rounding: the orbit is circular.
-constexpr double kSteady = 1e-10;
-
-// Eccentric anomaly at the angle L along the orbit.
-struct Orbit {
-  double eps, om, root;
-
-  Orbit(double eps_, double om_) : eps(eps_), om(om_), root(std::sqrt((1 - eps_) / (1 + eps_))) {}
-  double eccentric_anomaly(double L) const { return 2 * std::atan(std::tan((L - om) / 2) * root); }
-  double mean_anomaly(double E) const { return E - eps * std::sin(E); }
-  // Rate of the satellite along its orbit.
-  double rate(double E) const { return square(1 - eps * std::cos(E)) / std::sqrt(1 - eps * eps); }
-};
-
-// Components of the ground track's velocity with respect to L.
-struct Track {
-  double Q, T, W, P, s_inc, c_inc;
-
-  struct Velocity {
-    double B1, B4;
-    double speed() const { return std::sqrt(B1 * B1 + B4 * B4); }
-  };
-  Velocity at(double sl2, double cos_L, double U) const {
-    const double A1 = 1 + Q * sl2;
-    const double A2 = 1 + W * sl2;
-    return {(A2 / (A1 * A1) - P * c_inc * U) * std::sqrt(A1 / A2),
-            std::sqrt((1 + T * sl2) / (A2 * A1)) * cos_L * P * s_inc * U};
-  }
-};
 
 // Simpson's sums of K sequences f(0)..f(N) at once, N even, without the factor h / 3.
 template <std::size_t K, class F>
@@ -61,45 +33,44 @@ std::array<double, K> simpson(int32_t N, F f) {
   return sum;
 }
 
-// The Fourier series of the projection, and what follows from them at an angle along the orbit.
-struct Series {
-  int16_t n_terms;
-  double a0;
-  const double *C, *S, *X1, *X2, *X3, *X4;
-  Orbit orbit;
-  Track track;
-
-  struct Terms {
-    double T1, T2, Cx, Cy, speed;
-  };
-  // U is the satellite's rate at L.
-  Terms at(double L, double U) const {
-    const double s1 = std::sin(L);
-    const double c1 = std::cos(L);
-    double s = 0;  // sin and cos of n L, by turning on from term to term
-    double c = 1;
-    double theta = 0;
-    Terms t{};
-    for (int16_t n = 0; n < n_terms; ++n) {
-      const double next = s * c1 + c * s1;
-      c = c * c1 - s * s1;
-      s = next;
-      theta += (1 - c) * S[n] + s * C[n];
-      t.T1 += s * X1[n] - c * X4[n];
-      t.T2 += s * X2[n] - c * X3[n];
-    }
-    theta += a0 * L;
-    const Track::Velocity v = track.at(s1 * s1, c1, U);
-    const double sin_t = std::sin(theta);
-    const double cos_t = std::cos(theta);
-    t.Cx = cos_t * v.B1 - sin_t * v.B4;
-    t.Cy = cos_t * v.B4 + sin_t * v.B1;
-    t.speed = v.speed();
-    return t;
-  }
-};
-
 }  // namespace
+
+namespace tidewater::detail {
+
+// By contract: where the passes were used up, the point is completed from the last values.
+Next SpaceForward::other(const CoordinateTriple& in, CoordinateTriple* out,
+                         TWstatus* status) const {
+  const auto at = place(in.x, in.y);
+  *status = TW_I_LATITUDE_LIMITED;
+  out->x = at.x;
+  out->y = at.y;
+  return Next::point;
+}
+
+Next SpaceInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
+                         TWstatus* status) const {
+  const auto at = place(in.x, in.y);
+  if (at.moving) *status = TW_I_LATITUDE_LIMITED;
+  double lat = at.lat;
+  if (at.at.cos == 0) {
+    const double s_inc = series.track.s_inc;
+    const double c_inc2 = square(series.track.c_inc);
+    const double s2 = square(at.sin_ph);
+    const double a = s_inc * series.track.c_inc * G;
+    const double b = c_inc2 * G * G - s_inc * s_inc + s2 * e2;
+    const double c2 = 1 - s2;
+    const double r = std::sqrt((c2 - c_inc2 * e2) * G);
+    const double width = std::sqrt(4 * a * a + b * b);
+    const double side = at.at.sin < 0 ? -1 : 1;
+    lat =
+        std::asin(side * std::sqrt(2 * a * (a + side * at.sin_ph * r) - (c2 - c_inc2) * b) / width);
+  }
+  out->x = at.lon;
+  out->y = lat;
+  return Next::point;
+}
+
+}  // namespace tidewater::detail
 
 void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_terms,
              int16_t n_points, double* Q, double* T, double* W, double* G, double* a0, double* C,
@@ -115,10 +86,8 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
   if (N % 2 != 0) ++N;
   const double h = 2 * kPi / N;
   const std::size_t size = static_cast<std::size_t>(N) + 1;
-  const std::unique_ptr<double[]> speeds(new (std::nothrow) double[size]);
-  const std::unique_ptr<double[]> turns(new (std::nothrow) double[size]);
-  double* const s = speeds.get();
-  double* const c = turns.get();
+  const std::unique_ptr<double[]> s(new (std::nothrow) double[size]);
+  const std::unique_ptr<double[]> c(new (std::nothrow) double[size]);
   if (!s || !c) {
     *status = TW_NO_MEMORY;
     return;
@@ -234,57 +203,28 @@ void TWsom_f(int16_t orbit, int16_t side, int16_t n_terms, double lon_n, double 
              const double* X4, double R1, double R2, double R3, double R4, double m_sin,
              double m_cos, double sum3, double sum4, int32_t count, const CoordinateTriple* in,
              CoordinateTriple* out, int32_t axes, TWstatus* status) {
-  *status = TW_SUCCESS;
-  const double e2 = e * e;
-  const double s_inc = std::sin(inc);
-  const double c_inc = std::cos(inc);
-  const Series series = {
-      n_terms, a0, C, S, X1, X2, X3, X4, Orbit(eps, om), {Q, T, W, P, s_inc, c_inc}};
   const double start = (side + 4 * orbit + 2) * kPi / 2;
-  const double half_turn = std::sin(start) * kHalfPi;
-  const double D = std::sqrt(m_cos * m_cos + m_sin * m_sin);
-  for (int32_t i = 0; i < count; ++i) {
-    const double d = in[i].x - lon_n;
-    const double lat = in[i].y;
-    const double sin_lat = std::sin(lat);
-    const double cos_lat = std::cos(lat);
-    const double base = std::cos(start * P + d) < 0 ? start + half_turn : start - half_turn;
-    const double rise = s_inc * std::tan(lat) * G;
-    double L = start;
-    double previous = 1.0;
-    double E = 0;
-    double lt = 0;
-    for (int passes = 0; std::fabs(previous - L) > 1e-10;) {
-      previous = L;
-      if (++passes > 50) {
-        *status =
-            TW_I_LATITUDE_LIMITED;  // By contract: the point is completed from the last values
-        break;
-      }
-      E = series.orbit.eccentric_anomaly(L);
-      lt = (series.orbit.mean_anomaly(E) + om) * P + d;
-      L = std::atan((rise + c_inc * std::sin(lt)) / std::cos(lt)) + base;
-    }
-    const double ph = std::asin((sin_lat * c_inc * G - std::sin(lt) * cos_lat * s_inc) /
-                                std::sqrt(1 - e2 * sin_lat * sin_lat));
-    const Series::Terms t = series.at(L, series.orbit.rate(E));
-    const double y0 = std::log(std::tan(ph / 2 + kQuarterPi));
-    double x = 0;
-    double y = 0;
-    if (std::fabs(a0) < kSteady) {
-      const double X = m_sin * L + t.T1 + sum4 - y0 * t.Cx / t.speed;
-      const double Y = m_cos * L + t.T2 + sum3 + y0 * t.Cy / t.speed;
-      x = (X * m_sin + Y * m_cos) / D;
-      y = (Y * m_sin - X * m_cos) / D;
-    } else {
-      const double sin_u = std::sin(a0 * L);
-      const double cos_u = std::cos(a0 * L);
-      x = sin_u * (t.T2 + R1) - cos_u * (R2 - t.T1) + R3 - y0 * t.Cx / t.speed;
-      y = sin_u * (R2 - t.T1) + cos_u * (t.T2 + R1) - R4 + y0 * t.Cy / t.speed;
-    }
-    out[i].x = axes == 1 ? x : y;
-    out[i].y = axes == 1 ? y : -x;
-  }
+  const SpaceSeries series = {n_terms,
+                              a0,
+                              C,
+                              S,
+                              X1,
+                              X2,
+                              X3,
+                              X4,
+                              R1,
+                              R2,
+                              R3,
+                              R4,
+                              m_sin,
+                              m_cos,
+                              sum3,
+                              sum4,
+                              Orbit(eps, om),
+                              {Q, T, W, P, std::sin(inc), std::cos(inc)}};
+  *status = over_points(
+      SpaceForward{series, lon_n, e * e, G, start, std::sin(start) * kHalfPi, axes == 1}, count, in,
+      out);
 }
 
 void TWsom_i(int16_t n_terms, double lon_n, double e, double inc, double P, double eps, double om,
@@ -293,77 +233,25 @@ void TWsom_i(int16_t n_terms, double lon_n, double e, double inc, double P, doub
              double R2, double R3, double R4, double m_sin, double m_cos, double sum3, double sum4,
              int32_t count, const CoordinateTriple* in, CoordinateTriple* out, int32_t axes,
              TWstatus* status) {
-  *status = TW_SUCCESS;
-  const double e2 = e * e;
-  const double s_inc = std::sin(inc);
-  const double c_inc = std::cos(inc);
-  const double c_inc2 = c_inc * c_inc;
-  const Series series = {
-      n_terms, a0, C, S, X1, X2, X3, X4, Orbit(eps, om), {Q, T, W, P, s_inc, c_inc}};
-  const double D = std::sqrt(m_cos * m_cos + m_sin * m_sin);
-  const double q = c_inc2 * e2 / G;
-  const bool steady = -kSteady <= a0 && a0 <= kSteady;
-  for (int32_t i = 0; i < count; ++i) {
-    double X = axes == 1 ? in[i].x : -in[i].y;
-    double Y = axes == 1 ? in[i].y : in[i].x;
-    if (std::fabs(a0) <
-        kSteady) {  // By contract: strict here, and not where the branch is taken below
-      const double x = X;
-      X = (m_sin * x - m_cos * Y) / D;
-      Y = (m_sin * Y + m_cos * x) / D;
-    }
-    double L = Y;
-    double previous = 1.0;
-    // These hold also where the first test ends the loop, for a Y hard by 1.
-    Series::Terms t = series.at(L, series.orbit.rate(series.orbit.eccentric_anomaly(L)));
-    for (int passes = 0; std::fabs(previous - L) > 1e-10;) {
-      previous = L;
-      if (++passes > 50) {
-        *status =
-            TW_I_LATITUDE_LIMITED;  // By contract: the point is completed from the last values
-        break;
-      }
-      if (passes > 1) t = series.at(L, series.orbit.rate(series.orbit.eccentric_anomaly(L)));
-      if (steady) {
-        L = ((X - sum4 - t.T1) * t.Cy + (Y - sum3 - t.T2) * t.Cx) / (t.Cy * m_sin + t.Cx * m_cos);
-      } else {
-        const double c = std::cos(a0 * L);
-        L = std::asin(((X - R3 - c * t.T1) * t.Cy + (t.Cy * R2 - R1 * t.Cx) * c +
-                       (R4 + Y - c * t.T2) * t.Cx) /
-                      ((R1 + t.T2) * t.Cy + (R2 - t.T1) * t.Cx)) /
-            a0;
-      }
-    }
-    const double v = steady
-                         ? m_sin * L + sum4 + t.T1 - X
-                         : std::sin(a0 * L) * (R1 + t.T2) + R3 - X - std::cos(a0 * L) * (R2 - t.T1);
-    const double ph = 2 * (std::atan(std::exp(v * t.speed / t.Cx)) - kQuarterPi);
-    const double mean_anomaly = series.orbit.mean_anomaly(series.orbit.eccentric_anomaly(L));
-    const double sin_ph = std::sin(ph);
-    const double s2 = square(sin_ph);
-    const double sin_L = std::sin(L);
-    const double cos_L = std::cos(L);
-    const double g = (sin_L * c_inc * (1 - s2 / G) -
-                      std::sqrt((1 + Q * sin_L * sin_L) * (1 - s2) - s2 * q) * s_inc * sin_ph) /
-                     (1 - (q + 1) * s2);
-    const double lt = std::atan2(g, cos_L);
-    double lat = 0;
-    if (cos_L == 0) {
-      const double a = s_inc * c_inc * G;
-      const double b = c_inc2 * G * G - s_inc * s_inc + s2 * e2;
-      const double c2 = square(std::cos(ph));
-      const double r = std::sqrt((c2 - c_inc2 * e2) * G);
-      const double width = std::sqrt(4 * a * a + b * b);
-      lat = std::asin(sin_L < 0 ? -std::sqrt(2 * a * (a - sin_ph * r) - (c2 - c_inc2) * b) / width
-                                : std::sqrt(2 * a * (a + sin_ph * r) - (c2 - c_inc2) * b) / width);
-    } else if (std::fabs(inc) <= 1e-10) {
-      lat = std::asin(sin_ph / std::sqrt(s2 * e2 + G * G));
-    } else {
-      lat = std::atan((std::cos(lt) * std::tan(L) - std::sin(lt) * c_inc) / (s_inc * G));
-    }
-    out[i].x = wrap_below_then_above(lt + lon_n - (om + mean_anomaly) * P);
-    out[i].y = lat;
-  }
+  const SpaceSeries series = {n_terms,
+                              a0,
+                              C,
+                              S,
+                              X1,
+                              X2,
+                              X3,
+                              X4,
+                              R1,
+                              R2,
+                              R3,
+                              R4,
+                              m_sin,
+                              m_cos,
+                              sum3,
+                              sum4,
+                              Orbit(eps, om),
+                              {Q, T, W, P, std::sin(inc), std::cos(inc)}};
+  *status = over_points(SpaceInverse{series, lon_n, e * e, inc, G, axes == 1}, count, in, out);
 }
 
 void TWsomps(int32_t paths, double lon_ref, int16_t row, int16_t path, int16_t row_first,

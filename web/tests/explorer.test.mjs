@@ -1,0 +1,207 @@
+// The explorer in a headless Chromium.
+
+import assert from "node:assert/strict";
+import { readFileSync } from "node:fs";
+import { createRequire } from "node:module";
+import { after, before, test } from "node:test";
+import { openExplorer } from "./browser.mjs";
+import { LAMBERT, nativeFigures } from "./native.mjs";
+
+const axe = readFileSync(createRequire(import.meta.url).resolve("axe-core/axe.min.js"), "utf8");
+
+let explorer, page;
+before(async () => {
+  explorer = await openExplorer();
+  page = explorer.page;
+});
+after(() => explorer.close());
+
+const settled = () => page.waitForTimeout(400);
+const figures = () => page.locator("#figures").innerText();
+
+test("every projection draws without errors and without stray lines", async () => {
+  const drawn = await page.evaluate(() =>
+    explorer.projections.map(({ id, controls }) => {
+      explorer.state.tissot = true;
+      const runs = [];
+      // As it comes, and turned so that land lies on its edges.
+      for (const turn of [0, 97, -171]) {
+        explorer.chooseProjection(id);
+        if (controls.some((c) => c.key === "lon0")) explorer.state.values.lon0 = turn || explorer.state.values.lon0;
+        if (controls.some((c) => c.key === "lat0") && turn) explorer.state.values.lat0 = turn / 3;
+        explorer.drawNow(turn !== 0);
+        const { view } = explorer;
+        const { data } = view.context.getImageData(0, 0, view.canvas.width, view.canvas.height);
+        let painted = 0;
+        for (let i = 3; i < data.length; i += 4) if (data[i] > 0) ++painted;
+        const border = view.outline.x.filter((v) => !Number.isFinite(v)).length;
+        const size = Math.hypot(view.box[2] - view.box[0], view.box[3] - view.box[1]);
+        runs.push({ longest: view.longest, size, painted: painted / (data.length / 4), border });
+      }
+      return { id, runs };
+    }));
+  assert.ok(drawn.length >= 40);
+  for (const { id, runs } of drawn) {
+    for (const { longest, size, painted, border } of runs) {
+      // Steps of the data are four degrees at most: much of a small region's map, and more than on the
+      // ground beside the poles of Van der Grinten's. A line across a map is a fifth of it and more.
+      const most = size > 2e7 ? 0.08 : Math.max(0.08, 5.2e5 / size);
+      assert.ok(longest > 0 && longest < most, `${id}: a step of ${longest} of the map's diagonal`);
+      assert.ok(painted > 0.08, `${id}: only ${painted} of the canvas is painted`);
+      assert.equal(border, 0, `${id}: its border has points without an image`);
+    }
+  }
+  const worst = drawn.flatMap(({ id, runs }) => runs.map((r) => [r.longest, id])).sort((a, b) => b[0] - a[0])[0];
+  console.log(`${drawn.length} projections; the longest step is ${worst[0].toFixed(4)} of the diagonal (${worst[1]})`);
+  assert.deepEqual(explorer.errors, []);
+});
+
+test("figures shown are the native library's", async () => {
+  for (const { kind, what, numbers } of nativeFigures()) {
+    const [lon, lat, x, y] = numbers;
+    const got = await page.evaluate(({ kind: k, what: w, lon: a, lat: b, lambert }) => {
+      if (k === "transform") {
+        explorer.chooseSystem(Number(w.slice(5)));
+        explorer.drawNow();
+        const f = explorer.figuresAt(a, b);
+        return [f.x, f.y];
+      }
+      return explorer.library.projection(w, w === "lambert conformal" ? lambert : {}).forward(a, b);
+    }, { kind, what, lon, lat, lambert: LAMBERT });
+    assert.ok(Math.abs(got[0] - x) < 1e-7 && Math.abs(got[1] - y) < 1e-7, `${what}: ${got}, native ${[x, y]}`);
+  }
+  // And as text.
+  const [, , x, y] = nativeFigures().find((f) => f.what === "EPSG:2154").numbers;
+  await page.evaluate(() => {
+    explorer.chooseSystem(2154);
+    explorer.state.points = [[2.35, 48.85]];
+    explorer.drawNow();
+  });
+  const text = await figures();
+  for (const value of [x, y]) {
+    const shown = value.toLocaleString("en", { minimumFractionDigits: 3, maximumFractionDigits: 3 });
+    assert.ok(text.includes(`${shown} m`), `${shown} in ${text}`);
+  }
+});
+
+test("a click gives the point's figures, a second one the way", async () => {
+  await page.evaluate(() => {
+    explorer.state.points = [];
+    explorer.chooseProjection("mercator");
+  });
+  await settled();
+  const box = await page.locator("#map").boundingBox();
+  await page.mouse.click(box.x + box.width * 0.5, box.y + box.height * 0.5);
+  await settled();
+  assert.match(await figures(), /Point A[\s\S]*Latitude[\s\S]*Convergence/);
+  await page.mouse.click(box.x + box.width * 0.6, box.y + box.height * 0.4);
+  await settled();
+  assert.match(await figures(), /Shortest way[\s\S]*km[\s\S]*Rhumb line[\s\S]*Longer by/);
+  assert.match(page.url(), /projection=mercator.*a=.*b=/);
+});
+
+test("dragging turns the map, frame by frame", async () => {
+  await page.evaluate(() => explorer.chooseProjection("orthographic"));
+  await settled();
+  const box = await page.locator("#map").boundingBox();
+  const [x, y] = [box.x + box.width / 2, box.y + box.height / 2];
+  const before_ = await page.evaluate(() => ({ ...explorer.state.values }));
+  await page.mouse.move(x, y);
+  await page.mouse.down();
+  for (let i = 1; i <= 10; ++i) await page.mouse.move(x - 8 * i, y + 4 * i);
+  await page.mouse.up();
+  await settled();
+  const after_ = await page.evaluate(() => ({ ...explorer.state.values }));
+  assert.ok(after_.lon0 > before_.lon0 + 5, `${after_.lon0}`);
+  assert.ok(after_.lat0 > before_.lat0 + 2, `${after_.lat0}`);
+  assert.equal(Number(await page.inputValue("#number-lon0")), after_.lon0);
+  const spent = await page.evaluate(() =>
+    [true, false].map((moving) => {
+      const times = [];
+      for (let i = 0; i < 40; ++i) {
+        explorer.state.values.lon0 = i * 3 - 60;
+        const begin = performance.now();
+        explorer.drawNow(moving);
+        times.push(performance.now() - begin);
+      }
+      return times.sort((a, b) => a - b)[20].toFixed(1);
+    }));
+  console.log(`a frame while the hand moves: ${spent[0]} ms, at rest in full detail: ${spent[1]} ms`);
+});
+
+test("the keyboard turns and zooms", async () => {
+  await page.evaluate(() => explorer.chooseProjection("robinson"));
+  await page.focus("#map");
+  await page.keyboard.press("ArrowRight");
+  await page.keyboard.press("+");
+  await page.keyboard.press("Enter");
+  await settled();
+  const { lon0, zoom, points } = await page.evaluate(() => ({
+    lon0: explorer.state.values.lon0, zoom: explorer.state.zoom, points: explorer.state.points.length }));
+  assert.equal(lon0, 5);
+  assert.equal(zoom, 1.25);
+  assert.equal(points, 1);
+});
+
+test("search finds systems by name and by code", async () => {
+  await page.fill("#search", "lambert-93");
+  await page.waitForSelector("#found button");
+  assert.match(await page.locator("#found").innerText(), /RGF93 v1 \/ Lambert-93/);
+  await page.fill("#search", "27700");
+  await page.waitForSelector("#found button");
+  await page.keyboard.press("ArrowDown");
+  await page.keyboard.press("Enter");
+  await settled();
+  assert.equal(await page.evaluate(() => explorer.state.code), 27700);
+  assert.match(page.url(), /system=27700/);
+  await page.fill("#search", "qqqqqq");
+  assert.match(await page.locator("#found").innerText(), /Nothing/);
+  await page.fill("#search", "");
+});
+
+test("an address brings its view back", async () => {
+  await page.goto(`http://127.0.0.1:${explorer.port}/#projection=albers&lon0=20&lat1=10&lat2=50&distortion=area&a=10,20`);
+  await page.reload();
+  await page.waitForSelector("html[data-ready]");
+  await settled();
+  const state = await page.evaluate(() => explorer.state);
+  assert.deepEqual(
+    [state.id, state.values.lon0, state.values.lat1, state.values.lat2, state.distortion],
+    ["albers", 20, 10, 50, "area"]);
+  assert.deepEqual(state.points, [[10, 20]]);
+  assert.ok(await page.isVisible("#legend"));
+});
+
+test("a file is converted and offered", async () => {
+  await page.fill("#from", "EPSG:4326");
+  await page.fill("#to", "EPSG:2154");
+  await page.setInputFiles("#file", {
+    name: "places.csv", mimeType: "text/csv", buffer: Buffer.from("name,lon,lat\nParis,2.35,48.85\n") });
+  const link = page.locator("#converted a");
+  await link.waitFor();
+  const [download] = await Promise.all([page.waitForEvent("download"), link.click()]);
+  assert.equal(download.suggestedFilename(), "places-epsg-2154.csv");
+  assert.equal(readFileSync(await download.path(), "utf8"), "name,lon,lat\nParis,652301.5648,6861302.7259\n");
+  await page.fill("#to", "nowhere at all");
+  await page.setInputFiles("#file", { name: "a.csv", mimeType: "text/csv", buffer: Buffer.from("1,2\n") });
+  await page.waitForFunction(() => /nowhere at all/.test(document.querySelector("#converted").textContent));
+});
+
+for (const dark of [false, true]) {
+  for (const width of [1280, 390]) {
+    test(`nothing bars anybody: ${dark ? "dark" : "light"}, ${width} wide`, async () => {
+      const other = await openExplorer({
+        width, height: 844, dark, hash: "#projection=lambert-conformal&distortion=angle&a=2,48&b=10,50" });
+      await other.page.waitForTimeout(400);
+      await other.page.evaluate(axe);
+      const { violations } = await other.page.evaluate(() => axe.run());
+      const grave = violations.filter((v) => ["serious", "critical"].includes(v.impact));
+      assert.deepEqual(grave.map((v) => `${v.id}: ${v.nodes.map((n) => n.html).join(" ")}`), []);
+      const overflow = await other.page.evaluate(
+        () => document.documentElement.scrollWidth - document.documentElement.clientWidth);
+      assert.equal(overflow, 0);
+      assert.deepEqual(other.errors, []);
+      await other.close();
+    });
+  }
+}
