@@ -100,7 +100,7 @@ TW_INLINE V power_of_two(V k) {
   return number(shift_left(bits(k + 0x1.8p52) + Bits<V>(int64_t{1023}), 52));
 }
 
-// e^r - 1 = r + tail for |r| <= ln 2 / 2, as the two parts; low is what r lacks.
+// x = k ln 2 + r with |r| <= ln 2 / 2, and e^r - 1 = r + tail.
 template <class V>
 struct Expm1Parts {
   V k, r, tail;
