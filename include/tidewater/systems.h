@@ -18,6 +18,7 @@
 #include <stdint.h>
 
 #include "tidewater/frame.h"
+#include "tidewater/version.h"
 
 #if defined(TIDEWATER_STATIC) || defined(TIDEWATER_SYSTEMS_STATIC)
 #define TW_SYSTEMS_C_API
@@ -38,7 +39,7 @@ extern "C" {
 /** @name Help
  *  @{ */
 
-/** The version of the library, "0.1.0". */
+/** The version of the library that is loaded, as TIDEWATER_VERSION is that of the headers. */
 TW_SYSTEMS_C_API const char* tw_version(void);
 
 /** What a status word says, in a sentence; never null, and the text stays. */
