@@ -20,7 +20,10 @@ struct GridContent;
 
 /** Where the nodes of a grid lie, degrees; west may be beyond -180, east beyond 180. */
 struct GridBounds {
-  double west, south, east, north;
+  double west;  /**< westernmost nodes */
+  double south; /**< southernmost nodes */
+  double east;  /**< easternmost nodes */
+  double north; /**< northernmost nodes */
 };
 
 /**
@@ -100,6 +103,7 @@ class TW_SYSTEMS_API ShiftGrid {
  */
 class TW_SYSTEMS_API GeoidGrid {
  public:
+  /** How undulations are found between nodes. */
   enum class Interpolation {
     bilinear,   /**< on the four nodes around a point */
     biquadratic /**< of the second order both ways, on the three nearest nodes each way */

@@ -30,6 +30,7 @@ struct ParsedAngle {
   Axis axis = Axis::unknown; /**< by its letter, else as it was asked for */
   std::string reason = {};   /**< a sentence; empty when the angle was read */
 
+  /** There is no reason why not. */
   explicit operator bool() const { return reason.empty(); }
 };
 
@@ -72,6 +73,7 @@ struct ParsedPosition {
   double height = std::numeric_limits<double>::quiet_NaN(); /**< metres; not-a-number without one */
   std::string reason = {}; /**< a sentence; empty when the position was read */
 
+  /** There is no reason why not. */
   explicit operator bool() const { return reason.empty(); }
 };
 
@@ -112,7 +114,7 @@ enum class AngleMarks {
 
 /** How an angle is written. */
 struct AngleFormat {
-  AngleForm form = AngleForm::degrees;
+  AngleForm form = AngleForm::degrees; /**< how it is divided */
   AngleMarks marks = AngleMarks::none; /**< colons where the form has parts and none is asked */
   int precision = 8; /**< decimals of the last part, 0 to 15; in minutes and seconds at most 9 */
   Axis axis = Axis::unknown; /**< letter N, S, E, W behind; unknown: a sign in front */
@@ -126,6 +128,7 @@ inline constexpr std::size_t kAngleTextSize = 64;
  *
  * @param degrees  east and north positive; "nan" is written for what is not finite or beyond a
  *                 million degrees
+ * @param format   how it is written
  * @param out      kAngleTextSize bytes; no terminator is written
  * @return the number of bytes written
  */
@@ -147,6 +150,7 @@ struct GridPosition {
   double square = 0;
   std::string reason = {}; /**< a sentence; empty when there is a position */
 
+  /** There is no reason why not. */
   explicit operator bool() const { return reason.empty(); }
 };
 

@@ -83,27 +83,32 @@ class TW_SYSTEMS_API Transformation {
    */
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to single. */
   Summary forward(std::size_t count, Coordinates<const float> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to double. */
   Summary forward(std::size_t count, Coordinates<const float> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from double precision to single. */
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
   /** Points of the target to points of the source; otherwise as forward(). */
   Summary inverse(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to single. */
   Summary inverse(std::size_t count, Coordinates<const float> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to double. */
   Summary inverse(std::size_t count, Coordinates<const float> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from double precision to single. */
   Summary inverse(std::size_t count, Coordinates<const double> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
-  /** One point; not-a-numbers where it fails. */
-  Point forward(Point point) const noexcept;
-  Point inverse(Point point) const noexcept;
+  Point forward(Point point) const noexcept; /**< One point; not-a-numbers where it fails. */
+  Point inverse(Point point) const noexcept; /**< One point; not-a-numbers where it fails. */
 
-  const System& source() const;
-  const System& target() const;
+  const System& source() const; /**< the system it leads from */
+  const System& target() const; /**< the system it leads to */
   /** The steps in words, a line each, with the operation taken and its accuracy. */
   std::string describe() const;
   /** Stated accuracy of the datum step in metres: 0 without one, not-a-number when unknown. */

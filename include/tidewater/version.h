@@ -9,9 +9,9 @@
 #ifndef TIDEWATER_VERSION_H
 #define TIDEWATER_VERSION_H
 
-#define TIDEWATER_VERSION_MAJOR 1
-#define TIDEWATER_VERSION_MINOR 0
-#define TIDEWATER_VERSION_PATCH 0
+#define TIDEWATER_VERSION_MAJOR 1 /**< rises when a program that works has to be changed */
+#define TIDEWATER_VERSION_MINOR 0 /**< rises when something is added */
+#define TIDEWATER_VERSION_PATCH 0 /**< rises when something is mended */
 
 /** The three numbers as text. */
 #define TIDEWATER_VERSION "1.0.0"
