@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/datum.h"
+#include "tidewater/complex_polynomial.h"
 
 using namespace tidewater::detail;
 

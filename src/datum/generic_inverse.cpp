@@ -4,7 +4,7 @@
 #include <cmath>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/generic_inverse.h"
 
 using namespace tidewater::detail;
 

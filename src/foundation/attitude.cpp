@@ -3,7 +3,7 @@
 #include <cmath>
 
 #include "formulas/constants.hpp"
-#include "tidewater/foundation.h"
+#include "tidewater/attitude.h"
 
 using namespace tidewater::detail;
 

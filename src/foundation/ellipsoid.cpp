@@ -4,7 +4,7 @@
 
 #include "formulas/constants.hpp"
 #include "foundation/meridian_arc.hpp"
-#include "tidewater/foundation.h"
+#include "tidewater/ellipsoid.h"
 
 namespace tidewater::detail {
 namespace {

@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/foundation.h"
+#include "tidewater/geocentric.h"
 
 using namespace tidewater::detail;
 

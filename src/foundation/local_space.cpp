@@ -4,7 +4,7 @@
 
 #include <cmath>
 
-#include "tidewater/foundation.h"
+#include "tidewater/local_space.h"
 
 using namespace tidewater::detail;
 

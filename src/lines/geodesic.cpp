@@ -16,8 +16,8 @@
 #include <cstdint>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/lines.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/geodesic.h"
 
 using namespace tidewater::detail;
 namespace points = tidewater::points;

@@ -3,9 +3,9 @@
 #include <cmath>
 
 #include "formulas/constants.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
-#include "tidewater/lines.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/mercator.h"
+#include "tidewater/rhumb.h"
 
 using namespace tidewater::detail;
 

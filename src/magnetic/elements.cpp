@@ -7,8 +7,9 @@
 #include <new>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/magnetic.h"
+#include "tidewater/geocentric.h"
+#include "tidewater/harmonic_synthesis.h"
+#include "tidewater/magnetic_elements.h"
 
 using namespace tidewater::detail;
 

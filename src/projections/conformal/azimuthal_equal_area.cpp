@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "tidewater/azimuthal_equal_area.h"
 
 using namespace tidewater::detail;
 

@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "tidewater/azimuthal_equidistant.h"
 
 using namespace tidewater::detail;
 

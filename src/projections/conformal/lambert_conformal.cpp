@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "formulas/pole_hold.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/lambert_conformal.h"
 
 using namespace tidewater::detail;
 

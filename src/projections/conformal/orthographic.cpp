@@ -5,8 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
+#include "tidewater/geocentric.h"
+#include "tidewater/orthographic.h"
 
 using namespace tidewater::detail;
 

@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "projections/turn_points.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/perspective.h"
 
 using namespace tidewater::detail;
 

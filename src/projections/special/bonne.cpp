@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "tidewater/bonne.h"
 
 using namespace tidewater::detail;
 

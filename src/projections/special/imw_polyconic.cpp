@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "tidewater/frame.h"
-#include "tidewater/special.h"
+#include "tidewater/imw_polyconic.h"
 
 using namespace tidewater::detail;
 

@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "tidewater/indian_polyhedric.h"
 
 using namespace tidewater::detail;
 

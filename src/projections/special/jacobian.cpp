@@ -4,8 +4,8 @@
 #include <cmath>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/special.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/jacobian.h"
 
 using namespace tidewater::detail;
 

@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "tidewater/oblique_mercator.h"
 
 using namespace tidewater::detail;
 

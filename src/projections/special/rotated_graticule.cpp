@@ -4,7 +4,7 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "tidewater/rotated_graticule.h"
 
 using namespace tidewater::detail;
 

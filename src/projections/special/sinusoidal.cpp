@@ -5,8 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/foundation.h"
-#include "tidewater/special.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/sinusoidal.h"
 
 using namespace tidewater::detail;
 

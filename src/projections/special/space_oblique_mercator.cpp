@@ -9,7 +9,7 @@
 #include <memory>
 #include <new>
 
-#include "tidewater/special.h"
+#include "tidewater/space_oblique_mercator.h"
 
 using namespace tidewater::detail;
 

@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "projections/special/cycle_watch.hpp"
-#include "tidewater/special.h"
+#include "tidewater/van_der_grinten.h"
 
 using namespace tidewater::detail;
 
