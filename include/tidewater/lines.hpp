@@ -84,7 +84,7 @@ struct LineCourses {
  * included (to a flattening of 0.01: 15 nm); areas below a line within 0.2 square metres, or as far
  * as the azimuths carry where the ends are nearly antipodal.
  *
- * Latitudes beyond 90 degrees and numbers that are not finite give not-a-numbers, counted as
+ * Latitudes beyond 90 degrees and numbers that are not finite give NaN, counted as
  * failed.
  */
 class TW_SYSTEMS_API Geodesic {
@@ -135,7 +135,7 @@ class TW_SYSTEMS_API Geodesic {
  *
  * Between two points the shorter way around is taken, eastwards where both are of one length.  A
  * point at a pole is reached along its meridian.  A line that would go on over a pole has no end:
- * not-a-numbers, counted as failed.
+ * NaN, counted as failed.
  */
 class TW_SYSTEMS_API Rhumb {
  public:

@@ -58,12 +58,12 @@ class TW_SYSTEMS_API MagneticModel {
   /**
    * @param count  number of points
    * @param in     longitude, latitude in degrees on WGS 84, height in metres above the ellipsoid
-   * @param out    count results; not-a-numbers for a point that fails
+   * @param out    count results; NaN for a point that fails
    * @param run    words and threads
    */
   Summary field(std::size_t count, Coordinates<const double> in, MagneticValue* out,
                 Run run = {}) const noexcept;
-  MagneticValue field(Point point) const noexcept; /**< One point; not-a-numbers where it fails. */
+  MagneticValue field(Point point) const noexcept; /**< One point; NaN where it fails. */
 
   /** Names of the models of the store. */
   static std::vector<std::string> models();

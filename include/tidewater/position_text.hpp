@@ -70,7 +70,7 @@ enum class Order {
 struct ParsedPosition {
   double longitude = std::numeric_limits<double>::quiet_NaN(); /**< degrees, east positive */
   double latitude = std::numeric_limits<double>::quiet_NaN();  /**< degrees, north positive */
-  double height = std::numeric_limits<double>::quiet_NaN(); /**< metres; not-a-number without one */
+  double height = std::numeric_limits<double>::quiet_NaN();    /**< metres; NaN without one */
   std::string reason = {}; /**< a sentence; empty when the position was read */
 
   /** There is no reason why not. */
@@ -80,8 +80,8 @@ struct ParsedPosition {
 /**
  * Reads a position: two angles as parse_angle() takes them, and perhaps a height in metres.
  *
- * The angles are parted by a comma, a semicolon, a tab or a slash, by their letters, signs, degree
- * signs or colons, or by blanks where that leaves no doubt:
+ * The angles are separated by a comma, a semicolon, a tab or a slash, by their letters, signs,
+ * degree signs or colons, or by blanks where that leaves no doubt:
  *
  *     48°51'24"N 2°21'03"E   N48 51.4, E2 21.05, 35 m   2.35 48.85   +48.8577+002.2950/
  *

@@ -92,7 +92,7 @@ class TW_SYSTEMS_API System {
 
   /**
    * Systems whose names have these words, without regard to case and accents.
-   * @param words  parted by blanks; each must occur
+   * @param words  separated by blanks; each must occur
    * @param limit  how many at most
    */
   static std::vector<FoundSystem> search(std::string_view words, std::size_t limit = 20);

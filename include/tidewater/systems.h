@@ -115,7 +115,7 @@ TW_SYSTEMS_C_API int32_t tw_system_area(const tw_system* system, double bounds[4
 
 /**
  * Systems whose names have these words, without regard to case and accents.
- * @param words  parted by blanks; each must occur
+ * @param words  separated by blanks; each must occur
  * @param codes  limit places; names are those of tw_system_create("EPSG:code")
  * @param limit  how many at most
  * @return how many codes were written
@@ -132,7 +132,7 @@ typedef struct tw_transformation tw_transformation;
 /** What a transformation is asked beyond its two systems; all zero is what is usual. */
 typedef struct tw_transformation_options {
   const char* operation;    /**< as TransformationOptions::operation; null: the best */
-  const char* grid_folders; /**< folders parted by line feeds, or null */
+  const char* grid_folders; /**< folders separated by line feeds, or null */
   double epoch;             /**< decimal year of the coordinates; 0: none */
   const double* area;       /**< west, south, east, north in degrees of the points, or null */
   int32_t radians;          /**< not 0: geographic coordinates in radians */
@@ -172,7 +172,7 @@ typedef struct tw_points_f {
  * @param inverse  0: forward; 1: from the target to the source
  * @param count    number of points
  * @param in       not changed, unless it is out
- * @param out      may be in; a point that fails becomes not-a-number
+ * @param out      may be in; a point that fails becomes NaN
  * @param status   a word for each point, or null
  * @param threads  how many at most; 0: as many as there are cores
  * @return how many points failed
@@ -191,7 +191,7 @@ TW_SYSTEMS_C_API size_t tw_transformation_describe(const tw_transformation* tran
 /** The datum step, as options take it; empty without one. */
 TW_SYSTEMS_C_API size_t tw_transformation_operation(const tw_transformation* transformation,
                                                     char* text, size_t size);
-/** Stated accuracy of the datum step in metres: 0 without one, not-a-number when unknown. */
+/** Stated accuracy of the datum step in metres: 0 without one, NaN when unknown. */
 TW_SYSTEMS_C_API double tw_transformation_accuracy(const tw_transformation* transformation);
 
 /** An operation that could serve between two systems. */
@@ -210,7 +210,7 @@ TW_SYSTEMS_C_API size_t tw_candidate_operation(const tw_candidates* candidates, 
 /** The names of its steps in the registry. */
 TW_SYSTEMS_C_API size_t tw_candidate_name(const tw_candidates* candidates, size_t i, char* text,
                                           size_t size);
-/** Stated accuracy in metres; not-a-number when unknown. */
+/** Stated accuracy in metres; NaN when unknown. */
 TW_SYSTEMS_C_API double tw_candidate_accuracy(const tw_candidates* candidates, size_t i);
 /** What hinders its use; empty where nothing does. */
 TW_SYSTEMS_C_API size_t tw_candidate_missing(const tw_candidates* candidates, size_t i, char* text,
@@ -282,7 +282,7 @@ TW_SYSTEMS_C_API int32_t tw_parse_angle(const char* text, int32_t axis, int32_t 
  * @param text           UTF-8
  * @param decimal_comma  not 0: the comma is a decimal mark
  * @param order     0: refused where the text does not tell, 1: longitude first, 2: latitude first
- * @param position  longitude, latitude in degrees, height in metres (not-a-number without one);
+ * @param position  longitude, latitude in degrees, height in metres (NaN without one);
  *                  unwritten on failure
  * @return 1, or 0 with the reason in tw_last_error()
  */
