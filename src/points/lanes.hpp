@@ -8,6 +8,7 @@
 // Comparisons give a Mask<V>, combined by &, | and !, and used by select().
 #pragma once
 
+#include <float.h>
 #include <stdint.h>
 
 #if defined(__SSE2__)
@@ -21,6 +22,10 @@
 // On every function of a formula: a function that stayed a symbol of its own could be linked from
 // an object that was compiled for a wider processor.
 #define TW_INLINE [[gnu::always_inline]] inline
+
+#if FLT_EVAL_METHOD != 0 && FLT_EVAL_METHOD != 1
+#error "Doubles must be rounded at each step: x87 arithmetic gives other figures (-msse2 -mfpmath=sse)"
+#endif
 
 namespace tidewater::points {
 

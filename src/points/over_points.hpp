@@ -92,7 +92,7 @@ TWstatus over_points(const Kernel& kernel, int32_t count, const CoordinateTriple
   int32_t i = 0;
   if (count > kFew) {
     switch (level()) {
-#if defined(__x86_64__) || defined(__i386__)
+#if defined(TIDEWATER_WIDE_LANES)
       case Level::avx512:
         // Below one block of it the narrower one wastes less.
         i = count >= 16 ? run<Level::avx512>(kernel, count, in, out, &status)
