@@ -12,6 +12,21 @@
  * only by a failure or an information event, so a word set for one point stands at the end of the
  * array.  Test its low bit with TW_OK(): set means that the values may be used.  A result pointer
  * is written only when its value was computed.  No pointer is checked for null.
+ *
+ * Projections.  A projection is up to four functions with one stem: _c computes constants, _f goes
+ * from longitude and latitude to the plane, _i goes back, _s gives local scale factors.  The
+ * constants are the caller's: _c writes them once, and they are passed to the others.
+ * - Plane coordinates are in units of the semi-major axis, with central scale 1 and no false
+ *   origin: TWab_to_en() applies those.
+ * - _f and _i read and write elements x and y of a point; z of the output stays as it is.
+ * - _s writes (k, h, areal scale): scale along the parallel, along the meridian, and of areas, with
+ *   the caller's k0 multiplied in.
+ * - A point that fails leaves its word, which later points do not clear, and takes one of three
+ *   forms.  SKIP: its output stays as it was, the loop goes on.  STOP: the function returns, the
+ *   rest of the output stays as it was.  FILL: the scale falls back to k0 and is written, the loop
+ *   goes on.
+ *
+ * "Snyder 1987" is Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987).
  */
 #ifndef TIDEWATER_FRAME_H
 #define TIDEWATER_FRAME_H

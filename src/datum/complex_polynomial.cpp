@@ -3,8 +3,9 @@
 
 #include "datum/complex_polynomial_points.hpp"
 
+#include <cmath>
 #include "points/portable.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/complex_polynomial.h"
 
 using namespace tidewater::detail;
 

@@ -5,7 +5,7 @@
 
 #include "formulas/wraps.hpp"
 #include "points/portable.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/generic_inverse.h"
 
 using namespace tidewater::detail;
 

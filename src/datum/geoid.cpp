@@ -13,7 +13,7 @@
 #include "datum/grid_window.hpp"
 #include "formulas/interpolation.hpp"
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/geoid.h"
 
 using namespace tidewater::detail;
 

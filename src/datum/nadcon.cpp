@@ -12,7 +12,7 @@
 #include "datum/grid_window.hpp"
 #include "formulas/interpolation.hpp"
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/nadcon.h"
 
 using namespace tidewater::detail;
 

@@ -10,7 +10,7 @@
 
 #include "datum/grid_file.hpp"
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/national_grid.h"
 
 using namespace tidewater::detail;
 

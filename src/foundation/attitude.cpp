@@ -4,7 +4,7 @@
 
 #include "formulas/constants.hpp"
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
+#include "tidewater/attitude.h"
 
 using namespace tidewater::detail;
 

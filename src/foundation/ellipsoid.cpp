@@ -5,7 +5,7 @@
 #include "formulas/constants.hpp"
 #include "foundation/meridian_arc.hpp"
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
+#include "tidewater/ellipsoid.h"
 
 namespace tidewater::detail {
 namespace {

@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
+#include "tidewater/geocentric.h"
 
 using namespace tidewater::detail;
 

@@ -5,7 +5,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
+#include "tidewater/local_space.h"
 
 using namespace tidewater::detail;
 

@@ -17,8 +17,8 @@
 
 #include "formulas/wraps.hpp"
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/lines.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/geodesic.h"
 
 using namespace tidewater::detail;
 namespace points = tidewater::points;

@@ -4,9 +4,9 @@
 
 #include "formulas/constants.hpp"
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
-#include "tidewater/lines.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/mercator.h"
+#include "tidewater/rhumb.h"
 
 using namespace tidewater::detail;
 

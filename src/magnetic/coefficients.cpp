@@ -7,7 +7,7 @@
 #include <cstdlib>
 #include <initializer_list>
 
-#include "tidewater/magnetic.h"
+#include "tidewater/harmonic_synthesis.h"
 
 namespace {
 

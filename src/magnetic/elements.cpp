@@ -8,8 +8,9 @@
 
 #include "formulas/wraps.hpp"
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/magnetic.h"
+#include "tidewater/geocentric.h"
+#include "tidewater/harmonic_synthesis.h"
+#include "tidewater/magnetic_elements.h"
 
 using namespace tidewater::detail;
 

@@ -7,7 +7,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/albers.h"
 
 using namespace tidewater::detail;
 

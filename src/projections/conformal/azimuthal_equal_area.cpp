@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/azimuthal_equal_area.h"
 
 using namespace tidewater::detail;
 

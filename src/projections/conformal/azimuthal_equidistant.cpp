@@ -7,7 +7,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/azimuthal_equidistant.h"
 
 using namespace tidewater::detail;
 

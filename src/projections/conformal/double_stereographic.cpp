@@ -1,9 +1,11 @@
 // Double stereographic: the ellipsoid onto the Gauss sphere, that turned to its pole, that
 // projected.
 
+#include "tidewater/double_stereographic.h"
 #include "formulas/constants.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/special.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/rotated_graticule.h"
+#include "tidewater/stereographic.h"
 
 using namespace tidewater::detail;
 

@@ -6,8 +6,10 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/mercator.h"
+#include "tidewater/transverse_mercator.h"
 
 using namespace tidewater::detail;
 

@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/gnomonic.h"
 
 using namespace tidewater::detail;
 

@@ -7,7 +7,7 @@
 
 #include "formulas/pole_hold.hpp"
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/lambert_conformal.h"
 
 using namespace tidewater::detail;
 

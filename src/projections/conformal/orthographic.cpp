@@ -6,8 +6,8 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
+#include "tidewater/geocentric.h"
+#include "tidewater/orthographic.h"
 
 using namespace tidewater::detail;
 

@@ -7,7 +7,7 @@
 
 #include "points/portable.hpp"
 #include "projections/turn_points.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/perspective.h"
 
 using namespace tidewater::detail;
 

@@ -6,7 +6,7 @@
 #include "formulas/constants.hpp"
 #include "points/portable.hpp"
 #include "projections/conformal/state_plane_zones.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/state_plane.h"
 
 using namespace tidewater::detail;
 

@@ -6,8 +6,8 @@
 
 #include "points/portable.hpp"
 #include "projections/conformal/stereographic_points.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/stereographic.h"
 
 using namespace tidewater::detail;
 

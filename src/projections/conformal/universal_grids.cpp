@@ -1,7 +1,7 @@
 // Parameters of the universal grids and of the British national grid.
 
+#include "tidewater/universal_grids.h"
 #include "formulas/constants.hpp"
-#include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
 

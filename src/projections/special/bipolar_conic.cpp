@@ -3,8 +3,9 @@
 
 #include "projections/special/bipolar_conic_points.hpp"
 
+#include <cmath>
 #include "points/portable.hpp"
-#include "tidewater/special.h"
+#include "tidewater/bipolar_conic.h"
 
 using namespace tidewater::detail;
 

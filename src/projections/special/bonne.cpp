@@ -3,8 +3,9 @@
 
 #include "projections/special/bonne_points.hpp"
 
+#include <cmath>
 #include "points/portable.hpp"
-#include "tidewater/special.h"
+#include "tidewater/bonne.h"
 
 using namespace tidewater::detail;
 

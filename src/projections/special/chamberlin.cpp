@@ -6,9 +6,9 @@
 #include "formulas/constants.hpp"
 #include "points/portable.hpp"
 #include "projections/turn_points.hpp"
-#include "tidewater/datum.h"
-#include "tidewater/lines.h"
-#include "tidewater/special.h"
+#include "tidewater/chamberlin.h"
+#include "tidewater/generic_inverse.h"
+#include "tidewater/geodesic.h"
 
 using namespace tidewater::detail;
 

@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/special.h"
+#include "tidewater/eckert4.h"
 
 using namespace tidewater::detail;
 

@@ -7,7 +7,7 @@
 
 #include "points/portable.hpp"
 #include "tidewater/frame.h"
-#include "tidewater/special.h"
+#include "tidewater/imw_polyconic.h"
 
 using namespace tidewater::detail;
 

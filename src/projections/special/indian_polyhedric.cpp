@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/special.h"
+#include "tidewater/indian_polyhedric.h"
 
 using namespace tidewater::detail;
 

@@ -5,8 +5,8 @@
 
 #include "formulas/wraps.hpp"
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/special.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/jacobian.h"
 
 using namespace tidewater::detail;
 

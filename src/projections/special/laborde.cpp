@@ -4,8 +4,9 @@
 #include "points/over_heights.hpp"
 #include "points/portable.hpp"
 #include "projections/special/laborde_points.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/special.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/laborde.h"
+#include "tidewater/transverse_mercator.h"
 
 using namespace tidewater::detail;
 

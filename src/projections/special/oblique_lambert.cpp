@@ -7,9 +7,11 @@
 
 #include "formulas/wraps.hpp"
 #include "projections/turn_points.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/lines.h"
-#include "tidewater/special.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/geodesic.h"
+#include "tidewater/lambert_conformal.h"
+#include "tidewater/oblique_lambert.h"
+#include "tidewater/rotated_graticule.h"
 
 using namespace tidewater::detail;
 

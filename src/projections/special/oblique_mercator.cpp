@@ -6,7 +6,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/special.h"
+#include "tidewater/oblique_mercator.h"
 
 using namespace tidewater::detail;
 

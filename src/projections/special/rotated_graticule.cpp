@@ -5,7 +5,7 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/special.h"
+#include "tidewater/rotated_graticule.h"
 
 using namespace tidewater::detail;
 

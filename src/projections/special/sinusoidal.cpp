@@ -6,8 +6,8 @@
 #include <cmath>
 
 #include "points/portable.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/special.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/sinusoidal.h"
 
 using namespace tidewater::detail;
 

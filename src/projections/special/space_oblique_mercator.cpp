@@ -10,7 +10,7 @@
 #include <new>
 
 #include "points/portable.hpp"
-#include "tidewater/special.h"
+#include "tidewater/space_oblique_mercator.h"
 
 using namespace tidewater::detail;
 

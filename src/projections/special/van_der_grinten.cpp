@@ -7,7 +7,7 @@
 
 #include "points/portable.hpp"
 #include "projections/special/cycle_watch.hpp"
-#include "tidewater/special.h"
+#include "tidewater/van_der_grinten.h"
 
 using namespace tidewater::detail;
 
