@@ -70,7 +70,7 @@ TW_INLINE int64_t shift_right(int64_t b, int n) { return b >> n; }  // keeps the
 TW_INLINE double lane(double v, int) { return v; }
 TW_INLINE bool lane(bool m, int) { return m; }
 
-// f(v), for the few values that only the standard library can serve.
+// f(i), for the few values that a formula's short road does not cover.
 template <class F>
 TW_INLINE void mend(bool m, double& result, F f) {
   if (m) [[unlikely]] {
