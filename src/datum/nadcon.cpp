@@ -1,5 +1,7 @@
 // NADCON shifts: bilinear interpolation in a window of 4 by 4 nodes that is read from the grid
 // files when a point leaves it.
+// W. T. Dewhurst, NADCON: The Application of Minimum Curvature-Derived Surfaces in the
+// Transformation of Positional Data, NOAA Technical Memorandum NOS NGS-50 (1990).
 
 #include <algorithm>
 #include <cmath>

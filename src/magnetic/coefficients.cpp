@@ -1,5 +1,8 @@
 // Coefficient sets of a spherical-harmonic model: row tables, recursion constants, normalisation,
 // and the coefficients of a date.
+// S. A. Holmes and W. E. Featherstone, A unified approach to the Clenshaw summation and the
+// recursive computation of very high degree and order normalised associated Legendre functions,
+// Journal of Geodesy 76 (2002), 279-299, eq. 12.
 
 #include <algorithm>
 #include <cmath>
