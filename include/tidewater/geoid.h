@@ -23,6 +23,10 @@
  *   #TW_GEOID_READ_ERROR or #TW_NO_MEMORY gives success and a figure that is none when it is asked
  *   for again.  After a read error nothing may be tried again before a point far off, whose window
  *   can be read.
+ *
+ * Source: Milbert, GEOID90: A High-Resolution Geoid for the United States, Eos 72 (1991), for the
+ * grids; Abramowitz and Stegun, Handbook of Mathematical Functions (1964), section 25.2, Newton's
+ * forward difference formula, for the interpolation.
  */
 #ifndef TIDEWATER_GEOID_H
 #define TIDEWATER_GEOID_H

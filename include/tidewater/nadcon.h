@@ -84,7 +84,7 @@ TW_API int32_t TWnadcon_c(const char* directory, NadconControl* control, TWstatu
  *                 longitude brought into (-pi, pi], the others shifted; #TW_GRID_FILE_ERROR,
  *                 #TW_NO_MEMORY where a window could not be loaded, or moved so far off a better
  *                 grid that no cell of it serves the point: the point, and later ones up to the
- *                 next load, stay unwritten, and the next load clears the word
+ *                 next load, stay unwritten, and the next load clears the status
  */
 TW_API void TWnadcon_f(int32_t count, const CoordinateTriple* in, const NadconControl* control,
                        CoordinateTriple* out, TWstatus* status);

@@ -152,7 +152,7 @@ typedef struct tw_points_f {
  * @param inverse  0: forward; 1: from the target to the source
  * @param count    number of points
  * @param in       not changed, unless it is out
- * @param out      may be in; a point that fails becomes not-a-number
+ * @param out      may be in; a point that fails becomes NaN
  * @param status   a word for each point, or null
  * @param threads  how many at most; 0: as many as there are cores
  * @return how many points failed
@@ -170,7 +170,7 @@ TW_SYSTEMS_C_API size_t tw_transformation_describe(const tw_transformation* tran
 /** The datum step, as options take it; empty without one. */
 TW_SYSTEMS_C_API size_t tw_transformation_operation(const tw_transformation* transformation,
                                                     char* text, size_t size);
-/** Stated accuracy of the datum step in metres: 0 without one, not-a-number when unknown. */
+/** Stated accuracy of the datum step in metres: 0 without one, NaN when unknown. */
 TW_SYSTEMS_C_API double tw_transformation_accuracy(const tw_transformation* transformation);
 
 /** An operation that could serve between two systems. */
@@ -248,7 +248,7 @@ TW_SYSTEMS_C_API int32_t tw_parse_angle(const char* text, int32_t axis, int32_t 
 /**
  * Reads a position as parse_position() does.
  * @param order     0: refused where the text does not tell, 1: longitude first, 2: latitude first
- * @param position  longitude, latitude in degrees, height in metres (not-a-number without one);
+ * @param position  longitude, latitude in degrees, height in metres (NaN without one);
  *                  unwritten on failure
  * @return 1, or 0 with the reason in tw_last_error()
  */
