@@ -2,8 +2,8 @@
  * @file generic_inverse.h
  * Inverse of any forward projection.
  *
- * Source: this library's own iteration, a secant method on the sphere: each step turns and stretches
- * the plane's error as the step before was turned and stretched.
+ * Source: this library's own iteration, a secant method on the sphere: each step turns and
+ * stretches the plane's error as the step before was turned and stretched.
  */
 #ifndef TIDEWATER_GENERIC_INVERSE_H
 #define TIDEWATER_GENERIC_INVERSE_H

@@ -117,22 +117,6 @@ TEST_F(CatalogueLists, ZonesOfTheTwoSystems) {
   EXPECT_EQ(number, 407);
 }
 
-TEST(CatalogueRecords, HaveTheLayoutOfTheirRows) {
-  EXPECT_EQ(sizeof(ZoneRecord), 44u);
-  EXPECT_EQ(offsetof(ZoneRecord, zone_name), 2u);
-  EXPECT_EQ(sizeof(SatelliteRecord), 120u);
-  EXPECT_EQ(offsetof(SatelliteRecord, real1), 32u);
-  EXPECT_EQ(offsetof(SatelliteRecord, angle1), 48u);
-  EXPECT_EQ(offsetof(SatelliteRecord, real3), 64u);
-  EXPECT_EQ(offsetof(SatelliteRecord, angle3), 88u);
-  EXPECT_EQ(offsetof(SatelliteRecord, count1), 96u);
-  EXPECT_EQ(offsetof(SatelliteRecord, short1), 100u);
-  EXPECT_EQ(offsetof(SatelliteRecord, id), 106u);
-  EXPECT_EQ(sizeof(MreTerm), 16u);
-  EXPECT_EQ(offsetof(MreTerm, power_u), 8u);
-  EXPECT_EQ(offsetof(MreTerm, power_v), 10u);
-}
-
 TEST_F(CatalogueLists, SatellitesComeWithTheirAnglesInRadians) {
   store_.add_table("Satellites", {{"sat_name", 0, Type::kText}, {"id", 106, Type::kInt16}});
   PackedRow row(120);

@@ -14,6 +14,8 @@ static_assert(offsetof(CoordinateTriple, z) == 16);
 
 static_assert(sizeof(AngleUnit) == 48);
 static_assert(alignof(AngleUnit) == 8);
+static_assert(offsetof(AngleUnit, format) == 0);
+static_assert(offsetof(AngleUnit, wide_format) == 0);
 static_assert(offsetof(AngleUnit, precision) == 32);
 static_assert(offsetof(AngleUnit, hemisphere_mode) == 34);
 static_assert(offsetof(AngleUnit, factor) == 40);
