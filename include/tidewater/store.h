@@ -3,11 +3,11 @@
  * The seven operations that the library needs of a parameter store: a file of named tables with
  * named columns.
  *
- * The library calls them as ordinary external functions.  libtabdll is their default implementation;
- * any other store that answers them may take its place at link or load time.  Every operation
- * returns a word: exactly #TW_STORE_SUCCESS on success, exactly #TW_STORE_END_OF_TABLE at the end
- * of a walk, anything else is a failure or a miss.  A walk must end: the library goes on until it
- * sees the end-of-table word.
+ * The library calls them as ordinary external functions.  libtabdll is their default
+ * implementation; any other store that answers them may take its place at link or load time.  Every
+ * operation returns a word: exactly #TW_STORE_SUCCESS on success, exactly #TW_STORE_END_OF_TABLE at
+ * the end of a walk, anything else is a failure or a miss.  A walk must end: the library goes on
+ * until it sees the end-of-table word.
  *
  * There is one current store, from an open to the next close; in libtabdll one for each thread.
  *
