@@ -33,6 +33,7 @@
 
 #include <stdint.h>
 
+/** Marks what the library exports. */
 #if defined(TIDEWATER_STATIC)
 #define TW_API
 #elif defined(_WIN32)

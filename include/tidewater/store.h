@@ -21,6 +21,7 @@
 
 #include <stdint.h>
 
+/** Marks what a store exports. */
 #if defined(TIDEWATER_STATIC)
 #define TW_STORE_API
 #elif defined(_WIN32)
