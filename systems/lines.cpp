@@ -41,7 +41,7 @@ template <class Kernel>
 Summary over_lines(const Kernel& kernel, std::size_t count, const LineArrays& arrays) {
   Summary summary;
   switch (count == 1 ? points::Level::one_by_one : points::level()) {
-#if defined(__x86_64__) || defined(__i386__)
+#if defined(TIDEWATER_WIDE_LANES)
     case points::Level::avx512:
       summary.failed = take_lines_at<points::Level::avx512>(kernel, count, arrays);
       break;

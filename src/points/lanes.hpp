@@ -8,6 +8,7 @@
 // Comparisons give a Mask<V>, combined by &, | and !, and used by select().
 #pragma once
 
+#include <float.h>
 #include <stdint.h>
 
 #if defined(__SSE2__)
@@ -21,6 +22,10 @@
 // On every function of a formula: a function that stayed a symbol of its own could be linked from
 // an object that was compiled for a wider processor.
 #define TW_INLINE [[gnu::always_inline]] inline
+
+#if FLT_EVAL_METHOD != 0 && FLT_EVAL_METHOD != 1
+#error "Doubles must be rounded at each step: x87 arithmetic gives other figures (-msse2 -mfpmath=sse)"
+#endif
 
 namespace tidewater::points {
 
@@ -65,7 +70,7 @@ TW_INLINE int64_t shift_right(int64_t b, int n) { return b >> n; }  // keeps the
 TW_INLINE double lane(double v, int) { return v; }
 TW_INLINE bool lane(bool m, int) { return m; }
 
-// f(v), for the few values that only the standard library can serve.
+// f(i), for the few values that a formula's short road does not cover.
 template <class F>
 TW_INLINE void mend(bool m, double& result, F f) {
   if (m) [[unlikely]] {

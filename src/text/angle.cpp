@@ -9,6 +9,7 @@
 #include <string>
 #include <string_view>
 
+#include "points/portable.hpp"
 #include "text/locale.hpp"
 #include "text/wide.hpp"
 
@@ -139,7 +140,7 @@ std::string sexagesimal_text(double v, int precision, Form form) {
   // Seconds that would be rounded to 60 go to the next minute.  The bound is included, with an
   // allowance for its own rounding; it does not grow with the value, the double alone decides.
   constexpr double kBoundRounding = 4 * std::numeric_limits<double>::epsilon() * 60;
-  const double half_unit = std::pow(10.0, -precision) * 0.5;
+  const double half_unit = portable::pow(10.0, -precision) * 0.5;
   if (std::fabs(60 - sec) <= half_unit + kBoundRounding) {
     sec = 0;
     min += 1;

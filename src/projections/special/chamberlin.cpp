@@ -1,9 +1,12 @@
 // Chamberlin trimetric projection of the ellipsoid: a point is placed by its geodesic distances
 // from the three corners of a triangle.
+// A. H. J. Christensen, The Chamberlin trimetric projection, Cartography and Geographic Information
+// Systems 19 (1992), pp. 88-100.
 
 #include <cmath>
 
 #include "formulas/constants.hpp"
+#include "points/portable.hpp"
 #include "projections/turn_points.hpp"
 #include "tidewater/chamberlin.h"
 #include "tidewater/generic_inverse.h"
@@ -29,7 +32,7 @@ double side_of(double edge_azimuth, double azimuth) {
 
 // The angle whose cosine is c; a cosine out of range is rounded, not clamped.
 double angle_of(double c) {
-  if (c > -1 && c < 1) return std::acos(c);
+  if (c > -1 && c < 1) return portable::acos(c);
   return std::floor(c + 0.5) <= -1 ? kPi : 0;
 }
 
@@ -48,7 +51,7 @@ void turn_to_north(double e, const CoordinateTriple* control, const double* side
   CoordinateTriple image[2] = {};
   TWchamtri_f(e, control, sides, azimuths, plane, 2, probes, image, status);
   if (!TW_OK(*status)) return;
-  const double angle = north - std::atan2(image[1].y - image[0].y, image[1].x - image[0].x);
+  const double angle = north - portable::atan2(image[1].y - image[0].y, image[1].x - image[0].x);
   turn_points(angle, 3, plane);
 }
 
@@ -75,10 +78,10 @@ void TWchamtri_c(TWtransform forward, TWcontext context, int16_t mode, double e,
     plane[0].y = 0;
     const double a0 = angle_of((a * a + m * m - b * b / 4) / (2 * a * m));
     const double a2 = angle_of((c * c + m * m - b * b / 4) / (2 * c * m));
-    plane[1].x = std::cos(a0) * a + plane[0].x;
-    plane[1].y = std::sin(a0) * a * s;
-    plane[2].x = std::cos(a2) * c + plane[0].x;
-    plane[2].y = -s * std::sin(a2) * c;
+    plane[1].x = portable::cos(a0) * a + plane[0].x;
+    plane[1].y = portable::sin(a0) * a * s;
+    plane[2].x = portable::cos(a2) * c + plane[0].x;
+    plane[2].y = -s * portable::sin(a2) * c;
     const CoordinateTriple origin = {};
     CoordinateTriple place = {};
     TWgeneric_i(forward, context, 0, 0, 0, 1, &origin, &place, status);

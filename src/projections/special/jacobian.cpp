@@ -1,9 +1,12 @@
 // Local distortion of any transformation of points, by finite differences.  Points go one by one:
 // the time is the caller's transformation's, and the records of nine are not points.
+// J. P. Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 20-26,
+// for the scale factors.
 
 #include <cmath>
 
 #include "formulas/wraps.hpp"
+#include "points/portable.hpp"
 #include "tidewater/ellipsoid.h"
 #include "tidewater/jacobian.h"
 
@@ -23,7 +26,7 @@ void difference(const CoordinateTriple& from, const CoordinateTriple& to, double
 }
 
 // Azimuthal slope of the north-going axis.
-double north_slope(const double* record) { return std::atan2(record[4], record[3]); }
+double north_slope(const double* record) { return portable::atan2(record[4], record[3]); }
 
 }  // namespace
 
@@ -105,7 +108,7 @@ void TWJ_to_slopes(int32_t count, const double* jacobians, CoordinateTriple* out
   for (int32_t i = 0; i < count; ++i, jacobians += kRecord) {
     const double t2 = north_slope(jacobians);
     // By contract: element 3 and not element 1, the slope of the east-going axis.
-    const double t1 = std::atan2(jacobians[3], jacobians[0]);
+    const double t1 = portable::atan2(jacobians[3], jacobians[0]);
     out[i] = {t1, t2, t2 - t1};
   }
 }
