@@ -43,8 +43,9 @@ struct MagneticValue {
 class TW_SYSTEMS_API MagneticModel {
  public:
   /**
-   * @param name  the model's name in the store, "WMM2025"; empty for that of the newest
-   * coefficients
+   * @param name  the model's name in the store, "WMM2025" or "IGRF-13", without regard to case and
+   *              hyphens; of a series, "IGRF", the generation in force; empty for the model of the
+   *              newest coefficients, of several the one made for the present alone
    * @param year  decimal year
    * @throws Error if the store has no such model, or the model no field at that date
    */
