@@ -409,8 +409,9 @@ GridContent read_grid(const std::string& name, const std::vector<std::string>& f
   const std::string& path = content.path;
   const auto must_be = [&](GridKind expected, const char* form) {
     if (kind != expected) {
-      refuse(path, std::string(form) + (kind == GridKind::geoid ? " holds no undulations"
-                                                                : " holds no datum shifts"));
+      refuse(path, std::string(form) + (kind == GridKind::geoid   ? " holds no undulations"
+                                        : kind == GridKind::shift ? " holds no datum shifts"
+                                                                  : " holds no translations"));
     }
   };
   const bool las = ends_with(path, ".las"), los = ends_with(path, ".los");
@@ -441,7 +442,7 @@ GridContent read_grid(const std::string& name, const std::vector<std::string>& f
       refuse(path, "is of no form that is known: NTv2, NADCON, GTX, .geo or GeoTIFF");
     }
   }
-  for (Lattice& g : content.lattices) close_round(kind == GridKind::shift ? 2 : 1, &g);
+  for (Lattice& g : content.lattices) close_round(bands_of(kind), &g);
   plant(&content);
   return content;
 } catch (const std::length_error&) {

@@ -291,10 +291,23 @@ class TransformationImpl {
         has_ellipsoidal_height(one) || has_ellipsoidal_height(other)
             ? std::vector<Way>{}
             : height_ways(one.vertical_code, other.vertical_code, one, wanted, options);
-    if (const Way* way = picked(offsets, named_heights); way && way->missing.empty()) {
+    const bool own_offsets = named_heights.size() == 1 && named_heights[0].starts_with("offset:");
+    if (own_offsets) {
+      add(offset_grid_step(named_heights[0].substr(7), options.grid_folders));
+      accuracy = kNotANumber;
       go(one, other, true);
-      note(*way);
-      add(height_offset_step(way->links[0], frame_of(other.datum)));
+    } else if (const Way* way = picked(offsets, named_heights); way && way->missing.empty()) {
+      const Link& link = way->links[0];
+      if (is_offset_grid(link.operation.method)) {
+        // The grid is read on the source's positions.
+        note(*way);
+        add(offset_grid_step(link, options.grid_folders));
+        go(one, other, true);
+      } else {
+        go(one, other, true);
+        note(*way);
+        add(height_offset_step(link, frame_of(other.datum)));
+      }
     } else {
       // Over heights above the ellipsoid.
       std::optional<Leg> first;
@@ -327,11 +340,12 @@ class TransformationImpl {
   };
 
   static bool names_heights(std::string_view word) {
-    if (word.starts_with("geoid:")) return true;
+    if (word.starts_with("geoid:") || word.starts_with("offset:")) return true;
     const auto code = registry_code(word.starts_with('-') ? word.substr(1) : word);
     const auto operation_named = code ? Registry::shared().operation(*code) : std::nullopt;
     return operation_named &&
-           (is_geoid_grid(operation_named->method) || is_height_offset(operation_named->method));
+           (is_geoid_grid(operation_named->method) || is_height_offset(operation_named->method) ||
+            is_offset_grid(operation_named->method));
   }
 
   // The best way, or the one that the caller has named; null without one.

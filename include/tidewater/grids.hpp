@@ -97,7 +97,7 @@ class TW_SYSTEMS_API ShiftGrid {
  * described as geoid_undulation, or with one band only, in metres.  A grid all round the Earth has
  * no seam.
  *
- * Otherwise as ShiftGrid.  datum.h has a C structure of the same name outside the namespace.
+ * Otherwise as ShiftGrid.  geoid.h has a C structure of the same name outside the namespace.
  * Measured against PROJ 9.1 on EGM96 at 15 minutes, bilinear: within
  * 0.001 mm.
  */

@@ -50,7 +50,9 @@ class TW_SYSTEMS_API System {
    * From what users have:
    * - a registry code: "EPSG:2154", "2154"; a compound "EPSG:7405", or two codes "EPSG:2154+5720";
    * - a short name: "wgs84", "web mercator", "utm:30N", "ups:N", "spcs83:2900", "spcs27:0401",
-   *   "geocentric:wgs84"; "utm:30N ED50" on another system's datum;
+   *   "geocentric:wgs84"; "utm:30N ED50" on another system's datum; "mgrs:31U", "mgrs:31UDQ4811"
+   *   for the zone that a reference of the military grid stands in (references themselves are text:
+   *   parse_mgrs() and format_mgrs() of position_text.hpp);
    * - a registry name that only one system bears: "RGF93 v1 / Lambert-93";
    * - a definition: "lambert conformal lat1=44 lat2=49 lat0=46.5 lon0=3 x0=700000 y0=6600000
    *   ellps=GRS80" (degrees and metres; ellps, datum or a and rf; pm, units, axes);
@@ -60,8 +62,8 @@ class TW_SYSTEMS_API System {
   explicit System(std::string_view text);
 
   /**
-   * The same, where the zone of "utm" or "ups" is found from a point.
-   * @param text                "utm", "ups", or whatever the other constructor takes
+   * The same, where the zone of "utm", "ups" or "mgrs" (either of them) is found from a point.
+   * @param text                "utm", "ups", "mgrs", or whatever the other constructor takes
    * @param longitude,latitude  degrees
    */
   System(std::string_view text, double longitude, double latitude);

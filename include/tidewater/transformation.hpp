@@ -26,7 +26,8 @@ struct TransformationOptions {
    * several follow each other, "EPSG:1234 EPSG:5678"; "grid:ntf_r93.gsb" a grid file of the
    * caller's, from the source's datum to the target's ("-grid:..." the other way round);
    * "geoid:egm96_15.gtx" undulations of the caller's between a compound system's heights and the
-   * ellipsoid of its datum; "no shift" leaves datum and heights unchanged.
+   * ellipsoid of its datum; "offset:file.gtx" offsets that are added to heights of the source to
+   * give those of the target; "no shift" leaves datum and heights unchanged.
    */
   std::string operation;
   /** Folders in which grids are looked for, before the usual ones. */

@@ -40,7 +40,7 @@ MeridianArc::MeridianArc(double a, double e) : a_(a), sphere_(e < kSphereLimit) 
   const double c6 = -0.7291666666666666 * n3;
   const double c8 = 0.615234375 * n4;
   n_ = n;
-  g_ = a / (1 + n);
+  g_ = 0.5 * (a + b);  // a / (1 + n)
   mean_ = 1 + n2 / 4 + n4 / 64;
   t0_ = c2 - c6;
   t1_ = 2 * c4 - 4 * c8;
@@ -71,8 +71,8 @@ MeridianFoot::MeridianFoot(const MeridianArc& arc)
 }
 
 double MeridianArc::tail(double lat) const {
-  const double c = portable::cos(2 * lat);
-  return (((t3_ * c + t2_) * c + t1_) * c + t0_) * portable::sin(2 * lat);
+  const auto [s, c] = points::sincos(2 * lat);
+  return (((t3_ * c + t2_) * c + t1_) * c + t0_) * s;
 }
 
 TWstatus MeridianArc::forward(double lat, double* distance) const {
@@ -100,12 +100,13 @@ TWstatus MeridianArc::inverse(double distance, double* lat) const {
     *lat = distance / a_;
     return TW_SUCCESS;
   }
-  const double start = distance * (1 + n_) / (mean_ * a_);
-  double p = start;
+  double p = 0;
   if (n_ < kSeriesLimit) {
     // Where the rounds below come to rest within a few, the series is there at once.
     p = MeridianFoot(*this).latitude(distance);
   } else {
+    const double start = distance * (1 + n_) / (mean_ * a_);
+    p = start;
     constexpr int kMostRounds = 50;
     double previous = 0;
     int rounds = 0;

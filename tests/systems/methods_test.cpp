@@ -105,6 +105,12 @@ TEST(Methods, EveryOneGoesForthAndBack) {
       if (form == "y0") value = -200000;
       if (form == "h") value = 5900000;
       if (form == "colat") value = 30;
+      if (form == "lat3") value = 30;
+      if (form == "lon3") value = 4;
+      if (form == "inclination") value = 99;
+      if (form == "days") value = 0.07;
+      if (form == "satellite") value = 4;
+      if (form == "path") value = 199;
       if (kind->quantity == detail::Quantity::angle && kind->usual != 0)
         value *= 180 / 3.14159265358979324;
       parameters.emplace_back(kind->name, value);
@@ -128,7 +134,13 @@ TEST(Methods, EveryOneGoesForthAndBack) {
       parameters[3].second = 1;
       parameters[4].second = 30;
     }
-    const Projection map(method.name, parameters, Ellipsoid("International 1924"));
+    if (method.code == detail::kMalaya) {
+      lon = 102;
+      lat = 4.5;
+    }
+    const Projection map(method.name, parameters,
+                         method.code == detail::kMalaya ? Ellipsoid(6377304.063, 300.8017)
+                                                        : Ellipsoid("International 1924"));
     EXPECT_EQ(map.method_code(), method.code);
     const Point there = map.forward({lon, lat});
     ASSERT_TRUE(std::isfinite(there.x) && std::isfinite(there.y)) << there.x << " " << there.y;
