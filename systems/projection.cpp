@@ -132,11 +132,13 @@ void ProjectionImpl::run(Block& block, bool inverse_way) const {
 }
 
 void ProjectionImpl::forward(Block& block) const {
-  const Plane& plane = formula_->plane;
+  const Plane plane = formula_->plane;  // a copy: stores of points could be stores into it
+  const int count = block.count;
+  CoordinateTriple* const from = block.now;
   bool odd = false;
-  for (int i = 0; i < block.count; ++i) {
-    block.now[i].x = within_half_turn(block.now[i].x - plane.lon0);
-    odd |= !(std::fabs(block.now[i].y) <= kHalfPi);
+  for (int i = 0; i < count; ++i) {
+    from[i].x = within_half_turn(from[i].x - plane.lon0);
+    odd |= !(std::fabs(from[i].y) <= kHalfPi);
   }
   if (odd) {
     for (int i = 0; i < block.count; ++i) {
@@ -152,16 +154,16 @@ void ProjectionImpl::forward(Block& block) const {
   if (odd || formula_->forward(block.count, block.now, block.spare) != TW_SUCCESS) {
     one_by_one(block, false);
   }
-  for (int i = 0; i < block.count; ++i) {
-    block.spare[i].x = plane.x0 + plane.sx * block.spare[i].x;
-    block.spare[i].y = plane.y0 + plane.sy * block.spare[i].y;
-    block.spare[i].z = block.now[i].z;
+  CoordinateTriple* const to = block.spare;
+  for (int i = 0; i < count; ++i) {
+    const CoordinateTriple at = to[i];
+    to[i] = {plane.x0 + plane.sx * at.x, plane.y0 + plane.sy * at.y, from[i].z};
   }
   block.swap();
 }
 
 void ProjectionImpl::inverse(Block& block) const {
-  const Plane& plane = formula_->plane;
+  const Plane plane = formula_->plane;
   const double by_x = 1 / plane.sx;
   const double by_y = 1 / plane.sy;
   bool odd = block.failed;
