@@ -269,11 +269,56 @@ def krovak(e):
 
     def forward(lon, lat):
         v, u = mapping(lon_0 - lon, lat)
-        s = mp.asin(mp.cos(colat) * mp.sin(u) - mp.sin(colat) * mp.cos(u) * mp.cos(v))
+        s = mp.asin(mp.cos(colat) * mp.sin(u) + mp.sin(colat) * mp.cos(u) * mp.cos(v))
         d = mp.asin(mp.cos(u) * mp.sin(v) / mp.cos(s))
         theta = n * d
         r = r0 * (mp.tan(PI / 4 + lat_p / 2) / mp.tan(s / 2 + PI / 4)) ** n
         return -r * mp.sin(theta), -r * mp.cos(theta)
+
+    return forward
+
+
+def bipolar(scaled=False):
+    """The map of the Americas, a sphere of radius 1 (Snyder 1987, eq. 17-1 to 17-22)."""
+    deg = PI / 180
+    lat_a, lon_a, lat_b, apart, z1, z2 = (v * deg for v in (-20, -110, 45, 104, 31, 73))
+    lon_b = lon_a + mp.acos((mp.cos(apart) - mp.sin(lat_a) * mp.sin(lat_b))
+                            / (mp.cos(lat_a) * mp.cos(lat_b)))
+    n = mp.log(mp.sin(z1) / mp.sin(z2)) / mp.log(mp.tan(z1 / 2) / mp.tan(z2 / 2))
+    size = mp.sin(z1) / (n * mp.tan(z1 / 2) ** n)
+    total = mp.tan(z1 / 2) ** n + mp.tan(z2 / 2) ** n
+    rho_c = size * total / 2
+    z_c = 2 * mp.atan((total / 2) ** (1 / n))
+    k0 = 2 / (1 + n * size * mp.tan(26 * deg) ** n / mp.sin(52 * deg)) if scaled else 1
+
+    def from_pole(lat_p, lon_p, lat, lon):
+        d = lon - lon_p
+        z = mp.acos(mp.sin(lat_p) * mp.sin(lat) + mp.cos(lat_p) * mp.cos(lat) * mp.cos(d))
+        return z, mp.atan2(mp.sin(d) * mp.cos(lat), mp.cos(lat_p) * mp.sin(lat)
+                           - mp.sin(lat_p) * mp.cos(lat) * mp.cos(d))
+
+    az_ab = from_pole(lat_a, lon_a, lat_b, lon_b)[1]  # eastward from north
+    az_ba = -from_pole(lat_b, lon_b, lat_a, lon_a)[1]  # westward
+    lat_c = mp.asin(mp.sin(lat_a) * mp.cos(z_c) + mp.cos(lat_a) * mp.sin(z_c) * mp.cos(az_ab))
+    az_c = mp.asin(mp.cos(lat_a) * mp.sin(az_ab) / mp.cos(lat_c))
+
+    def forward(lon, lat):
+        z, east = from_pole(lat_b, lon_b, lat, lon)
+        west = -east
+        by_b = west <= az_ba
+        if by_b:
+            turn = n * (az_ba - west)
+        else:
+            z, east = from_pole(lat_a, lon_a, lat, lon)
+            turn = n * (az_ab - east)
+        r = size * mp.tan(z / 2) ** n
+        cosine = (mp.tan(z / 2) ** n + mp.tan((apart - z) / 2) ** n) / total
+        alpha = mp.acos(min(cosine, mp.mpf(1)))
+        if abs(turn) < alpha:
+            r /= mp.cos(alpha - turn if by_b else alpha + turn)
+        x, y = r * mp.sin(turn), (r if by_b else -r) * mp.cos(turn)
+        y += -rho_c if by_b else rho_c
+        return k0 * (-x * mp.cos(az_c) - y * mp.sin(az_c)), k0 * (-y * mp.cos(az_c) + x * mp.sin(az_c))
 
     return forward
 
@@ -504,6 +549,55 @@ def equal_earth(e, lon0):
         return rq * 2 * mp.sqrt(3) * (lon - lon0) * mp.cos(t) / (3 * slope), rq * y
 
     return forward
+
+
+# --- the track of a satellite --------------------------------------------------------------------
+
+
+class SpaceOblique:
+    """Snyder 1987, eq. 27-1 to 27-16, of a circular orbit: his series are the integrals' own."""
+
+    def __init__(self, e, inclination, ratio, node):
+        e2, s = e * e, mp.sin(inclination)
+        self.e2, self.s, self.c, self.p, self.node = e2, s, mp.cos(inclination), ratio, node
+        self.j = (1 - e2) ** 3
+        self.w = ((1 - e2 * self.c ** 2) / (1 - e2)) ** 2 - 1
+        self.q = e2 * s * s / (1 - e2)
+        self.t = e2 * s * s * (2 - e2) / (1 - e2) ** 2
+
+    def terms(self, angle):
+        s2 = mp.sin(angle) ** 2
+        one, two = 1 + self.q * s2, 1 + self.w * s2
+        big_s = self.p * self.s * mp.cos(angle) * mp.sqrt((1 + self.t * s2) / (two * one))
+        big_h = mp.sqrt(one / two) * (two / one ** 2 - self.p * self.c)
+        return big_s, big_h, mp.sqrt(self.j ** 2 + big_s ** 2)
+
+    def forward(self, lon, lat, start):
+        """start: an angle along the orbit near that of the point."""
+        tangent = (1 - self.e2) * self.s * mp.tan(lat)
+        angle = start
+        for _ in range(500):
+            turned = lon - self.node + self.p * angle
+            way = mp.atan2(self.c * mp.sin(turned) + tangent, mp.cos(turned))
+            way += 2 * PI * mp.nint((angle - way) / (2 * PI))
+            step, angle = abs(way - angle), way
+            if step < mp.mpf(10) ** -40:
+                break
+        sine = ((1 - self.e2) * self.c * mp.sin(lat) - self.s * mp.cos(lat) * mp.sin(turned))
+        y0 = mp.atanh(sine / mp.sqrt(1 - self.e2 * mp.sin(lat) ** 2))
+        big_s, _, size = self.terms(angle)
+
+        def along(v):
+            s, h, d = self.terms(v)
+            return (h * self.j - s * s) / d
+
+        def across(v):
+            s, h, d = self.terms(v)
+            return s * (h + self.j) / d
+
+        pieces = [angle * k / 4 for k in range(5)]
+        return (mp.quad(along, pieces) - big_s / size * y0,
+                mp.quad(across, pieces) + self.j / size * y0)
 
 
 # --- distortion --------------------------------------------------------------------------------

@@ -11,18 +11,29 @@ from functools import lru_cache
 import mpmath as mp
 
 
-def coefficients(path):
-    """{epoch: {(n, m): (g, h)}} of a table of IAGA's form, rows n, m with m below 0 for h."""
+def rows_of(path):
+    """The rows of a table of the store's sources, by the names of the columns."""
     with open(path, newline="") as file:
-        rows = list(csv.reader(file))
-    epochs = [float(text) for text in rows[0][2:]]
-    sets = {epoch: {} for epoch in epochs}
-    for row in rows[1:]:
-        n, m = int(row[0]), int(row[1])
-        for epoch, text in zip(epochs, row[2:]):
-            g, h = sets[epoch].get((n, abs(m)), (mp.mpf(0), mp.mpf(0)))
-            sets[epoch][n, abs(m)] = (g, mp.mpf(text)) if m < 0 else (mp.mpf(text), h)
-    return sets
+        return list(csv.DictReader(line for line in file if not line.startswith("#")))
+
+
+def of_store(data, name, date):
+    """The coefficients of a date, {(n, m): (g, h)}, of a model of the folder data/."""
+    model = next(row for row in rows_of(data / "magnetic_models.csv") if row["model name"] == name)
+    files = {row["table"]: row["file"] for row in rows_of(data / "tables.csv")}
+    epochs = rows_of(data / files[model["epoch table"]])
+
+    def read(epoch):
+        return {(int(row["n"]), int(row["m"])): (mp.mpf(row["C"]), mp.mpf(row["S"]))
+                for row in rows_of(data / files[epoch["coefficient table"]]) if row["n"] != "0"}
+
+    # the last set holds the yearly rates of the one before it
+    sets = {float(epoch["Epoch date"]): read(epoch) for epoch in epochs[:-1]}
+    end, newest = float(epochs[-1]["Epoch date"]), max(sets)
+    rates = read(epochs[-1])
+    sets[end] = {key: tuple(a + b * (end - newest) for a, b in zip(value, rates[key]))
+                 for key, value in sets[newest].items()}
+    return between(sets, date)
 
 
 def between(sets, date):
@@ -31,8 +42,10 @@ def between(sets, date):
     last = max(i for i, epoch in enumerate(epochs[:-1]) if epoch <= date)
     low, high = epochs[last], epochs[last + 1]
     share = (mp.mpf(date) - low) / (high - low)
-    return {key: tuple(a + (b - a) * share for a, b in zip(sets[low][key], sets[high][key]))
-            for key in sets[low]}
+    none = (mp.mpf(0), mp.mpf(0))
+    return {key: tuple(a + (b - a) * share for a, b in
+                       zip(sets[low].get(key, none), sets[high].get(key, none)))
+            for key in set(sets[low]) | set(sets[high])}
 
 
 @lru_cache(maxsize=None)

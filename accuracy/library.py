@@ -45,7 +45,7 @@ _SCALARS = {"double": ctypes.c_double, "int32_t": ctypes.c_int32, "int16_t": cty
             "CoordinateTriple": Triple, "TWcontext": ctypes.c_size_t}
 _DTYPES = {"double": np.float64, "int32_t": np.int32, "int16_t": np.int16, "uint32_t": np.uint32,
            "uint16_t": np.uint16, "float": np.float32, "CoordinateTriple": np.float64,
-           "TWstatus": np.uint32}
+           "TWstatus": np.uint32, "NadconControl": np.float64, "GeoidControl": np.float64}
 
 
 def _prototypes():
@@ -66,7 +66,7 @@ PROTOTYPES = _prototypes()
 
 
 def contract(name, **given):
-    """Calls a function; its inputs and outputs by name, and its words as "status" and "result"."""
+    """Calls a function; its inputs and outputs by name, and its word as "status"."""
     result, arguments = PROTOTYPES[name]
     function = getattr(_core, name)
     function.restype = _SCALARS.get(result)
@@ -98,20 +98,27 @@ def contract(name, **given):
             array = np.ascontiguousarray(array, _DTYPES[kind])
             kept[argument] = array
             values.append(array.ctypes.data_as(ctypes.c_void_p))
-    answer = function(*values)
-    kept.update(status=int(status[0]), result=answer)
+    function(*values)
+    kept.update(status=int(status[0]))
     return kept
 
 
 def points(name, array, in_place=False, **given):
     """Calls an array function on rows of two or three; a point that fails is not-a-number."""
-    given = {key: value for key, value in given.items() if key not in ("status", "result")}
+    given = {key: value for key, value in given.items() if key != "status"}
     array = np.asarray(array, np.float64)
     rows = np.zeros((len(array), 3))
     rows[:, :array.shape[1]] = array
     out = rows if in_place else np.full_like(rows, np.nan)
     given.update({"in": rows, "out": out, "count": len(rows)})
-    return contract(name, **given)["out"]
+    answer = contract(name, **given)["out"]
+    # Some functions stop at a point that fails: those behind it are asked one by one.
+    failed = np.flatnonzero(~np.isfinite(answer[:, 0])) if not in_place else []
+    if 0 < len(failed) < len(rows):
+        for i in failed:
+            one = {**given, "in": rows[i:i + 1].copy(), "out": np.full((1, 3), np.nan), "count": 1}
+            answer[i] = contract(name, **one)["out"]
+    return answer
 
 
 # --- the systems layer ------------------------------------------------------------------------
@@ -196,11 +203,18 @@ class Projection:
         return np.array([[getattr(f, name) for name, _ in Factors._fields_] for f in out])
 
 
+class Options(ctypes.Structure):
+    _fields_ = [("operation", ctypes.c_char_p), ("grid_folders", ctypes.c_char_p),
+                ("epoch", ctypes.c_double), ("area", ctypes.c_void_p), ("radians", ctypes.c_int32),
+                ("own_axes", ctypes.c_int32)]
+
+
 class Transformation:
-    def __init__(self, source, target):
+    def __init__(self, source, target, operation=None):
+        options = Options(operation.encode() if operation else None)
         self.handle = _made(_transformation(_made(_system(source.encode()), source),
-                                            _made(_system(target.encode()), target), None),
-                            f"{source} to {target}")
+                                            _made(_system(target.encode()), target),
+                                            ctypes.addressof(options)), f"{source} to {target}")
 
     def __call__(self, array, inverse=False):
         given, out = _columns(array), _columns(np.zeros((len(array), 3)))

@@ -73,11 +73,10 @@ class Error:
 def shown(value, unit):
     """A figure in the unit that suits it."""
     if unit == "m":
-        for size, name in ((1000, "km"), (1, "m"), (1e-3, "mm"), (1e-6, "µm")):
+        for size, name in ((1000, "km"), (1, "m"), (1e-3, "mm"), (1e-6, "µm"), (1e-9, "nm")):
             if value >= size:
-                return f"{value / size:.2g} {name}" if value < 100 * size else \
-                    f"{value / size:.0f} {name}"
-        return "< 1 nm" if value < 1e-9 else f"{value / 1e-9:.2g} nm"
+                return f"{value / size:.{0 if value >= 10 * size else 1}f} {name}"
+        return "< 1 nm"
     if value == 0:
         return f"0 {unit}".strip()
     return f"{value:.1e} {unit}".strip()

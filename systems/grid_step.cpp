@@ -13,8 +13,6 @@ namespace {
 // Where PROJ's grids usually are, after the folders of the caller's.
 constexpr const char* kUsualFolders[] = {"/usr/share/proj", "/usr/local/share/proj"};
 
-constexpr double kDegree = kPi / 180;
-
 constexpr int kNadcon = 9613, kNationalVersion1 = 9614, kNationalVersion2 = 9615;
 constexpr int kGeocentricByGrid = 1087;
 
@@ -86,22 +84,25 @@ class ShiftGridStep final : public DatumStep {
     const bool back = inverse != reversed_;
     const double before = (back ? target_ : source_).meridian;
     const double after = (back ? source_ : target_).meridian;
+    const GridContent& grid = grid_.content();
     for (int i = 0; i < block.count; ++i) {
-      block.now[i].x = (block.now[i].x - before) * (1 / kDegree);
-      block.now[i].y *= 1 / kDegree;
-    }
-    const Coordinates<double> points = {&block.now[0].x, &block.now[0].y, &block.now[0].z, 3};
-    TWstatus words[kBlockSize];
-    const auto count = static_cast<std::size_t>(block.count);
-    const Summary summary = back ? grid_.inverse(count, points, points, words)
-                                 : grid_.forward(count, points, points, words);
-    for (int i = 0; i < block.count; ++i) {
-      block.now[i].x = block.now[i].x * kDegree + after;
-      block.now[i].y *= kDegree;
-    }
-    if (summary.failed == 0) return;
-    for (int i = 0; i < block.count; ++i) {
-      if (words[i] != TW_SUCCESS) block.fail(i, words[i]);
+      CoordinateTriple& point = block.now[i];
+      double x = point.x - before;
+      double y = point.y;
+      TWstatus word = TW_SUCCESS;
+      if (back) {
+        int passes = 0;
+        word = grid.unshift(&x, &y, &passes);
+      } else {
+        double dlon = 0;
+        double dlat = 0;
+        if (!grid.shift(x, y, &dlon, &dlat)) word = TW_I_OUTSIDE_CNT;
+        x += dlon;
+        y += dlat;
+      }
+      point.x = x + after;
+      point.y = y;
+      if (word != TW_SUCCESS) block.fail(i, word);
     }
   }
   std::string describe() const override { return words_; }

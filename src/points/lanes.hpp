@@ -197,6 +197,8 @@ TW_INLINE bool any(LanesMask<N> a) {
 #endif
 #if defined(__SSE2__)
   if constexpr (N == 2) return _mm_movemask_pd(__builtin_bit_cast(__m128d, a.m)) != 0;
+#elif defined(__wasm_simd128__)
+  if constexpr (N == 2) return wasm_v128_any_true(__builtin_bit_cast(v128_t, a.m));
 #endif
   int64_t either = 0;
   for (int i = 0; i < N; ++i) either |= a.m[i];
@@ -228,7 +230,12 @@ TW_INLINE Lanes<N> select(LanesMask<N> m, double a, Lanes<N> b) {
 
 template <int N>
 TW_INLINE Lanes<N> abs(Lanes<N> a) {
+#if defined(__wasm_simd128__)
+  return __builtin_bit_cast(typename Lanes<N>::Vector,
+                            wasm_f64x2_abs(__builtin_bit_cast(v128_t, a.v)));
+#else
   return number(bits(a) & LanesBits<N>(INT64_MAX));
+#endif
 }
 template <int N>
 TW_INLINE Lanes<N> copysign(Lanes<N> a, Lanes<N> sign) {

@@ -35,6 +35,7 @@ void TWget_jacobian(TWtransform_ptr transform, void* context, double step0, doub
                     TWstatus* status) {
   *status = TW_SUCCESS;
   const double steps[3] = {step0, step1, step2};
+  // A point at a time: the caller's function takes the time, and sees six points a call.
   for (int32_t i = 0; i < count; ++i, jacobians += kRecord) {
     const CoordinateTriple p = in[i];
     // minus and plus along each of the three axes
