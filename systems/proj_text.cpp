@@ -101,11 +101,11 @@ constexpr NamedEllipsoid kEllipsoids[] = {
     {"clrk66", 6378206.4, 6378206.4 / (6378206.4 - 6356583.8)},
     {"clrk80", 6378249.145, 293.4663},
     {"clrk80ign", 6378249.2, 293.4660212936269},
-    {"evrst30", 6377276.345, 300.8017},
-    {"evrst48", 6377304.063, 300.8017},
-    {"evrst56", 6377301.243, 300.8017},
-    {"evrst69", 6377295.664, 300.8017},
-    {"evrstSS", 6377298.556, 300.8017},
+    {"evrst30", 6377276.345, 300.8017},  // Everest 1830 (1937 Adjustment)
+    {"evrst48", 6377304.063, 300.8017},  // Everest 1830 Modified
+    {"evrst56", 6377301.243, 300.8017},  // Everest 1830 (1962 Definition)
+    {"evrst69", 6377295.664, 300.8017},  // Everest 1830 (RSO 1969)
+    {"evrstSS", 6377298.556, 300.8017},  // Everest 1830 (1967 Definition)
     {"fschr60", 6378166, 298.3},
     {"helmert", 6378200, 298.3},
     {"hough", 6378270, 297},
@@ -119,7 +119,7 @@ constexpr NamedEllipsoid kEllipsoids[] = {
     {"danish", 6377019.2563, 300},
     {"new_intl", 6378157.5, 6378157.5 / (6378157.5 - 6356772.2)},
     {"plessis", 6376523, 6376523 / (6376523.0 - 6355863)},
-    {"sphere", 6370997, 0},
+    {"sphere", 6370997, 0},  // Clarke 1866 Authalic Sphere
 };
 
 struct Given {
@@ -625,6 +625,10 @@ std::string_view foreign(const Definition& definition) {
       return sphere || definition.method == 1029 ? "" : "PROJ takes the ellipsoid's formula";
     case 1028:
       return sphere ? "" : "PROJ takes the sphere's formula";
+    case kChamberlin:
+      return sphere ? "" : "PROJ takes the sphere's formula";
+    case kLandsat:
+      return definition.parameter(kSatellite) == 7 ? "PROJ knows Landsat 1 to 5 alone" : "";
     case 1130:
       return definition.parameter(kAzimuth) != 0 || definition.parameter(kLineScale, 1) != 1
                  ? "PROJ cannot turn or scale it"

@@ -23,7 +23,7 @@ extern "C" {
 /**
  * Constants of a cone with one or two standard parallels (Snyder 1987, eq. 14-12 to 14-15).  It
  * cannot fail: parallels symmetric about the equator give a cone constant of zero and a rho0 that
- * is no number.
+ * is NaN.
  * @param e          first eccentricity; exactly 0 for the sphere
  * @param lon0       not read
  * @param lat0       latitude of origin, radians
@@ -46,7 +46,7 @@ TW_API void TWalbers_c(double e, double lon0, double lat0, double lat1, double l
  * @param in      longitude, latitude
  * @param out     x, y
  * @param status  #TW_BAD_LATITUDE beyond pi/2 + 1e-12: stop; #TW_I_LATITUDE_LIMITED for a latitude
- *                beyond pi/2 held at the pole
+ *                beyond pi/2 clamped to the pole
  */
 TW_API void TWalbers_f(double e, double lon0, double n, double C, double rho0, int32_t count,
                        const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
@@ -54,8 +54,8 @@ TW_API void TWalbers_f(double e, double lon0, double n, double C, double rho0, i
 /**
  * Inverse (Snyder 1987, eq. 14-8 to 14-11, 14-19, 3-16), to 1e-13 radians away from the poles.
  * Newton's steps shrink only by half towards a pole; there they are extrapolated, and a latitude
- * that comes within 4e-5 radians may be held at the pole.  On the sphere (e of 1e-13 or less) one
- * within 4e-7 of a pole is the pole.  The longitude is not wrapped.  For an eccentricity above
+ * that comes within 4e-5 radians may be clamped to the pole.  On the sphere (e of 1e-13 or less)
+ * one within 4e-7 of a pole is the pole.  The longitude is not wrapped.  For an eccentricity above
  * 1e-13 and below about 0.01, as no ellipsoid of the earth has, the logarithm of the formula loses
  * digits (1e-16 / e of them), in all four functions: pass 0 for a sphere.
  * @param e       first eccentricity
@@ -67,9 +67,9 @@ TW_API void TWalbers_f(double e, double lon0, double n, double C, double rho0, i
  * @param in      x, y
  * @param out     longitude, latitude
  * @param status  #TW_NOT_CONVERGED for a point outside the cone's fan or beyond its poles: stop;
- *                #TW_I_LATITUDE_LIMITED for a latitude held at a pole, or one that took all 30
- *                steps, both written; on the ellipsoid a point a hair beyond the SOUTH pole comes
- *                out at the north pole with this word
+ *                #TW_I_LATITUDE_LIMITED for a latitude clamped to a pole, or one that took all 30
+ *                steps, both written; on the ellipsoid a point just beyond the SOUTH pole comes out
+ *                at the north pole with this status
  */
 TW_API void TWalbers_i(double e, double lon0, double n, double C, double rho0, int32_t count,
                        const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);

@@ -12,6 +12,13 @@
 
 #include "tidewater/frame.h"
 
+/** Puts a member on a multiple of 8 bytes on every machine, 32-bit ones included. */
+#ifdef __cplusplus
+#define TW_ALIGNED_8 alignas(8)
+#else
+#define TW_ALIGNED_8 _Alignas(8)
+#endif
+
 #ifdef __cplusplus
 extern "C" {
 #endif
@@ -38,8 +45,8 @@ typedef struct AngleUnit {
   };
   int16_t precision;       /**< Decimals: of the unit, in the other forms of the seconds. */
   int16_t hemisphere_mode; /**< 0 to 5, see above. */
-  double factor; /**< Radians per unit; in the colon and the packed form radians per second of arc.
-                  */
+  /** Radians per unit; in the colon and the packed form radians per second of arc. */
+  TW_ALIGNED_8 double factor;
 } AngleUnit;
 
 /**
@@ -77,7 +84,7 @@ TW_API void TWascii_to_rad_wide(TWchar16* text, AngleUnit unit, int16_t axis, do
  * Writes an angle.
  *
  * Seconds that would round to 60 go to the next minute, minutes that reach 60 to the next degree.
- * An angle that is infinite or not a number is written as in a decimal unit.
+ * An angle that is infinite or NaN is written as in a decimal unit.
  * @param value   angle, radians, positive east and north
  * @param unit    unit with a narrow format
  * @param axis    0 longitude, 1 latitude; with another value no letter is written

@@ -5,6 +5,13 @@
  * Three sets of angles of a camera's attitude, all in radians: omega, phi, kappa; tilt, swing,
  * azimuth; and Wx, Wy, Wz, rotations about the geocentric axes seen at a ground position.  The
  * status is always #TW_SUCCESS.
+ *
+ * The conversions of angles rest on the matrix R_kappa R_phi R_omega of rotations of the axes,
+ * omega applied first.  By contract TWcalc_matrix() has ANOTHER order, R_phi R_omega R_kappa: its
+ * matrix is not that of the same three angles in the conversions.
+ *
+ * Source: Wolf and Dewitt, Elements of Photogrammetry with Applications in GIS, third edition
+ * (2000), the rotation matrix by omega, phi, kappa and by azimuth, tilt, swing.
  */
 #ifndef TIDEWATER_ATTITUDE_H
 #define TIDEWATER_ATTITUDE_H
@@ -16,7 +23,8 @@ extern "C" {
 #endif
 
 /**
- * Rotation matrix of omega, phi, kappa; exactly the identity when all three are exactly zero.
+ * Rotation matrix R_phi R_omega R_kappa, kappa applied first; exactly the identity when all three
+ * are exactly zero.
  * @param omega,phi,kappa  angles
  * @param matrix           nine doubles, row by row
  * @param status           always #TW_SUCCESS

@@ -50,7 +50,7 @@ TW_API void TWlam_az_eq_c(double e, double lon0, double lat0, double* e2, double
  * @param D                  constant of TWlam_az_eq_c()
  * @param out                x, y; may be in
  * @param status             #TW_NOT_CONVERGED for |q / qp| beyond 1 and 1e-12: stop;
- *                           #TW_I_LATITUDE_LIMITED for a lesser excess, held at 1
+ *                           #TW_I_LATITUDE_LIMITED for a lesser excess, clamped to 1
  */
 TW_API void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, double lon0,
                           double lat0, double e2, double q1, double qp, double rq, double m1,
@@ -74,7 +74,7 @@ TW_API void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, d
  * @param status             #TW_NOT_CONVERGED outside the disc by more than 1e-12 (sphere) or
  *                           0.0005 (ellipsoid) of its radius, when 50 passes were used, or for a
  *                           latitude beyond a pole: stop.  #TW_I_LATITUDE_LIMITED for a lesser
- *                           excess, held at 1
+ *                           excess, clamped to 1
  */
 TW_API void TWlam_az_eq_i(const CoordinateTriple* in, int32_t count, double e, double lon0,
                           double lat0, double e2, double qp, double rq, double sin_b1,

@@ -6,6 +6,12 @@
  * with an azimuth that is off that of the geodesic by up to 6e-6 radians there.  Past a quarter
  * turn on the meridian of the origin the distance is the meridian arc.
  *
+ * Forward and inverse are two series, and do not return exactly.  Round trip on WGS 84, measured
+ * over origins at 0, 45, 60 and 90 degrees: 1e-6 m at 100 km from the origin, 0.3 mm at 300 km, 11
+ * mm at 600 km, 0.13 m at 1000 km, 4 m at 2000 km, hundreds of metres at 5000 km, kilometres beyond
+ * 10,000 km.  Across a pole from an origin at 60 degrees of latitude it is 30 m at 89 degrees and
+ * 120 m at 80.
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 191-202.
  *
@@ -38,7 +44,7 @@ TW_API void TWaz_eq_c(double e, double lat0, double* n1, double* g);
  * @param count      number of points
  * @param in         longitude, latitude
  * @param out        x, y; may be in
- * @param status     #TW_SUCCESS, or the word of the last meridian arc that was computed
+ * @param status     #TW_SUCCESS, or the status of the last meridian arc that was computed
  */
 TW_API void TWaz_eq_f(double e, double lon0, double lat0, double n1, double g, int32_t count,
                       const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);

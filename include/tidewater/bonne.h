@@ -24,7 +24,7 @@ extern "C" {
  * @param e2      square of e, 0 for a sphere
  * @param c1      radius of the standard parallel on the cone
  * @param r0      c1 and the meridian arc of lat1
- * @param status  #TW_BAD_ECCENTRICITY for e of 1 or more or below 0, nothing written; word of
+ * @param status  #TW_BAD_ECCENTRICITY for e of 1 or more or below 0, nothing written; the status of
  *                TWmerid_dist_f(), r0 unwritten on failure
  */
 TW_API void TWbonne_c(double e, double* lat1, double* e2, double* c1, double* r0, TWstatus* status);
@@ -41,7 +41,7 @@ TW_API void TWbonne_c(double e, double* lat1, double* e2, double* c1, double* r0
  * @param count   number of points
  * @param in      longitude, latitude
  * @param out     x, y
- * @param status  word of TWmerid_dist_f(): stop on failure
+ * @param status  the status of TWmerid_dist_f(): stop on failure
  */
 TW_API void TWbonne_f(double lon0, double lat1, double e, double e2, double c1, double r0,
                       int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
@@ -59,7 +59,7 @@ TW_API void TWbonne_f(double lon0, double lat1, double e, double e2, double c1, 
  * @param count   number of points
  * @param in      x, y
  * @param out     longitude, latitude
- * @param status  word of TWmerid_dist_i(): stop on failure
+ * @param status  the status of TWmerid_dist_i(): stop on failure
  */
 TW_API void TWbonne_i(double lon0, double lat1, double e, double e2, double c1, double r0,
                       int32_t count, const CoordinateTriple* in, CoordinateTriple* out,

@@ -71,8 +71,8 @@ TW_API void TWcassini_i(double e, double lon0, double c0, double m0, double d2, 
  * Scale (Snyder 1987, p. 95): 1 + x^2 / 2 R^2 with R^2 the product of the radii of curvature, along
  * the central meridian's direction; true across it.  It works IN PLACE only: in and out must be the
  * same array, which then holds scales.  (With two arrays z of in is lost to the latitude, and h is
- * formed with whatever latitude z of out held.)  A latitude within 1e-10 of a pole is held there;
- * one near the south pole is held just past the NORTH pole.
+ * formed with whatever latitude z of out held.)  A latitude within 1e-10 of a pole is clamped to
+ * it; one near the south pole is clamped to just past the NORTH pole.
  * @param e            first eccentricity
  * @param lon0         central meridian
  * @param k0           central scale

@@ -10,7 +10,7 @@
  * Status words that all functions share, beside those that each names:
  * - #TW_PF_OPEN_ERROR: the store cannot be opened.
  * - #TW_PF_TABLE_ERROR: a table is missing or cannot be read; in the functions that say so, also a
- *   store that cannot be closed, over any other word.
+ *   store that cannot be closed, over any other status.
  *
  * After a failure the outputs are as they were, except where a function says otherwise.
  *

@@ -39,7 +39,7 @@ extern "C" {
  * @param rotation     angle from the x axis to north, radians: written (pi/2) in mode 0, read in
  *                     mode 1
  * @param status       #TW_BAD_INPUT for another mode, with sides and azimuths written; a failing
- *                     TWgeneric_i() or TWchamtri_f() ends the call with its word
+ *                     TWgeneric_i() or TWchamtri_f() ends the call with its status
  */
 TW_API void TWchamtri_c(TWtransform forward, TWcontext context, int16_t mode, double e,
                         const CoordinateTriple* control, double* sides, double* azimuths,
@@ -56,7 +56,7 @@ TW_API void TWchamtri_c(TWtransform forward, TWcontext context, int16_t mode, do
  * @param count     number of points
  * @param in        longitude, latitude, height
  * @param out       x, y, and the HEIGHT, which is copied
- * @param status    the word of the last TWgeodesic_inv()
+ * @param status    the status of the last TWgeodesic_inv()
  */
 TW_API void TWchamtri_f(double e, const CoordinateTriple* control, const double* sides,
                         const double* azimuths, const CoordinateTriple* plane, int32_t count,

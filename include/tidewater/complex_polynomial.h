@@ -62,7 +62,7 @@ TW_API void TWcomplexpol_i(int32_t order, double y0, double x0, double sy, doubl
 /**
  * Conformal mapping of second degree: with X = (x - x0) / sx and Y = (y - y0) / sy, x' = a0 + a1 X
  * - b1 Y + a2 (X^2 - Y^2) - 2 b2 X Y and y' = b0 + b1 X + a1 Y + b2 (X^2 - Y^2) + 2 a2 X Y. The
- * second-degree terms are dropped where hypot(a2, b2) is below 1e-12.
+ *   second-degree terms are dropped where hypot(a2, b2) is below 1e-12.
  * @param x0,y0,sx,sy  normalising origin and scales
  * @param a0,a1,a2     coefficients
  * @param b0,b1,b2     coefficients

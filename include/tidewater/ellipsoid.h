@@ -4,6 +4,10 @@
  *
  * The ellipsoid is a, the semi-major axis, whose unit is that of every length, and e, the first
  * eccentricity (not its square; TWdM_dphi() alone takes the square).
+ *
+ * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987); Helmert,
+ * Die mathematischen und physikalischen Theorieen der hoeheren Geodaesie, part 1 (1880), for the
+ * meridian arc; Heiskanen and Moritz, Physical Geodesy (1967), for normal gravity.
  */
 #ifndef TIDEWATER_ELLIPSOID_H
 #define TIDEWATER_ELLIPSOID_H
@@ -70,7 +74,7 @@ TW_API void TWeq_vol_R(double a, double e, double* radius, TWstatus* status);
  * @param distance  signed arc, in the unit of a
  * @param status    #TW_BAD_ECCENTRICITY unless 0 <= e < 1, then #TW_BAD_SEMI_MAJOR for a of zero or
  *                  below, then #TW_BAD_LATITUDE beyond pi/2 + 1e-12, each with distance unwritten;
- *                  #TW_I_LATITUDE_LIMITED for a latitude beyond pi/2 held at the pole
+ *                  #TW_I_LATITUDE_LIMITED for a latitude beyond pi/2 clamped to the pole
  */
 TW_API void TWmerid_dist_f(double a, double e, double lat, double* distance, TWstatus* status);
 

@@ -25,7 +25,7 @@ extern "C" {
  * to change nothing but the longitude's origin; an origin within 2e-6 of a pole gives c = 1, with t
  * and R taken at 2e-6 from the pole.
  * @param e       first eccentricity
- * @param lat0    latitude of origin, radians; beyond a pole t is a not-a-number
+ * @param lat0    latitude of origin, radians; beyond a pole t is a NaN
  * @param chi0    latitude of origin on the sphere
  * @param c       ratio of longitudes, sphere over ellipsoid
  * @param t       shift of the isometric latitude between ellipsoid and sphere

@@ -1,6 +1,9 @@
 /**
  * @file generic_inverse.h
  * Inverse of any forward projection.
+ *
+ * Source: this library's own iteration, a secant method on the sphere: each step turns and
+ * stretches the plane's error as the step before was turned and stretched.
  */
 #ifndef TIDEWATER_GENERIC_INVERSE_H
 #define TIDEWATER_GENERIC_INVERSE_H
@@ -24,7 +27,7 @@ extern "C" {
  * @param in                   x, y
  * @param out                  longitude, latitude; may be in
  * @param status               #TW_NOT_CONVERGED for a start latitude beyond a pole, and where
- *                             forward fails: stop.  An information word of forward is handed on
+ *                             forward fails: stop.  An information status of forward is handed on
  */
 TW_API void TWgeneric_i(TWtransform forward, TWcontext context, double start_lon, double start_lat,
                         double unused, int32_t count, const CoordinateTriple* in,

@@ -4,6 +4,9 @@
  *
  * The ellipsoid is a, the semi-major axis, whose unit is that of every length, and e, the first
  * eccentricity (not its square).  No function here tests a latitude or a longitude.
+ *
+ * Source: Heiskanen and Moritz, Physical Geodesy (1967); Bowring, The Accuracy of Geodetic Latitude
+ * and Height Equations, Survey Review 28 (1985), pp. 202-206.
  */
 #ifndef TIDEWATER_GEOCENTRIC_H
 #define TIDEWATER_GEOCENTRIC_H

@@ -8,15 +8,16 @@
  * azimuth is the azimuth at the end point back to the start point.
  *
  * Take the geodesic for the shortest way and the rhumb line for a constant course.  No argument is
- * checked for its range; the words are those of the last inner call made.
+ * checked for its range; the status is that of the last inner call made.
  *
  * A line is described by its vertex, the point of highest reduced latitude on it, and integrated
  * outward from there by a five-term binomial expansion.  On the earth's ellipsoids a solved line is
  * within 0.1 mm of the exact one; a line whose vertex lies within a degree of a pole, or within
  * 0.001 degrees of the equator, loses digits (up to some decimetres across the line).
  *
- * In mode 0 the line is given by its two ends, and distance and azimuth are not read; in any other
- * mode it is given by start, distance and azimuth, and end is not read.
+ * TWgeodesic_cnt() and TWgeodesic_buf() lay points along a line: in mode 0 it is given by its two
+ * ends, and distance and azimuth are not read; in any other mode it is given by start, distance and
+ * azimuth, and end is not read.
  *
  * Source: Bessel, Ueber die Berechnung der geographischen Laengen und Breiten aus geodaetischen
  * Vermessungen, Astronomische Nachrichten 4 (1825), pp. 241-254.
@@ -60,7 +61,7 @@ TW_API void geodesic_int(double x, double k, int16_t flag, double b, double e2, 
  * @param a,e           ellipsoid
  * @param end           longitude, latitude, the start's height
  * @param back_azimuth  azimuth at the end towards the start, radians
- * @param status        #TW_SUCCESS; along a meridian the word of TWmerid_dist_i(), whose failure
+ * @param status        #TW_SUCCESS; along a meridian the status of TWmerid_dist_i(), whose failure
  *                      leaves the latitude of end unwritten
  */
 TW_API void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, double a,
@@ -72,10 +73,16 @@ TW_API void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distan
  *
  * NEARLY ANTIPODAL POINTS ARE NOT SOLVED: where the iteration fails, the length is that along the
  * parallel for points on one parallel, and otherwise a times the sine of the spherical arc, which
- * is far too short.  Whether the vertex lies ahead of a point is decided on the sphere: a long line
- * that leaves a point within some tenths of a degree of due east or west can come out short by up
- * to a thousandth of its length.  The iteration ends on a change of 0.0001 in the unit of a: GIVE
- * THE ELLIPSOID IN METRES; on one of unit axis most lines end in that failure.  The status is
+ * is far too short.  Whether the vertex lies ahead of a point is decided on the sphere, which is
+ * wrong for many lines that leave a point close to due east or west, SHORT ONES TOO; such a line
+ * comes out short or long, or its iteration fails.  Measured on WGS 84 over lines whose azimuth at
+ * the start lies 1e-6 to 1 degree from due east or west, in equal parts by its logarithm: of lines
+ * of 50 to 15,000 km 28 to 45 in a hundred are off by more than 1 mm.  Of those the median is off
+ * by 2e-6 to 4e-5 of the length, one in ten by 4e-4 to 8e-4 or more, and the worst by 0.3 per cent
+ * at 50 to 441 km, 2 per cent at 2000 km, 10 per cent at 5000 km and 70 per cent at 15,000 km.
+ * Nearly all of these start within half a degree of due east or west.  Where that matters, take
+ * tidewater/lines.hpp.  The iteration ends on a change of 0.0001 in the unit of a: GIVE THE
+ * ELLIPSOID IN METRES; on one of unit axis most lines end in that failure.  The status is
  * #TW_SUCCESS all the same.
  *
  * Points that are antipodal on a meridian circle to 1e-14 radians are joined over the north pole.
@@ -86,9 +93,9 @@ TW_API void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distan
  * @param azimuth       azimuth at start towards end, radians, 0 to 2 pi
  * @param back_azimuth  azimuth at end towards start, radians, 0 to 2 pi
  * @param distance      length of the line
- * @param status        #TW_SUCCESS; along a meridian the words of TWmerid_dist_f(), which for a bad
- *                      start leaves all three results unwritten, but for a turn added to azimuths
- *                      that are negative
+ * @param status        #TW_SUCCESS; along a meridian the status of TWmerid_dist_f(), which for a
+ *                      bad start leaves all three results unwritten, but for a turn added to
+ *                      azimuths that are negative
  */
 TW_API void TWgeodesic_inv(CoordinateTriple start, CoordinateTriple end, double a, double e,
                            double* azimuth, double* back_azimuth, double* distance,
@@ -97,11 +104,17 @@ TW_API void TWgeodesic_inv(CoordinateTriple start, CoordinateTriple end, double 
 /**
  * How many points a spacing needs: one more than the whole spacings in the line, and one more for a
  * remainder.
+ *
+ * By contract, where the spacing or the distance is NaN neither comparison of the two holds: count
+ * stays UNWRITTEN and the status is #TW_SUCCESS.  Set count before the call.  A number of points
+ * beyond 32 bits is clamped to the largest integer, 2147483647, with #TW_SUCCESS, as for a spacing
+ * of zero.
  * @param mode              0: by two ends; else by azimuth and distance
  * @param start,end         the ends
  * @param distance,azimuth  length, and azimuth at the start in radians
  * @param a,e               ellipsoid
- * @param spacing           distance between points; zero is not caught
+ * @param spacing           distance between points; zero is not caught, and a negative one gives a
+ *                          count below zero
  * @param count             number of points, both ends included
  * @param status            #TW_W_NO_POINTS for a spacing above the distance, with a count of 0
  */
@@ -121,7 +134,7 @@ TW_API void TWgeodesic_cnt(int16_t mode, CoordinateTriple start, CoordinateTripl
  * @param count             number of points, at least 2
  * @param points            count points
  * @param status            #TW_BUFFER_TOO_SMALL for a count below 2, with nothing written; else the
- *                          word of the last TWgeodesic_dir()
+ *                          status of the last TWgeodesic_dir()
  */
 TW_API void TWgeodesic_buf(int16_t mode, CoordinateTriple start, CoordinateTriple end,
                            double distance, double azimuth, double spacing, double a, double e,

@@ -23,6 +23,10 @@
  *   #TW_GEOID_READ_ERROR or #TW_NO_MEMORY gives success and a figure that is none when it is asked
  *   for again.  After a read error nothing may be tried again before a point far off, whose window
  *   can be read.
+ *
+ * Source: Milbert, GEOID90: A High-Resolution Geoid for the United States, Eos 72 (1991), for the
+ * grids; Abramowitz and Stegun, Handbook of Mathematical Functions (1964), section 25.2, Newton's
+ * forward difference formula, for the interpolation.
  */
 #ifndef TIDEWATER_GEOID_H
 #define TIDEWATER_GEOID_H
@@ -35,11 +39,15 @@ extern "C" {
 
 /** A grid of the list, as its file header tells it; degrees, negative west of Greenwich. */
 typedef struct GeoidGrid {
-  char name[260];               /**< Base name of its file. */
-  int32_t nc;                   /**< Columns. */
-  int32_t nr;                   /**< Rows. */
-  float xmin, ymin, xmax, ymax; /**< Bounds. */
-  float dx, dy;                 /**< Spacing of columns and of rows. */
+  char name[260]; /**< Base name of its file. */
+  int32_t nc;     /**< Columns. */
+  int32_t nr;     /**< Rows. */
+  float xmin;     /**< Western bound. */
+  float ymin;     /**< Southern bound. */
+  float xmax;     /**< Eastern bound. */
+  float ymax;     /**< Northern bound. */
+  float dx;       /**< Spacing of columns. */
+  float dy;       /**< Spacing of rows. */
 } GeoidGrid;
 
 /** The grids of a directory in order of priority; the caller's, filled by TWgeo90_c(). */
@@ -51,10 +59,14 @@ typedef struct GeoidControl {
 
 /** A window of up to 22 by 22 nodes; degrees, negative west of Greenwich. */
 typedef struct GeoidWindow {
-  int32_t nc;                   /**< Columns: 22 unless clipped to the grid. */
-  int32_t nr;                   /**< Rows: 22 unless clipped to the grid. */
-  float xmin, ymin, xmax, ymax; /**< Bounds. */
-  float dx, dy;                 /**< Spacing of columns and of rows. */
+  int32_t nc; /**< Columns: 22 unless clipped to the grid. */
+  int32_t nr; /**< Rows: 22 unless clipped to the grid. */
+  float xmin; /**< Western bound. */
+  float ymin; /**< Southern bound. */
+  float xmax; /**< Eastern bound. */
+  float ymax; /**< Northern bound. */
+  float dx;   /**< Spacing of columns. */
+  float dy;   /**< Spacing of rows. */
 } GeoidWindow;
 
 /**

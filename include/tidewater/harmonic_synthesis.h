@@ -79,7 +79,7 @@ TW_API void TWhar_normaliz(int32_t kind, int32_t N, double** C, double** S, TWst
 
 /**
  * Coefficients and their rates between set i and set i + 1.  Without interpolation, for dt below
- * tolerance or a not-a-number, the coefficients are those of set i.
+ * tolerance or a NaN, the coefficients are those of set i.
  * @param last_interval  0: set i + 1 is a model, and the rates are its differences from set i over
  *                       interval; 1: set i + 1 holds the rates themselves
  * @param interval       time between the two sets; read for last_interval 0
@@ -104,7 +104,7 @@ TW_API void TWhar_intp_Cnm(int16_t last_interval, double interval, double dt, do
  * Nothing is done if the whole units between date and last_date are not above tolerance: a change
  * of less than one unit never leads to new coefficients, whatever the tolerance.
  * @param date           in the unit of the epochs
- * @param last_date      date that the arrays hold, in and out; a not-a-number before first use
+ * @param last_date      date that the arrays hold, in and out; a NaN before first use
  * @param tolerance      see above, and TWhar_intp_Cnm()
  * @param epoch_count    number of sets, at least 2
  * @param degrees        degree of each set
@@ -138,7 +138,7 @@ TW_API void TWhar_set_date(double date, double* last_date, double tolerance, int
  * caches hold for one C, S, N, radius and mode: after a change of any set last_colat or last_radius
  * to a value that matches no point.  Two threads need a rec_b, work arrays and caches each.
  *
- * A point within 1e-12 radians of the axis is held there, at longitude 0.
+ * A point within 1e-12 radians of the axis is clamped to it, at longitude 0.
  * @param mode                             0: (north, east, down); 1: north alone; 2: east alone; 3:
  *                                         down alone; 4: gm / (r gamma) times the sum of C and S,
  *                                         with gamma normal gravity at the point, as for a geoid
@@ -153,7 +153,7 @@ TW_API void TWhar_set_date(double date, double* last_date, double tolerance, int
  * @param sum_dC,sum_dS,sum_lC,sum_lS,sum_rC,sum_rS,sum_C,sum_S  work arrays of N + 1 doubles
  * @param last_colat,last_radius,last_lon  remembered position, in and out; before first use any
  *                                         value that matches no point, such as 1e30, but for
- *                                         last_lon no not-a-number
+ *                                         last_lon not NaN
  * @param tolerance                        a length, in the unit of radius
  * @param saved_tcos,saved_tsin,saved_scale_theta,saved_scale_lambda,saved_scale_r  remembered
  *                                         values, in and out

@@ -40,7 +40,8 @@ TW_API void TWIMWmodP_stp(double lon0, double lat, double* lon_w, double* lon_e,
  * @param c       ordinate of the northern edge on the central meridian
  * @param p,q     how the ordinate of the eastern meridian's image goes with the meridian arc
  * @param s,t     how its abscissa does
- * @param status  #TW_BAD_LATITUDE as in TWIMWmodP_stp(), nothing written; words of TWmerid_dist_f()
+ * @param status  #TW_BAD_LATITUDE as in TWIMWmodP_stp(), nothing written; the status of
+ *                TWmerid_dist_f()
  */
 TW_API void TWIMWmodPoly_c(double e, double lon0, double lat1, double* r1, double* r2, double* c,
                            double* p, double* q, double* s, double* t, TWstatus* status);
@@ -56,8 +57,9 @@ TW_API void TWIMWmodPoly_c(double e, double lon0, double lat1, double* r1, doubl
  * @param in         longitude, latitude
  * @param out        x, y; the origin is the southern edge on the central meridian
  * @param status     #TW_BAD_LATITUDE beyond a pole by more than 1e-9, #TW_BAD_LONGITUDE,
- *                   #TW_RANGE_ERROR for a point too far from the sheet, and the words of
- *                   TWmerid_dist_f(): stop.  #TW_I_LATITUDE_LIMITED for a latitude held at a pole
+ *                   #TW_RANGE_ERROR for a point too far from the sheet, and the status of
+ *                   TWmerid_dist_f(): stop.  #TW_I_LATITUDE_LIMITED for a latitude clamped to a
+ *                   pole
  */
 TW_API void TWIMWmodPoly_f(double e, double lon0, double lat1, double r1, double r2, double c,
                            double p, double q, double s, double t, int32_t count,
@@ -74,7 +76,7 @@ TW_API void TWIMWmodPoly_f(double e, double lon0, double lat1, double r1, double
  * @param in         x, y
  * @param out        longitude, latitude
  * @param status     #TW_I_LATITUDE_LIMITED where the passes ran out, the forward function failed or
- *                   the latitude was held at a pole; the point is written all the same
+ *                   the latitude was clamped to a pole; the point is written all the same
  */
 TW_API void TWIMWmodPoly_i(double e, double lon0, double lat1, double r1, double r2, double c,
                            double p, double q, double s, double t, int32_t count,

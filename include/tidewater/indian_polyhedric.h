@@ -2,7 +2,9 @@
  * @file indian_polyhedric.h
  * Indian polyhedric projection of the ellipsoid.
  *
- * Two orders about a latitude of origin, for sheets of some degrees.
+ * A power series of the second order about a latitude of origin, for sheets of some degrees.
+ *
+ * Source: Survey of India, Auxiliary Tables, fifth edition (1907), polyhedric projection.
  *
  * What all projections have in common (units, scale, and what skip, stop and fill mean) is told in
  * frame.h.

@@ -5,8 +5,8 @@
  * A Jacobian record is nine doubles: the derivatives of the output's elements x, y, z by the
  * input's x, then by its y, then by its z.
  *
- * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
- * pp. 20-26, for the scale factors.
+ * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), chapter
+ * 4, for the scale factors; central and one-sided differences for the derivatives.
  */
 #ifndef TIDEWATER_JACOBIAN_H
 #define TIDEWATER_JACOBIAN_H
@@ -29,9 +29,9 @@ extern "C" {
  * @param count      number of points
  * @param in         points
  * @param jacobians  nine doubles for each point, written whole or not at all
- * @param status     word of the transformation's last call that was not held back for a neighbour;
- *                   on failure of the point itself, or of both neighbours along an axis, the call
- *                   ends
+ * @param status     the status of the transformation's last call that was not held back for a
+ *                   neighbour; on failure of the point itself, or of both neighbours along an axis,
+ *                   the call ends
  */
 TW_API void TWget_jacobian(TWtransform_ptr transform, void* context, double step0, double step1,
                            double step2, int32_t count, const CoordinateTriple* in,

@@ -110,7 +110,7 @@ TW_API void TWlabor_s(double k0, double A, double B, int32_t count, const Coordi
  * @param B        constant of TWlabor_c()
  * @param C        constant of TWlabor_c()
  * @param D        constant of TWlabor_c()
- * @param status   word of TWgaussII_c() or TWt_merc_c(); later stages unwritten on failure
+ * @param status   the status of TWgaussII_c() or TWt_merc_c(); later stages unwritten on failure
  */
 TW_API void TWlaborde_c(double e, double lon0, double lat0, double azimuth, double* chi0, double* c,
                         double* t, double* R, double* A0, double* A2, double* A4, double* A6,
@@ -134,7 +134,7 @@ TW_API void TWlaborde_c(double e, double lon0, double lat0, double azimuth, doub
  * @param count   number of points
  * @param in      longitude, latitude
  * @param out     x, y in units of the radius of the sphere
- * @param status  word of the stage that failed; later stages are left out
+ * @param status  the status of the stage that failed; later stages are left out
  */
 TW_API void TWlaborde_f(double e, double lon0, double c, double t, double A0, double A2, double A4,
                         double A6, double A8, double M0, double A, double B, int32_t count,
@@ -160,7 +160,7 @@ TW_API void TWlaborde_f(double e, double lon0, double c, double t, double A0, do
  * @param count   number of points
  * @param in      x, y in units of the radius of the sphere
  * @param out     longitude, latitude
- * @param status  word of the stage that failed; later stages are left out for the WHOLE array
+ * @param status  the status of the stage that failed; later stages are left out for the WHOLE array
  */
 TW_API void TWlaborde_i(double e, double lon0, double chi0, double c, double t, double A0,
                         double M0, double B2, double B4, double B6, int16_t mode, double A,
@@ -187,7 +187,7 @@ TW_API void TWlaborde_i(double e, double lon0, double chi0, double c, double t, 
  * @param count   number of points
  * @param in      longitude, latitude; z CHANGED by the call
  * @param out     (k, k, k k); after a failure the array as the first stage left it, x and y times R
- * @param status  word of TWg_schreiber()
+ * @param status  the status of TWg_schreiber()
  */
 TW_API void TWlaborde_s(double e, double lon0, double c, double t, double R, double A0, double A2,
                         double A4, double A6, double A8, double M0, double A, double B, double k0,

@@ -69,9 +69,9 @@ TW_API void TWlam_i(double e, double lon0, double C, double n, double rho0, int3
                     CoordinateTriple* out, const CoordinateTriple* in, TWstatus* status);
 
 /**
- * Scale (Snyder 1987, eq. 15-7, 14-16).  A latitude within 1e-10 of the north pole is held there;
- * one within 1e-10 of the south pole is held just past the NORTH pole, where the formula gives a
- * not-a-number unless n is a whole number.
+ * Scale (Snyder 1987, eq. 15-7, 14-16).  A latitude within 1e-10 of the north pole is clamped to
+ * it; one within 1e-10 of the south pole is clamped to just past the NORTH pole, where the formula
+ * gives a NaN unless n is a whole number.
  * @param e       first eccentricity
  * @param k0      central scale
  * @param C       constant of TWlam_c()

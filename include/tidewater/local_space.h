@@ -9,6 +9,9 @@
  * TWllh_to_lsr() and TWlsr_to_llh() use a times their scale.  A matrix is nine doubles row by row:
  * the local x, y and z axis in geocentric components, z the outward normal at the origin.  No
  * function here tests a latitude or a longitude.
+ *
+ * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), geocentric to topocentric, methods 9836 and
+ * 9837.
  */
 #ifndef TIDEWATER_LOCAL_SPACE_H
 #define TIDEWATER_LOCAL_SPACE_H

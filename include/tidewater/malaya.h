@@ -4,8 +4,8 @@
  *
  * The polynomials of degree five stand for the rectified skew orthomorphic grid of TWrso_param().
  *
- * Source: the polynomials were fitted to the projection of skew_orthomorphic.h (Hotine, The
- * Orthomorphic Projection of the Spheroid, Empire Survey Review 8 and 9, 1946-47).
+ * Source: the coefficients are the grid's own, and stand for the projection of skew_orthomorphic.h:
+ * Hotine, The Orthomorphic Projection of the Spheroid, Empire Survey Review 8 and 9 (1946-47).
  *
  * What all projections have in common (units, scale, and what skip, stop and fill mean) is told in
  * frame.h.

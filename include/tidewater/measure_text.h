@@ -27,7 +27,14 @@ extern "C" {
 TW_API void TWmet_to_ascii(double value, int16_t precision, double unit, char* text,
                            TWstatus* status);
 
-/** As TWmet_to_ascii(), with wide text. */
+/**
+ * As TWmet_to_ascii(), with wide text.
+ * @param value      length, metres
+ * @param precision  decimals
+ * @param unit       metres per unit; a negative one changes the sign
+ * @param text       room for the whole text, which is never cut
+ * @param status     #TW_RANGE_ERROR for a unit of exactly zero; text unwritten
+ */
 TW_API void TWmet_to_ascii_wide(double value, int16_t precision, double unit, TWchar16* text,
                                 TWstatus* status);
 
@@ -42,7 +49,14 @@ TW_API void TWmet_to_ascii_wide(double value, int16_t precision, double unit, TW
 TW_API void TWsq_met_to_ascii(double value, int16_t precision, double unit, char* text,
                               TWstatus* status);
 
-/** As TWsq_met_to_ascii(), with wide text. */
+/**
+ * As TWsq_met_to_ascii(), with wide text.
+ * @param value      area, square metres
+ * @param precision  decimals
+ * @param unit       square metres per unit
+ * @param text       room for the whole text, which is never cut
+ * @param status     #TW_RANGE_ERROR for a unit of zero or below; text unwritten
+ */
 TW_API void TWsq_met_to_ascii_wide(double value, int16_t precision, double unit, TWchar16* text,
                                    TWstatus* status);
 
@@ -57,7 +71,14 @@ TW_API void TWsq_met_to_ascii_wide(double value, int16_t precision, double unit,
 TW_API void TWcub_met_to_ascii(double value, int16_t precision, double unit, char* text,
                                TWstatus* status);
 
-/** As TWcub_met_to_ascii(), with wide text. */
+/**
+ * As TWcub_met_to_ascii(), with wide text.
+ * @param value      volume, cubic metres
+ * @param precision  decimals
+ * @param unit       cubic metres per unit
+ * @param text       room for the whole text, which is never cut
+ * @param status     #TW_RANGE_ERROR for a unit of zero or below; text unwritten
+ */
 TW_API void TWcub_met_to_ascii_wide(double value, int16_t precision, double unit, TWchar16* text,
                                     TWstatus* status);
 
@@ -70,7 +91,13 @@ TW_API void TWcub_met_to_ascii_wide(double value, int16_t precision, double unit
  */
 TW_API void TWascii_to_met(const char* text, double unit, double* value, TWstatus* status);
 
-/** As TWascii_to_met(), with wide text of any length. */
+/**
+ * As TWascii_to_met(), with wide text of any length.
+ * @param text    the text, all of which is read
+ * @param unit    metres per unit
+ * @param value   length, metres
+ * @param status  #TW_BAD_TEXT for a character that is not admitted; value unwritten
+ */
 TW_API void TWascii_to_met_wide(const TWchar16* text, double unit, double* value, TWstatus* status);
 
 /**
@@ -82,7 +109,13 @@ TW_API void TWascii_to_met_wide(const TWchar16* text, double unit, double* value
  */
 TW_API void TWascii_to_sq_met(const char* text, double unit, double* value, TWstatus* status);
 
-/** As TWascii_to_sq_met(), with wide text of any length. */
+/**
+ * As TWascii_to_sq_met(), with wide text of any length.
+ * @param text    the text, all of which is read
+ * @param unit    square metres per unit
+ * @param value   area, square metres
+ * @param status  #TW_BAD_TEXT for a character that is not admitted; value unwritten
+ */
 TW_API void TWascii_to_sq_met_wide(const TWchar16* text, double unit, double* value,
                                    TWstatus* status);
 
@@ -95,7 +128,13 @@ TW_API void TWascii_to_sq_met_wide(const TWchar16* text, double unit, double* va
  */
 TW_API void TWascii_to_cub_met(const char* text, double unit, double* value, TWstatus* status);
 
-/** As TWascii_to_cub_met(), with wide text of any length. */
+/**
+ * As TWascii_to_cub_met(), with wide text of any length.
+ * @param text    the text, all of which is read
+ * @param unit    cubic metres per unit
+ * @param value   volume, cubic metres
+ * @param status  #TW_BAD_TEXT for a character that is not admitted; value unwritten
+ */
 TW_API void TWascii_to_cub_met_wide(const TWchar16* text, double unit, double* value,
                                     TWstatus* status);
 

@@ -53,8 +53,8 @@ TW_API void TWmerc_i(double e, double lon0, double y0, int32_t count, const Coor
                      CoordinateTriple* out, TWstatus* status);
 
 /**
- * Scale (Snyder 1987, eq. 7-8).  A latitude within 1e-10 of the north pole is held there; one
- * within 1e-10 of the south pole is held just past the NORTH pole and gives a negative k.
+ * Scale (Snyder 1987, eq. 7-8).  A latitude within 1e-10 of the north pole is clamped to it; one
+ * within 1e-10 of the south pole is clamped to just past the NORTH pole and gives a negative k.
  * @param e       first eccentricity
  * @param k0      central scale
  * @param count   number of points

@@ -39,11 +39,15 @@ extern "C" {
 
 /** A grid of the list, as its two file headers tell it; degrees, negative west of Greenwich. */
 typedef struct NadconGrid {
-  char name[264];                /**< Base name of its files. */
-  int32_t nc;                    /**< Columns. */
-  int32_t nr;                    /**< Rows. */
-  double xmin, ymin, xmax, ymax; /**< Bounds. */
-  double dx, dy;                 /**< Spacing of columns and of rows. */
+  char name[264]; /**< Base name of its files. */
+  int32_t nc;     /**< Columns. */
+  int32_t nr;     /**< Rows. */
+  double xmin;    /**< Western bound. */
+  double ymin;    /**< Southern bound. */
+  double xmax;    /**< Eastern bound. */
+  double ymax;    /**< Northern bound. */
+  double dx;      /**< Spacing of columns. */
+  double dy;      /**< Spacing of rows. */
 } NadconGrid;
 
 /** The grids of a directory in order of priority; the caller's, filled by TWnadcon_c(). */
@@ -55,10 +59,14 @@ typedef struct NadconControl {
 
 /** A window of 4 by 4 nodes; degrees, negative west of Greenwich. */
 typedef struct NadconWindow {
-  int32_t nc;                    /**< Columns: 4 once loaded. */
-  int32_t nr;                    /**< Rows: 4 once loaded. */
-  double xmin, ymin, xmax, ymax; /**< Bounds. */
-  double dx, dy;                 /**< Spacing of columns and of rows. */
+  int32_t nc;  /**< Columns: 4 once loaded. */
+  int32_t nr;  /**< Rows: 4 once loaded. */
+  double xmin; /**< Western bound. */
+  double ymin; /**< Southern bound. */
+  double xmax; /**< Eastern bound. */
+  double ymax; /**< Northern bound. */
+  double dx;   /**< Spacing of columns. */
+  double dy;   /**< Spacing of rows. */
 } NadconWindow;
 
 /**
@@ -84,7 +92,7 @@ TW_API int32_t TWnadcon_c(const char* directory, NadconControl* control, TWstatu
  *                 longitude brought into (-pi, pi], the others shifted; #TW_GRID_FILE_ERROR,
  *                 #TW_NO_MEMORY where a window could not be loaded, or moved so far off a better
  *                 grid that no cell of it serves the point: the point, and later ones up to the
- *                 next load, stay unwritten, and the next load clears the word
+ *                 next load, stay unwritten, and the next load clears the status
  */
 TW_API void TWnadcon_f(int32_t count, const CoordinateTriple* in, const NadconControl* control,
                        CoordinateTriple* out, TWstatus* status);

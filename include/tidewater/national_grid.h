@@ -16,7 +16,7 @@
  *
  * By contract a block that could not be read counts as loaded, with the nodes that were in their
  * place before: a point of that block that is asked for AGAIN after #TW_GSB_READ_ERROR gets
- * #TW_SUCCESS and a figure that is none.  After that word nothing may be tried again before
+ * #TW_SUCCESS and a figure that is none.  After that status nothing may be tried again before
  * TWcnt_c() or a point far off, whose nodes can be read.  A block is four records in each of four
  * rows also in a sub-grid of fewer than four rows or columns, and is then read with what follows
  * the sub-grid in the file; at the end of the file that is the read error.
@@ -115,7 +115,7 @@ TW_API void TWcnt_to_from(int32_t reserved, char* from, char* to, TWstatus* stat
 
 /**
  * Loads the nodes around a record of a sub-grid, 4 by 4, unless they are the ones kept.  A failure
- * is told by no word; an index of no sub-grid does nothing.
+ * leaves no status; an index of no sub-grid does nothing.
  * @param sub_grid  index of the sub-grid in the file, from 0
  * @param record    number of the node's record in the file, from 1
  */

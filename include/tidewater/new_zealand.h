@@ -58,7 +58,7 @@ TW_API void TWn_zeal_f(double e, double lon0, double unused, double y0, int32_t 
                        const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse.  An iteration that does not converge leaves no word.
+ * Inverse.  An iteration that does not converge leaves the status as it was.
  * @param e       first eccentricity
  * @param lon0    longitude of origin
  * @param unused  not read
@@ -73,7 +73,7 @@ TW_API void TWn_zeal_i(double e, double lon0, double unused, double y0, int32_t 
 
 /**
  * Scale, the size of the polynomial's derivative times the Mercator scale.  Latitudes within 1e-10
- * of a pole are held as in TWmerc_s(), the south pole just past the NORTH pole, which gives a
+ * of a pole are clamped as in TWmerc_s(), the south pole just past the NORTH pole, which gives a
  * negative k and #TW_BAD_LATITUDE.
  * @param e       first eccentricity
  * @param lon0    longitude of origin; the difference is not wrapped

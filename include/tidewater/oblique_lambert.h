@@ -36,7 +36,7 @@ extern "C" {
  * @param offset             of TWrotgrat_c()
  * @param C,n_cone,rho0      of TWlam_c()
  * @param g_c,g_t            of TWgaussII_c()
- * @param status             the word of the inner call that failed, which ends the call
+ * @param status             the status of the inner call that failed, which ends the call
  */
 TW_API void TWo_lam_c(double e, double lon0, double lat0, double d1, double d2, double azimuth,
                       uint32_t use_azimuth, double* pole_lon, double* pole_lat, double* lat_r,
@@ -44,9 +44,9 @@ TW_API void TWo_lam_c(double e, double lon0, double lat0, double d1, double d2, 
                       double* rho0, double* g_c, double* g_t, TWstatus* status);
 
 /**
- * Constants of the Krovak projection (EPSG Guidance Note 7-2, method 9819), for TWo_lam_f() and its
- * fellows: as TWo_lam_c(), but with the cone's pole on the sphere at 59.71186 degrees (not for e =
- * 0), the standard parallel at 78.5 degrees, a rho0 of 0 and C times 0.9999.
+ * Constants of the Krovak projection (EPSG Guidance Note 7-2, method 9819), for TWo_lam_f(),
+ * TWo_lam_i() and TWo_lam_s(): as TWo_lam_c(), but with the cone's pole on the sphere at 59.71186
+ * degrees (not for e = 0), the standard parallel at 78.5 degrees, a rho0 of 0 and C times 0.9999.
  * @param e                  first eccentricity
  * @param lon0,lat0          origin, radians
  * @param d1,d2              they choose the conformal sphere's latitude, lat0 + (d1 + d2) / 2
@@ -58,7 +58,7 @@ TW_API void TWo_lam_c(double e, double lon0, double lat0, double d1, double d2, 
  * @param offset             of TWrotgrat_c()
  * @param C,n_cone,rho0      of TWlam_c(), changed as above
  * @param g_c,g_t            of TWgaussII_c()
- * @param status             the word of the inner call that failed, which ends the call
+ * @param status             the status of the inner call that failed, which ends the call
  */
 TW_API void TWkrovak_c(double e, double lon0, double lat0, double d1, double d2, double azimuth,
                        uint32_t use_azimuth, double* pole_lon, double* pole_lat, double* lat_r,
@@ -69,7 +69,7 @@ TW_API void TWkrovak_c(double e, double lon0, double lat0, double d1, double d2,
  * Forward.
  * @param e              first eccentricity
  * @param lon0           longitude of the origin
- * @param lat_r          constants of TWo_lam_c(), as the others without a word here
+ * @param lat_r          constants of TWo_lam_c(), as the others of which nothing is said here
  * @param C,n_cone,rho0  of the cone
  * @param s_lon,s_lat    the cone's pole; nothing is turned where it is the pole above lon0 to 1e-13
  * @param turn           the plane is turned by minus this angle about its origin, radians
@@ -78,8 +78,8 @@ TW_API void TWkrovak_c(double e, double lon0, double lat0, double d1, double d2,
  * @param count          number of points
  * @param in             longitude, latitude
  * @param out            x, y
- * @param status         the word of the inner call that failed, which ends the call with out as it
- *                       stands between two steps
+ * @param status         the status of the inner call that failed, which ends the call with out as
+ *                       it stands between two steps
  */
 TW_API void TWo_lam_f(double e, double lon0, double lat_r, double C, double n_cone, double rho0,
                       double s_lon, double s_lat, double turn, double offset, double g_c,
@@ -96,7 +96,7 @@ TW_API void TWo_lam_f(double e, double lon0, double lat_r, double C, double n_co
  * @param count          number of points
  * @param in             x, y; CHANGED by the call: turned in place
  * @param out            longitude, latitude
- * @param status         the word of the inner call that failed, which ends the call
+ * @param status         the status of the inner call that failed, which ends the call
  */
 TW_API void TWo_lam_i(double e, double lon0, double lat_r, double C, double n_cone, double rho0,
                       double s_lon, double s_lat, double turn, double offset, double g_c,
@@ -116,7 +116,7 @@ TW_API void TWo_lam_i(double e, double lon0, double lat_r, double C, double n_co
  * @param count        number of points
  * @param in           longitude, latitude
  * @param out          (k, k, k k) of TWlam_s()
- * @param status       the word of an inner call
+ * @param status       the status of an inner call
  */
 TW_API void TWo_lam_s(double e, double k0, double lon0, double lat_r, double C, double n_cone,
                       double s_lon, double s_lat, double offset, double g_c, double g_t,

@@ -96,7 +96,9 @@ TW_API void TWo_merc_f(double e, double alpha, double gamma0, double lon0, doubl
                        TWstatus* status);
 
 /**
- * Inverse (Snyder 1987, eq. 9-35 to 9-43).  The longitude is not wrapped.
+ * Inverse (Snyder 1987, eq. 9-35 to 9-43).  The latitude is the one at which Snyder's iteration
+ * rests, found without it, so that an eccentricity near 1 takes no longer than another.  The
+ * longitude is not wrapped.
  * @param e       first eccentricity
  * @param alpha   rotation from skew to map axes, constant of TWo_merc_c()
  * @param gamma0  constant of TWo_merc_c()

@@ -42,7 +42,7 @@ TW_API void TWortho_c(double e, double lon0, double lat0, double* x0, double* y0
  * @param in         longitude, latitude
  * @param out        x, y; may be in
  * @param status     #TW_I_LATITUDE_LIMITED for a point more than 90 degrees from the origin: STOP,
- *                   although the word counts as good
+ *                   although that status counts as success
  */
 TW_API void TWortho_f(double a, double e, double lon0, double lat0, double x0, double y0, double z0,
                       const double* r, int32_t count, const CoordinateTriple* in,
@@ -51,7 +51,7 @@ TW_API void TWortho_f(double a, double e, double lon0, double lat0, double x0, d
 /**
  * Inverse: the local vertical met with the ellipsoid, a quadratic equation, to 1e-15 radians of the
  * surface; within three degrees of the rim, and above e = 0.1, by iteration along the vertical to
- * 1e-9 radians.  An inner call sets the word anew, so a word of an earlier point does not outlast a
+ * 1e-9 radians.  An inner call sets the status anew, so that of an earlier point does not outlast a
  * later point that is computed.
  * @param a          not read
  * @param e          first eccentricity
@@ -62,8 +62,8 @@ TW_API void TWortho_f(double a, double e, double lon0, double lat0, double x0, d
  * @param in         x, y
  * @param out        longitude, latitude; may be in
  * @param status     #TW_I_LATITUDE_LIMITED for a point at or beyond sqrt(1 - e^2) from the origin:
- *                   STOP, although the word counts as good; and when the passes were used up: the
- *                   last values are written, the loop goes on
+ *                   STOP, although that status counts as success; and when the passes were used up:
+ *                   the last values are written, the loop goes on
  */
 TW_API void TWortho_i(double a, double e, double lon0, double lat0, double x0, double y0, double z0,
                       const double* r, int32_t count, const CoordinateTriple* in,
@@ -71,7 +71,7 @@ TW_API void TWortho_i(double a, double e, double lon0, double lat0, double x0, d
 
 /**
  * Scale on the SPHERE (Snyder 1987, eq. 20-5): the cosine of the distance from the origin.
- * Latitudes within 1e-10 of a pole are held as in TWmerc_s(), the south pole just past the NORTH
+ * Latitudes within 1e-10 of a pole are clamped as in TWmerc_s(), the south pole just past the NORTH
  * pole.
  * @param lon0,lat0  origin
  * @param k0         not read

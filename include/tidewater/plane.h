@@ -1,6 +1,9 @@
 /**
  * @file plane.h
  * Helpers on the plane.
+ *
+ * Source: Abramowitz and Stegun, Handbook of Mathematical Functions (1964), section 25.2, for the
+ * interpolations; the others are definitions.
  */
 #ifndef TIDEWATER_PLANE_H
 #define TIDEWATER_PLANE_H

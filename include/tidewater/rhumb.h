@@ -8,7 +8,7 @@
  * azimuth is the azimuth at the end point back to the start point.
  *
  * Take the geodesic for the shortest way and the rhumb line for a constant course.  No argument is
- * checked for its range; the words are those of the last inner call made.
+ * checked for its range; the status is that of the last inner call made.
  *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 46-47.
@@ -33,8 +33,8 @@ extern "C" {
  * @param a,e           ellipsoid
  * @param end           longitude, latitude, the start's height
  * @param back_azimuth  azimuth + pi, less a turn above 2 pi
- * @param status        the word of the last inner call, TWmerc_c() of the start's latitude: a line
- *                      past a pole is not reported, and the latitude of end is then unwritten
+ * @param status        the status of the last inner call, TWmerc_c() of the start's latitude: a
+ *                      line past a pole is not reported, and the latitude of end is then unwritten
  */
 TW_API void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distance, double a,
                            double e, CoordinateTriple* end, double* back_azimuth, TWstatus* status);
@@ -48,7 +48,7 @@ TW_API void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distan
  *                      points
  * @param back_azimuth  azimuth at end towards start
  * @param distance      length of the line
- * @param status        the word of the last inner call, TWmerid_dist_f() of the start's latitude;
+ * @param status        the status of the last inner call, TWmerid_dist_f() of the start's latitude;
  *                      #TW_SUCCESS along a parallel
  */
 TW_API void TWrhmbline_inv(CoordinateTriple start, CoordinateTriple end, double a, double e,
@@ -57,6 +57,11 @@ TW_API void TWrhmbline_inv(CoordinateTriple start, CoordinateTriple end, double 
 
 /**
  * As TWgeodesic_cnt(), for a rhumb line.
+ *
+ * By contract, where the spacing or the distance is NaN neither comparison of the two holds: count
+ * stays UNWRITTEN and the status is #TW_SUCCESS.  Set count before the call.  A number of points
+ * beyond 32 bits is clamped to the largest integer, 2147483647, with #TW_SUCCESS, as for a spacing
+ * of zero.
  * @param mode              0: by two ends; else by azimuth and distance
  * @param start,end         the ends
  * @param distance,azimuth  length, and azimuth in radians
@@ -80,7 +85,7 @@ TW_API void TWrhmbline_cnt(int16_t mode, CoordinateTriple start, CoordinateTripl
  * @param count             number of points, at least 2
  * @param points            count points
  * @param status            #TW_BUFFER_TOO_SMALL for a count below 2, with nothing written; else the
- *                          word of the last TWrhmbline_dir()
+ *                          status of the last TWrhmbline_dir()
  */
 TW_API void TWrhmbline_buf(int16_t mode, CoordinateTriple start, CoordinateTriple end,
                            double distance, double azimuth, double spacing, double a, double e,

@@ -45,8 +45,8 @@ TW_API void TWrobin_c(double* knots, double* y_coef, double* x_coef, double* y0,
  * @param count   number of points
  * @param out     x, y
  * @param in      longitude, latitude
- * @param status  #TW_I_LATITUDE_LIMITED for a latitude less than 0.0001 beyond a pole, held there;
- *                #TW_BAD_LATITUDE farther out: stop
+ * @param status  #TW_I_LATITUDE_LIMITED for a latitude less than 0.0001 beyond a pole, clamped to
+ *                it; #TW_BAD_LATITUDE farther out: stop
  */
 TW_API void TWrobin_f(const double* knots, const double* y_coef, const double* x_coef, double lon0,
                       double y0, int32_t count, CoordinateTriple* out, const CoordinateTriple* in,
@@ -63,7 +63,7 @@ TW_API void TWrobin_f(const double* knots, const double* y_coef, const double* x
  * @param in      x, y
  * @param out     longitude, latitude
  * @param status  #TW_I_LATITUDE_LIMITED for an ordinate that leads less than 0.0001 beyond a pole,
- *                held there; #TW_BAD_LATITUDE for any other beyond the table's end: stop
+ *                clamped to it; #TW_BAD_LATITUDE for any other beyond the table's end: stop
  */
 TW_API void TWrobin_i(const double* knots, const double* y_coef, const double* x_coef, double lon0,
                       double y0, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
@@ -82,7 +82,7 @@ TW_API void TWrobin_i(const double* knots, const double* y_coef, const double* x
  * @param count   number of points
  * @param in      longitude, latitude
  * @param out     (k, h, areal scale)
- * @param status  #TW_BAD_LATITUDE beyond a pole: fill; a word of TWRparal() or TWRmerid(): stop
+ * @param status  #TW_BAD_LATITUDE beyond a pole: fill; a status of TWRparal() or TWRmerid(): stop
  */
 TW_API void TWrobin_s(const double* knots, const double* y_coef, const double* x_coef, double lon0,
                       double radius, double a, double e, double k0, int32_t count,

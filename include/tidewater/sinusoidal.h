@@ -38,7 +38,7 @@ TW_API void TWsinusoidal_c(double e, double lat0, double* e2, double* m0, TWstat
  * @param count   number of points
  * @param in      longitude, latitude
  * @param out     x, y
- * @param status  word of TWmerid_dist_f(): stop on failure
+ * @param status  the status of TWmerid_dist_f(): stop on failure
  */
 TW_API void TWsinusoidal_f(double lon0, double lat0, double e, double e2, double m0, int32_t count,
                            const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
@@ -54,7 +54,7 @@ TW_API void TWsinusoidal_f(double lon0, double lat0, double e, double e2, double
  * @param count   number of points
  * @param in      x, y
  * @param out     longitude, latitude
- * @param status  word of TWmerid_dist_i(): stop on failure
+ * @param status  the status of TWmerid_dist_i(): stop on failure
  */
 TW_API void TWsinusoidal_i(double lon0, double lat0, double e, double e2, double m0, int32_t count,
                            const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
@@ -67,7 +67,7 @@ TW_API void TWsinusoidal_i(double lon0, double lat0, double e, double e2, double
  * @param count   number of points
  * @param in      longitude, latitude
  * @param out     (k0, h, areal scale)
- * @param status  #TW_BAD_LATITUDE more than 1e-12 beyond a pole, or the word of TWdM_dphi(): stop
+ * @param status  #TW_BAD_LATITUDE more than 1e-12 beyond a pole, or the status of TWdM_dphi(): stop
  */
 TW_API void TWsinusoidal_s(double k0, double lon0, double e2, int32_t count,
                            const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);

@@ -18,7 +18,7 @@ extern "C" {
 #endif
 
 /**
- * Constants.  A centre hard by the equator gives not-a-numbers, untested.
+ * Constants.  A centre very close to the equator gives NaNs; it is not tested for.
  * @param e       first eccentricity
  * @param lon_c   longitude of the centre
  * @param lat_c   latitude of the centre

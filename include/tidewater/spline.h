@@ -34,7 +34,7 @@ TW_API void TWrobin_csform(const double* knots, double* coef, int32_t n, TWstatu
  * @param coef   n rows of four coefficients, from TWrobin_csform()
  * @param n      number of knots, at least 2
  * @param flag   1 inside the range of the knots; 2 outside, by the outermost cubic
- * @return the value; not-a-number for fewer than 2 knots
+ * @return the value; NaN for fewer than 2 knots
  */
 TW_API double TWrobin_cseval(double x, const double* knots, const double* coef, int32_t n,
                              uint32_t* flag);
@@ -46,7 +46,7 @@ TW_API double TWrobin_cseval(double x, const double* knots, const double* coef, 
  * @param coef   n rows of four coefficients, from TWrobin_csform()
  * @param n      number of knots, at least 2
  * @param flag   1 inside the range of the knots; 2 outside, by the outermost cubic
- * @return the derivative; not-a-number for fewer than 2 knots
+ * @return the derivative; NaN for fewer than 2 knots
  */
 TW_API double TWrobin_csderv(double x, const double* knots, const double* coef, int32_t n,
                              uint32_t* flag);
@@ -59,7 +59,7 @@ TW_API double TWrobin_csderv(double x, const double* knots, const double* coef, 
  * @param coef   n rows of four coefficients, from TWrobin_csform()
  * @param n      number of knots, at least 2
  * @param flag   1 inside the range of the values; 2 outside, by the outermost cubic
- * @return the argument; not-a-number for fewer than 2 knots
+ * @return the argument; NaN for fewer than 2 knots
  */
 TW_API double TWrobin_csinv(double y, const double* knots, const double* coef, int32_t n,
                             uint32_t* flag);

@@ -50,11 +50,11 @@ TW_API void TWstereo_f(double e, double lon0, double lat0, double C, double m0, 
 /**
  * Inverse, to 1e-12 radians (Snyder 1987, eq. 20-14, 21-36 to 21-38; polar 7-9, 20-16).
  *
- * On the oblique road the longitude is a plain arctangent, so it NEVER LIES MORE THAN 90 DEGREES
- * from lon0.  On the polar road of the south lon0 is negated at each point that is not the origin,
- * so with a lon0 other than 0 the longitudes of points in an array ALTERNATE between right and
- * shifted by twice lon0.  At the end every output within 2e-12 of a pole, skipped or not, gets lon0
- * as it then stands.
+ * In the oblique aspect the longitude is a plain arctangent, so it NEVER LIES MORE THAN 90 DEGREES
+ * from lon0.  In the south polar aspect lon0 is negated at each point that is not the origin, so
+ * with a lon0 other than 0 the longitudes of points in an array ALTERNATE between right and shifted
+ * by twice lon0.  At the end every output within 2e-12 of a pole, skipped or not, gets lon0 as it
+ * then stands.
  * @param e          first eccentricity
  * @param lon0,lat0  origin
  * @param C,m0,chi0  constants of TWstereo_c()
@@ -106,7 +106,7 @@ TW_API void TWstereo_latTs(double e, double lon0, double lat0, double C, double 
  * @param k0         the scale, above 0 and at most 1
  * @param lat_ts     latitude of true scale; for C = 0 the angular distance from lat0
  * @param status     #TW_BAD_SCALE_LATITUDE for a k0 out of range; lat_ts unwritten.
- *                   #TW_RANGE_ERROR when no latitude was found, otherwise the word of the last
+ *                   #TW_RANGE_ERROR when no latitude was found, otherwise the status of the last
  *                   scale evaluated; lat_ts is written in both cases
  */
 TW_API void TWstereo_sTlat(double e, double lon0, double lat0, double C, double m0, double chi0,

@@ -1,6 +1,8 @@
 /**
  * @file tolerance_count.h
  * How many points a line needs.
+ *
+ * Source: this library's own: doubling, then the secant method.
  */
 #ifndef TIDEWATER_TOLERANCE_COUNT_H
 #define TIDEWATER_TOLERANCE_COUNT_H
@@ -20,7 +22,8 @@ extern "C" {
  * transform's output, or a transform that jumps) keeps the doubling going until the count or the
  * memory is at its end: at a count of 2^30 + 1 the arrays take 48 GB.  A caller that takes the
  * tolerance from a user should hold it above what the transform can give.
- * @param transform  a caller's map of points; it may set the word, which then stands for that trial
+ * @param transform  a caller's map of points; it may set the status, which then stands for that
+ *                   trial
  * @param context    handed through to transform
  * @param start,end  the ends of the line, radians
  * @param a,e        ellipsoid
@@ -29,8 +32,8 @@ extern "C" {
  * @param count      number of points; 2 where the image is straight
  * @param status     #TW_BAD_TOLERANCE for a tolerance of exactly 0, then #TW_BAD_INPUT for another
  *                   line_kind, both with count unwritten; #TW_NO_MEMORY where an allocation failed,
- *                   or a doubling would pass 32 bits; otherwise the word of the last trial, and if
- *                   that is not #TW_SUCCESS at the end of the doubling, count is left at 3
+ *                   or a doubling would pass 32 bits; otherwise the status of the last trial, and
+ *                   if that is not #TW_SUCCESS at the end of the doubling, count is left at 3
  */
 TW_API void TWtoler_to_cnt(TWtransform transform, TWcontext context, CoordinateTriple start,
                            CoordinateTriple end, double a, double e, double tolerance,

@@ -3,8 +3,14 @@
  * Transverse Mercator projection of the ellipsoid.
  *
  * Series about the central meridian.  For differences of longitude up to 3 degrees on the earth's
- * ellipsoids x is within 0.01 mm and y, whose meridian arc is a series too, within 2 mm; so is a
- * round trip.  Some use remains to 50 degrees.
+ * ellipsoids x is within 0.01 mm of the exact projection and y, whose meridian arc is a series too,
+ * within 1.8 mm (near 70 degrees of latitude).  Some use remains to 50 degrees.
+ *
+ * Round trip on WGS 84, measured: within 2 mm for differences of longitude up to 3.5 degrees, 13 mm
+ * at 5, 0.05 m at 6, 0.4 m at 8, 1.7 m at 10, 32 m at 15.  By contract TWt_merc_i() gives up the
+ * series for a sphere where the two depart by 0.005 radians, and is then 15 to 17 km off with
+ * success: beyond 88.4 degrees of latitude at a difference of 3 degrees, 86.9 at 6, 85.2 at 10,
+ * 81.8 at 20.  From 25 degrees on a round trip is off by a kilometre and more.
  *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 48-65.
@@ -57,10 +63,11 @@ TW_API void TWt_merc_f(double e, double lon0, double A0, double A2, double A4, d
 
 /**
  * Inverse: the closed form on the sphere for e below 1e-12 (Snyder 1987, eq. 8-6, 8-7), otherwise
- * the series from the footpoint (eq. 8-17, 8-18).  Where the series depart by more than 0.005
- * radians from a sphere that fits midway, as they do far from the central meridian, the sphere's
- * position is given instead, without a word.  The longitude is not wrapped; a footpoint within
- * 1e-12 of a pole gives lon0 and the pole.
+ * the series from the footpoint (eq. 8-17, 8-18).  By contract, where the series depart by more
+ * than 0.005 radians from a sphere that fits midway, as they do far from the central meridian and
+ * near the poles (beyond 88.4 degrees of latitude in a zone of 6 degrees), the sphere's position is
+ * given instead, some 16 km off, and the status stays #TW_SUCCESS.  The longitude is not wrapped; a
+ * footpoint within 1e-12 of a pole gives lon0 and the pole.
  * @param e         first eccentricity
  * @param lon0      central meridian
  * @param lat0      latitude of origin, for the sphere

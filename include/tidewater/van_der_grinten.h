@@ -22,7 +22,7 @@ extern "C" {
 
 /**
  * Ordinate of the latitude of origin.  It has no status word.
- * @param lat0  latitude of origin, radians; not-a-number beyond a pole
+ * @param lat0  latitude of origin, radians; NaN beyond a pole
  * @param y0    ordinate of lat0
  */
 TW_API void TWvdg_c(double lat0, double* y0);

@@ -1,5 +1,7 @@
 // Shifts by a national grid file of the NTv2 format: a forest of sub-grids, the deepest of which
 // serves a point, read through a block of 4 by 4 nodes.
+// D. J. Junkins and S. A. Farley, NTv2: National Transformation Version 2 Developer's Guide,
+// Geomatics Canada (1995).
 
 #include <algorithm>
 #include <array>

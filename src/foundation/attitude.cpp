@@ -1,4 +1,6 @@
 // A camera's attitude in its three sets of angles.
+// P. R. Wolf, Elements of Photogrammetry, 2nd edition (1983), on omega, phi, kappa and on tilt,
+// swing, azimuth.
 
 #include <cmath>
 

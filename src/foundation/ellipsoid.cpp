@@ -1,4 +1,6 @@
 // Radii, equal spheres, meridian arc, conformal latitude and normal gravity of an ellipsoid.
+// J. P. Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 15-25;
+// W. A. Heiskanen and H. Moritz, Physical Geodesy (1967), on normal gravity.
 
 #include <cmath>
 

@@ -1,4 +1,5 @@
 // Direct and inverse problem of the rhumb line, the straight line on the Mercator map.
+// J. P. Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 46-47.
 
 #include <cmath>
 

@@ -1,4 +1,6 @@
 // The magnetic field in the geodetic frame, its elements, and their change in one unit of time.
+// The US/UK World Magnetic Model for 2025-2030: Technical Report, NOAA National Centers for
+// Environmental Information, on elements and their rates.
 
 #include <algorithm>
 #include <cmath>

@@ -50,8 +50,13 @@ Level level() noexcept;
 // or the build lacks it.
 bool ask_for_level(Level wanted) noexcept;
 
-// Up to this many points are done one by one.
+// Up to this many points are done one by one.  Where every byte counts a kernel is compiled for
+// blocks alone, and few points fill one up.
+#if defined(TIDEWATER_ONE_WIDTH)
+inline constexpr int32_t kFew = 0;
+#else
 inline constexpr int32_t kFew = 4;
+#endif
 
 template <class Kernel>
 concept TakesThree = requires(const Kernel& kernel, double v) {
@@ -92,9 +97,12 @@ template <class Kernel>
 [[gnu::noinline]] TWstatus over_many_points(const Kernel& kernel, int32_t count,
                                             const CoordinateTriple* in, CoordinateTriple* out) {
   TWstatus status = TW_SUCCESS;
+#if defined(TIDEWATER_ONE_WIDTH)
+  run<Level::baseline>(kernel, count, in, out, &status);
+#else
   int32_t i = 0;
   switch (level()) {
-#if defined(__x86_64__) || defined(__i386__)
+#if defined(TIDEWATER_WIDE_LANES)
     case Level::avx512:
       // Below one block of it the narrower one wastes less.
       i = count >= 16 ? run<Level::avx512>(kernel, count, in, out, &status)
@@ -115,6 +123,7 @@ template <class Kernel>
   for (; i < count; ++i) {
     if (one_point(kernel, in[i], out + i, &status) == Next::none) break;
   }
+#endif
   return status;
 }
 

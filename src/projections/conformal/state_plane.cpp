@@ -1,4 +1,6 @@
 // State plane zones: the projection parameters of a zone number.
+// C. N. Claire, State Plane Coordinates by Automatic Data Processing, C&GS Publication 62-4 (1968);
+// J. E. Stem, State Plane Coordinate System of 1983, NOAA Manual NOS NGS 5 (1989).
 
 #include <cstdlib>
 #include <span>

@@ -1,5 +1,7 @@
 // Chamberlin trimetric projection of the ellipsoid: a point is placed by its geodesic distances
 // from the three corners of a triangle.
+// A. H. J. Christensen, The Chamberlin trimetric projection, Cartography and Geographic Information
+// Systems 19 (1992), pp. 88-100.
 
 #include "projections/special/chamberlin_points.hpp"
 

@@ -1,5 +1,7 @@
 // Local distortion of any transformation of points, by finite differences.  Points go one by one:
 // the time is the caller's transformation's, and the records of nine are not points.
+// J. P. Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 20-26,
+// for the scale factors.
 
 #include <cmath>
 
