@@ -95,8 +95,7 @@ class TW_SYSTEMS_API ShiftGrid {
  * no seam.
  *
  * Otherwise as ShiftGrid.  datum.h has a C structure of the same name outside the namespace.
- * Measured against PROJ 9.1 on EGM96 at 15 minutes, bilinear: within
- * 0.001 mm.
+ * Measured against PROJ 9.1 on EGM96 at 15 minutes, bilinear: within 0.001 mm.
  */
 class TW_SYSTEMS_API GeoidGrid {
  public:

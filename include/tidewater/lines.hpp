@@ -138,20 +138,30 @@ class TW_SYSTEMS_API Geodesic {
  */
 class TW_SYSTEMS_API Rhumb {
  public:
-  /** As Geodesic's, likewise. */
+  /**
+   * @param a  semi-major axis, above zero
+   * @param f  flattening, from -0.01 to 0.01; 0 for a sphere
+   * @throws Error for other figures
+   */
   Rhumb(double a, double f);
+  /** @throws Error for an ellipsoid beyond that flattening */
   explicit Rhumb(const Ellipsoid& ellipsoid);
 
   double a() const;
   double f() const;
 
+  /** Where a line leads: from a point by an azimuth for a length, which may be negative. */
   LineEnd direct(double lon, double lat, double azimuth, double length) const;
+  /** The rhumb line between two points. */
   LineCourse inverse(double lon1, double lat1, double lon2, double lat2) const;
+  /** Many lines, several at a time. */
   Summary direct(std::size_t count, const LineStarts& starts, const LineEnds& ends) const noexcept;
   Summary inverse(std::size_t count, const LinePairs& pairs,
                   const LineCourses& courses) const noexcept;
+  /** Points of one line at given lengths from its start. */
   Summary along(double lon, double lat, double azimuth, std::size_t count, const double* lengths,
                 const LineEnds& points) const noexcept;
+  /** A polygon whose sides are rhumb lines; otherwise as Geodesic's. */
   PolygonMeasure polygon(std::size_t count, const double* lon, const double* lat) const;
 
  private:
