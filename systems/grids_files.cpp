@@ -4,9 +4,10 @@
 #include <array>
 #include <bit>
 #include <cmath>
+#include <cstdio>
 #include <filesystem>
-#include <fstream>
 #include <limits>
+#include <memory>
 #include <new>
 #include <numbers>
 #include <stdexcept>
@@ -345,9 +346,12 @@ Bytes read_file(const std::string& path) {
   if (error) throw Error("The grid file " + path + " cannot be read.");
   if (size > kMostBytes) refuse(path, "is larger than 2 GB");
   std::vector<unsigned char> bytes(static_cast<std::size_t>(size));
-  std::ifstream file(path, std::ios::binary);
-  file.read(reinterpret_cast<char*>(bytes.data()), static_cast<std::streamsize>(size));
-  if (!file) throw Error("The grid file " + path + " cannot be read.");
+  // Not by a stream, which would bring the standard library's locales into the browser's package.
+  const std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(std::fopen(path.c_str(), "rb"),
+                                                             &std::fclose);
+  if (!file || std::fread(bytes.data(), 1, bytes.size(), file.get()) != bytes.size()) {
+    throw Error("The grid file " + path + " cannot be read.");
+  }
   return {path, std::move(bytes)};
 }
 

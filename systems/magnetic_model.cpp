@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
+#include <iterator>
 #include <optional>
 
 #include "block.hpp"
@@ -86,10 +87,7 @@ struct Info {
     TWmagmdl_info(store.c_str(), key.data(), &number, 1, table, &radius, &normalisation, publisher,
                   &first_date, &last_date, &interval, &epoch_count, &status);
     need_store(store, status);
-    if (!TW_OK(status)) {
-      fail("The store \"" + store + "\" has no magnetic model \"" + name +
-           "\"; MagneticModel::models() lists those it has.");
-    }
+    if (!TW_OK(status)) fail("The magnetic model " + name + " cannot be read.");
     // A set of coefficients and a set of rates are the least that makes a model.
     if (epoch_count < 2) fail("The magnetic model " + name + " has no rates of change.");
     const auto count = static_cast<std::size_t>(epoch_count);
@@ -132,15 +130,56 @@ std::vector<std::string> model_names(const std::string& store) {
   return list;
 }
 
-Info chosen(const std::string& store, std::string_view name) {
-  if (!name.empty()) return Info(store, std::string(name));
-  std::optional<Info> newest;
-  for (const std::string& model : model_names(store)) {
-    Info info(store, model);
-    if (!newest || info.newest_epoch() > newest->newest_epoch()) newest = std::move(info);
+// Letters and digits of a name: "IGRF-14" is "igrf14".
+std::string plain(std::string_view name) {
+  std::string text;
+  for (const char c : name) {
+    if (c >= 'A' && c <= 'Z') text += static_cast<char>(c - 'A' + 'a');
+    if ((c >= 'a' && c <= 'z') || (c >= '0' && c <= '9')) text += c;
   }
-  if (!newest) fail("The store \"" + store + "\" has no magnetic models.");
-  return *std::move(newest);
+  return text;
+}
+
+// A model's name without its generation or year: "igrf".
+std::string series_of(std::string_view name) {
+  std::string text = plain(name);
+  text.resize(text.find_last_not_of("0123456789") + 1);
+  return text;
+}
+
+// The models that a name may mean: its own, or all of a series.
+std::vector<std::string> meant(const std::string& store, std::string_view name) {
+  std::vector<std::string> list = model_names(store);
+  if (name.empty()) return list;
+  const auto keep = [&list](auto&& fits) {
+    std::vector<std::string> kept;
+    std::copy_if(list.begin(), list.end(), std::back_inserter(kept), fits);
+    return kept;
+  };
+  const std::string wanted = plain(name);
+  auto kept = keep([&](const std::string& model) { return model == name; });
+  if (kept.empty()) kept = keep([&](const std::string& model) { return plain(model) == wanted; });
+  if (kept.empty() && !wanted.empty()) {
+    kept = keep([&](const std::string& model) { return series_of(model) == wanted; });
+  }
+  return kept;
+}
+
+// Of those meant the one of the newest coefficients; of two of one epoch the one that is made for
+// the present alone.
+Info chosen(const std::string& store, std::string_view name) {
+  std::optional<Info> newest;
+  for (const std::string& model : meant(store, name)) {
+    Info info(store, model);
+    if (!newest || info.newest_epoch() > newest->newest_epoch() ||
+        (info.newest_epoch() == newest->newest_epoch() && info.first_date > newest->first_date)) {
+      newest = std::move(info);
+    }
+  }
+  if (newest) return *std::move(newest);
+  if (name.empty()) fail("The store \"" + store + "\" has no magnetic models.");
+  fail("The store \"" + store + "\" has no magnetic model \"" + std::string(name) +
+       "\"; MagneticModel::models() lists those it has.");
 }
 
 }  // namespace

@@ -28,17 +28,21 @@ MethodArguments arguments(const Definition& definition) {
   return {definition, a, std::sqrt(e2), e2, f};
 }
 
-// An inverse whose result must lead back: some formulas answer with success beyond their map.
+// An inverse whose result must lead back: some formulas answer with success beyond their map.  Within
+// `sure` of the plane's origin all points are the map's.
 class CheckedFormula final : public Formula {
  public:
-  explicit CheckedFormula(std::unique_ptr<const Formula> formula)
-      : Formula(formula->plane), formula_(std::move(formula)) {}
+  CheckedFormula(std::unique_ptr<const Formula> formula, double sure)
+      : Formula(formula->plane), formula_(std::move(formula)), sure2_(sure * sure) {}
   TWstatus forward(int count, const CoordinateTriple* in, CoordinateTriple* out) const override {
     return formula_->forward(count, in, out);
   }
   TWstatus inverse(int count, const CoordinateTriple* in, CoordinateTriple* out) const override {
     const TWstatus word = formula_->inverse(count, in, out);
     if (word != TW_SUCCESS) return word;
+    bool sure = true;
+    for (int i = 0; i < count; ++i) sure &= in[i].x * in[i].x + in[i].y * in[i].y < sure2_;
+    if (sure) return TW_SUCCESS;
     CoordinateTriple back[kBlockSize];
     for (int i = 0; i < count; ++i) {
       if (!(std::fabs(out[i].x) <= kPi + kPoleRounding)) return TW_RANGE_ERROR;
@@ -58,7 +62,11 @@ class CheckedFormula final : public Formula {
 
  private:
   std::unique_ptr<const Formula> formula_;
+  double sure2_;
 };
+
+// The map of equal area about a point is a disk of a radius near 2, in semi-major axes.
+double sure_radius(int method) { return method == 9820 || method == 1027 ? 1 : 0; }
 
 // The methods of our own and those about a point or a parallel, whose maps have an edge.
 bool needs_check(int method) {
@@ -113,7 +121,8 @@ ProjectionImpl::ProjectionImpl(const Definition& definition)
   }
   formula_ = method_->make(arguments(definition_));
   if (needs_check(method_->code)) {
-    formula_ = std::make_unique<const CheckedFormula>(std::move(formula_));
+    formula_ = std::make_unique<const CheckedFormula>(std::move(formula_),
+                                                      sure_radius(method_->code));
   }
   const Plane& plane = formula_->plane;
   if (!(std::isfinite(plane.sx) && std::isfinite(plane.sy) && std::isfinite(plane.x0) &&

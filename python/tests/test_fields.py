@@ -81,7 +81,9 @@ def test_magnetic():
     yearly = model.yearly(2.0, 48.0)
     assert later.total - model.field(2.0, 48.0).total == pytest.approx(yearly.total, abs=0.05)
     assert np.isnan(model.field(0, 91).total)
-    assert {"WMM2025", "IGRF-13"} <= set(MagneticModel.models())
+    assert {"WMM2025", "IGRF-13", "IGRF-14"} <= set(MagneticModel.models())
+    assert MagneticModel("IGRF", year=2026).name == "IGRF-14"
+    assert MagneticModel("igrf13", year=2020).name == "IGRF-13"
     for year in (1950, np.nan, np.inf):
         with pytest.raises(tidewater.Error):
             MagneticModel("WMM2025", year=year)

@@ -101,6 +101,46 @@ TEST(Magnetic, TheFieldStandsUprightAtTheDipPolesOfTheIgrf) {
   }
 }
 
+TEST(Magnetic, TheGenerationInForceIsMeantByTheSeries) {
+  // accuracy/harmonics.py: the sum of the 14th generation's coefficients by its definition, 30
+  // digits.
+  const struct {
+    const char* where;
+    double X, Y, Z;
+  } rows[] = {
+      {"--date 2025 80 0", 6527.398, 141.596, 54782.531},
+      {"--date 2026.5 48.39 -4.49", 21348.320, -13.758, 42986.403},
+      {"--date 2024 -33 151 1000", 24577.841, 5372.576, -50635.511},
+      {"--date 2029 0 120 100000", 37719.953, -177.213, -9862.260},
+      {"--date 1952.5 48.39 -4.49", 19486.867, -3585.493, 41962.910},
+      {"--date 2030 -80 240", 6273.775, 15708.998, -51549.378},
+  };
+  for (const auto& row : rows) {
+    const Figures f = figures(std::string("--model IGRF ") + row.where);
+    EXPECT_NEAR(f.X, row.X, 0.0511) << row.where;
+    EXPECT_NEAR(f.Y, row.Y, 0.0511) << row.where;
+    EXPECT_NEAR(f.Z, row.Z, 0.0511) << row.where;
+  }
+  const struct {
+    const char* asked;
+    const char* got;
+  } names[] = {{"IGRF", "IGRF-14"},    {"igrf", "IGRF-14"},   {"IGRF14", "IGRF-14"},
+               {"IGRF-13", "IGRF-13"}, {"igrf13", "IGRF-13"}, {"WMM", "WMM2025"},
+               {"wmm-2025", "WMM2025"}};
+  for (const auto& name : names) {
+    const Outcome r = magnetic(std::string("--date 2026 --model ") + name.asked + " 1 2");
+    EXPECT_EQ(r.err.rfind(std::string(name.got) + " at ", 0) != 0,
+              std::string(name.got) == "IGRF-13")  // which warns first
+        << r.err;
+    EXPECT_NE(r.err.find(std::string(name.got) + " at "), r.err.npos) << r.err;
+  }
+  for (const char* none : {"IGRF-12", "igr", "IGRF1", "-", "13"}) {
+    const Outcome r = magnetic(std::string("--date 2026 --model=") + none + " 1 2");
+    EXPECT_EQ(r.status, 2) << none;
+    EXPECT_NE(r.err.find(std::string("no magnetic model \"") + none + "\""), r.err.npos) << r.err;
+  }
+}
+
 TEST(Magnetic, BetweenTwoEpochsTheIgrfIsTheirMean) {
   const Figures before = figures("--model IGRF-13 --date 1950 48.39 -4.49");
   const Figures after = figures("--model IGRF-13 --date 1955 48.39 -4.49");
@@ -193,7 +233,7 @@ TEST(Magnetic, StoresWithoutAModelThatCanBeUsed) {
       {"/^2030/d' magnetic/wmm2025_epochs.csv",
        "The magnetic model WMM2025 has no rates of change"},
       {"s/,12,/,1,/' magnetic/wmm2025_epochs.csv", "The magnetic model WMM2025 has no field"},
-      {"/^IGRF/s/,5$/,0/' magnetic_models.csv",
+      {"/^IGRF-13/s/,5$/,0/' magnetic_models.csv",
        "The epochs of the magnetic model IGRF-13 cannot be used"},
   };
   for (const auto& store : stores) {

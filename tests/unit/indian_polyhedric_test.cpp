@@ -9,7 +9,7 @@ using namespace tidewater::test;
 
 namespace {
 
-// Everest 1830: e^2 = 0.006637846630199687, a = 6377276.345 m.
+// Everest 1830 (1937 Adjustment): e^2 = 0.006637846630199687, a = 6377276.345 m.
 const double kE = std::sqrt(0.006637846630199687);
 constexpr double kA = 6377276.345;
 

@@ -144,6 +144,7 @@ Ellipsoid find_ellipsoid(const std::string& text) {
       return Ellipsoid(a, rf);
     }
   }
+  // The authalic sphere of Clarke 1866.
   if (lowered(text) == "sphere") return Ellipsoid(6370997, 0);
   return Ellipsoid(text);
 }

@@ -430,7 +430,7 @@ Examples:
   # lines of positions with heights, in degrees, minutes and seconds with letters
   echo "48:23:25.1N 4:29:10.7W 34.2 Brest" | tidewater magnetic --date 2026-07-01 --format dms --hemisphere behind
   # the declination of the past
-  echo "48.39 -4.49" | tidewater magnetic --model IGRF-13 --date 1950
+  echo "48.39 -4.49" | tidewater magnetic --model IGRF --date 1950
 )";
 
 }  // namespace
@@ -452,7 +452,10 @@ void add_magnetic(CLI::App& app, int& exit_status) {
       ->allow_extra_args(false)
       ->excludes(position);
   add_angle_options(*command, options->in, "", "Input");
-  command->add_option("--model", options->model, "model of the store; the newest if not given")
+  command
+      ->add_option(
+          "--model", options->model,
+          "model of the store, or a series (IGRF) for its newest; the newest of all if not given")
       ->group("Model");
   command->add_option("--date", options->date, "decimal year, or YYYY-MM-DD; today if not given")
       ->group("Model");

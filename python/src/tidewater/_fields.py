@@ -157,7 +157,7 @@ class MagneticModel(_core.MagneticModel):
     Parameters
     ----------
     name : str
-        ``"WMM2025"``, ``"IGRF-13"``; empty for the newest.
+        ``"WMM2025"``, ``"IGRF-13"``; ``"IGRF"`` for the generation in force; empty for the newest.
     year : float
         Decimal year.
 

@@ -1,4 +1,6 @@
-// Grid of Malaya as a pair of bivariate polynomials.
+// Grid of Malaya as a pair of bivariate polynomials, fitted to the rectified skew orthomorphic
+// projection: M. Hotine, The orthomorphic projection of the spheroid, Empire Survey Review 8-9
+// (1946-47).
 #pragma once
 
 #include "formulas/constants.hpp"
@@ -41,6 +43,7 @@ struct MalayaForward {
 
   template <Number V>
   TW_INLINE Answer<V> operator()(V lon, V lat) const {
+    // The semi-major axis is that of Everest 1830 Modified.
     constexpr double kUnit = kMetresPerChain / 6377304.063 / 0.99984;
     const auto [E, N] = malaya_sums(table, table + kMalayaRow, lon - lon0, lat - lat0);
     return {(0.8 * E - 0.6 * N) * kUnit, (0.6 * E + 0.8 * N) * kUnit};
