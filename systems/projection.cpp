@@ -338,6 +338,8 @@ std::vector<std::pair<std::string, double>> Projection::parameters() const {
   return list;
 }
 
+std::string Projection::truth() const { return impl_->truth(); }
+
 Ellipsoid Projection::ellipsoid() const {
   const auto& ellipsoid = impl_->definition().datum.ellipsoid;
   return Ellipsoid(ellipsoid.a, ellipsoid.inverse_flattening);

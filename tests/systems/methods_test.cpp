@@ -218,6 +218,7 @@ TEST(Methods, EveryOneGoesForthAndBack) {
                          method.code == detail::kMalaya ? Ellipsoid(6377304.063, 300.8017)
                                                         : Ellipsoid("International 1924"));
     EXPECT_EQ(map.method_code(), method.code);
+    EXPECT_GT(map.truth().size(), 10u);
     const Point there = map.forward({lon, lat});
     ASSERT_TRUE(std::isfinite(there.x) && std::isfinite(there.y)) << there.x << " " << there.y;
     const Point back = map.inverse(there);
