@@ -452,6 +452,9 @@ function list(rows) {
     [element("dt", { textContent: name }), element("dd", { textContent: value })]));
 }
 
+// What stands there while there is no point.
+const invitation = $("figures").firstElementChild;
+
 function showFigures() {
   const parts = state.points.map(([lon, lat], i) => {
     const { x, y, factors, mgrs } = figuresAt(lon, lat);
@@ -490,7 +493,7 @@ function showFigures() {
         ["Constant bearing", bearing(rhumb.azimuth1)],
         ["Longer by", length(Math.max(0, rhumb.length - geodesic.length))]]));
   }
-  if (parts.length === 0) return;
+  if (parts.length === 0) parts.push(invitation);
   $("figures").replaceChildren(...parts);
 }
 

@@ -165,6 +165,29 @@ test("the keyboard turns and zooms", async () => {
   assert.equal(lon0, 5);
   assert.equal(zoom, 1.25);
   assert.equal(points, 1);
+  assert.match(await figures(), /Point A/);
+  await page.keyboard.press("Escape");
+  await settled();
+  assert.match(await figures(), /^Click the map/);
+});
+
+test("a standard parallel is dragged by its handle", async () => {
+  await page.evaluate(() => explorer.chooseProjection("albers"));
+  await settled();
+  const box = await page.locator("#map").boundingBox();
+  const { place: [x, y], lat2 } = await page.evaluate(() => {
+    const { lon0, lat2 } = explorer.state.values;
+    return { place: explorer.view.fromEarth(lon0 + 12, lat2), lat2 };
+  });
+  await page.mouse.move(box.x + x, box.y + y);
+  await page.mouse.down();
+  for (let i = 1; i <= 8; ++i) await page.mouse.move(box.x + x, box.y + y - 5 * i);
+  await page.mouse.up();
+  await settled();
+  const after_ = await page.evaluate(() => ({ ...explorer.state.values }));
+  assert.ok(after_.lat2 > lat2 + 5, `${after_.lat2}`);
+  assert.deepEqual([after_.lon0, after_.lat1], [-96, 29.5]);
+  assert.equal(Number(await page.inputValue("#number-lat2")), after_.lat2);
 });
 
 test("search finds systems by name and by code", async () => {
@@ -206,6 +229,13 @@ test("a file is converted and offered", async () => {
   const [download] = await Promise.all([page.waitForEvent("download"), link.click()]);
   assert.equal(download.suggestedFilename(), "places-epsg-2154.csv");
   assert.equal(readFileSync(await download.path(), "utf8"), "name,lon,lat\nParis,652301.5648,6861302.7259\n");
+  // Dropped anywhere on the page.
+  await page.evaluate(() => {
+    const dataTransfer = new DataTransfer();
+    dataTransfer.items.add(new File(['{"type":"Point","coordinates":[2.35,48.85]}'], "p.geojson"));
+    document.dispatchEvent(new DragEvent("drop", { dataTransfer, bubbles: true, cancelable: true }));
+  });
+  await page.waitForFunction(() => document.querySelector("#converted a")?.download === "p-epsg-2154.geojson");
   await page.fill("#to", "nowhere at all");
   await page.setInputFiles("#file", { name: "a.csv", mimeType: "text/csv", buffer: Buffer.from("1,2\n") });
   await page.waitForFunction(() => /nowhere at all/.test(document.querySelector("#converted").textContent));
