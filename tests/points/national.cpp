@@ -1,5 +1,7 @@
 // Laborde, Malaya, Bonne, oblique Lambert and Krovak.
 
+#include <array>
+
 #include "points/operations.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
@@ -72,14 +74,17 @@ struct Krovak {
   }
 };
 
-double table[84];
 const Laborde laborde;
 const Krovak krovak;
 
 const double* malaya_table() {
-  TWstatus status;
-  TWmalaya_c(table, &status);
-  return table;
+  static const std::array<double, 84> table = [] {
+    std::array<double, 84> made;
+    TWstatus status;
+    TWmalaya_c(made.data(), &status);
+    return made;
+  }();
+  return table.data();
 }
 
 const Operations national = {
