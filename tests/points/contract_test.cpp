@@ -99,8 +99,7 @@ TEST_P(Contract, NothingToDo) {
       if (function() != "TWhar_sum") {
         EXPECT_TRUE(same(out, kNothing)) << count;
       }
-      EXPECT_TRUE(TW_OK(status) || function() == "TWbw_i" || function() == "TWmol_bdk_i")
-          << std::hex << status;
+      EXPECT_EQ(status, TW_SUCCESS) << std::hex << status;
     }
   }
 }
@@ -181,7 +180,7 @@ TEST_P(RoundTrip, ComesBack) {
 }
 
 const Pair kPairs[] = {
-    {"TWmerc_f", "TWmerc_i", -160, -88, 190, 88, 2e-14},
+    {"TWmerc_f", "TWmerc_i", -160, -88, 190, 88, 1e-14},
     {"TWmerc_f, e = 0.3", "TWmerc_i, e = 0.3", -160, -88, 190, 88, 2e-14},
     {"TWmiller_cyl_f", "TWmiller_cyl_i", -160, -89, 190, 89, 2e-15},
     {"TWcyl_eqr_f", "TWcyl_eqr_i", -160, -89, 190, 89, 2e-15},
@@ -194,7 +193,7 @@ const Pair kPairs[] = {
     {"TWlam_f", "TWlam_i", -270, -60, 75, 89, 2e-14},
     {"TWlam_f, southern", "TWlam_i, southern", -270, -89, 75, 60, 2e-14},
     {"TWlam_f, e = 0.3", "TWlam_i, e = 0.3", -270, -60, 75, 89, 2e-14},
-    {"TWalbers_f", "TWalbers_i", -270, -80, 75, 85, 1e-12},
+    {"TWalbers_f", "TWalbers_i", -270, -80, 75, 85, 3e-14},
     {"TWconic_f", "TWconic_i", -270, -80, 75, 89, 1e-9},
     {"TWpolycon_f", "TWpolycon_i", -10, -80, 45, 80, 2e-9},
     {"TWbonne_f", "TWbonne_i", -40, -60, 75, 85, 2e-11},
@@ -279,8 +278,8 @@ TEST_P(AgreesWithProj, Forward) {
 }
 
 const Peer kPeers[] = {
-    {"TWmerc_f", "merc +lon_0=0.3r", -160, -88, 190, 88, 2e-14, 0.1},
-    {"TWmiller_cyl_f", "mill +lon_0=0.3r", -160, -89, 190, 89, 2e-14, 0.1, 1, true},
+    {"TWmerc_f", "merc +lon_0=0.3r", -160, -88, 190, 88, 1e-14, 0.1},
+    {"TWmiller_cyl_f", "mill +lon_0=0.3r", -160, -89, 190, 89, 1e-14, 0.1, 1, true},
     {"TWcyl_eqr_f", "eqc +lon_0=0.3r +lat_ts=0.6435011087932844r", -160, -89, 190, 89, 2e-14, 0.1,
      1, true},
     {"TWt_merc_f", "tmerc +lon_0=0.3r +lat_0=0.3r", 15, -84, 20, 84, 4e-10},
@@ -289,7 +288,7 @@ const Peer kPeers[] = {
     {"TWlam_f, southern", "lcc +lon_0=-1.7r +lat_0=-0.4r +lat_1=-0.5r +lat_2=-0.8r", -270, -89, 75,
      60, 2e-13},
     {"TWalbers_f", "aea +lon_0=-1.7r +lat_0=0.4r +lat_1=0.5r +lat_2=0.8r", -270, -85, 75, 89,
-     2e-13},
+     1e-13},
     {"TWalbers_f, sphere", "aea +lon_0=-1.7r +lat_0=0.4r +lat_1=0.5r +lat_2=0.8r", -270, -85, 75,
      89, 2e-13, 0, 1, true},
     {"TWconic_f", "eqdc +lon_0=-1.7r +lat_0=0.1r +lat_1=0.5r +lat_2=0.8r", -270, -85, 75, 89, 4e-9},
@@ -315,8 +314,8 @@ const Peer kPeers[] = {
     {"TWo_merc_f, ellipsoid", "omerc +lonc=0.81r +lat_0=-0.33r +alpha=0.33r +no_uoff", 35, -50, 60,
      50, 2e-12},
     {"TWsinusoidal_f, sphere", "sinu +lon_0=0.3r", -160, -89, 190, 89, 2e-12, 0.2, 1, true},
-    {"TWmollweide_f", "moll +lon_0=0.3r", -160, -85, 190, 85, 2e-7, 0.1, 1, true},
-    {"TWeckertIV_f", "eck4 +lon_0=0.3r", -160, -85, 190, 85, 2e-7, 0.1, 1, true},
+    {"TWmollweide_f", "moll +lon_0=0.3r", -160, -85, 190, 85, 1e-7, 0.1, 1, true},
+    {"TWeckertIV_f", "eck4 +lon_0=0.3r", -160, -85, 190, 85, 1e-7, 0.1, 1, true},
     {"TWvdg_f", "vandg +lon_0=0.3r", -150, 2, 15, 88, 1e-11, 0.1, 1, true},
 };
 

@@ -213,22 +213,6 @@ TEST(Cassini, ScaleWithTwoArrays) {
   expect_near(out[1], 1, 1, 1, 0);
 }
 
-TEST(Cassini, NothingToDo) {
-  for (const int32_t count : {0, -1}) {
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWcassini_f(0.08, 0, 1, 0, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWcassini_i(0.08, 0, 1, 0, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWcassini_s(0.08, 0, 1, 1, 0, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(Cassini, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

@@ -113,20 +113,6 @@ TEST(DoubleStereographic, RoundTripInPlace) {
   }
 }
 
-TEST(DoubleStereographic, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  const Double d(0.0818, 0.4, 0.8);
-  for (const int32_t count : {0, -1}) {
-    TWstatus status = 0;
-    TWstereo3_f(d.e, d.lon0, d.chi_g, d.c, d.t, d.C, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWstereo3_i(d.e, d.lon0, d.chi_g, d.c, d.t, d.C, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(DoubleStereographic, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

@@ -196,22 +196,6 @@ TEST(EquidistantConic, ScaleIsTheDerivative) {
   EXPECT_GT(out[0].x, 1e14);  // no guard at the pole
 }
 
-TEST(EquidistantConic, NothingToDo) {
-  for (const int32_t count : {0, -1}) {
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWconic_f(0, 0.5, 1, 1, 1, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWconic_i(0, 0.5, 1, 1, 1, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWconic_s(0.08, 1, 0.5, 1, 1, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(EquidistantConic, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

@@ -310,19 +310,4 @@ TEST(Laborde, RoundTrip) {
   for (std::size_t i = 0; i < in.size(); ++i) expect_near(out[i], in[i].x, in[i].y, 4, 2e-11);
 }
 
-TEST(Laborde, NothingToDo) {
-  const Laborde p = tananarive();
-  Points none;
-  Points guard = untouched(1);
-  EXPECT_EQ(p.forward(none, guard), TW_SUCCESS);
-  EXPECT_EQ(p.inverse(1, none, guard), TW_SUCCESS);
-  EXPECT_EQ(p.scale(1, none, guard), TW_SUCCESS);
-  TWstatus status = 0;
-  TWlabor_f(p.A, p.B, -1, guard.data(), guard.data(), &status);
-  TWlabor_i(1, p.A, p.B, p.C, p.D, -1, guard.data(), guard.data(), &status);
-  TWlabor_s(1, p.A, p.B, -1, guard.data(), guard.data(), &status);
-  EXPECT_EQ(status, TW_SUCCESS);
-  expect_untouched(guard[0]);
-}
-
 }  // namespace

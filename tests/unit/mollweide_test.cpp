@@ -3,7 +3,6 @@
 #include <random>
 
 #include "support/points.hpp"
-#include "support/proj_peer.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::test;
@@ -29,18 +28,6 @@ TEST(Mollweide, AreaNorthOfAParallel) {
     const double theta = std::asin(forward(0, lat).y / kRoot2);
     EXPECT_NEAR(theta + std::sin(theta) * std::cos(theta), kPi / 2 * std::sin(lat), 2e-15);
   }
-}
-
-TEST(Mollweide, AgreesWithProj) {
-  TIDEWATER_NEED_PROJ();
-#ifdef TIDEWATER_HAVE_PROJ
-  const ProjPeer peer("+proj=moll +R=1 +lon_0=10");
-  ASSERT_TRUE(peer.ok());
-  for (double lat = -86; lat < 87; lat += 4.3) {
-    const CoordinateTriple expected = peer.forward({degrees(50), degrees(lat), 0});
-    expect_near(forward(degrees(50), degrees(lat), degrees(10)), expected.x, expected.y, 1e-7);
-  }
-#endif
 }
 
 TEST(Mollweide, LongitudeIsNotWrapped) {

@@ -287,24 +287,6 @@ TEST(Perspective, TiltedRoundTripInPlace) {
   }
 }
 
-TEST(Perspective, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  for (const int32_t count : {0, -1}) {
-    for (const double e : {0.0, 0.08}) {
-      TWstatus status = 0;
-      TWpersp_vert_f(1, e, 0, 0.5, 0, 1, 2, 0.5, count, &p, &p, &status);
-      EXPECT_EQ(status, TW_SUCCESS);
-      TWpersp_vert_i(1, e, 0, 0.5, 0, 1, 2, 0.5, count, &p, &p, &status);
-      EXPECT_EQ(status, TW_SUCCESS);
-      TWpersp_f(1, e, 0, 0.5, 0, 1, 2, 0.5, 0.1, 0.1, 0.1, count, &p, &p, &status);
-      EXPECT_EQ(status, TW_SUCCESS);
-      TWpersp_i(1, e, 0, 0.5, 0, 1, 2, 0.5, 0.1, 0.1, 0.1, count, &p, &p, &status);
-      EXPECT_EQ(status, TW_SUCCESS);
-    }
-    expect_untouched(p);
-  }
-}
-
 TEST(Perspective, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

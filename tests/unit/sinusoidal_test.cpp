@@ -193,15 +193,6 @@ TEST(Sinusoidal, ScaleStopsBeyondThePole) {
   expect_untouched(out[0]);
 }
 
-TEST(Sinusoidal, NothingToDo) {
-  const Sinusoidal p(0.08, 0, 0);
-  Points none, guard = untouched(1);
-  EXPECT_EQ(p.forward(none, guard), TW_SUCCESS);
-  EXPECT_EQ(p.inverse(none, guard), TW_SUCCESS);
-  EXPECT_EQ(p.scale(1, none, guard), TW_SUCCESS);
-  expect_untouched(guard[0]);
-}
-
 TEST(Sinusoidal, FarFromAHugeCentralMeridian) {
   // The wrap ends, and gives what single steps give.
   for (const double lon0 : {1e9, -1e9, 1e13}) {

@@ -217,20 +217,6 @@ TEST(VanDerGrinten, ScaleFillsAtThePoles) {
   EXPECT_EQ(status, TW_SUCCESS);
 }
 
-TEST(VanDerGrinten, NothingToDo) {
-  CoordinateTriple q = kUntouchedPoint;
-  for (const int32_t count : {0, -1}) {
-    TWstatus status = 0;
-    TWvdg_f(0, 0, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWvdg_i(0, 0, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWvdg_s(1, 0, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(q);
-  }
-}
-
 TEST(VanDerGrinten, ClosedFormBesideTheStatedIteration) {
   // The latitude by the iteration, pass for pass.
   const auto stated = [](double X, double Y) {
