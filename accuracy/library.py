@@ -147,7 +147,6 @@ _last_error = _function("tw_last_error", _T)
 _system = _function("tw_system_create", _V, _T)
 _transformation = _function("tw_transformation_create", _V, _V, _V, _V)
 _transform = _function("tw_transform", _S, _V, _I, _S, _P, _P, _V, ctypes.c_uint32)
-_system_text = _function("tw_system_text", _S, _V, _T, _T, _S)
 _projection_of = _function("tw_projection_of", _V, _V)
 _project = _function("tw_project", _S, _V, _I, _S, _P, _P, _V, ctypes.c_uint32)
 _factors = _function("tw_project_factors", _S, _V, _S, _P, _V, _V)
@@ -273,10 +272,3 @@ def position_of_mgrs(text):
     position = np.full(2, np.nan)
     _parse_mgrs(text.encode(), position.ctypes.data)
     return position
-
-
-def proj_text(definition):
-    """The system as a PROJ string."""
-    text = ctypes.create_string_buffer(2000)
-    _system_text(_made(_system(definition.encode()), definition), b"proj", text, 2000)
-    return text.value.decode()

@@ -398,7 +398,8 @@ namespace {
 int usage() {
   std::fputs(
       "usage: tidewater_bench [--filter REGEX] [--level one_by_one|baseline|avx2|avx512]\n"
-      "                       [--points N] [--markdown]\n",
+      "                       [--points N] [--markdown]\n"
+      "       tidewater_bench --threads\n",
       stderr);
   return 2;
 }
@@ -411,6 +412,10 @@ int main(int argc, char** argv) {
   bool markdown = false;
   for (int i = 1; i < argc; ++i) {
     const std::string option = argv[i];
+    if (option == "--threads") {
+      measure_two_threads();
+      return 0;
+    }
     if (option == "--markdown") {
       markdown = true;
     } else if (i + 1 == argc) {

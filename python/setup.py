@@ -2,6 +2,7 @@
 
 import os
 import pathlib
+import re
 import subprocess
 import sys
 
@@ -33,5 +34,8 @@ class CMakeBuild(build_ext):
             link.unlink()
             file.rename(link)
 
+VERSION = re.search(r'define TIDEWATER_VERSION "(.*)"',
+                    (HERE.parent / "include/tidewater/version.h").read_text()).group(1)
 
-setup(ext_modules=[Extension("tidewater._core", sources=[])], cmdclass={"build_ext": CMakeBuild})
+setup(version=VERSION, ext_modules=[Extension("tidewater._core", sources=[])],
+      cmdclass={"build_ext": CMakeBuild})

@@ -1,6 +1,7 @@
 #include "builder.hpp"
 
 #include <fcntl.h>
+#include <signal.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -219,6 +220,24 @@ fs::path target_of(const fs::path& store) {
   return target;
 }
 
+// While it lives, the signals that ask a command to end wait: a draft is removed or in its place
+// before they do.
+class SignalsHeld {
+ public:
+  SignalsHeld() {
+    sigset_t ends;
+    ::sigemptyset(&ends);
+    for (const int signal : {SIGHUP, SIGINT, SIGTERM}) ::sigaddset(&ends, signal);
+    ::pthread_sigmask(SIG_BLOCK, &ends, &before_);
+  }
+  ~SignalsHeld() { ::pthread_sigmask(SIG_SETMASK, &before_, nullptr); }
+  SignalsHeld(const SignalsHeld&) = delete;
+  SignalsHeld& operator=(const SignalsHeld&) = delete;
+
+ private:
+  sigset_t before_;
+};
+
 // A new file beside its target, under a name that nothing else has, that takes the target's place
 // when it is whole.  Until then the target is as it was, and a failure removes this file alone.
 class Draft {
@@ -276,6 +295,7 @@ class Draft {
     require(::fchmod(file_, mode) == 0);
   }
 
+  SignalsHeld held_;  // the last to go
   fs::path target_;
   fs::path path_;
   int file_ = -1;

@@ -86,7 +86,12 @@ CsvFile read_csv(const std::filesystem::path& path) {
   std::ifstream in;
   if (std::filesystem::is_regular_file(path, ignored)) in.open(path, std::ios::binary);
   if (!in.is_open()) throw SourceError(path.string() + ": cannot be opened");
-  std::string text{std::istreambuf_iterator<char>(in), {}};
+  // By read(), which tells of a failing disk by the stream's state.
+  std::string text;
+  char block[1 << 14];
+  while (in.read(block, sizeof block) || in.gcount() > 0) {
+    text.append(block, static_cast<std::size_t>(in.gcount()));
+  }
   if (in.bad()) throw SourceError(path.string() + ": cannot be read");
   Reader reader(path, std::move(text));
   CsvFile file{path, {}, {}};

@@ -104,9 +104,10 @@ Summary run_blocks(std::size_t count, const Run& run, const Load& load, const Ch
       load(at, block);
       chain(block);
       bool odd = block.failed;
+      const CoordinateTriple* const points = block.now;
       for (int i = 0; i < block.count; ++i) {
-        odd |= !(std::fabs(block.now[i].x) <= std::numeric_limits<double>::max());
-        odd |= !(std::fabs(block.now[i].y) <= std::numeric_limits<double>::max());
+        // Nothing but a number less itself is nothing.
+        odd |= !((points[i].x - points[i].x) + (points[i].y - points[i].y) == 0);
       }
       if (odd) {
         for (int i = 0; i < block.count; ++i) {

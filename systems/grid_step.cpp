@@ -1,6 +1,7 @@
 // Datum steps by grids of longitude and latitude shifts.
 #include <filesystem>
 
+#include "grids_content.hpp"
 #include "makers.hpp"
 #include "operation.hpp"
 #include "tidewater/grids.hpp"
@@ -12,7 +13,8 @@ namespace {
 // Where PROJ's grids usually are, after the folders of the caller's.
 constexpr const char* kUsualFolders[] = {"/usr/share/proj", "/usr/local/share/proj"};
 
-constexpr double kDegree = kPi / 180;
+constexpr int kNadcon = 9613, kNationalVersion1 = 9614, kNationalVersion2 = 9615;
+constexpr int kGeocentricByGrid = 1087;
 
 std::vector<std::string> all_folders(const std::vector<std::string>& folders) {
   std::vector<std::string> all = folders;
@@ -47,7 +49,17 @@ struct GridFile {
   bool reversed = false;
 };
 GridFile grid_of(const OperationRecord& operation, const std::vector<std::string>& folders) {
+  // The registry's own files of these methods are of forms that are not read.
+  const bool only_tiff =
+      operation.method == kNationalVersion1 || is_geocentric_grid(operation.method);
   for (const GridName& grid : operation.grids) {
+    if (only_tiff) {
+      if (!grid.proj_name.ends_with(".tif")) continue;
+      if (auto path = found(grid.proj_name, folders); !path.empty()) {
+        return {std::move(path), grid.proj_reversed};
+      }
+      continue;
+    }
     if (auto path = found(grid.name, folders); !path.empty()) return {std::move(path)};
     for (const std::string& name : {grid.proj_name, older_name(grid.proj_name, ".gsb")}) {
       if (auto path = found(name, folders); !path.empty()) {
@@ -72,22 +84,25 @@ class ShiftGridStep final : public DatumStep {
     const bool back = inverse != reversed_;
     const double before = (back ? target_ : source_).meridian;
     const double after = (back ? source_ : target_).meridian;
+    const GridContent& grid = grid_.content();
     for (int i = 0; i < block.count; ++i) {
-      block.now[i].x = (block.now[i].x - before) * (1 / kDegree);
-      block.now[i].y *= 1 / kDegree;
-    }
-    const Coordinates<double> points = {&block.now[0].x, &block.now[0].y, &block.now[0].z, 3};
-    TWstatus words[kBlockSize];
-    const auto count = static_cast<std::size_t>(block.count);
-    const Summary summary = back ? grid_.inverse(count, points, points, words)
-                                 : grid_.forward(count, points, points, words);
-    for (int i = 0; i < block.count; ++i) {
-      block.now[i].x = block.now[i].x * kDegree + after;
-      block.now[i].y *= kDegree;
-    }
-    if (summary.failed == 0) return;
-    for (int i = 0; i < block.count; ++i) {
-      if (words[i] != TW_SUCCESS) block.fail(i, words[i]);
+      CoordinateTriple& point = block.now[i];
+      double x = point.x - before;
+      double y = point.y;
+      TWstatus word = TW_SUCCESS;
+      if (back) {
+        int passes = 0;
+        word = grid.unshift(&x, &y, &passes);
+      } else {
+        double dlon = 0;
+        double dlat = 0;
+        if (!grid.shift(x, y, &dlon, &dlat)) word = TW_I_OUTSIDE_CNT;
+        x += dlon;
+        y += dlat;
+      }
+      point.x = x + after;
+      point.y = y;
+      if (word != TW_SUCCESS) block.fail(i, word);
     }
   }
   std::string describe() const override { return words_; }
@@ -99,10 +114,89 @@ class ShiftGridStep final : public DatumStep {
   std::string words_;
 };
 
+// Translations of geocentric coordinates that a grid has for the positions of the target: IOGP
+// Publication 373-7-2, method 1087.
+class GeocentricGridStep final : public DatumStep {
+ public:
+  GeocentricGridStep(GridContent grid, bool reversed, bool flat, const Frame& source,
+                     const Frame& target, std::string words)
+      : grid_(std::move(grid)),
+        reversed_(reversed),
+        flat_(flat),
+        source_(source),
+        target_(target),
+        words_(std::move(words)) {}
+
+  void run(Block& block, bool inverse) const override {
+    const bool back = inverse != reversed_;
+    const Frame& from = back ? target_ : source_;
+    const Frame& to = back ? source_ : target_;
+    for (int i = 0; i < block.count; ++i) {
+      CoordinateTriple& point = block.now[i];
+      point.x -= from.meridian;
+      if (flat_) point.z = 0;
+      const TWstatus word = back ? backward(point) : forward(point);
+      if (word == TW_SUCCESS) {
+        point.x += to.meridian;
+      } else {
+        block.fail(i, word);
+      }
+    }
+  }
+  std::string describe() const override { return words_; }
+
+ private:
+  static constexpr int kMostPasses = 20;
+  static constexpr double kTolerance = 1e-13;  // radians
+
+  // The grid is read where the point comes out.
+  TWstatus forward(CoordinateTriple& point) const {
+    CoordinateTriple from{};
+    TWstatus word;
+    TWllh_to_xyz(source_.a, source_.e, 1, &point, &from, &word);
+    CoordinateTriple at = point;
+    for (int pass = 0; pass < kMostPasses; ++pass) {
+      double by[3];
+      if (!grid_.translation(at.x, at.y, &by)) return TW_I_OUTSIDE_CNT;
+      const CoordinateTriple moved = {from.x + by[0], from.y + by[1], from.z + by[2]};
+      CoordinateTriple next{};
+      TWxyz_to_llh(target_.a, target_.e, 1, &moved, &next, &word);
+      const bool rest =
+          std::fabs(next.x - at.x) <= kTolerance && std::fabs(next.y - at.y) <= kTolerance;
+      at = next;
+      if (rest) {
+        point = at;
+        return TW_SUCCESS;
+      }
+    }
+    return TW_NOT_CONVERGED;
+  }
+
+  TWstatus backward(CoordinateTriple& point) const {
+    double by[3];
+    if (!grid_.translation(point.x, point.y, &by)) return TW_I_OUTSIDE_CNT;
+    CoordinateTriple moved{};
+    TWstatus word;
+    TWllh_to_xyz(target_.a, target_.e, 1, &point, &moved, &word);
+    moved = {moved.x - by[0], moved.y - by[1], moved.z - by[2]};
+    TWxyz_to_llh(source_.a, source_.e, 1, &moved, &point, &word);
+    return TW_SUCCESS;
+  }
+
+  GridContent grid_;
+  bool reversed_, flat_;
+  Frame source_, target_;
+  std::string words_;
+};
+
 }  // namespace
 
-// NTv2 and NADCON.
-bool is_shift_grid(int method) { return method == 9615 || method == 9613; }
+bool is_shift_grid(int method) {
+  return method == kNationalVersion2 || method == kNadcon || method == kNationalVersion1 ||
+         is_geocentric_grid(method);
+}
+
+bool is_geocentric_grid(int method) { return method == kGeocentricByGrid; }
 
 std::string shift_grid_file(const OperationRecord& operation,
                             const std::vector<std::string>& folders) {
@@ -129,9 +223,15 @@ std::vector<std::string> folders_for(const std::string& file,
 
 std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& source,
                                                  const Frame& target,
-                                                 const std::vector<std::string>& folders) {
+                                                 const std::vector<std::string>& folders,
+                                                 bool flat) {
   const GridFile file = grid_of(link.operation, folders);
   if (file.path.empty()) throw Error(in_words(link) + " needs a grid that was not found.");
+  if (is_geocentric_grid(link.operation.method)) {
+    return std::make_unique<GeocentricGridStep>(read_grid(file.path, {}, GridKind::geocentric),
+                                                link.reversed, flat, source, target,
+                                                in_words(link));
+  }
   return std::make_unique<ShiftGridStep>(ShiftGrid(file.path), link.reversed != file.reversed,
                                          file.reversed ? target : source,
                                          file.reversed ? source : target, in_words(link));

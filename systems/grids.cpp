@@ -123,6 +123,19 @@ bool GridContent::shift(double lon, double lat, double* dlon, double* dlat) cons
   return !std::isnan(*dlon + *dlat);
 }
 
+bool GridContent::translation(double lon, double lat, double (*by)[3]) const {
+  Cell cell;
+  const Lattice* const g = find_lattice(*this, near_greenwich(lon), lat, &cell);
+  if (!g) return false;
+  const float* const south =
+      &g->values[static_cast<std::size_t>(3 * (cell.row * g->columns + cell.column))];
+  const float* const north = south + 3 * g->columns;
+  for (int k = 0; k < 3; ++k) {
+    (*by)[k] = bilinear<3>(south + k, north + k, cell.fx, cell.fy) * g->unit;
+  }
+  return !std::isnan((*by)[0] + (*by)[1] + (*by)[2]);
+}
+
 namespace {
 
 // Moves a point that lies beyond the edges by less than a cell onto them; false where it lies

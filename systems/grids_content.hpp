@@ -21,8 +21,8 @@ struct Lattice {
   double dx = 0, dy = 0;
   std::int64_t columns = 0, rows = 0;
   bool round = false;  // all round the Earth: the last column is the first once more
-  // One value a node (undulation) or two (shift of longitude, shift of latitude), in the file's
-  // unit; not-a-number where there is none.
+  // One value a node (undulation), two (shifts of longitude and latitude) or three (geocentric
+  // translations), in the file's unit; not-a-number where there is none.
   std::vector<float> values;
   double unit = 1;  // radians or metres in one of the file's
   std::vector<std::int32_t> children;
@@ -31,7 +31,9 @@ struct Lattice {
   double height() const { return static_cast<double>(rows - 1) * dy; }
 };
 
-enum class GridKind : std::uint8_t { shift, geoid };
+enum class GridKind : std::uint8_t { geoid, shift, geocentric };
+
+inline int bands_of(GridKind kind) { return static_cast<int>(kind) + 1; }
 
 struct GridContent {
   std::string path, form, source, target;
@@ -44,6 +46,8 @@ struct GridContent {
   bool shift(double lon, double lat, double* dlon, double* dlat) const;
   // The point that the shift brings to lon, lat, by iteration; passes are told.
   TWstatus unshift(double* lon, double* lat, int* passes) const;
+  // Translation of geocentric coordinates at a point, metres; false outside.
+  bool translation(double lon, double lat, double (*by)[3]) const;
   // Undulation in metres, not-a-number outside.
   double undulation(double lon, double lat) const;
 };

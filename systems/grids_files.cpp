@@ -4,9 +4,10 @@
 #include <array>
 #include <bit>
 #include <cmath>
+#include <cstdio>
 #include <filesystem>
-#include <fstream>
 #include <limits>
+#include <memory>
 #include <new>
 #include <numbers>
 #include <stdexcept>
@@ -345,9 +346,12 @@ Bytes read_file(const std::string& path) {
   if (error) throw Error("The grid file " + path + " cannot be read.");
   if (size > kMostBytes) refuse(path, "is larger than 2 GB");
   std::vector<unsigned char> bytes(static_cast<std::size_t>(size));
-  std::ifstream file(path, std::ios::binary);
-  file.read(reinterpret_cast<char*>(bytes.data()), static_cast<std::streamsize>(size));
-  if (!file) throw Error("The grid file " + path + " cannot be read.");
+  // Not by a stream, which would bring the standard library's locales into the browser's package.
+  const std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(std::fopen(path.c_str(), "rb"),
+                                                             &std::fclose);
+  if (!file || std::fread(bytes.data(), 1, bytes.size(), file.get()) != bytes.size()) {
+    throw Error("The grid file " + path + " cannot be read.");
+  }
   return {path, std::move(bytes)};
 }
 
@@ -409,8 +413,9 @@ GridContent read_grid(const std::string& name, const std::vector<std::string>& f
   const std::string& path = content.path;
   const auto must_be = [&](GridKind expected, const char* form) {
     if (kind != expected) {
-      refuse(path, std::string(form) + (kind == GridKind::geoid ? " holds no undulations"
-                                                                : " holds no datum shifts"));
+      refuse(path, std::string(form) + (kind == GridKind::geoid   ? " holds no undulations"
+                                        : kind == GridKind::shift ? " holds no datum shifts"
+                                                                  : " holds no translations"));
     }
   };
   const bool las = ends_with(path, ".las"), los = ends_with(path, ".los");
@@ -441,7 +446,7 @@ GridContent read_grid(const std::string& name, const std::vector<std::string>& f
       refuse(path, "is of no form that is known: NTv2, NADCON, GTX, .geo or GeoTIFF");
     }
   }
-  for (Lattice& g : content.lattices) close_round(kind == GridKind::shift ? 2 : 1, &g);
+  for (Lattice& g : content.lattices) close_round(bands_of(kind), &g);
   plant(&content);
   return content;
 } catch (const std::length_error&) {

@@ -266,9 +266,9 @@ bool place(TIFF* tiff, const Image& image, const std::string& path, Lattice* g) 
 
 // Radians or metres in a unit as bands name it.
 double unit_of(const std::string& name, GridKind kind, const std::string& path) {
-  if (kind == GridKind::geoid) {
+  if (kind != GridKind::shift) {
     if (name.empty() || name == "metre" || name == "meter" || name == "m") return 1;
-    refuse(path, "has undulations in the unit " + name + ", not in metres");
+    refuse(path, "has figures in the unit " + name + ", not in metres");
   }
   if (name.empty() || name == "arc-second" || name == "arc-seconds per year") return kDegree / 3600;
   if (name == "degree") return kDegree;
@@ -289,10 +289,16 @@ void read_image(TIFF* tiff, std::int64_t file_size, bool first, GridContent* con
     }
     return -1;
   };
-  int bands[2] = {-1, -1};  // as the lattice has them
-  int band_count = 1;
-  if (content->kind == GridKind::shift) {
-    band_count = 2;
+  int bands[3] = {-1, -1, -1};  // as the lattice has them
+  const int band_count = bands_of(content->kind);
+  if (content->kind == GridKind::geocentric) {
+    bands[0] = band_of("x_translation");
+    bands[1] = band_of("y_translation");
+    bands[2] = band_of("z_translation");
+    if (bands[0] < 0 || bands[1] < 0 || bands[2] < 0) {
+      refuse(path, "has no bands of geocentric translations");
+    }
+  } else if (content->kind == GridKind::shift) {
     bands[0] = band_of("longitude_offset");
     bands[1] = band_of("latitude_offset");
     const bool described = !item(metadata, 0, "description").empty();

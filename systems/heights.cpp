@@ -97,6 +97,23 @@ bool is_geoid_grid(int method) {
   }
 }
 
+// Of the forms of such grids the one that is read.
+bool is_offset_grid(int method) { return method == 1084; }
+
+std::unique_ptr<const DatumStep> offset_grid_step(const Link& link,
+                                                  const std::vector<std::string>& folders) {
+  // Offsets are added to heights of the source, undulations taken off those above the ellipsoid.
+  return std::make_unique<UndulationStep>(GeoidGrid(geoid_grid_file(link.operation, folders)),
+                                          link.reversed, in_words(link));
+}
+
+std::unique_ptr<const DatumStep> offset_grid_step(const std::string& file,
+                                                  const std::vector<std::string>& folders) {
+  GeoidGrid grid(file, folders_for(file, folders));
+  std::string words = "heights by offsets of " + grid.describe() + " " + grid.path();
+  return std::make_unique<UndulationStep>(std::move(grid), false, std::move(words));
+}
+
 bool is_height_offset(int method) { return method == kOffset || method == kOffsetAndSlope; }
 
 std::unique_ptr<const DatumStep> geoid_step(const Link& link,

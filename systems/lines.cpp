@@ -40,8 +40,11 @@ using namespace detail;
 template <class Kernel>
 Summary over_lines(const Kernel& kernel, std::size_t count, const LineArrays& arrays) {
   Summary summary;
+#if defined(TIDEWATER_ONE_WIDTH)
+  summary.failed = take_lines_at<points::Level::baseline>(kernel, count, arrays);
+#else
   switch (count == 1 ? points::Level::one_by_one : points::level()) {
-#if defined(__x86_64__) || defined(__i386__)
+#if defined(TIDEWATER_WIDE_LANES)
     case points::Level::avx512:
       summary.failed = take_lines_at<points::Level::avx512>(kernel, count, arrays);
       break;
@@ -57,6 +60,7 @@ Summary over_lines(const Kernel& kernel, std::size_t count, const LineArrays& ar
     default:
       summary.failed = take_lines<double>(kernel, count, arrays);
   }
+#endif
   if (summary.failed != 0) summary.word = TW_RANGE_ERROR;
   return summary;
 }

@@ -215,7 +215,12 @@ std::size_t take_lines_at(const Kernel& kernel, std::size_t count, const LineArr
 #ifdef TIDEWATER_LEVEL
 template <points::Level level, class Kernel>
 std::size_t take_lines_at(const Kernel& kernel, std::size_t count, const LineArrays& arrays) {
+#if defined(TIDEWATER_ONE_WIDTH)
+  // Lines have the longest formulas: one register of them takes half the room of two.
+  return take_lines<points::Lanes<2>>(kernel, count, arrays);
+#else
   return take_lines<typename points::BlockOf<level>::V>(kernel, count, arrays);
+#endif
 }
 #define TIDEWATER_LINES(Kernel)                                                                  \
   template std::size_t take_lines_at<points::Level::TIDEWATER_LEVEL>(const Kernel&, std::size_t, \

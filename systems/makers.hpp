@@ -125,4 +125,10 @@ Made make_vertical_perspective(const MethodArguments& given);
 Made make_tilted_perspective(const MethodArguments& given);
 Made make_imw_polyconic(const MethodArguments& given);
 
+Made make_chamberlin(const MethodArguments& given);
+Made make_indian_polyhedric(const MethodArguments& given);
+Made make_malaya(const MethodArguments& given);
+Made make_space_oblique(const MethodArguments& given);
+Made make_landsat(const MethodArguments& given);
+
 }  // namespace tidewater::detail

@@ -4,8 +4,7 @@
 #include "formulas/krovak.hpp"
 #include "formulas/oblique_mercator.hpp"
 
-#include "makers.hpp"
-#include "projection_points.hpp"
+#include "map_formula.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
@@ -347,16 +346,12 @@ Made make_polar_stereographic_c(const MethodArguments& given) {
 }
 
 Made make_stereographic(const MethodArguments& given) {
-  const double e = given.e;
+  const Plane plane = natural_plane(given, given(kK0, 1));
   const double lat0 = given(kLat0);
-  double C, m0 = 0, chi0 = 0;
-  TWstatus made;
-  TWstereo_c(e, lat0, &C, &m0, &chi0, &made);
-  require(made, given);
-  return formula(
-      natural_plane(given, given(kK0, 1)),
-      [=](TW_BLOCK) { TWstereo_f(e, 0, lat0, C, m0, chi0, count, in, out, status); },
-      [=](TW_BLOCK) { TWstereo_i(e, 0, lat0, C, m0, chi0, count, in, out, status); });
+  if (kHalfPi - std::fabs(lat0) < 1e-10) {
+    return polar_stereographic(given, plane, std::copysign(kHalfPi, lat0));
+  }
+  return map_formula(plane, StereographicAboutPoint(given.e, lat0));
 }
 
 Made make_new_zealand(const MethodArguments& given) {

@@ -5,8 +5,7 @@
 #include "formulas/colombia_urban.hpp"
 #include "formulas/equal_earth.hpp"
 #include "formulas/latitudes.hpp"
-#include "makers.hpp"
-#include "projection_points.hpp"
+#include "map_formula.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/special.h"
 
@@ -228,30 +227,6 @@ Made make_sinusoidal(const MethodArguments& given) {
       [=](TW_BLOCK) { TWsinusoidal_i(0, 0, e, e2, m0, count, in, out, status); });
 }
 
-Made make_eckert4(const MethodArguments& given) {
-  return formula(
-      natural_plane(given, 1), [](TW_BLOCK) { TWeckertIV_f(0, 0, count, in, out, status); },
-      [](TW_BLOCK) { TWeckertIV_i(0, 0, count, in, out, status); });
-}
-
-namespace {
-
-// The block functions of a map, and the plane of one that works in metres.
-template <class Map>
-Made map_formula(const Plane& plane, const Map& map) {
-  const MapForward<Map> forward{map};
-  const MapInverse<Map> inverse{map};
-  return formula(
-      plane, [=](TW_BLOCK) { *status = over_points(forward, count, in, out); },
-      [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
-}
-
-Plane metric_plane(const MethodArguments& given) {
-  return {given(kLon0), 1, 1, given(kX0), given(kY0)};
-}
-
-}  // namespace
-
 template <class Map>
 Next MapForward<Map>::other(const CoordinateTriple&, CoordinateTriple*, TWstatus* status) const {
   *status = TW_RANGE_ERROR;
@@ -277,6 +252,10 @@ template struct MapForward<VanDerGrinten>;
 template struct MapInverse<VanDerGrinten>;
 template struct MapForward<Mollweide>;
 template struct MapInverse<Mollweide>;
+template struct MapForward<Eckert4>;
+template struct MapInverse<Eckert4>;
+template struct MapForward<StereographicAboutPoint>;
+template struct MapInverse<StereographicAboutPoint>;
 
 // The lines that the many do not cover, one by one.
 Next GeodesicEquidistantForward::other(const CoordinateTriple& in, CoordinateTriple* out,
@@ -521,6 +500,10 @@ Made make_miller(const MethodArguments& given) {
   return formula(
       natural_plane(given, 1), [](TW_BLOCK) { TWmiller_cyl_f(in, count, 0, 0, out, status); },
       [](TW_BLOCK) { TWmiller_cyl_i(in, count, 0, 0, out, status); });
+}
+
+Made make_eckert4(const MethodArguments& given) {
+  return map_formula(natural_plane(given, 1), Eckert4());
 }
 
 Made make_mollweide(const MethodArguments& given) {

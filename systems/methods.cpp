@@ -66,6 +66,10 @@ constexpr ParameterKind kKinds[] = {
     {kTilt, angle, "Tilt", "tilt", "tilt", 0},
     {kSatellite, scale, "Satellite Number", "satellite", "satellite", 0},
     {kPath, scale, "Path Number", "path", "path", 1},
+    {kInclination, angle, "Inclination of orbit", "inclination of the orbit", "inclination", 0},
+    {kPeriodRatio, scale, "Period of revolution", "days of one revolution", "days", 0},
+    {kAscendingNode, angle, "Longitude of ascending node", "longitude of the ascending node",
+     "lon0", 0},
 };
 
 #define TW_FALSE_ORIGIN \
@@ -233,6 +237,36 @@ constexpr MethodParameter kObliqueCone[] = {
     {kAzimuth, "", "azimuth"},          {kLineScale, "", "scale_factor"},
     {kX0, "", "false_easting"},         {kY0, "", "false_northing"},
 };
+constexpr MethodParameter kThreePoints[] = {
+    {kLatitudeOfFirstPoint, "lat_1", "latitude_of_1st_point"},
+    {kLongitudeOfFirstPoint, "lon_1", "longitude_of_1st_point"},
+    {kLatitudeOfSecondPoint, "lat_2", "latitude_of_2nd_point"},
+    {kLongitudeOfSecondPoint, "lon_2", "longitude_of_2nd_point"},
+    {kLatitudeOfThirdPoint, "lat_3", "latitude_of_3rd_point"},
+    {kLongitudeOfThirdPoint, "lon_3", "longitude_of_3rd_point"},
+    TW_FALSE_ORIGIN,
+};
+constexpr MethodParameter kIndian[] = {
+    {kLat0, "", "latitude_of_origin"},
+    {kLon0, "", "central_meridian"},
+    {kX0, "", "false_easting"},
+    {kY0, "", "false_northing"},
+};
+constexpr MethodParameter kOwnFalseOrigin[] = {
+    {kX0, "", "false_easting"},
+    {kY0, "", "false_northing"},
+};
+constexpr MethodParameter kOrbit[] = {
+    {kInclination, "inc_angle", "inclination"},
+    {kPeriodRatio, "ps_rev", "period_of_revolution"},
+    {kAscendingNode, "asc_lon", "longitude_of_ascending_node"},
+    TW_FALSE_ORIGIN,
+};
+constexpr MethodParameter kSatellitePath[] = {
+    {kSatellite, "lsat", "satellite_number"},
+    {kPath, "path", "path_number"},
+    TW_FALSE_ORIGIN,
+};
 
 #undef TW_FALSE_ORIGIN
 
@@ -377,6 +411,15 @@ constexpr Method kMethods[] = {
      "Vertical_Near_Side_Perspective", kVertical, make_vertical_perspective},
     {kTiltedPerspective, "Tilted Perspective", "tilted perspective|tpers", "tpers",
      "Tilted_Perspective", "", kTilted, make_tilted_perspective},
+    {kChamberlin, "Chamberlin Trimetric", "chamberlin trimetric|chamberlin|chamb", "chamb",
+     "Chamberlin_Trimetric", "", kThreePoints, make_chamberlin},
+    {kSpaceOblique, "Space Oblique Mercator", "space oblique mercator|som", "som",
+     "Space_Oblique_Mercator", "", kOrbit, make_space_oblique},
+    {kLandsat, "Space Oblique Mercator (Landsat)", "space oblique mercator landsat|landsat|lsat",
+     "lsat", "Space_Oblique_Mercator_Landsat", "", kSatellitePath, make_landsat},
+    {kIndianPolyhedric, "Indian Polyhedric", "indian polyhedric", "", "Indian_Polyhedric", "",
+     kIndian, make_indian_polyhedric},
+    {kMalaya, "Malaya Grid", "malaya grid", "", "Malaya_Grid", "", kOwnFalseOrigin, make_malaya},
 };
 
 }  // namespace

@@ -31,7 +31,8 @@ enum OwnMethod : int {
   kIndianPolyhedric = -17,
   kRectifiedSkewOrthomorphic = -18,
   kTwoPointOblique = -19,
-  kGaussSphere = -20,
+  kMalaya = -20,
+  kLandsat = -21,
 };
 
 // Parameters that the registry lacks, likewise.
@@ -45,6 +46,9 @@ enum OwnParameter : int {
   kTilt = -107,
   kSatellite = -108,
   kPath = -109,
+  kInclination = -110,
+  kPeriodRatio = -111,
+  kAscendingNode = -112,
 };
 
 enum class Quantity { angle, length, scale };

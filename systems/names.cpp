@@ -118,6 +118,41 @@ Definition ups(std::string_view rest, const std::optional<Where>& where, std::st
   return definition_from_registry(south ? 5042 : 5041);
 }
 
+// References of the military grid are texts; the numbers in them are those of a zone of UTM or of
+// UPS, which a point, a reference or the letters of a zone name.
+Definition military_grid(std::string_view rest, const std::optional<Where>& where,
+                         std::string_view text) {
+  const auto zone_of = [](int zone, bool north) {
+    return definition_from_registry(zone == 0 ? (north ? 5041 : 5042)
+                                              : (north ? 32600 : 32700) + zone);
+  };
+  if (rest.empty()) {
+    if (!where) {
+      throw Error(quoted(text) +
+                  " is a text form of positions on WGS 84: parse_mgrs() and format_mgrs() read and "
+                  "write references; a zone's numbers are \"utm:31N\", \"ups:N\" or, by a "
+                  "reference, \"mgrs:31UDQ\".");
+    }
+    const int zone = utm_zone(where->longitude, where->latitude);
+    if (zone < 0) throw Error("The point that tells the zone of " + quoted(text) + " is none.");
+    return zone_of(zone, where->latitude >= 0);
+  }
+  // A zone alone, "31U" or "Z", or a whole reference.
+  int zone = 0;
+  const auto [end, error] = std::from_chars(rest.data(), rest.data() + rest.size(), zone);
+  const std::string letter = folded(rest.substr(static_cast<std::size_t>(end - rest.data())));
+  if (letter.size() == 1) {
+    const bool polar = error != std::errc();
+    const std::string_view bands = polar ? "abyz" : "cdefghjklmnpqrstuvwx";
+    if (bands.find(letter[0]) != std::string_view::npos && (polar || (zone >= 1 && zone <= 60))) {
+      return zone_of(polar ? 0 : zone, polar ? letter[0] > 'm' : letter[0] >= 'n');
+    }
+  }
+  const GridPosition grid = parse_mgrs(rest);
+  if (!grid) throw Error(grid.reason);
+  return zone_of(grid.zone, grid.north);
+}
+
 Definition state_plane(std::string_view rest, bool of_1983) {
   int16_t type;
   double lon0, lat0, x0, y0, k0, lat1 = 0, lat2 = 0, lon_c = 0, lat_c = 0, azimuth = 0;
@@ -401,6 +436,7 @@ Definition definition_from_text(std::string_view text, const std::optional<Where
   const auto [head, rest] = headed(text);
   if (head == "utm") return utm(rest, where, text);
   if (head == "ups") return ups(rest, where, text);
+  if (head == "mgrs" || head == "usng") return military_grid(rest, where, text);
   if (head == "spcs83") return state_plane(rest, true);
   if (head == "spcs27") return state_plane(rest, false);
   if (head == "geocentric") return geocentric(rest);

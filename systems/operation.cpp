@@ -360,8 +360,15 @@ std::vector<Way> height_ways(int source, int target, const Definition& own, cons
     way.accuracy = operation.accuracy;
     way.area = area_of(operation);
     const int read_in = operation.interpolation;
+    const bool by_offset_grid = both && is_offset_grid(operation.method);
     if (is_height_offset(operation.method)) {
       way.missing = "";
+    } else if (by_offset_grid && read_in != 0 && datum_of(read_in) != own.datum.code) {
+      way.missing = "positions on the datum in which its grid is read";
+    } else if (by_offset_grid) {
+      if (geoid_grid_file(operation, options.grid_folders).empty()) {
+        way.missing = grid_names(operation);
+      }
     } else if (both || !is_geoid_grid(operation.method)) {
       way.missing = "the method " + registry.method_name(operation.method);
     } else if (read_in != 0 && datum_of(read_in) != datum_of(operation.source)) {
@@ -421,7 +428,7 @@ std::unique_ptr<const DatumStep> datum_step(const Link& link, const Transformati
     return similarity_or_offset(link, source, target, options.epoch, flat);
   }
   if (is_shift_grid(operation.method)) {
-    return shift_grid_step(link, source, target, options.grid_folders);
+    return shift_grid_step(link, source, target, options.grid_folders, flat);
   }
   throw Error(in_words(link) + " cannot be carried out: there is no formula for " +
               Registry::shared().method_name(operation.method) + ".");

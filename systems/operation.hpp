@@ -62,14 +62,16 @@ bool depends_on_time(int method);
 std::unique_ptr<const DatumStep> similarity_or_offset(const Link& link, const Frame& source,
                                                       const Frame& target, double epoch, bool flat);
 
-// Methods by grids of longitude and latitude shifts.
+// Methods by grids of longitude and latitude shifts, or of geocentric translations.
 bool is_shift_grid(int method);
+bool is_geocentric_grid(int method);
 // The file that serves an operation, empty where there is none in the folders.
 std::string shift_grid_file(const OperationRecord& operation,
                             const std::vector<std::string>& folders);
 std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& source,
                                                  const Frame& target,
-                                                 const std::vector<std::string>& folders);
+                                                 const std::vector<std::string>& folders,
+                                                 bool flat);
 // A grid of the caller's.
 std::unique_ptr<const DatumStep> shift_grid_step(const std::string& file, bool reversed,
                                                  const Frame& source, const Frame& target,
@@ -89,6 +91,14 @@ std::unique_ptr<const DatumStep> geoid_step(const Link& link,
 // A grid of the caller's.
 std::unique_ptr<const DatumStep> geoid_step(const std::string& file, bool to_geoid,
                                             const std::vector<std::string>& folders);
+
+// A grid of offsets from one vertical datum to another; those of a file of the caller's count from
+// the source.
+bool is_offset_grid(int method);
+std::unique_ptr<const DatumStep> offset_grid_step(const Link& link,
+                                                  const std::vector<std::string>& folders);
+std::unique_ptr<const DatumStep> offset_grid_step(const std::string& file,
+                                                  const std::vector<std::string>& folders);
 
 // Offsets between two vertical datums; the frame is that of the positions.
 bool is_height_offset(int method);

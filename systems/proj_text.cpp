@@ -625,6 +625,10 @@ std::string_view foreign(const Definition& definition) {
       return sphere || definition.method == 1029 ? "" : "PROJ takes the ellipsoid's formula";
     case 1028:
       return sphere ? "" : "PROJ takes the sphere's formula";
+    case kChamberlin:
+      return sphere ? "" : "PROJ takes the sphere's formula";
+    case kLandsat:
+      return definition.parameter(kSatellite) == 7 ? "PROJ knows Landsat 1 to 5 alone" : "";
     case 1130:
       return definition.parameter(kAzimuth) != 0 || definition.parameter(kLineScale, 1) != 1
                  ? "PROJ cannot turn or scale it"

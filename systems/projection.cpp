@@ -28,17 +28,21 @@ MethodArguments arguments(const Definition& definition) {
   return {definition, a, std::sqrt(e2), e2, f};
 }
 
-// An inverse whose result must lead back: some formulas answer with success beyond their map.
+// An inverse whose result must lead back: some formulas answer with success beyond their map.  Within
+// `sure` of the plane's origin all points are the map's.
 class CheckedFormula final : public Formula {
  public:
-  explicit CheckedFormula(std::unique_ptr<const Formula> formula)
-      : Formula(formula->plane), formula_(std::move(formula)) {}
+  CheckedFormula(std::unique_ptr<const Formula> formula, double sure)
+      : Formula(formula->plane), formula_(std::move(formula)), sure2_(sure * sure) {}
   TWstatus forward(int count, const CoordinateTriple* in, CoordinateTriple* out) const override {
     return formula_->forward(count, in, out);
   }
   TWstatus inverse(int count, const CoordinateTriple* in, CoordinateTriple* out) const override {
     const TWstatus word = formula_->inverse(count, in, out);
     if (word != TW_SUCCESS) return word;
+    bool sure = true;
+    for (int i = 0; i < count; ++i) sure &= in[i].x * in[i].x + in[i].y * in[i].y < sure2_;
+    if (sure) return TW_SUCCESS;
     CoordinateTriple back[kBlockSize];
     for (int i = 0; i < count; ++i) {
       if (!(std::fabs(out[i].x) <= kPi + kPoleRounding)) return TW_RANGE_ERROR;
@@ -58,10 +62,16 @@ class CheckedFormula final : public Formula {
 
  private:
   std::unique_ptr<const Formula> formula_;
+  double sure2_;
 };
+
+// The map of equal area about a point is a disk of a radius near 2, in semi-major axes.
+double sure_radius(int method) { return method == 9820 || method == 1027 ? 1 : 0; }
 
 // The methods of our own and those about a point or a parallel, whose maps have an edge.
 bool needs_check(int method) {
+  // The ends of an orbit's map lie on each other.
+  if (method == kSpaceOblique || method == kLandsat) return false;
   return method < 0 || method == 9818 || method == 9827 || method == 9828 || method == 9820 ||
          method == 1027 || method == 9832 || method == 9806 || method == 9840 || method == 1130;
 }
@@ -111,7 +121,8 @@ ProjectionImpl::ProjectionImpl(const Definition& definition)
   }
   formula_ = method_->make(arguments(definition_));
   if (needs_check(method_->code)) {
-    formula_ = std::make_unique<const CheckedFormula>(std::move(formula_));
+    formula_ = std::make_unique<const CheckedFormula>(std::move(formula_),
+                                                      sure_radius(method_->code));
   }
   const Plane& plane = formula_->plane;
   if (!(std::isfinite(plane.sx) && std::isfinite(plane.sy) && std::isfinite(plane.x0) &&
@@ -130,11 +141,13 @@ void ProjectionImpl::run(Block& block, bool inverse_way) const {
 }
 
 void ProjectionImpl::forward(Block& block) const {
-  const Plane& plane = formula_->plane;
+  const Plane plane = formula_->plane;  // a copy: stores of points could be stores into it
+  const int count = block.count;
+  CoordinateTriple* const from = block.now;
   bool odd = false;
-  for (int i = 0; i < block.count; ++i) {
-    block.now[i].x = within_half_turn(block.now[i].x - plane.lon0);
-    odd |= !(std::fabs(block.now[i].y) <= kHalfPi);
+  for (int i = 0; i < count; ++i) {
+    from[i].x = within_half_turn(from[i].x - plane.lon0);
+    odd |= !(std::fabs(from[i].y) <= kHalfPi);
   }
   if (odd) {
     for (int i = 0; i < block.count; ++i) {
@@ -150,16 +163,16 @@ void ProjectionImpl::forward(Block& block) const {
   if (odd || formula_->forward(block.count, block.now, block.spare) != TW_SUCCESS) {
     one_by_one(block, false);
   }
-  for (int i = 0; i < block.count; ++i) {
-    block.spare[i].x = plane.x0 + plane.sx * block.spare[i].x;
-    block.spare[i].y = plane.y0 + plane.sy * block.spare[i].y;
-    block.spare[i].z = block.now[i].z;
+  CoordinateTriple* const to = block.spare;
+  for (int i = 0; i < count; ++i) {
+    const CoordinateTriple at = to[i];
+    to[i] = {plane.x0 + plane.sx * at.x, plane.y0 + plane.sy * at.y, from[i].z};
   }
   block.swap();
 }
 
 void ProjectionImpl::inverse(Block& block) const {
-  const Plane& plane = formula_->plane;
+  const Plane plane = formula_->plane;
   const double by_x = 1 / plane.sx;
   const double by_y = 1 / plane.sy;
   bool odd = block.failed;

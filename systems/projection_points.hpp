@@ -1,9 +1,11 @@
 // Formulas of this layer's own methods as kernels, compiled once for each level.
 #pragma once
 
+#include "formulas/eckert4.hpp"
 #include "formulas/equidistant.hpp"
 #include "formulas/geodesic.hpp"
 #include "formulas/mollweide.hpp"
+#include "formulas/oblique_stereographic.hpp"
 #include "formulas/transverse_mercator.hpp"
 #include "formulas/van_der_grinten.hpp"
 #include "points/over_points.hpp"
@@ -106,6 +108,8 @@ TIDEWATER_MAP(EquidistantConic)
 TIDEWATER_MAP(PolarEquidistant)
 TIDEWATER_MAP(VanDerGrinten)
 TIDEWATER_MAP(Mollweide)
+TIDEWATER_MAP(Eckert4)
+TIDEWATER_MAP(StereographicAboutPoint)
 #undef TIDEWATER_MAP
 TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantForward)
 TIDEWATER_INSTANCE(tidewater::detail::GeodesicEquidistantInverse)

@@ -11,6 +11,7 @@
 #include "tidewater/position_text.hpp"
 #include "tidewater/systems.h"
 #include "tidewater/transformation.hpp"
+#include "tidewater/version.h"
 
 using tidewater::Candidate;
 using tidewater::Coordinates;

@@ -134,25 +134,22 @@ struct End {
     const std::ptrdiff_t stride = in.stride;
     const T* x = (swapped ? in.y : in.x) + static_cast<std::ptrdiff_t>(at) * stride;
     const T* y = (swapped ? in.x : in.y) + static_cast<std::ptrdiff_t>(at) * stride;
-    bool odd = false;
     const double limit_x = angles ? 4 * kPi + 1e-9 : 1e100;
     const double limit_y = angles ? kHalfPi + 1e-12 : 1e100;
-    for (int i = 0; i < block.count; ++i) {
-      const double px = static_cast<double>(x[i * stride]) * sx;
-      const double py = static_cast<double>(y[i * stride]) * sy;
-      block.now[i].x = px;
-      block.now[i].y = py;
-      odd |= !(std::fabs(px) <= limit_x);
-      odd |= !(std::fabs(py) <= limit_y);
-    }
-    if (in.z == nullptr) {
-      for (int i = 0; i < block.count; ++i) block.now[i].z = 0;
-    } else {
-      const T* z = in.z + static_cast<std::ptrdiff_t>(at) * stride;
-      for (int i = 0; i < block.count; ++i) {
-        block.now[i].z = static_cast<double>(z[i * stride]) * sz;
-        odd |= !(std::fabs(block.now[i].z) <= 1e100);
-      }
+    // Copies: stores of points could be stores into the members.
+    const double by_x = sx;
+    const double by_y = sy;
+    const double by_z = in.z == nullptr ? 0 : sz;
+    const T* z = in.z == nullptr ? x : in.z + static_cast<std::ptrdiff_t>(at) * stride;
+    const int count = block.count;
+    CoordinateTriple* const to = block.now;
+    bool odd = false;
+    for (int i = 0; i < count; ++i) {
+      const double px = static_cast<double>(x[i * stride]) * by_x;
+      const double py = static_cast<double>(y[i * stride]) * by_y;
+      const double pz = static_cast<double>(z[i * stride]) * by_z;
+      to[i] = {px, py, pz};
+      odd |= !(std::fabs(px) <= limit_x) | !(std::fabs(py) <= limit_y) | !(std::fabs(pz) <= 1e100);
     }
     if (!odd) return;
     for (int i = 0; i < block.count; ++i) {
@@ -174,24 +171,31 @@ struct End {
     const std::ptrdiff_t stride = out.stride;
     T* x = (swapped ? out.y : out.x) + static_cast<std::ptrdiff_t>(at) * stride;
     T* y = (swapped ? out.x : out.y) + static_cast<std::ptrdiff_t>(at) * stride;
+    T* z = out.z == nullptr ? nullptr : out.z + static_cast<std::ptrdiff_t>(at) * stride;
     const double by_x = 1 / sx;
     const double by_y = 1 / sy;
-    if (angles) {
-      for (int i = 0; i < block.count; ++i) {
-        x[i * stride] = static_cast<T>(within_half_turn(block.now[i].x) * by_x);
-        y[i * stride] = static_cast<T>(block.now[i].y * by_y);
-      }
-    } else {
-      for (int i = 0; i < block.count; ++i) {
-        x[i * stride] = static_cast<T>(block.now[i].x * by_x);
-        y[i * stride] = static_cast<T>(block.now[i].y * by_y);
-      }
-    }
-    if (out.z == nullptr) return;
-    T* z = out.z + static_cast<std::ptrdiff_t>(at) * stride;
     const double by_z = 1 / sz;
-    for (int i = 0; i < block.count; ++i) {
-      z[i * stride] = static_cast<T>(block.now[i].z * by_z);
+    const int count = block.count;
+    const CoordinateTriple* const from = block.now;
+    const auto each = [&](const auto& turned) {
+      if (z == nullptr) {
+        for (int i = 0; i < count; ++i) {
+          x[i * stride] = static_cast<T>(turned(from[i].x) * by_x);
+          y[i * stride] = static_cast<T>(from[i].y * by_y);
+        }
+      } else {
+        for (int i = 0; i < count; ++i) {
+          const CoordinateTriple point = from[i];
+          x[i * stride] = static_cast<T>(turned(point.x) * by_x);
+          y[i * stride] = static_cast<T>(point.y * by_y);
+          z[i * stride] = static_cast<T>(point.z * by_z);
+        }
+      }
+    };
+    if (angles) {
+      each([](double lon) { return within_half_turn(lon); });
+    } else {
+      each([](double value) { return value; });
     }
   }
 };
@@ -291,10 +295,23 @@ class TransformationImpl {
         has_ellipsoidal_height(one) || has_ellipsoidal_height(other)
             ? std::vector<Way>{}
             : height_ways(one.vertical_code, other.vertical_code, one, wanted, options);
-    if (const Way* way = picked(offsets, named_heights); way && way->missing.empty()) {
+    const bool own_offsets = named_heights.size() == 1 && named_heights[0].starts_with("offset:");
+    if (own_offsets) {
+      add(offset_grid_step(named_heights[0].substr(7), options.grid_folders));
+      accuracy = kNotANumber;
       go(one, other, true);
-      note(*way);
-      add(height_offset_step(way->links[0], frame_of(other.datum)));
+    } else if (const Way* way = picked(offsets, named_heights); way && way->missing.empty()) {
+      const Link& link = way->links[0];
+      if (is_offset_grid(link.operation.method)) {
+        // The grid is read on the source's positions.
+        note(*way);
+        add(offset_grid_step(link, options.grid_folders));
+        go(one, other, true);
+      } else {
+        go(one, other, true);
+        note(*way);
+        add(height_offset_step(link, frame_of(other.datum)));
+      }
     } else {
       // Over heights above the ellipsoid.
       std::optional<Leg> first;
@@ -327,11 +344,12 @@ class TransformationImpl {
   };
 
   static bool names_heights(std::string_view word) {
-    if (word.starts_with("geoid:")) return true;
+    if (word.starts_with("geoid:") || word.starts_with("offset:")) return true;
     const auto code = registry_code(word.starts_with('-') ? word.substr(1) : word);
     const auto operation_named = code ? Registry::shared().operation(*code) : std::nullopt;
     return operation_named &&
-           (is_geoid_grid(operation_named->method) || is_height_offset(operation_named->method));
+           (is_geoid_grid(operation_named->method) || is_height_offset(operation_named->method) ||
+            is_offset_grid(operation_named->method));
   }
 
   // The best way, or the one that the caller has named; null without one.

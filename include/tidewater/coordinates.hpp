@@ -15,7 +15,9 @@ namespace tidewater {
 
 /** One point: longitude or easting first, then latitude or northing, then height. */
 struct Point {
-  double x = 0, y = 0, z = 0;
+  double x = 0; /**< longitude, easting or X */
+  double y = 0; /**< latitude, northing or Y */
+  double z = 0; /**< height or Z */
 };
 
 /**
@@ -45,7 +47,7 @@ struct Summary {
   std::size_t failed = 0;     /**< points that have no result */
   TWstatus word = TW_SUCCESS; /**< status word of the first of them */
 
-  explicit operator bool() const { return failed == 0; }
+  explicit operator bool() const { return failed == 0; } /**< every point has a result */
 };
 
 /** How an array call is run. */

@@ -34,6 +34,7 @@ class TW_SYSTEMS_API Ellipsoid {
   double a() const { return a_; }                   /**< semi-major axis, metres */
   double b() const;                                 /**< semi-minor axis, metres */
   double inverse_flattening() const { return inverse_flattening_; } /**< 0 for a sphere */
+  /** f = (a - b) / a; 0 for a sphere. */
   double flattening() const { return inverse_flattening_ == 0 ? 0 : 1 / inverse_flattening_; }
   double eccentricity() const; /**< first eccentricity */
 
@@ -57,9 +58,9 @@ class TW_SYSTEMS_API PrimeMeridian {
   /** @param degrees  longitude from Greenwich, east positive */
   explicit PrimeMeridian(double degrees) : longitude_(degrees) {}
 
-  const std::string& name() const { return name_; }
-  int code() const { return code_; }
-  double longitude() const { return longitude_; } /**< degrees east of Greenwich */
+  const std::string& name() const { return name_; } /**< empty if made from degrees */
+  int code() const { return code_; }                /**< registry code, 0 without one */
+  double longitude() const { return longitude_; }   /**< degrees east of Greenwich */
 
  private:
   std::string name_;
@@ -70,6 +71,7 @@ class TW_SYSTEMS_API PrimeMeridian {
 /** A unit of length or of angle. */
 class TW_SYSTEMS_API Unit {
  public:
+  /** What it measures. */
   enum class Kind { length, angle, scale };
   /**
    * By name or registry code: "metre", "US survey foot", "us-ft", "degree", "grad", "EPSG:9003".
@@ -77,10 +79,10 @@ class TW_SYSTEMS_API Unit {
    */
   explicit Unit(std::string_view name);
 
-  const std::string& name() const { return name_; }
-  int code() const { return code_; }
-  Kind kind() const { return kind_; }
-  double factor() const { return factor_; } /**< metres or radians in one unit */
+  const std::string& name() const { return name_; } /**< the registry's name */
+  int code() const { return code_; }                /**< registry code, 0 without one */
+  Kind kind() const { return kind_; }               /**< what it measures */
+  double factor() const { return factor_; }         /**< metres or radians in one unit */
 
  private:
   std::string name_;

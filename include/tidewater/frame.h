@@ -5,19 +5,35 @@
  *
  * Every function can be called at any time, from C or C++, without set-up.  Angles are radians,
  * longitude first and positive east, latitude positive north.  Points travel as arrays of
- * CoordinateTriple; the output array may be the input array, partial overlap is not supported.
- * A count of zero or below does nothing and leaves #TW_SUCCESS.
+ * CoordinateTriple; the output array may be the input array, partial overlap is not supported.  A
+ * count of zero or below does nothing and leaves #TW_SUCCESS.
  *
  * The last argument is the caller's status word.  It is set to #TW_SUCCESS first and written again
- * only by a failure or an information event, so a word set for one point stands at the end of the
+ * only by a failure or an information event, so a status set for one point stands at the end of the
  * array.  Test its low bit with TW_OK(): set means that the values may be used.  A result pointer
  * is written only when its value was computed.  No pointer is checked for null.
+ *
+ * Projections.  A projection is up to four functions with one stem: _c computes constants, _f goes
+ * from longitude and latitude to the plane, _i goes back, _s gives local scale factors.  The
+ * constants are the caller's: _c writes them once, and they are passed to the others.
+ * - Plane coordinates are in units of the semi-major axis, with central scale 1 and no false
+ *   origin: TWab_to_en() applies those.
+ * - _f and _i read and write elements x and y of a point; z of the output stays as it is.
+ * - _s writes (k, h, areal scale): scale along the parallel, along the meridian, and of areas, with
+ *   the caller's k0 multiplied in.
+ * - A point that fails leaves its status, which later points do not clear, and takes one of three
+ *   forms.  SKIP: its output stays as it was, the loop goes on.  STOP: the function returns, the
+ *   rest of the output stays as it was.  FILL: the scale falls back to k0 and is written, the loop
+ *   goes on.
+ *
+ * "Snyder 1987" is Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987).
  */
 #ifndef TIDEWATER_FRAME_H
 #define TIDEWATER_FRAME_H
 
 #include <stdint.h>
 
+/** Marks what the library exports. */
 #if defined(TIDEWATER_STATIC)
 #define TW_API
 #elif defined(_WIN32)
@@ -44,11 +60,13 @@ typedef struct CoordinateTriple {
   double z; /**< Height in metres, or Z. */
 } CoordinateTriple;
 
-/** Status word: facility 0x0FCF in the high half, message above bit 3, severity in the low 3 bits.
+/**
+ * Status word: facility 0x0FCF in the high half, message above bit 3, severity in the low 3 bits.
  */
 typedef uint32_t TWstatus;
 
-/** A caller's value that is handed through to a callback: an integer or a pointer turned into one.
+/**
+ * A caller's value that is handed through to a callback: an integer or a pointer turned into one.
  */
 typedef uintptr_t TWcontext;
 
@@ -65,12 +83,12 @@ typedef void (*TWtransform_ptr)(void* context, int32_t count, const CoordinateTr
 
 /** @name Status words
  *  @{ */
-#define TW_SUCCESS UINT32_C(0x0FCF8009)            /**< The call did what was asked. */
-#define TW_FAILURE UINT32_C(0x0FCF8012)            /**< A step without a word of its own failed. */
-#define TW_RANGE_ERROR UINT32_C(0x0FCF801A)        /**< The formula has no answer for the value. */
-#define TW_BAD_ECCENTRICITY UINT32_C(0x0FCF8022)   /**< Eccentricity of one or more, or negative. */
-#define TW_BAD_LONGITUDE UINT32_C(0x0FCF802A)      /**< Longitude beyond two pi either way. */
-#define TW_BAD_LATITUDE UINT32_C(0x0FCF8032)       /**< Latitude beyond the function's bound. */
+#define TW_SUCCESS UINT32_C(0x0FCF8009)          /**< The call did what was asked. */
+#define TW_FAILURE UINT32_C(0x0FCF8012)          /**< A step without a status of its own failed. */
+#define TW_RANGE_ERROR UINT32_C(0x0FCF801A)      /**< The formula has no answer for the value. */
+#define TW_BAD_ECCENTRICITY UINT32_C(0x0FCF8022) /**< Eccentricity of one or more, or negative. */
+#define TW_BAD_LONGITUDE UINT32_C(0x0FCF802A)    /**< Longitude beyond two pi either way. */
+#define TW_BAD_LATITUDE UINT32_C(0x0FCF8032)     /**< Latitude beyond the function's bound. */
 #define TW_BAD_SCALE_LATITUDE UINT32_C(0x0FCF803A) /**< Scale not above 0 and at most 1. */
 #define TW_BAD_DATE UINT32_C(0x0FCF8042)           /**< Date outside the magnetic model's span. */
 #define TW_BAD_STANDARD_PARALLEL UINT32_C(0x0FCF804A) /**< Standard parallel at the pole. */
@@ -101,17 +119,17 @@ typedef void (*TWtransform_ptr)(void* context, int32_t count, const CoordinateTr
 #define TW_NO_SUCH_SATELLITE UINT32_C(0x0FCF8112)  /**< The store has no such satellite. */
 #define TW_W_NO_POINTS UINT32_C(0x0FCF8118) /**< Line too short for any intermediate point. */
 #define TW_I_LATITUDE_LIMITED \
-  UINT32_C(0x0FCF8123)                           /**< A value was held, or an iteration ran out. */
+  UINT32_C(0x0FCF8123) /**< A value was clamped, or an iteration ran out. */
 #define TW_I_OUTSIDE_NADCON UINT32_C(0x0FCF812B) /**< A point outside the NADCON grids. */
 #define TW_I_OUTSIDE_GEOID UINT32_C(0x0FCF8133)  /**< A point outside the geoid grids. */
 #define TW_I_OUTSIDE_CNT UINT32_C(0x0FCF813B)    /**< A point outside the national grid. */
 /** @} */
 
 /**
- * Checks a latitude and holds it to the pole.
+ * Checks a latitude and clamps it to the pole.
  * @param lat     latitude, radians
  * @param result  the latitude; exactly plus or minus pi/2 where lat lies beyond by less than 1e-12
- * @param status  #TW_BAD_LATITUDE at or beyond pi/2 + 1e-12 or for a not-a-number; result unwritten
+ * @param status  #TW_BAD_LATITUDE at or beyond pi/2 + 1e-12 or for a NaN; result unwritten
  */
 TW_API void TWverify_lat(double lat, double* result, TWstatus* status);
 
@@ -119,13 +137,13 @@ TW_API void TWverify_lat(double lat, double* result, TWstatus* status);
  * Checks a longitude and brings it into [-pi, pi].
  * @param lon     longitude, radians, from -2 pi to 2 pi, both included
  * @param result  the longitude; exactly pi and -pi stay, 2 pi gives 0
- * @param status  #TW_BAD_LONGITUDE outside that range or for a not-a-number; result unwritten
+ * @param status  #TW_BAD_LONGITUDE outside that range or for a NaN; result unwritten
  */
 TW_API void TWverify_lon(double lon, double* result, TWstatus* status);
 
 /**
  * How many decimal places a number can carry in a double: TWmax_f_prec() for a magnitude of 1.0 or
- * more, otherwise (a not-a-number too) TWmin_f_prec().
+ * more, otherwise (a NaN too) TWmin_f_prec().
  * @param value      the number
  * @param precision  decimal places
  * @param status     always #TW_SUCCESS

@@ -20,7 +20,10 @@ struct GridContent;
 
 /** Where the nodes of a grid lie, degrees; west may be beyond -180, east beyond 180. */
 struct GridBounds {
-  double west, south, east, north;
+  double west;  /**< westernmost nodes */
+  double south; /**< southernmost nodes */
+  double east;  /**< easternmost nodes */
+  double north; /**< northernmost nodes */
 };
 
 /**
@@ -57,7 +60,7 @@ class TW_SYSTEMS_API ShiftGrid {
    * @param in      longitude, latitude in degrees, of any turn; height
    * @param out     shifted longitude and latitude, not wrapped; height copied; may be in
    * @param status  a word for each point, or null: #TW_SUCCESS, or #TW_I_OUTSIDE_CNT outside the
-   *                grid and next to nodes without data, where x, y and z become not-a-number
+   *                grid and next to nodes without data, where x, y and z become NaN
    */
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   TWstatus* status = nullptr) const noexcept;
@@ -71,8 +74,8 @@ class TW_SYSTEMS_API ShiftGrid {
    */
   Summary inverse(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   TWstatus* status = nullptr, int* passes = nullptr) const noexcept;
-  Point forward(Point point) const noexcept; /**< One point; not-a-numbers where it fails. */
-  Point inverse(Point point) const noexcept; /**< One point; not-a-numbers where it fails. */
+  Point forward(Point point) const noexcept; /**< One point; NaN where it fails. */
+  Point inverse(Point point) const noexcept; /**< One point; NaN where it fails. */
 
   const std::string& path() const;        /**< the file, as it was found */
   const std::string& source() const;      /**< name of the source datum in the file; may be empty */
@@ -94,12 +97,13 @@ class TW_SYSTEMS_API ShiftGrid {
  * described as geoid_undulation, or with one band only, in metres.  A grid all round the Earth has
  * no seam.
  *
- * Otherwise as ShiftGrid.  datum.h has a C structure of the same name outside the namespace.
+ * Otherwise as ShiftGrid.  geoid.h has a C structure of the same name outside the namespace.
  * Measured against PROJ 9.1 on EGM96 at 15 minutes, bilinear: within
  * 0.001 mm.
  */
 class TW_SYSTEMS_API GeoidGrid {
  public:
+  /** How undulations are found between nodes. */
   enum class Interpolation {
     bilinear,   /**< on the four nodes around a point */
     biquadratic /**< of the second order both ways, on the three nearest nodes each way */
@@ -115,7 +119,7 @@ class TW_SYSTEMS_API GeoidGrid {
   explicit GeoidGrid(const std::string& name, const std::vector<std::string>& folders = {},
                      Interpolation interpolation = Interpolation::bilinear);
 
-  /** N at a point in degrees; not-a-number outside the grid and next to nodes without data. */
+  /** N at a point in degrees; NaN outside the grid and next to nodes without data. */
   double undulation(double longitude, double latitude) const noexcept;
 
   /**
@@ -124,7 +128,7 @@ class TW_SYSTEMS_API GeoidGrid {
    * @param in      longitude, latitude in degrees, of any turn; height in metres
    * @param out     longitude and latitude copied, height shifted; may be in
    * @param status  a word for each point, or null: #TW_SUCCESS, or #TW_I_OUTSIDE_GEOID where there
-   *                is no N and x, y and z become not-a-number
+   *                is no N and x, y and z become NaN
    */
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   TWstatus* status = nullptr) const noexcept;

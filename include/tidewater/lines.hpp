@@ -30,7 +30,7 @@ struct LineEnd {
 
 /** A line between two points. */
 struct LineCourse {
-  double length;
+  double length;   /**< in the unit of a */
   double azimuth1; /**< at the first point, degrees from -180 to 180 */
   double azimuth2; /**< at the second, going on */
   double area;     /**< as in LineEnd */
@@ -38,41 +38,41 @@ struct LineCourse {
 
 /** What a polygon measures. */
 struct PolygonMeasure {
-  double perimeter;
+  double perimeter; /**< in the unit of a */
   double area; /**< positive for a ring that runs counterclockwise, negative for the other sense; of
                     the two parts of the earth the one of less than half */
 };
 
 /** Arrays of lines to lead on: each of `count` numbers. */
 struct LineStarts {
-  const double* lon;
-  const double* lat;
-  const double* azimuth;
-  const double* length;
+  const double* lon;     /**< longitudes, degrees */
+  const double* lat;     /**< latitudes, degrees */
+  const double* azimuth; /**< degrees clockwise from north */
+  const double* length;  /**< in the unit of a; negative for the way behind */
 };
 
 /** Where the ends go; null what is not wanted.  May be the arrays of the starts. */
 struct LineEnds {
-  double* lon = nullptr;
-  double* lat = nullptr;
-  double* azimuth = nullptr;
-  double* area = nullptr;
+  double* lon = nullptr;     /**< LineEnd::lon */
+  double* lat = nullptr;     /**< LineEnd::lat */
+  double* azimuth = nullptr; /**< LineEnd::azimuth */
+  double* area = nullptr;    /**< LineEnd::area */
 };
 
 /** Arrays of pairs of points. */
 struct LinePairs {
-  const double* lon1;
-  const double* lat1;
-  const double* lon2;
-  const double* lat2;
+  const double* lon1; /**< longitudes of the first points, degrees */
+  const double* lat1; /**< latitudes of the first points, degrees */
+  const double* lon2; /**< longitudes of the second points, degrees */
+  const double* lat2; /**< latitudes of the second points, degrees */
 };
 
 /** Where the courses go; null what is not wanted. */
 struct LineCourses {
-  double* length = nullptr;
-  double* azimuth1 = nullptr;
-  double* azimuth2 = nullptr;
-  double* area = nullptr;
+  double* length = nullptr;   /**< LineCourse::length */
+  double* azimuth1 = nullptr; /**< LineCourse::azimuth1 */
+  double* azimuth2 = nullptr; /**< LineCourse::azimuth2 */
+  double* area = nullptr;     /**< LineCourse::area */
 };
 
 /**
@@ -84,7 +84,7 @@ struct LineCourses {
  * included (to a flattening of 0.01: 15 nm); areas below a line within 0.2 square metres, or as far
  * as the azimuths carry where the ends are nearly antipodal.
  *
- * Latitudes beyond 90 degrees and numbers that are not finite give not-a-numbers, counted as
+ * Latitudes beyond 90 degrees and numbers that are not finite give NaN, counted as
  * failed.
  */
 class TW_SYSTEMS_API Geodesic {
@@ -98,16 +98,17 @@ class TW_SYSTEMS_API Geodesic {
   /** @throws Error for an ellipsoid beyond that flattening */
   explicit Geodesic(const Ellipsoid& ellipsoid);
 
-  double a() const;
-  double f() const;
+  double a() const; /**< semi-major axis */
+  double f() const; /**< flattening */
 
   /** Where a line leads: from a point by an azimuth for a length, which may be negative. */
   LineEnd direct(double lon, double lat, double azimuth, double length) const;
   /** The shortest line between two points. */
   LineCourse inverse(double lon1, double lat1, double lon2, double lat2) const;
 
-  /** Many lines, several at a time. */
+  /** Where many lines lead, several at a time. */
   Summary direct(std::size_t count, const LineStarts& starts, const LineEnds& ends) const noexcept;
+  /** The shortest lines between many pairs of points, several at a time. */
   Summary inverse(std::size_t count, const LinePairs& pairs,
                   const LineCourses& courses) const noexcept;
   /** Points of one line at given lengths from its start. */
@@ -134,24 +135,31 @@ class TW_SYSTEMS_API Geodesic {
  *
  * Between two points the shorter way around is taken, eastwards where both are of one length.  A
  * point at a pole is reached along its meridian.  A line that would go on over a pole has no end:
- * not-a-numbers, counted as failed.
+ * NaN, counted as failed.
  */
 class TW_SYSTEMS_API Rhumb {
  public:
-  /** As Geodesic's, likewise. */
+  /** As Geodesic's, for the same figures. */
   Rhumb(double a, double f);
+  /** @throws Error for an ellipsoid beyond that flattening */
   explicit Rhumb(const Ellipsoid& ellipsoid);
 
-  double a() const;
-  double f() const;
+  double a() const; /**< semi-major axis */
+  double f() const; /**< flattening */
 
+  /** Where a line leads: from a point by an azimuth for a length, which may be negative. */
   LineEnd direct(double lon, double lat, double azimuth, double length) const;
+  /** The line between two points, the shorter way around. */
   LineCourse inverse(double lon1, double lat1, double lon2, double lat2) const;
+  /** Where many lines lead, several at a time. */
   Summary direct(std::size_t count, const LineStarts& starts, const LineEnds& ends) const noexcept;
+  /** The lines between many pairs of points, several at a time. */
   Summary inverse(std::size_t count, const LinePairs& pairs,
                   const LineCourses& courses) const noexcept;
+  /** Points of one line at given lengths from its start. */
   Summary along(double lon, double lat, double azimuth, std::size_t count, const double* lengths,
                 const LineEnds& points) const noexcept;
+  /** A polygon whose sides are rhumb lines; otherwise as Geodesic::polygon(). */
   PolygonMeasure polygon(std::size_t count, const double* lon, const double* lat) const;
 
  private:

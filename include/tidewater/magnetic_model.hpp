@@ -20,11 +20,13 @@ class MagneticModelImpl;
 
 /** The field at a point, or its change in a year. */
 struct MagneticField {
-  double north, east, down; /**< components, nanotesla */
-  double horizontal;        /**< horizontal intensity, nanotesla */
-  double total;             /**< total intensity, nanotesla */
-  double declination;       /**< degrees, east of true north positive */
-  double inclination;       /**< degrees, downwards positive */
+  double north;       /**< component to true north, nanotesla */
+  double east;        /**< component to the east, nanotesla */
+  double down;        /**< component downwards, nanotesla */
+  double horizontal;  /**< horizontal intensity, nanotesla */
+  double total;       /**< total intensity, nanotesla */
+  double declination; /**< degrees, east of true north positive */
+  double inclination; /**< degrees, downwards positive */
 };
 
 /** The field at a point, and how it changes. */
@@ -49,19 +51,20 @@ class TW_SYSTEMS_API MagneticModel {
    */
   MagneticModel(std::string_view name, double year);
 
-  const std::string& name() const;
-  double year() const;
-  double first_year() const; /**< the first year for which the model is published */
-  double last_year() const;  /**< the last one; the model may reach a few years further */
+  const std::string& name() const; /**< its name in the store */
+  double year() const;             /**< the decimal year that was asked for */
+  double first_year() const;       /**< the first year for which the model is published */
+  double last_year() const;        /**< the last one; the model may reach a few years further */
 
   /**
    * @param count  number of points
    * @param in     longitude, latitude in degrees on WGS 84, height in metres above the ellipsoid
-   * @param out    count results; not-a-numbers for a point that fails
+   * @param out    count results; NaN for a point that fails
+   * @param run    words and threads
    */
   Summary field(std::size_t count, Coordinates<const double> in, MagneticValue* out,
                 Run run = {}) const noexcept;
-  MagneticValue field(Point point) const noexcept;
+  MagneticValue field(Point point) const noexcept; /**< One point; NaN where it fails. */
 
   /** Names of the models of the store. */
   static std::vector<std::string> models();

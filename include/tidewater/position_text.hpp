@@ -30,6 +30,7 @@ struct ParsedAngle {
   Axis axis = Axis::unknown; /**< by its letter, else as it was asked for */
   std::string reason = {};   /**< a sentence; empty when the angle was read */
 
+  /** There is no reason why not. */
   explicit operator bool() const { return reason.empty(); }
 };
 
@@ -69,17 +70,18 @@ enum class Order {
 struct ParsedPosition {
   double longitude = std::numeric_limits<double>::quiet_NaN(); /**< degrees, east positive */
   double latitude = std::numeric_limits<double>::quiet_NaN();  /**< degrees, north positive */
-  double height = std::numeric_limits<double>::quiet_NaN(); /**< metres; not-a-number without one */
+  double height = std::numeric_limits<double>::quiet_NaN();    /**< metres; NaN without one */
   std::string reason = {}; /**< a sentence; empty when the position was read */
 
+  /** There is no reason why not. */
   explicit operator bool() const { return reason.empty(); }
 };
 
 /**
  * Reads a position: two angles as parse_angle() takes them, and perhaps a height in metres.
  *
- * The angles are parted by a comma, a semicolon, a tab or a slash, by their letters, signs, degree
- * signs or colons, or by blanks where that leaves no doubt:
+ * The angles are separated by a comma, a semicolon, a tab or a slash, by their letters, signs,
+ * degree signs or colons, or by blanks where that leaves no doubt:
  *
  *     48°51'24"N 2°21'03"E   N48 51.4, E2 21.05, 35 m   2.35 48.85   +48.8577+002.2950/
  *
@@ -112,7 +114,7 @@ enum class AngleMarks {
 
 /** How an angle is written. */
 struct AngleFormat {
-  AngleForm form = AngleForm::degrees;
+  AngleForm form = AngleForm::degrees; /**< how it is divided */
   AngleMarks marks = AngleMarks::none; /**< colons where the form has parts and none is asked */
   int precision = 8; /**< decimals of the last part, 0 to 15; in minutes and seconds at most 9 */
   Axis axis = Axis::unknown; /**< letter N, S, E, W behind; unknown: a sign in front */
@@ -126,6 +128,7 @@ inline constexpr std::size_t kAngleTextSize = 64;
  *
  * @param degrees  east and north positive; "nan" is written for what is not finite or beyond a
  *                 million degrees
+ * @param format   how it is written
  * @param out      kAngleTextSize bytes; no terminator is written
  * @return the number of bytes written
  */
@@ -147,6 +150,7 @@ struct GridPosition {
   double square = 0;
   std::string reason = {}; /**< a sentence; empty when there is a position */
 
+  /** There is no reason why not. */
   explicit operator bool() const { return reason.empty(); }
 };
 

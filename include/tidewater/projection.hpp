@@ -56,12 +56,12 @@ class TW_SYSTEMS_API Projection {
   int method_code() const;
   /** The parameters by the registry's names; degrees, metres. */
   std::vector<std::pair<std::string, double>> parameters() const;
-  Ellipsoid ellipsoid() const;
+  Ellipsoid ellipsoid() const; /**< what is projected */
 
   /**
    * Longitude, latitude in degrees to easting, northing in metres.
    *
-   * A point that has no image becomes not-a-number and leaves its word; points do not disturb each
+   * A point that has no image becomes NaN and leaves its word; points do not disturb each
    * other.  Never throws.  In place is safe where in and out are the same view.
    */
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
@@ -69,17 +69,20 @@ class TW_SYSTEMS_API Projection {
   /** Easting, northing in metres to longitude, latitude in degrees; otherwise as forward(). */
   Summary inverse(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
-  Point forward(Point point) const noexcept;
-  Point inverse(Point point) const noexcept;
+  Point forward(Point point) const noexcept; /**< One point; NaN where it fails. */
+  Point inverse(Point point) const noexcept; /**< One point; NaN where it fails. */
 
   /**
    * Distortion at points given as longitude, latitude in degrees, by central differences of the
    * forward formula to the sixth order: 1e-9 of a scale away from the map's edges.
-   * @param out  count results; not-a-numbers where a point or its neighbourhood has no image
+   * @param count  number of points
+   * @param in     longitude, latitude in degrees
+   * @param out    count results; NaN where a point or its neighbourhood has no image
+   * @param run    words and threads
    */
   Summary factors(std::size_t count, Coordinates<const double> in, Factors* out,
                   Run run = {}) const noexcept;
-  Factors factors(Point point) const noexcept;
+  Factors factors(Point point) const noexcept; /**< One point; NaN where it fails. */
 
   /** The names of all methods, in the registry's words where it has them. */
   static std::vector<std::string> methods();

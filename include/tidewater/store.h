@@ -11,16 +11,17 @@
  *
  * There is one current store, from an open to the next close; in libtabdll one for each thread.
  *
- * In libtabdll counts, walks and searches are views of the same rows, which are read and checked as a
- * whole when a file is first opened.  They are kept for later openings, from any thread, while the
- * file's device, inode, size and times are those that were read; an open store stays as it was read
- * whatever becomes of the file.
+ * In libtabdll counts, walks and searches are views of the same rows, which are read and checked as
+ * a whole when a file is first opened.  They are kept for later openings, from any thread, while
+ * the file's device, inode, size and times are those that were read; an open store stays as it was
+ * read whatever becomes of the file.
  */
 #ifndef TIDEWATER_STORE_H
 #define TIDEWATER_STORE_H
 
 #include <stdint.h>
 
+/** Marks what a store exports. */
 #if defined(TIDEWATER_STATIC)
 #define TW_STORE_API
 #elif defined(_WIN32)

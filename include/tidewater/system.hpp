@@ -25,15 +25,18 @@ class SystemImpl;
 
 /** An area on the Earth in degrees; west is greater than east across the 180th meridian. */
 struct Area {
-  std::string name; /**< empty when unknown */
-  double west = -180, south = -90, east = 180, north = 90;
+  std::string name;   /**< empty when unknown */
+  double west = -180; /**< western limit */
+  double south = -90; /**< southern limit */
+  double east = 180;  /**< eastern limit */
+  double north = 90;  /**< northern limit */
 };
 
 /** What a search found. */
 struct FoundSystem {
   int code;         /**< registry code */
   std::string name; /**< the registry's name */
-  SystemKind kind;
+  SystemKind kind;  /**< what its coordinates are */
 };
 
 /**
@@ -47,7 +50,9 @@ class TW_SYSTEMS_API System {
    * From what users have:
    * - a registry code: "EPSG:2154", "2154"; a compound "EPSG:7405", or two codes "EPSG:2154+5720";
    * - a short name: "wgs84", "web mercator", "utm:30N", "ups:N", "spcs83:2900", "spcs27:0401",
-   *   "geocentric:wgs84"; "utm:30N ED50" on another system's datum;
+   *   "geocentric:wgs84"; "utm:30N ED50" on another system's datum; "mgrs:31U", "mgrs:31UDQ4811"
+   *   for the zone that a reference of the military grid stands in (references themselves are text:
+   *   parse_mgrs() and format_mgrs() of position_text.hpp);
    * - a registry name that only one system bears: "RGF93 v1 / Lambert-93";
    * - a definition: "lambert conformal lat1=44 lat2=49 lat0=46.5 lon0=3 x0=700000 y0=6600000
    *   ellps=GRS80" (degrees and metres; ellps, datum or a and rf; pm, units, axes);
@@ -57,19 +62,20 @@ class TW_SYSTEMS_API System {
   explicit System(std::string_view text);
 
   /**
-   * The same, where the zone of "utm" or "ups" is found from a point.
+   * The same, where the zone of "utm", "ups" or "mgrs" (either of them) is found from a point.
+   * @param text                "utm", "ups", "mgrs", or whatever the other constructor takes
    * @param longitude,latitude  degrees
    */
   System(std::string_view text, double longitude, double latitude);
 
-  std::string name() const;
-  int code() const; /**< registry code, 0 without one */
-  SystemKind kind() const;
-  Ellipsoid ellipsoid() const;
-  std::string datum() const; /**< name of the datum */
-  PrimeMeridian meridian() const;
-  std::string unit() const;   /**< name of the unit of the horizontal axes */
-  double unit_factor() const; /**< metres or radians in one unit of the horizontal axes */
+  std::string name() const;       /**< the registry's, or the one it was given */
+  int code() const;               /**< registry code, 0 without one */
+  SystemKind kind() const;        /**< what its coordinates are */
+  Ellipsoid ellipsoid() const;    /**< that of its datum */
+  std::string datum() const;      /**< name of the datum */
+  PrimeMeridian meridian() const; /**< from which its longitudes count */
+  std::string unit() const;       /**< name of the unit of the horizontal axes */
+  double unit_factor() const;     /**< metres or radians in one unit of the horizontal axes */
   /** The axes in the definition's own order: letters E N W S U, or "XYZ". */
   std::string axes() const;
   std::string method() const; /**< projection method; empty if there is none */
@@ -79,6 +85,7 @@ class TW_SYSTEMS_API System {
   /** Projection of a projected system, without its unit. */
   std::optional<Projection> projection() const;
 
+  /** As a PROJ string, as far as that can say it. */
   std::string to_proj() const;
   std::string to_wkt() const;                         /**< WKT 2 */
   std::string to_wkt(std::string_view dialect) const; /**< "wkt1", "esri" or "wkt2" */
@@ -87,6 +94,7 @@ class TW_SYSTEMS_API System {
 
   /**
    * Systems whose names have these words, without regard to case and accents.
+   * @param words  separated by blanks; each must occur
    * @param limit  how many at most
    */
   static std::vector<FoundSystem> search(std::string_view words, std::size_t limit = 20);

@@ -18,6 +18,7 @@
 #include <stdint.h>
 
 #include "tidewater/frame.h"
+#include "tidewater/version.h"
 
 #if defined(TIDEWATER_STATIC) || defined(TIDEWATER_SYSTEMS_STATIC)
 #define TW_SYSTEMS_C_API
@@ -38,7 +39,7 @@ extern "C" {
 /** @name Help
  *  @{ */
 
-/** The version of the library, "0.1.0". */
+/** The version of the library that is loaded, as TIDEWATER_VERSION is that of the headers. */
 TW_SYSTEMS_C_API const char* tw_version(void);
 
 /** What a status word says, in a sentence; never null, and the text stays. */
@@ -52,6 +53,7 @@ TW_SYSTEMS_C_API const char* tw_last_error(void);
 /** @name Coordinate systems
  *  @{ */
 
+/** A coordinate system, a System. */
 typedef struct tw_system tw_system;
 
 /** What a system's coordinates are. */
@@ -72,28 +74,39 @@ TW_SYSTEMS_C_API tw_system* tw_system_create(const char* text);
 /** The same, where the zone of "utm" or "ups" is found from a point in degrees. */
 TW_SYSTEMS_C_API tw_system* tw_system_create_at(const char* text, double longitude,
                                                 double latitude);
+/** Takes a system back. */
 TW_SYSTEMS_C_API void tw_system_destroy(tw_system* system);
 
 TW_SYSTEMS_C_API int32_t tw_system_code(const tw_system* system); /**< 0 without one */
+/** What its coordinates are. */
 TW_SYSTEMS_C_API tw_kind tw_system_kind(const tw_system* system);
 /** Metres or radians in one unit of the horizontal axes. */
 TW_SYSTEMS_C_API double tw_system_unit_factor(const tw_system* system);
+/** Its name. */
 TW_SYSTEMS_C_API size_t tw_system_name(const tw_system* system, char* text, size_t size);
+/** The name of its datum. */
 TW_SYSTEMS_C_API size_t tw_system_datum(const tw_system* system, char* text, size_t size);
+/** The name of its projection method; empty without one. */
 TW_SYSTEMS_C_API size_t tw_system_method(const tw_system* system, char* text, size_t size);
+/** The name of the unit of its horizontal axes. */
 TW_SYSTEMS_C_API size_t tw_system_unit(const tw_system* system, char* text, size_t size);
+/** Its axes in their own order: letters E N W S U, or "XYZ". */
 TW_SYSTEMS_C_API size_t tw_system_axes(const tw_system* system, char* text, size_t size);
 /** All of the system in words, a line each. */
 TW_SYSTEMS_C_API size_t tw_system_describe(const tw_system* system, char* text, size_t size);
 /**
  * The system as another text.
- * @param form  "wkt2", "wkt1", "esri" or "proj"
+ * @param system  the system
+ * @param form    "wkt2", "wkt1", "esri" or "proj"
+ * @param text    size places, or null
+ * @param size    of the buffer
  * @return the length; 0 with the reason in tw_last_error() where there is no such form of it
  */
 TW_SYSTEMS_C_API size_t tw_system_text(const tw_system* system, const char* form, char* text,
                                        size_t size);
 /**
  * The area of use.
+ * @param system  the system
  * @param bounds  west, south, east, north in degrees; west is greater than east across the 180th
  *                meridian
  * @return 0 where the area is not known, and bounds are the whole Earth's
@@ -102,7 +115,9 @@ TW_SYSTEMS_C_API int32_t tw_system_area(const tw_system* system, double bounds[4
 
 /**
  * Systems whose names have these words, without regard to case and accents.
+ * @param words  separated by blanks; each must occur
  * @param codes  limit places; names are those of tw_system_create("EPSG:code")
+ * @param limit  how many at most
  * @return how many codes were written
  */
 TW_SYSTEMS_C_API size_t tw_system_search(const char* words, int32_t* codes, size_t limit);
@@ -111,12 +126,13 @@ TW_SYSTEMS_C_API size_t tw_system_search(const char* words, int32_t* codes, size
 /** @name Transformations
  *  @{ */
 
+/** A Transformation. */
 typedef struct tw_transformation tw_transformation;
 
 /** What a transformation is asked beyond its two systems; all zero is what is usual. */
 typedef struct tw_transformation_options {
   const char* operation;    /**< as TransformationOptions::operation; null: the best */
-  const char* grid_folders; /**< folders parted by line feeds, or null */
+  const char* grid_folders; /**< folders separated by line feeds, or null */
   double epoch;             /**< decimal year of the coordinates; 0: none */
   const double* area;       /**< west, south, east, north in degrees of the points, or null */
   int32_t radians;          /**< not 0: geographic coordinates in radians */
@@ -124,11 +140,14 @@ typedef struct tw_transformation_options {
 } tw_transformation_options;
 
 /**
+ * @param source   where points come from
+ * @param target   where they go
  * @param options  may be null
  * @return null where no datum operation is known or can be used
  */
 TW_SYSTEMS_C_API tw_transformation* tw_transformation_create(
     const tw_system* source, const tw_system* target, const tw_transformation_options* options);
+/** Takes a transformation back. */
 TW_SYSTEMS_C_API void tw_transformation_destroy(tw_transformation* transformation);
 
 /** Where an array's points stand. */
@@ -149,10 +168,11 @@ typedef struct tw_points_f {
 
 /**
  * Points of the source to points of the target, or back.
+ * @param transformation  the way
  * @param inverse  0: forward; 1: from the target to the source
  * @param count    number of points
  * @param in       not changed, unless it is out
- * @param out      may be in; a point that fails becomes not-a-number
+ * @param out      may be in; a point that fails becomes NaN
  * @param status   a word for each point, or null
  * @param threads  how many at most; 0: as many as there are cores
  * @return how many points failed
@@ -160,6 +180,7 @@ typedef struct tw_points_f {
 TW_SYSTEMS_C_API size_t tw_transform(const tw_transformation* transformation, int32_t inverse,
                                      size_t count, const tw_points* in, const tw_points* out,
                                      TWstatus* status, uint32_t threads);
+/** The same in single precision. */
 TW_SYSTEMS_C_API size_t tw_transform_f(const tw_transformation* transformation, int32_t inverse,
                                        size_t count, const tw_points_f* in, const tw_points_f* out,
                                        TWstatus* status, uint32_t threads);
@@ -170,21 +191,26 @@ TW_SYSTEMS_C_API size_t tw_transformation_describe(const tw_transformation* tran
 /** The datum step, as options take it; empty without one. */
 TW_SYSTEMS_C_API size_t tw_transformation_operation(const tw_transformation* transformation,
                                                     char* text, size_t size);
-/** Stated accuracy of the datum step in metres: 0 without one, not-a-number when unknown. */
+/** Stated accuracy of the datum step in metres: 0 without one, NaN when unknown. */
 TW_SYSTEMS_C_API double tw_transformation_accuracy(const tw_transformation* transformation);
 
 /** An operation that could serve between two systems. */
 typedef struct tw_candidates tw_candidates;
+/** All operations that could serve, best first; options may be null. */
 TW_SYSTEMS_C_API tw_candidates* tw_candidates_create(const tw_system* source,
                                                      const tw_system* target,
                                                      const tw_transformation_options* options);
+/** Takes a list back. */
 TW_SYSTEMS_C_API void tw_candidates_destroy(tw_candidates* candidates);
+/** How many there are. */
 TW_SYSTEMS_C_API size_t tw_candidates_count(const tw_candidates* candidates);
 /** Steps as options take them, for number i from 0; the others likewise. */
 TW_SYSTEMS_C_API size_t tw_candidate_operation(const tw_candidates* candidates, size_t i,
                                                char* text, size_t size);
+/** The names of its steps in the registry. */
 TW_SYSTEMS_C_API size_t tw_candidate_name(const tw_candidates* candidates, size_t i, char* text,
                                           size_t size);
+/** Stated accuracy in metres; NaN when unknown. */
 TW_SYSTEMS_C_API double tw_candidate_accuracy(const tw_candidates* candidates, size_t i);
 /** What hinders its use; empty where nothing does. */
 TW_SYSTEMS_C_API size_t tw_candidate_missing(const tw_candidates* candidates, size_t i, char* text,
@@ -194,10 +220,13 @@ TW_SYSTEMS_C_API size_t tw_candidate_missing(const tw_candidates* candidates, si
 /** @name Projections
  *  @{ */
 
+/** A Projection. */
 typedef struct tw_projection tw_projection;
 
 /**
  * A projection by method and named parameters, as Projection takes them; degrees, metres.
+ * @param method              the method, as Projection takes it
+ * @param count               number of parameters
  * @param names               count names of parameters
  * @param values              count values
  * @param a                   semi-major axis, metres
@@ -208,6 +237,7 @@ TW_SYSTEMS_C_API tw_projection* tw_projection_create(const char* method, size_t 
                                                      double a, double inverse_flattening);
 /** The projection of a projected system, without its unit; null for other systems. */
 TW_SYSTEMS_C_API tw_projection* tw_projection_of(const tw_system* system);
+/** Takes a projection back. */
 TW_SYSTEMS_C_API void tw_projection_destroy(tw_projection* projection);
 
 /** Degrees to metres, or back; as tw_transform(). */
@@ -230,6 +260,7 @@ TW_SYSTEMS_C_API size_t tw_project_factors(const tw_projection* projection, size
 
 /** Number of methods, and the name of number i from 0. */
 TW_SYSTEMS_C_API size_t tw_projection_method_count(void);
+/** The name of method i from 0. */
 TW_SYSTEMS_C_API size_t tw_projection_method(size_t i, char* text, size_t size);
 /** @} */
 
@@ -238,6 +269,7 @@ TW_SYSTEMS_C_API size_t tw_projection_method(size_t i, char* text, size_t size);
 
 /**
  * Reads an angle as parse_angle() does.
+ * @param text           UTF-8
  * @param axis           0: longitude or latitude, 1: longitude, 2: latitude
  * @param decimal_comma  not 0: the comma is a decimal mark
  * @param degrees        the angle, east and north positive; unwritten on failure
@@ -247,8 +279,10 @@ TW_SYSTEMS_C_API int32_t tw_parse_angle(const char* text, int32_t axis, int32_t 
                                         double* degrees);
 /**
  * Reads a position as parse_position() does.
+ * @param text           UTF-8
+ * @param decimal_comma  not 0: the comma is a decimal mark
  * @param order     0: refused where the text does not tell, 1: longitude first, 2: latitude first
- * @param position  longitude, latitude in degrees, height in metres (not-a-number without one);
+ * @param position  longitude, latitude in degrees, height in metres (NaN without one);
  *                  unwritten on failure
  * @return 1, or 0 with the reason in tw_last_error()
  */
@@ -256,13 +290,17 @@ TW_SYSTEMS_C_API int32_t tw_parse_position(const char* text, int32_t order, int3
                                            double position[3]);
 /**
  * The point of a military grid reference, the centre of its square.
+ * @param text      the reference, UTF-8
  * @param position  longitude, latitude in degrees on WGS 84; unwritten on failure
  * @return 1, or 0 with the reason in tw_last_error()
  */
 TW_SYSTEMS_C_API int32_t tw_parse_mgrs(const char* text, double position[2]);
 /**
  * The military grid reference of the square that holds a point.
+ * @param longitude,latitude  degrees on WGS 84
  * @param digits  0 to 11 of easting and northing each
+ * @param text    size places, or null
+ * @param size    of the buffer
  * @return the length; 0 where the point has none
  */
 TW_SYSTEMS_C_API size_t tw_format_mgrs(double longitude, double latitude, int32_t digits,
@@ -274,6 +312,7 @@ TW_SYSTEMS_C_API size_t tw_format_mgrs(double longitude, double latitude, int32_
  *  Degrees, and lengths in the unit of a.  What is not wanted may be null.
  *  @{ */
 
+/** A Geodesic or a Rhumb. */
 typedef struct tw_lines tw_lines;
 
 /**
@@ -282,6 +321,7 @@ typedef struct tw_lines tw_lines;
  * @param f      flattening, from -0.02 to 0.02
  */
 TW_SYSTEMS_C_API tw_lines* tw_lines_create(int32_t rhumb, double a, double f);
+/** Takes lines back. */
 TW_SYSTEMS_C_API void tw_lines_destroy(tw_lines* lines);
 /** Where lines lead; how many have no end. */
 TW_SYSTEMS_C_API size_t tw_lines_direct(const tw_lines* lines, size_t count, const double* lon,
@@ -300,11 +340,18 @@ TW_SYSTEMS_C_API void tw_lines_polygon(const tw_lines* lines, size_t count, cons
 /** @name The Earth's magnetic field
  *  @{ */
 
+/** A MagneticModel. */
 typedef struct tw_magnetic_model tw_magnetic_model;
 
-/** @param name  the model's name in the store; null or empty for the newest */
+/**
+ * @param name  the model's name in the store; null or empty for the newest
+ * @param year  decimal year
+ * @return null where the store has no such model, or the model no field at that date
+ */
 TW_SYSTEMS_C_API tw_magnetic_model* tw_magnetic_model_create(const char* name, double year);
+/** Takes a model back. */
 TW_SYSTEMS_C_API void tw_magnetic_model_destroy(tw_magnetic_model* model);
+/** Its name in the store. */
 TW_SYSTEMS_C_API size_t tw_magnetic_model_name(const tw_magnetic_model* model, char* text,
                                                size_t size);
 

@@ -26,7 +26,8 @@ struct TransformationOptions {
    * several follow each other, "EPSG:1234 EPSG:5678"; "grid:ntf_r93.gsb" a grid file of the
    * caller's, from the source's datum to the target's ("-grid:..." the other way round);
    * "geoid:egm96_15.gtx" undulations of the caller's between a compound system's heights and the
-   * ellipsoid of its datum; "no shift" leaves datum and heights unchanged.
+   * ellipsoid of its datum; "offset:file.gtx" offsets that are added to heights of the source to
+   * give those of the target; "no shift" leaves datum and heights unchanged.
    */
   std::string operation;
   /** Folders in which grids are looked for, before the usual ones. */
@@ -45,7 +46,7 @@ struct TransformationOptions {
 struct Candidate {
   std::string steps;   /**< as TransformationOptions::operation takes them */
   std::string name;    /**< the registry's names */
-  double accuracy;     /**< metres; not-a-number when unknown */
+  double accuracy;     /**< metres; NaN when unknown */
   Area area;           /**< where it holds */
   std::string missing; /**< grids that were not found; empty when it can be used */
 };
@@ -78,35 +79,40 @@ class TW_SYSTEMS_API Transformation {
   /**
    * Points of the source to points of the target.
    *
-   * A point that fails becomes not-a-number in all its axes and leaves its word; points do not
+   * A point that fails becomes NaN in all its axes and leaves its word; points do not
    * disturb each other.  In and out may be the same view.  Never throws.
    */
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to single. */
   Summary forward(std::size_t count, Coordinates<const float> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to double. */
   Summary forward(std::size_t count, Coordinates<const float> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from double precision to single. */
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
   /** Points of the target to points of the source; otherwise as forward(). */
   Summary inverse(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to single. */
   Summary inverse(std::size_t count, Coordinates<const float> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
+  /** The same, from single precision to double. */
   Summary inverse(std::size_t count, Coordinates<const float> in, Coordinates<double> out,
                   Run run = {}) const noexcept;
+  /** The same, from double precision to single. */
   Summary inverse(std::size_t count, Coordinates<const double> in, Coordinates<float> out,
                   Run run = {}) const noexcept;
-  /** One point; not-a-numbers where it fails. */
-  Point forward(Point point) const noexcept;
-  Point inverse(Point point) const noexcept;
+  Point forward(Point point) const noexcept; /**< One point; NaN where it fails. */
+  Point inverse(Point point) const noexcept; /**< One point; NaN where it fails. */
 
-  const System& source() const;
-  const System& target() const;
+  const System& source() const; /**< the system it leads from */
+  const System& target() const; /**< the system it leads to */
   /** The steps in words, a line each, with the operation taken and its accuracy. */
   std::string describe() const;
-  /** Stated accuracy of the datum step in metres: 0 without one, not-a-number when unknown. */
+  /** Stated accuracy of the datum step in metres: 0 without one, NaN when unknown. */
   double accuracy() const;
   /** The datum step as TransformationOptions::operation takes it; empty without one. */
   std::string operation() const;

@@ -395,6 +395,21 @@ void define_grids(py::module_& m) {
       });
 }
 
+// The package's named tuple of a line, made as a plain tuple is: its own maker takes longer than
+// the line itself.  The type is kept for as long as the interpreter lives.
+template <class... Numbers>
+py::object named(PyTypeObject* type, Numbers... values) {
+  auto made = py::reinterpret_steal<py::object>(type->tp_alloc(type, sizeof...(values)));
+  if (!made) throw py::error_already_set();
+  Py_ssize_t i = 0;
+  (PyTuple_SET_ITEM(made.ptr(), i++, py::float_(values).release().ptr()), ...);
+  return made;
+}
+PyTypeObject* tuple_type(const char* name) {
+  return reinterpret_cast<PyTypeObject*>(
+      py::module_::import("tidewater._lines").attr(name).release().ptr());
+}
+
 template <class Lines>
 void define_lines(py::module_& m, const char* name) {
   py::class_<Lines>(m, name)
@@ -405,7 +420,8 @@ void define_lines(py::module_& m, const char* name) {
           "inverse",
           [](const Lines& lines, double lon1, double lat1, double lon2, double lat2) {
             const LineCourse course = lines.inverse(lon1, lat1, lon2, lat2);
-            return numbers(course.length, course.azimuth1, course.azimuth2);
+            static PyTypeObject* const type = tuple_type("Course");
+            return named(type, course.length, course.azimuth1, course.azimuth2);
           },
           py::arg("lon1").noconvert(), py::arg("lat1").noconvert(), py::arg("lon2").noconvert(),
           py::arg("lat2").noconvert())
@@ -414,7 +430,8 @@ void define_lines(py::module_& m, const char* name) {
           "direct",
           [](const Lines& lines, double lon, double lat, double azimuth, double length) {
             const LineEnd end = lines.direct(lon, lat, azimuth, length);
-            return numbers(end.lon, end.lat, end.azimuth);
+            static PyTypeObject* const type = tuple_type("End");
+            return named(type, end.lon, end.lat, end.azimuth);
           },
           py::arg("lon").noconvert(), py::arg("lat").noconvert(), py::arg("azimuth").noconvert(),
           py::arg("length").noconvert())

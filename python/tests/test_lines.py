@@ -36,6 +36,17 @@ def test_there_and_back(lon, lat, azimuth, length):
     assert GEODESIC.inverse(lon, lat, lon2, lat2)[0] == pytest.approx(length, abs=1e-7)
 
 
+def test_results_have_names_whatever_the_arguments_are():
+    for kind in (float, np.float64, np.array):
+        there = [kind(value) for value in (-4.0, 48.0, 2.0, 49.0)]
+        course = GEODESIC.inverse(*there)
+        assert course.length == pytest.approx(456_300, abs=1500)  # 442.5 km east, 111.2 km north
+        end = GEODESIC.direct(there[0], there[1], course.azimuth1, course.length)
+        assert (end.lon, end.lat) == pytest.approx((2, 49), abs=1e-9)
+        assert end.azimuth == pytest.approx(course.azimuth2, abs=1e-9)
+    assert type(course) is type(GEODESIC.inverse(-4.0, 48.0, 2.0, 49.0))
+
+
 @given(LATITUDES, LATITUDES)
 def test_rhumb_along_a_meridian_is_the_geodesic(lat1, lat2):
     there = Rhumb().inverse(7.0, lat1, 7.0, lat2)

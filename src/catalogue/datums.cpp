@@ -1,7 +1,7 @@
 // Datum models in the parameter store.
 
 #include "catalogue/class_table.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_datums.h"
 
 using namespace tidewater::detail;
 

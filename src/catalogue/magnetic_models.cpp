@@ -1,7 +1,7 @@
 // Geomagnetic models in the parameter store: the models, their epochs and their coefficients.
 
 #include "catalogue/session.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_magnetic_models.h"
 
 using namespace tidewater::detail;
 

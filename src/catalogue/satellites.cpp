@@ -2,7 +2,7 @@
 
 #include "catalogue/session.hpp"
 #include "formulas/constants.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_satellites.h"
 
 using namespace tidewater::detail;
 

@@ -1,7 +1,7 @@
 // Coordinate systems in the parameter store.
 
 #include "catalogue/class_table.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_systems.h"
 
 using namespace tidewater::detail;
 

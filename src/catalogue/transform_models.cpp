@@ -1,7 +1,8 @@
 // Multiple-regression and complex polynomial models in the parameter store.
 
 #include "catalogue/session.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_transform_models.h"
+#include "tidewater/regression.h"
 
 using namespace tidewater::detail;
 

@@ -1,7 +1,7 @@
 // Undulation models in the parameter store.
 
 #include "catalogue/session.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_undulations.h"
 
 using namespace tidewater::detail;
 

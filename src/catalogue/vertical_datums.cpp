@@ -1,7 +1,7 @@
 // Vertical datums in the parameter store.
 
 #include "catalogue/session.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_vertical_datums.h"
 
 using namespace tidewater::detail;
 

@@ -1,7 +1,7 @@
 // Names and numbers of the state plane zones in the parameter store.
 
 #include "catalogue/session.hpp"
-#include "tidewater/catalogue.h"
+#include "tidewater/catalogue_zones.h"
 
 using namespace tidewater::detail;
 

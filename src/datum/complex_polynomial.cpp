@@ -4,8 +4,8 @@
 #include "datum/complex_polynomial_points.hpp"
 
 #include <cmath>
-
-#include "tidewater/datum.h"
+#include "points/portable.hpp"
+#include "tidewater/complex_polynomial.h"
 
 using namespace tidewater::detail;
 
@@ -18,7 +18,7 @@ struct Conformal2 {
 };
 
 Conformal2 conformal2(double a0, double a1, double a2, double b0, double b1, double b2) {
-  const int32_t order = std::hypot(a2, b2) < 1e-12 ? 1 : 2;
+  const int32_t order = portable::hypot(a2, b2) < 1e-12 ? 1 : 2;
   return {order, {b0, a0, a1, -b1, -b2, -a2}};
 }
 

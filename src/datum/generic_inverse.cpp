@@ -4,7 +4,8 @@
 #include <cmath>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "points/portable.hpp"
+#include "tidewater/generic_inverse.h"
 
 using namespace tidewater::detail;
 
@@ -58,25 +59,25 @@ class Walk {
       const double dy = y - f.y;
       if (std::fabs(dx) < kTolerance && std::fabs(dy) < kTolerance) break;
       double d = std::sqrt(dy * dy + dx * dx);
-      double angle = std::atan2(dy, dx);
-      const double u = std::cos(estimate_.lat) * (estimate_.lon - previous.lon);
+      double angle = portable::atan2(dy, dx);
+      const double u = portable::cos(estimate_.lat) * (estimate_.lon - previous.lon);
       const double v = estimate_.lat - previous.lat;
       if (std::fabs(u) < kTolerance && std::fabs(v) < kTolerance) break;
-      angle += std::atan2(v, u);
+      angle += portable::atan2(v, u);
       const double ex = f.x - p.x;
       const double ey = f.y - p.y;
       if (!(ex == 0 && ey == 0)) {
-        angle -= std::atan2(ey, ex);
+        angle -= portable::atan2(ey, ex);
         scale = std::sqrt(u * u + v * v) / std::sqrt(ex * ex + ey * ey);
       }
       previous = estimate_;
       p = f;
       d *= scale;
       if (d > kPi) d = kPi;
-      const double du = std::cos(angle) * d;
-      const double cos_lat = std::cos(estimate_.lat);
+      const double du = portable::cos(angle) * d;
+      const double cos_lat = portable::cos(estimate_.lat);
       if (std::fabs(du) < kPi * cos_lat) estimate_.lon += du / cos_lat;
-      estimate_.lat += std::sin(angle) * d;
+      estimate_.lat += portable::sin(angle) * d;
       fold_over_poles(estimate_);
       wrap_together(estimate_, previous);
     }

@@ -6,14 +6,13 @@
 #include <cstring>
 #include <limits>
 #include <memory>
-#include <new>
 #include <optional>
 
 #include "datum/grid_file.hpp"
 #include "datum/grid_window.hpp"
 #include "formulas/interpolation.hpp"
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/geoid.h"
 
 using namespace tidewater::detail;
 
@@ -123,9 +122,9 @@ void decode_nodes(const unsigned char* first, std::int64_t record, int32_t nr, i
 
 TWstatus read_window(std::FILE* file, const WindowPlace& place, const GeoidWindow& w, float* data) {
   if (!may_hold(file, place.offset + place.size)) return TW_GEOID_READ_ERROR;
-  const auto size = static_cast<std::size_t>(place.size);
-  const std::unique_ptr<unsigned char[]> buffer(new (std::nothrow) unsigned char[size]);
+  const std::unique_ptr<unsigned char[]> buffer = make_buffer(place.size);
   if (!buffer) return TW_NO_MEMORY;
+  const auto size = static_cast<std::size_t>(place.size);
   if (!seek_to(file, place.offset) || !read_exactly(file, buffer.get(), size)) {
     return TW_GEOID_READ_ERROR;
   }

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <limits>
 #include <new>
 #include <string_view>
 #include <utility>
@@ -96,6 +97,12 @@ bool read_exactly(std::FILE* file, void* bytes, std::size_t count) {
   return std::fread(bytes, 1, count, file) == count;
 }
 
+std::unique_ptr<unsigned char[]> make_buffer(std::int64_t size) {
+  if (size < 0 || size > std::numeric_limits<std::ptrdiff_t>::max()) return nullptr;
+  return std::unique_ptr<unsigned char[]>(
+      new (std::nothrow) unsigned char[static_cast<std::size_t>(size)]);
+}
+
 void FileImage::count_load(std::FILE* file, std::int64_t* budget) {
   // A load costs a few reads, the time in which so many bytes are copied.
   constexpr std::int64_t kLoadBytes = 1 << 15;
@@ -107,8 +114,7 @@ void FileImage::count_load(std::FILE* file, std::int64_t* budget) {
   }
   const std::int64_t size = length_of(file);
   if (size <= 0 || size > *budget || size > loads_ * kLoadBytes) return;
-  std::unique_ptr<unsigned char[]> bytes(
-      new (std::nothrow) unsigned char[static_cast<std::size_t>(size)]);
+  std::unique_ptr<unsigned char[]> bytes = make_buffer(size);
   if (!bytes || !seek_to(file, 0) ||
       !read_exactly(file, bytes.get(), static_cast<std::size_t>(size)))
     return;

@@ -1,9 +1,9 @@
 // Standard Molodensky shift: the way through geocentric space near the poles, and the exported
 // functions.
 
+#include "tidewater/molodensky.h"
 #include "datum/molodensky_points.hpp"
-#include "tidewater/datum.h"
-#include "tidewater/foundation.h"
+#include "tidewater/geocentric.h"
 
 using namespace tidewater::detail;
 

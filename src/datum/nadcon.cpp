@@ -1,18 +1,19 @@
 // NADCON shifts: bilinear interpolation in a window of 4 by 4 nodes that is read from the grid
 // files when a point leaves it.
+// W. T. Dewhurst, NADCON: The Application of Minimum Curvature-Derived Surfaces in the
+// Transformation of Positional Data, NOAA Technical Memorandum NOS NGS-50 (1990).
 
 #include <algorithm>
 #include <cmath>
 #include <limits>
 #include <memory>
-#include <new>
 #include <optional>
 
 #include "datum/grid_file.hpp"
 #include "datum/grid_window.hpp"
 #include "formulas/interpolation.hpp"
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/nadcon.h"
 
 using namespace tidewater::detail;
 
@@ -67,9 +68,9 @@ TWstatus read_tables(std::FILE* los, std::FILE* las, int32_t nc, std::int64_t ix
   const std::int64_t offset = iy * record;
   const std::int64_t end = offset + kSide * record;
   if (!may_hold(los, end) && !may_hold(las, end)) return TW_GRID_FILE_ERROR;  // both too short
-  const auto size = static_cast<std::size_t>(kSide * record);
-  const std::unique_ptr<unsigned char[]> buffer(new (std::nothrow) unsigned char[size]);
+  const std::unique_ptr<unsigned char[]> buffer = make_buffer(kSide * record);
   if (!buffer) return TW_NO_MEMORY;
+  const auto size = static_cast<std::size_t>(kSide * record);
   if (!seek_to(los, offset) || !seek_to(las, offset)) return TW_GRID_FILE_ERROR;
   const bool lon_read = read_exactly(los, buffer.get(), size);
   if (lon_read) decode_nodes(buffer.get() + ix * 4, record, lon_table);

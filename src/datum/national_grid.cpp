@@ -1,5 +1,7 @@
 // Shifts by a national grid file of the NTv2 format: a forest of sub-grids, the deepest of which
 // serves a point, read through a block of 4 by 4 nodes.
+// D. J. Junkins and S. A. Farley, NTv2: National Transformation Version 2 Developer's Guide,
+// Geomatics Canada (1995).
 
 #include <algorithm>
 #include <array>
@@ -10,7 +12,7 @@
 
 #include "datum/grid_file.hpp"
 #include "formulas/wraps.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/national_grid.h"
 
 using namespace tidewater::detail;
 
@@ -171,6 +173,23 @@ Node decode_node(const unsigned char* p) {
   return {decode_f32(p), decode_f32(p + 4), decode_f32(p + 8), decode_f32(p + 12)};
 }
 
+// A cell between four nodes: two values on each of its sides that a shift is interpolated from.
+struct Cell {
+  int32_t grid = kNone;
+  uint8_t code = 0;
+  int64_t row = 0, col = 0;
+  struct Sides {
+    double south, south_step, north, north_step;
+
+    double at(double fx, double fy) const {
+      const double on_south = south + south_step * fx;
+      const double on_north = north + north_step * fx;
+      return on_south + (on_north - on_south) * fy;
+    }
+  };
+  Sides lon = {}, lat = {};
+};
+
 // The open file for the time of one call.
 struct Call {
   Call() = default;
@@ -195,6 +214,8 @@ struct Call {
   // that they are brought into cnt_block only when another is read or the call ends.
   const unsigned char* nodes = nullptr;
   int64_t row_bytes = 0;
+  // That of the last point: the passes of an inverse, and points in a row, mostly stay in one.
+  Cell cell;
 };
 
 // Moves the block so that it begins one node south and east of a node of a sub-grid, as far as the
@@ -257,13 +278,9 @@ bool in_block(int64_t row, int64_t col) {
   return (within(row - cnt_block_row) & within(col - cnt_block_col)) != 0;
 }
 
-Shift interpolate(const Found& found, double x, double y, Call* call) {
+// Reads the nodes of a cell, moving the block where it does not hold them.
+Cell cell_at(const Found& found, int64_t row, int64_t col, Call* call) {
   const CntSubGrid& g = cnt_subgrids[found.grid];
-  const double u = (x - g.e_long) / g.long_inc;
-  const double v = (y - g.s_lat) / g.lat_inc;
-  // The base node of the cell, from 0; on an edge it serves for the nodes beyond as well.
-  const int64_t row = whole_spacings(v);
-  const int64_t col = whole_spacings(u);
   const int64_t to_west = found.code == kInside || found.code == kNorthEdge ? 1 : 0;
   const int64_t to_north = found.code == kInside || found.code == kWestEdge ? 1 : 0;
   // By contract: at the corner the fourth node is still that of the cell, which has all the weight
@@ -291,18 +308,29 @@ Shift interpolate(const Found& found, double x, double y, Call* call) {
   const Node west = node(r, held(c + to_west));
   const Node north = node(held(r + to_north), c);
   const Node northwest = node(held(r + to_corner_row), held(c + to_corner_col));
+  const auto sides = [&](float Node::*field) {
+    const auto b = static_cast<double>(base.*field);
+    const auto n = static_cast<double>(north.*field);
+    return Cell::Sides{b, static_cast<double>(west.*field) - b, n,
+                       static_cast<double>(northwest.*field) - n};
+  };
+  return {found.grid, found.code, row, col, sides(&Node::lon_shift), sides(&Node::lat_shift)};
+}
+
+Shift interpolate(const Found& found, double x, double y, Call* call) {
+  const CntSubGrid& g = cnt_subgrids[found.grid];
+  const double u = (x - g.e_long) / g.long_inc;
+  const double v = (y - g.s_lat) / g.lat_inc;
+  // The base node of the cell, from 0; on an edge it serves for the nodes beyond as well.
+  const int64_t row = whole_spacings(v);
+  const int64_t col = whole_spacings(u);
   const double fx = u - static_cast<double>(col);
   const double fy = v - static_cast<double>(row);
-  const auto bilinear = [&](float Node::*field) {
-    const auto b = static_cast<double>(base.*field);
-    const auto w = static_cast<double>(west.*field);
-    const auto n = static_cast<double>(north.*field);
-    const auto nw = static_cast<double>(northwest.*field);
-    const double on_south = b + (w - b) * fx;
-    const double on_north = n + (nw - n) * fx;
-    return on_south + (on_north - on_south) * fy;
-  };
-  return {bilinear(&Node::lon_shift), bilinear(&Node::lat_shift)};
+  Cell& cell = call->cell;
+  if (cell.grid != found.grid || cell.row != row || cell.col != col || cell.code != found.code) {
+    cell = cell_at(found, row, col, call);
+  }
+  return {cell.lon.at(fx, fy), cell.lat.at(fx, fy)};
 }
 
 // Shift of a point in radians, with the call's word; unwritten outside all sub-grids.

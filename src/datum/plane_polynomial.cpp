@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <cmath>
 
-#include "tidewater/datum.h"
+#include "tidewater/plane_polynomial.h"
 
 using namespace tidewater::detail;
 

@@ -5,9 +5,9 @@
 
 #include <algorithm>
 #include <array>
-#include <cmath>
 
 #include "formulas/wraps.hpp"
+#include "points/portable.hpp"
 
 using namespace tidewater::detail;
 
@@ -30,7 +30,7 @@ class Powers {
   // Powers beyond the table have no place in a model; they are still answered.
   double operator[](int16_t k) const {
     return k >= 0 && k < Regression::kPowers ? power_[static_cast<std::size_t>(k)]
-                                             : std::pow(base_, k);
+                                             : portable::pow(base_, k);
   }
 
  private:

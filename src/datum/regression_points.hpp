@@ -4,7 +4,7 @@
 
 #include "formulas/constants.hpp"
 #include "points/over_points.hpp"
-#include "tidewater/datum.h"
+#include "tidewater/regression.h"
 
 namespace tidewater::detail {
 

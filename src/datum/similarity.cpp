@@ -3,7 +3,7 @@
 
 #include "datum/similarity_points.hpp"
 
-#include "tidewater/datum.h"
+#include "tidewater/similarity.h"
 
 using namespace tidewater::detail;
 

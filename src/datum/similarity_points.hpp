@@ -1,4 +1,6 @@
 // Formulas of the similarity transformations of geocentric coordinates.
+// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2: coordinate frame rotation and
+// Molodensky-Badekas.
 #pragma once
 
 #include "formulas/constants.hpp"

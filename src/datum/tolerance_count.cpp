@@ -7,9 +7,10 @@
 #include <memory>
 #include <new>
 
-#include "tidewater/datum.h"
-#include "tidewater/foundation.h"
-#include "tidewater/lines.h"
+#include "tidewater/geodesic.h"
+#include "tidewater/plane.h"
+#include "tidewater/rhumb.h"
+#include "tidewater/tolerance_count.h"
 
 namespace {
 

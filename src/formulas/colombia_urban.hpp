@@ -5,6 +5,7 @@
 #include <cmath>
 
 #include "formulas/constants.hpp"
+#include "points/portable.hpp"
 
 namespace tidewater::detail {
 
@@ -14,20 +15,20 @@ struct ColombiaUrban {
   ColombiaUrban(double semi_major, double eccentricity2, double lat_origin, double height)
       : a(semi_major), e2(eccentricity2), lat0(lat_origin), h0(height) {
     rho0 = meridional(lat0);
-    const double nu0 = transverse(std::sin(lat0));
+    const double nu0 = transverse(portable::sin(lat0));
     A = 1 + h0 / nu0;
-    B = std::tan(lat0) / (2 * rho0 * nu0);
+    B = portable::tan(lat0) / (2 * rho0 * nu0);
   }
 
   double transverse(double s) const { return a / std::sqrt(1 - e2 * s * s); }
   double meridional(double lat) const {
-    const double s = std::sin(lat);
+    const double s = portable::sin(lat);
     const double w = 1 - e2 * s * s;
     return a * (1 - e2) / (w * std::sqrt(w));
   }
 
   void forward(double lon, double lat, double* x, double* y) const {
-    const double p = transverse(std::sin(lat)) * std::cos(lat) * lon;
+    const double p = transverse(portable::sin(lat)) * portable::cos(lat) * lon;
     const double G = 1 + h0 / meridional((lat0 + lat) / 2);
     *x = A * p;
     *y = G * rho0 * ((lat - lat0) + B * p * p);
@@ -46,7 +47,7 @@ struct ColombiaUrban {
       if (rest) break;
     }
     *lat = at;
-    *lon = p / (transverse(std::sin(at)) * std::cos(at));
+    *lon = p / (transverse(portable::sin(at)) * portable::cos(at));
   }
 };
 

@@ -6,6 +6,7 @@
 #include <cmath>
 
 #include "formulas/constants.hpp"
+#include "points/portable.hpp"
 
 namespace tidewater::detail {
 
@@ -26,8 +27,8 @@ struct EqualEarth {
   }
 
   static void forward(double lon, double beta, double* x, double* y) {
-    const double t = std::asin(kHalfRoot3 * std::sin(beta));
-    *x = lon * std::cos(t) / (kHalfRoot3 * slope(t));
+    const double t = portable::asin(kHalfRoot3 * portable::sin(beta));
+    *x = lon * portable::cos(t) / (kHalfRoot3 * slope(t));
     *y = ordinate(t);
   }
 
@@ -39,10 +40,10 @@ struct EqualEarth {
       t -= step;
       if (std::fabs(step) < 1e-16) break;
     }
-    const double s = std::sin(t) / kHalfRoot3;
+    const double s = portable::sin(t) / kHalfRoot3;
     if (!(std::fabs(s) <= 1 + 1e-12)) return false;
-    *beta = std::asin(s > 1 ? 1 : s < -1 ? -1 : s);
-    *lon = x * kHalfRoot3 * slope(t) / std::cos(t);
+    *beta = portable::asin(s > 1 ? 1 : s < -1 ? -1 : s);
+    *lon = x * kHalfRoot3 * slope(t) / portable::cos(t);
     return std::fabs(*lon) <= 3.14159265358979323846 + 1e-9;
   }
 };

@@ -14,6 +14,7 @@
 #include "formulas/degrees.hpp"
 #include "formulas/geodesic_coefficients.hpp"
 #include "formulas/latitudes.hpp"
+#include "points/portable.hpp"
 
 namespace tidewater::detail {
 
@@ -510,7 +511,7 @@ struct Geodesics {
     const auto omega = sincos(given.lambda / (f1 * w));
     const auto start = spherical_start(beta1, beta2, omega);
     const double sine = plain_hypot(start.sin, start.cos);
-    const double reach = std::asin(sine) * b * w;
+    const double reach = portable::asin(sine) * b * w;
     if (sine == 0) return restored(given, 0.0, {0.0, 1.0}, {0.0, 1.0}, 0.0);
     const auto alpha1 = unit(start.sin, start.cos);
     // the azimuth at the other end, likewise (eq. 50)

@@ -1,4 +1,5 @@
 // Interpolation between nodes.
+// M. Abramowitz and I. A. Stegun, Handbook of Mathematical Functions (1964), section 25.2.
 #pragma once
 
 namespace tidewater::detail {

@@ -5,6 +5,7 @@
 #include <cmath>
 
 #include "formulas/constants.hpp"
+#include "points/portable.hpp"
 
 namespace tidewater::detail {
 
@@ -16,19 +17,20 @@ struct Krovak {
   Krovak(double a, double first_eccentricity, double lat_centre, double colatitude,
          double pseudo_parallel, double k, bool with_polynomials)
       : e(first_eccentricity),
-        n(std::sin(pseudo_parallel)),
-        sin_axis(std::sin(colatitude)),
-        cos_axis(std::cos(colatitude)),
-        parallel(std::tan(kQuarterPi + pseudo_parallel / 2)),
+        n(portable::sin(pseudo_parallel)),
+        sin_axis(portable::sin(colatitude)),
+        cos_axis(portable::cos(colatitude)),
+        parallel(portable::tan(kQuarterPi + pseudo_parallel / 2)),
         modified(with_polynomials) {
-    const double s = std::sin(lat_centre);
-    const double c2 = std::cos(lat_centre) * std::cos(lat_centre);
+    const double s = portable::sin(lat_centre);
+    const double c2 = portable::cos(lat_centre) * portable::cos(lat_centre);
     const double A = a * std::sqrt(1 - e * e) / (1 - e * e * s * s);
     B = std::sqrt(1 + e * e * c2 * c2 / (1 - e * e));
-    const double gamma0 = std::asin(s / B);
-    t0 = std::tan(kQuarterPi + gamma0 / 2) * std::pow((1 + e * s) / (1 - e * s), e * B / 2) /
-         std::pow(std::tan(kQuarterPi + lat_centre / 2), B);
-    r0 = k * A / std::tan(pseudo_parallel);
+    const double gamma0 = portable::asin(s / B);
+    t0 = portable::tan(kQuarterPi + gamma0 / 2) *
+         portable::pow((1 + e * s) / (1 - e * s), e * B / 2) /
+         portable::pow(portable::tan(kQuarterPi + lat_centre / 2), B);
+    r0 = k * A / portable::tan(pseudo_parallel);
   }
 
   struct Grid {
@@ -50,17 +52,20 @@ struct Krovak {
   }
 
   Grid forward(double lon, double lat) const {
-    const double es = e * std::sin(lat);
-    const double U = 2 * (std::atan(t0 * std::pow(std::tan(lat / 2 + kQuarterPi), B) /
-                                    std::pow((1 + es) / (1 - es), e * B / 2)) -
-                          kQuarterPi);
+    const double es = e * portable::sin(lat);
+    const double U =
+        2 * (portable::atan(t0 * portable::pow(portable::tan(lat / 2 + kQuarterPi), B) /
+                            portable::pow((1 + es) / (1 - es), e * B / 2)) -
+             kQuarterPi);
     const double V = -B * lon;
-    const double T = std::asin(cos_axis * std::sin(U) + sin_axis * std::cos(U) * std::cos(V));
-    const double D = std::atan2(std::cos(U) * std::sin(V),
-                                cos_axis * std::cos(U) * std::cos(V) - sin_axis * std::sin(U));
+    const double T = portable::asin(cos_axis * portable::sin(U) +
+                                    sin_axis * portable::cos(U) * portable::cos(V));
+    const double D = portable::atan2(
+        portable::cos(U) * portable::sin(V),
+        cos_axis * portable::cos(U) * portable::cos(V) - sin_axis * portable::sin(U));
     const double theta = n * D;
-    const double r = r0 * std::pow(parallel / std::tan(T / 2 + kQuarterPi), n);
-    Grid grid{r * std::cos(theta), r * std::sin(theta)};
+    const double r = r0 * portable::pow(parallel / portable::tan(T / 2 + kQuarterPi), n);
+    Grid grid{r * portable::cos(theta), r * portable::sin(theta)};
     if (modified) {
       const Grid d = correction(grid);
       grid.southing -= d.southing;
@@ -82,17 +87,20 @@ struct Krovak {
       }
       grid = plain;
     }
-    const double r = std::hypot(grid.southing, grid.westing);
-    const double D = std::atan2(grid.westing, grid.southing) / n;
-    const double T = 2 * (std::atan(std::pow(r0 / r, 1 / n) * parallel) - kQuarterPi);
-    const double U = std::asin(cos_axis * std::sin(T) - sin_axis * std::cos(T) * std::cos(D));
-    const double V = std::atan2(std::cos(T) * std::sin(D),
-                                sin_axis * std::sin(T) + cos_axis * std::cos(T) * std::cos(D));
-    const double u = std::pow(std::tan(U / 2 + kQuarterPi) / t0, 1 / B);
+    const double r = portable::hypot(grid.southing, grid.westing);
+    const double D = portable::atan2(grid.westing, grid.southing) / n;
+    const double T = 2 * (portable::atan(portable::pow(r0 / r, 1 / n) * parallel) - kQuarterPi);
+    const double U = portable::asin(cos_axis * portable::sin(T) -
+                                    sin_axis * portable::cos(T) * portable::cos(D));
+    const double V = portable::atan2(
+        portable::cos(T) * portable::sin(D),
+        sin_axis * portable::sin(T) + cos_axis * portable::cos(T) * portable::cos(D));
+    const double u = portable::pow(portable::tan(U / 2 + kQuarterPi) / t0, 1 / B);
     double lat = U;
     for (int i = 0; i < 30; ++i) {
-      const double es = e * std::sin(lat);
-      const double next = 2 * (std::atan(u * std::pow((1 + es) / (1 - es), e / 2)) - kQuarterPi);
+      const double es = e * portable::sin(lat);
+      const double next =
+          2 * (portable::atan(u * portable::pow((1 + es) / (1 - es), e / 2)) - kQuarterPi);
       const bool rest = std::fabs(next - lat) < 1e-16;
       lat = next;
       if (rest) break;

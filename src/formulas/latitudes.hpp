@@ -12,6 +12,7 @@
 
 #include "formulas/latitude_coefficients.hpp"
 #include "formulas/series.hpp"
+#include "points/portable.hpp"
 
 namespace tidewater::detail {
 
@@ -93,7 +94,7 @@ inline double rectifying_radius(double a, double f) {
 inline double authalic_radius_squared(double a, double f) {
   const double e2 = f * (2 - f);
   const double e = std::sqrt(std::fabs(e2));
-  const double q = e2 == 0 ? 1 : (e2 > 0 ? std::atanh(e) : std::atan(e)) / e;
+  const double q = e2 == 0 ? 1 : (e2 > 0 ? portable::atanh(e) : portable::atan(e)) / e;
   return a * a * 0.5 * (1 + (1 - e2) * q);
 }
 
@@ -125,32 +126,32 @@ namespace exact {
 inline double eccentric(double e2, double s) {
   const double e = std::sqrt(std::fabs(e2));
   if (e * std::fabs(s) < 1e-8) return s;
-  return e2 > 0 ? std::atanh(e * s) / e : std::atan(e * s) / e;
+  return e2 > 0 ? portable::atanh(e * s) / e : portable::atan(e * s) / e;
 }
 
 inline double reduced(double f, double lat) {
-  return std::atan2((1 - f) * std::sin(lat), std::cos(lat));
+  return portable::atan2((1 - f) * portable::sin(lat), portable::cos(lat));
 }
 
 inline double conformal(double f, double lat) {
   const double e2 = f * (2 - f);
-  const double s = std::sin(lat);
-  const double c = std::cos(lat);
-  const double sigma = std::sinh(e2 * eccentric(e2, s));
-  return std::atan2(s * std::sqrt(1 + sigma * sigma) - sigma, c);
+  const double s = portable::sin(lat);
+  const double c = portable::cos(lat);
+  const double sigma = portable::sinh(e2 * eccentric(e2, s));
+  return portable::atan2(s * std::sqrt(1 + sigma * sigma) - sigma, c);
 }
 
 inline double authalic(double f, double lat) {
   const double e2 = f * (2 - f);
-  const double s = std::fabs(std::sin(lat));
-  const double c = std::cos(lat);
+  const double s = std::fabs(portable::sin(lat));
+  const double c = portable::cos(lat);
   const double q = s / (1 - e2 * s * s) + eccentric(e2, s);
   const double whole = 1 / (1 - e2) + eccentric(e2, 1);
   // whole - q without cancellation towards the pole
   const double t = c * c / (1 + s);  // 1 - s
   const double rest =
       t * (1 + e2 * s) / ((1 - e2) * (1 - e2 * s * s)) + eccentric(e2, t / (1 - e2 * s));
-  return std::copysign(std::atan2(q, std::sqrt(rest * (whole + q))), lat);
+  return std::copysign(portable::atan2(q, std::sqrt(rest * (whole + q))), lat);
 }
 
 inline double rectifying(double f, double lat) {
@@ -160,7 +161,7 @@ inline double rectifying(double f, double lat) {
   double sum = 0;
   for (int k = 1; k < 4000; ++k) {
     const double c = meridian_coefficient(n, k) / k;
-    sum += c * std::sin(2 * k * beta);
+    sum += c * portable::sin(2 * k * beta);
     if (std::fabs(c) < 1e-18) break;
   }
   return beta + sum / scale;
@@ -185,7 +186,8 @@ inline double from_geodetic(Latitude to, double f, double lat) {
 // By secants that stay within a shrinking bracket, one side of the equator at a time.
 inline double to_geodetic(Latitude from, double f, double lat) {
   if (from == Latitude::geodetic || !(std::fabs(lat) < kHalfPi)) return lat;
-  if (from == Latitude::reduced) return std::atan2(std::sin(lat), (1 - f) * std::cos(lat));
+  if (from == Latitude::reduced)
+    return portable::atan2(portable::sin(lat), (1 - f) * portable::cos(lat));
   const double wanted = std::fabs(lat);
   double low = 0;
   double high = kHalfPi;

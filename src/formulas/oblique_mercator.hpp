@@ -7,6 +7,7 @@
 #include <cmath>
 
 #include "formulas/isometric_latitude.hpp"
+#include "points/portable.hpp"
 
 namespace tidewater::detail {
 
@@ -19,26 +20,26 @@ struct ObliqueMercator {
   ObliqueMercator(double first_eccentricity, double lat, double azimuth)
       : e(first_eccentricity), latitudes(first_eccentricity) {
     const double e2 = e * e;
-    const double s = std::sin(lat);
-    const double c2 = std::cos(lat) * std::cos(lat);
+    const double s = portable::sin(lat);
+    const double c2 = portable::cos(lat) * portable::cos(lat);
     const double w = std::sqrt(1 - e2 * s * s);
     const double slope = std::sqrt(1 - e2);
     B = std::sqrt(1 + e2 * c2 * c2 / (1 - e2));
     A = B * slope / (w * w);
     // D = B slope / (cos(lat) w), of which the square less one is G squared.
-    const double G = std::tan(lat) * slope / w;
+    const double G = portable::tan(lat) * slope / w;
     const double D = std::sqrt(1 + G * G);
     // ln(G + D) - B psi(lat)
-    log_h = std::asinh(G) - B * isometric_latitude(e, sincos(lat));
-    const double sin_azimuth = std::sin(azimuth);
+    log_h = portable::asinh(G) - B * isometric_latitude(e, sincos(lat));
+    const double sin_azimuth = portable::sin(azimuth);
     // A right angle's cosine is zero.
     const double cos_azimuth =
-        std::fabs(std::fabs(sin_azimuth) - 1) < 1e-16 ? 0.0 : std::cos(azimuth);
+        std::fabs(std::fabs(sin_azimuth) - 1) < 1e-16 ? 0.0 : portable::cos(azimuth);
     sin_gamma = sin_azimuth / D;
     cos_gamma = std::sqrt(G * G + cos_azimuth * cos_azimuth) / D;
     // The line crosses the equator of the aposphere west of the centre by this.
-    crossing = -std::atan2(G * sin_gamma, cos_azimuth) / B;
-    centre_u = A / B * std::atan2(G, cos_azimuth);
+    crossing = -portable::atan2(G * sin_gamma, cos_azimuth) / B;
+    centre_u = A / B * portable::atan2(G, cos_azimuth);
   }
 
   // False on the line's own poles, where v has no bound.
@@ -50,25 +51,25 @@ struct ObliqueMercator {
       *u = A / B * std::copysign(kHalfPi, lat);
     } else {
       const double y = B * isometric_latitude(e, sincos(lat)) + log_h;
-      const double S = std::sinh(y);
-      const double V = std::sin(angle);
-      U = (S * sin_gamma - V * cos_gamma) / std::cosh(y);
-      *u = A / B * std::atan2(S * cos_gamma + V * sin_gamma, std::cos(angle));
+      const double S = portable::sinh(y);
+      const double V = portable::sin(angle);
+      U = (S * sin_gamma - V * cos_gamma) / portable::cosh(y);
+      *u = A / B * portable::atan2(S * cos_gamma + V * sin_gamma, portable::cos(angle));
     }
-    *v = -A / B * std::atanh(U);
+    *v = -A / B * portable::atanh(U);
     return std::fabs(U) < 1 - 1e-14;
   }
 
   void inverse(double u, double v, double* lon, double* lat) const {
     const double q = -B / A * v;
-    const double S = std::sinh(q);
-    const double T = std::cosh(q);
+    const double S = portable::sinh(q);
+    const double T = portable::cosh(q);
     const double along = B / A * u;
-    const double V = std::sin(along);
+    const double V = portable::sin(along);
     const double U = (V * cos_gamma + S * sin_gamma) / T;
-    *lon = crossing - std::atan2(S * cos_gamma - V * sin_gamma, std::cos(along)) / B;
+    *lon = crossing - portable::atan2(S * cos_gamma - V * sin_gamma, portable::cos(along)) / B;
     *lat = std::fabs(U) >= 1 ? std::copysign(kHalfPi, U)
-                             : latitudes.of_isometric((std::atanh(U) - log_h) / B);
+                             : latitudes.of_isometric((portable::atanh(U) - log_h) / B);
   }
 };
 

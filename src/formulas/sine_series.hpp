@@ -8,6 +8,7 @@ namespace tidewater::detail {
 // s[0] sin 2p + s[1] sin 4p + ... = sin 2p times a polynomial in cos 2p, since sin 2kp is sin 2p
 // times the Chebyshev polynomial of the second kind U_(k-1)(cos 2p).  The coefficients of these
 // series fall so fast that nothing is lost in the change.
+// M. Abramowitz and I. A. Stegun, Handbook of Mathematical Functions (1964), eq. 22.3.16.
 template <int N>
 struct SineSeries {
   static_assert(N % 2 == 0);

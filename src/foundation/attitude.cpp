@@ -1,9 +1,12 @@
 // A camera's attitude in its three sets of angles.
+// P. R. Wolf, Elements of Photogrammetry, 2nd edition (1983), on omega, phi, kappa and on tilt,
+// swing, azimuth.
 
 #include <cmath>
 
 #include "formulas/constants.hpp"
-#include "tidewater/foundation.h"
+#include "points/portable.hpp"
+#include "tidewater/attitude.h"
 
 using namespace tidewater::detail;
 
@@ -25,9 +28,9 @@ void TWcalc_matrix(double omega, double phi, double kappa, double* matrix, TWsta
     for (int i = 0; i < 9; ++i) m[i] = i % 4 == 0 ? 1 : 0;
     return;
   }
-  const double cw = std::cos(omega), sw = std::sin(omega);
-  const double cp = std::cos(phi), sp = std::sin(phi);
-  const double ck = std::cos(kappa), sk = std::sin(kappa);
+  const double cw = portable::cos(omega), sw = portable::sin(omega);
+  const double cp = portable::cos(phi), sp = portable::sin(phi);
+  const double ck = portable::cos(kappa), sk = portable::sin(kappa);
   m[0] = ck * cp - sk * sp * sw;
   m[1] = ck * sp * sw + cp * sk;
   m[2] = -cw * sp;
@@ -42,77 +45,77 @@ void TWcalc_matrix(double omega, double phi, double kappa, double* matrix, TWsta
 void TWopk_to_tsa(double omega, double phi, double kappa, double* tilt, double* swing,
                   double* azimuth, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double cw = std::cos(omega), sw = std::sin(omega);
-  const double cp = std::cos(phi), sp = std::sin(phi);
-  const double ck = std::cos(kappa), sk = std::sin(kappa);
-  const double t = std::acos(cp * cw);
+  const double cw = portable::cos(omega), sw = portable::sin(omega);
+  const double cp = portable::cos(phi), sp = portable::sin(phi);
+  const double ck = portable::cos(kappa), sk = portable::sin(kappa);
+  const double t = portable::acos(cp * cw);
   *tilt = t;
   if (std::fabs(t) < kPlumb) {
     *azimuth = 0;
-    *swing = take_off_a_turn(-std::atan2(cp * sk, -(ck * cp)));
+    *swing = take_off_a_turn(-portable::atan2(cp * sk, -(ck * cp)));
     return;
   }
-  *swing = std::atan2(ck * sp * cw - sk * sw, -(sk * sp * cw + ck * sw));
-  *azimuth = std::atan2(-sp, sw * cp);
+  *swing = portable::atan2(ck * sp * cw - sk * sw, -(sk * sp * cw + ck * sw));
+  *azimuth = portable::atan2(-sp, sw * cp);
 }
 
 void TWtsa_to_opk(double tilt, double swing, double azimuth, double* omega, double* phi,
                   double* kappa, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double ct = std::cos(tilt), st = std::sin(tilt);
-  const double cs = std::cos(swing), ss = std::sin(swing);
-  const double ca = std::cos(azimuth), sa = std::sin(azimuth);
+  const double ct = portable::cos(tilt), st = portable::sin(tilt);
+  const double cs = portable::cos(swing), ss = portable::sin(swing);
+  const double ca = portable::cos(azimuth), sa = portable::sin(azimuth);
   const double r = -(sa * st);
   if (std::fabs(std::fabs(r) - 1) < kPoleTolerance) {
     *phi = r > 0 ? kHalfPi : -kHalfPi;
     *kappa = 0;
-    *omega = std::atan2(-(st * cs), -(sa * ss) - ca * cs * ct);
+    *omega = portable::atan2(-(st * cs), -(sa * ss) - ca * cs * ct);
     return;
   }
-  const double w = std::atan2(ca * st, ct);
-  const double q =
-      std::fabs(std::cos(w)) >= kPoleTolerance ? ct / std::cos(w) : ca * st / std::sin(w);
-  const double p = std::atan2(r, q);
-  const double u = (ca * ss - sa * cs * ct) / std::cos(p);
-  const double v = (-(ca * cs) - sa * ss * ct) / std::cos(p);
+  const double w = portable::atan2(ca * st, ct);
+  const double q = std::fabs(portable::cos(w)) >= kPoleTolerance ? ct / portable::cos(w)
+                                                                 : ca * st / portable::sin(w);
+  const double p = portable::atan2(r, q);
+  const double u = (ca * ss - sa * cs * ct) / portable::cos(p);
+  const double v = (-(ca * cs) - sa * ss * ct) / portable::cos(p);
   *omega = w;
   *phi = p;
-  *kappa = std::atan2(-u, v);
+  *kappa = portable::atan2(-u, v);
 }
 
 void TWWxWyWzto_tsa(double wx, double wy, double wz, double lon, double lat, double* tilt,
                     double* swing, double* azimuth, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double cx = std::cos(wx), sx = std::sin(wx);
-  const double cy = std::cos(wy), sy = std::sin(wy);
-  const double cz = std::cos(wz), sz = std::sin(wz);
-  const double cl = std::cos(lon), sl = std::sin(lon);
-  const double cb = std::cos(lat), sb = std::sin(lat);
-  const double t = std::acos(cb * cl * sy - cb * sl * cy * sx + sb * cy * cx);
+  const double cx = portable::cos(wx), sx = portable::sin(wx);
+  const double cy = portable::cos(wy), sy = portable::sin(wy);
+  const double cz = portable::cos(wz), sz = portable::sin(wz);
+  const double cl = portable::cos(lon), sl = portable::sin(lon);
+  const double cb = portable::cos(lat), sb = portable::sin(lat);
+  const double t = portable::acos(cb * cl * sy - cb * sl * cy * sx + sb * cy * cx);
   const double g1 = cz * sy * sx + sz * cx;
   const double g2 = cz * cx - sz * sy * sx;
   *tilt = t;
   if (std::fabs(t) >= kPlumb) {
     const double n1 = g1 * cb * sl + (sz * sx - cz * sy * cx) * sb + cb * cl * cz * cy;
     const double d1 = g2 * cb * sl + (sz * sy * cx + cz * sx) * sb - cy * cb * cl * sz;
-    *swing = std::atan2(-n1, -d1);
+    *swing = portable::atan2(-n1, -d1);
     const double n2 = -(sy * sl) - cl * cy * sx;
     const double d2 = sb * sl * cy * sx - sy * sb * cl + cb * cy * cx;
-    *azimuth = std::atan2(-n2, -d2);
+    *azimuth = portable::atan2(-n2, -d2);
     return;
   }
   *azimuth = 0;
-  *swing = take_off_a_turn(-std::atan2(-(g2 * cl + sl * sz * cy), -(g1 * cl - cy * sl * cz)));
+  *swing = take_off_a_turn(-portable::atan2(-(g2 * cl + sl * sz * cy), -(g1 * cl - cy * sl * cz)));
 }
 
 void TWtsa_toWxWyWz(double tilt, double swing, double azimuth, double lon, double lat, double* wx,
                     double* wy, double* wz, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double c0 = std::cos(tilt), s0 = std::sin(tilt);
-  const double c1 = std::cos(swing), s1 = std::sin(swing);
-  const double c2 = std::cos(azimuth), s2 = std::sin(azimuth);
-  const double c3 = std::cos(lon), s3 = std::sin(lon);
-  const double c4 = std::cos(lat), s4 = std::sin(lat);
+  const double c0 = portable::cos(tilt), s0 = portable::sin(tilt);
+  const double c1 = portable::cos(swing), s1 = portable::sin(swing);
+  const double c2 = portable::cos(azimuth), s2 = portable::sin(azimuth);
+  const double c3 = portable::cos(lon), s3 = portable::sin(lon);
+  const double c4 = portable::cos(lat), s4 = portable::sin(lat);
   const double w = s4 * c3 * c2 * s0 + s3 * s2 * s0 + c4 * c3 * c0;
   const double h1 = c4 * s3;
   const double h2 = c2 * c1;
@@ -125,18 +128,19 @@ void TWtsa_toWxWyWz(double tilt, double swing, double azimuth, double lon, doubl
   if (std::fabs(std::fabs(w) - 1) < kPoleTolerance) {
     *wy = w > 0 ? kHalfPi : -kHalfPi;
     *wz = 0;
-    *wx = std::atan2((-h4 - h3) * c4 - s4 * c1 * s0, h5 * s3 + h8 * c3 - h1 * c1 * s0);
+    *wx = portable::atan2((-h4 - h3) * c4 - s4 * c1 * s0, h5 * s3 + h8 * c3 - h1 * c1 * s0);
     return;
   }
   const double u = s4 * s3 * c2 * s0 - s2 * c3 * s0 + h1 * c0;
   const double v = s4 * c0 - c2 * c4 * s0;
-  const double x = std::atan2(-u, v);
-  const double q = std::fabs(std::cos(x)) >= kPoleTolerance ? v / std::cos(x) : -u / std::sin(x);
-  const double y = std::atan2(w, q);
-  const double n = (h5 * c3 - h8 * s3 - c4 * c3 * c1 * s0) / std::cos(y);
+  const double x = portable::atan2(-u, v);
+  const double q =
+      std::fabs(portable::cos(x)) >= kPoleTolerance ? v / portable::cos(x) : -u / portable::sin(x);
+  const double y = portable::atan2(w, q);
+  const double n = (h5 * c3 - h8 * s3 - c4 * c3 * c1 * s0) / portable::cos(y);
   const double d =
-      (-((h7 - h6 * c0) * s4 * c3) + (h4 * c0 + h2) * s3 - c4 * c3 * s1 * s0) / std::cos(y);
+      (-((h7 - h6 * c0) * s4 * c3) + (h4 * c0 + h2) * s3 - c4 * c3 * s1 * s0) / portable::cos(y);
   *wx = x;
   *wy = y;
-  *wz = std::atan2(-n, d);
+  *wz = portable::atan2(-n, d);
 }

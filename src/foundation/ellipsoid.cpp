@@ -1,10 +1,13 @@
 // Radii, equal spheres, meridian arc, conformal latitude and normal gravity of an ellipsoid.
+// J. P. Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 15-25;
+// W. A. Heiskanen and H. Moritz, Physical Geodesy (1967), on normal gravity.
 
 #include <cmath>
 
 #include "formulas/constants.hpp"
 #include "foundation/meridian_arc.hpp"
-#include "tidewater/foundation.h"
+#include "points/portable.hpp"
+#include "tidewater/ellipsoid.h"
 
 namespace tidewater::detail {
 namespace {
@@ -37,7 +40,7 @@ MeridianArc::MeridianArc(double a, double e) : a_(a), sphere_(e < kSphereLimit) 
   const double c6 = -0.7291666666666666 * n3;
   const double c8 = 0.615234375 * n4;
   n_ = n;
-  g_ = a / (1 + n);
+  g_ = 0.5 * (a + b);  // a / (1 + n)
   mean_ = 1 + n2 / 4 + n4 / 64;
   t0_ = c2 - c6;
   t1_ = 2 * c4 - 4 * c8;
@@ -68,8 +71,8 @@ MeridianFoot::MeridianFoot(const MeridianArc& arc)
 }
 
 double MeridianArc::tail(double lat) const {
-  const double c = std::cos(2 * lat);
-  return (((t3_ * c + t2_) * c + t1_) * c + t0_) * std::sin(2 * lat);
+  const auto [s, c] = points::sincos(2 * lat);
+  return (((t3_ * c + t2_) * c + t1_) * c + t0_) * s;
 }
 
 TWstatus MeridianArc::forward(double lat, double* distance) const {
@@ -97,12 +100,13 @@ TWstatus MeridianArc::inverse(double distance, double* lat) const {
     *lat = distance / a_;
     return TW_SUCCESS;
   }
-  const double start = distance * (1 + n_) / (mean_ * a_);
-  double p = start;
+  double p = 0;
   if (n_ < kSeriesLimit) {
     // Where the rounds below come to rest within a few, the series is there at once.
     p = MeridianFoot(*this).latitude(distance);
   } else {
+    const double start = distance * (1 + n_) / (mean_ * a_);
+    p = start;
     constexpr int kMostRounds = 50;
     double previous = 0;
     int rounds = 0;
@@ -130,8 +134,8 @@ void TWRparal(double a, double e, double lat, double* radius, TWstatus* status) 
     *status = TW_BAD_LATITUDE;
     return;
   }
-  const double w = 1 - square(e) * square(std::sin(lat));
-  *radius = a * std::cos(lat) / std::sqrt(w);
+  const double w = 1 - square(e) * square(portable::sin(lat));
+  *radius = a * portable::cos(lat) / std::sqrt(w);
 }
 
 void TWRmerid(double a, double e, double lat, double* radius, TWstatus* status) {
@@ -140,7 +144,7 @@ void TWRmerid(double a, double e, double lat, double* radius, TWstatus* status) 
     *status = TW_BAD_LATITUDE;
     return;
   }
-  const double w = 1 - square(e) * square(std::sin(lat));
+  const double w = 1 - square(e) * square(portable::sin(lat));
   *radius = a * (1 - square(e)) / std::sqrt(cube(w));
 }
 
@@ -150,7 +154,7 @@ void TWgaussian_R(double a, double e, double lat, double* radius, TWstatus* stat
     *status = TW_BAD_ECCENTRICITY;
     return;
   }
-  const double w = 1 - square(e) * square(std::sin(lat));
+  const double w = 1 - square(e) * square(portable::sin(lat));
   *radius = a * std::sqrt(1 - square(e)) / w;
 }
 
@@ -171,7 +175,7 @@ void TWeq_vol_R(double a, double e, double* radius, TWstatus* status) {
     *status = TW_BAD_ECCENTRICITY;
     return;
   }
-  *radius = a * std::pow(1 - square(e), 0.16666666666666666);
+  *radius = a * portable::pow(1 - square(e), 0.16666666666666666);
 }
 
 void TWmerid_dist_f(double a, double e, double lat, double* distance, TWstatus* status) {
@@ -217,8 +221,8 @@ void TWdM_dphi(double a, double e2, double lat, double* derivative, TWstatus* st
   const double d6 = 0.7291666666666666 * n3;
   const double d8 = 0.615234375 * n4;
   *derivative = a / (1 + n) *
-                (mean - 2 * d2 * std::cos(2 * lat) + 4 * d4 * std::cos(4 * lat) -
-                 6 * d6 * std::cos(6 * lat) + 8 * d8 * std::cos(8 * lat));
+                (mean - 2 * d2 * portable::cos(2 * lat) + 4 * d4 * portable::cos(4 * lat) -
+                 6 * d6 * portable::cos(6 * lat) + 8 * d8 * portable::cos(8 * lat));
 }
 
 void TWgeod_conflat(double e, double lat, double* conformal_lat, TWstatus* status) {
@@ -227,10 +231,10 @@ void TWgeod_conflat(double e, double lat, double* conformal_lat, TWstatus* statu
     *status = TW_BAD_LATITUDE;
     return;
   }
-  const double es = e * std::sin(lat);
-  *conformal_lat =
-      2 * std::atan(std::pow((1 - es) / (1 + es), e / 2) * std::tan(lat / 2 + kQuarterPi)) -
-      kHalfPi;
+  const double es = e * portable::sin(lat);
+  *conformal_lat = 2 * portable::atan(portable::pow((1 - es) / (1 + es), e / 2) *
+                                      portable::tan(lat / 2 + kQuarterPi)) -
+                   kHalfPi;
 }
 
 void TWconflat_geod(double e, double conformal_lat, double* lat, TWstatus* status) {
@@ -240,14 +244,14 @@ void TWconflat_geod(double e, double conformal_lat, double* lat, TWstatus* statu
     return;
   }
   constexpr int kMostRounds = 10;
-  const double t = std::tan(conformal_lat / 2 + kQuarterPi);
+  const double t = portable::tan(conformal_lat / 2 + kQuarterPi);
   double p = conformal_lat;
   double previous = 0;
   int rounds = 0;
   do {
     previous = p;
-    const double es = e * std::sin(previous);
-    p = 2 * std::atan(std::pow((1 + es) / (1 - es), e / 2) * t) - kHalfPi;
+    const double es = e * portable::sin(previous);
+    p = 2 * portable::atan(portable::pow((1 + es) / (1 - es), e / 2) * t) - kHalfPi;
     ++rounds;
   } while (!(std::fabs(p - previous) <= 1e-12) && rounds < kMostRounds);
   // By contract: the count alone decides, and the word is that of a bad latitude.
@@ -263,7 +267,7 @@ int32_t TWnormal_grav(double a, double e, double gamma_equator, double gamma_pol
   *status = TW_SUCCESS;
   const double b = a * std::sqrt(1 - square(e));
   const double k = (b * gamma_pole) / (a * gamma_equator) - 1;
-  const double s2 = square(std::sin(lat));
+  const double s2 = square(portable::sin(lat));
   *gravity = gamma_equator * (1 + k * s2) / std::sqrt(1 - square(e) * s2) - height * 3.086e-6;
   return 1;
 }

@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/foundation.h"
+#include "points/portable.hpp"
+#include "tidewater/geocentric.h"
 
 using namespace tidewater::detail;
 
@@ -16,11 +17,11 @@ void TWllh_to_xyz(double a, double e, int32_t count, const CoordinateTriple* in,
 
 Next GeocentricToGeodetic::other(const CoordinateTriple& in, CoordinateTriple* out,
                                  TWstatus*) const {
-  const double p = std::hypot(in.x, in.y);
+  const double p = portable::hypot(in.x, in.y);
   if (p < kOnAxis) {
     *out = {0, in.z < 0 ? -kHalfPi : kHalfPi, std::fabs(in.z) - geodetic.b()};
   } else {  // so far out that the ellipsoid is a point
-    *out = {std::atan2(in.y, in.x), std::atan2(in.z, p), std::hypot(p, in.z)};
+    *out = {portable::atan2(in.y, in.x), portable::atan2(in.z, p), portable::hypot(p, in.z)};
   }
   return Next::point;
 }

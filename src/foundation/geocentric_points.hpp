@@ -1,4 +1,5 @@
-// Geodetic coordinates to and from the earth-centred rectangular frame.
+// Geodetic coordinates to and from the earth-centred rectangular frame; formulas/geocentric.hpp
+// names the sources.
 #pragma once
 
 #include "formulas/geocentric.hpp"

@@ -4,7 +4,8 @@
 
 #include <cmath>
 
-#include "tidewater/foundation.h"
+#include "points/portable.hpp"
+#include "tidewater/local_space.h"
 
 using namespace tidewater::detail;
 
@@ -24,17 +25,17 @@ void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double 
   *x0 = origin.x;
   *y0 = origin.y;
   *z0 = origin.z;
-  const double sin_lon = std::sin(lon0);
-  const double cos_lon = std::cos(lon0);
-  const double sin_lat = std::sin(lat0);
-  const double cos_lat = std::cos(lat0);
+  const double sin_lon = portable::sin(lon0);
+  const double cos_lon = portable::cos(lon0);
+  const double sin_lat = portable::sin(lat0);
+  const double cos_lat = portable::cos(lat0);
   double* m = matrix;
   m[6] = cos_lat * cos_lon;
   m[7] = cos_lat * sin_lon;
   m[8] = sin_lat;
   if (mode == 1) {
-    const double s = std::sin(*azimuth);
-    const double c = std::cos(*azimuth);
+    const double s = portable::sin(*azimuth);
+    const double c = portable::cos(*azimuth);
     m[0] = -s * sin_lon - c * sin_lat * cos_lon;
     m[1] = s * cos_lon - c * sin_lat * sin_lon;
     m[2] = c * cos_lat;
@@ -62,9 +63,9 @@ void TWlsr_c(int16_t mode, double a, double e, double lon0, double lat0, double 
   m[1] = m[5] * m[6] - m[3] * m[8];
   m[2] = m[7] * m[3] - m[6] * m[4];
   if (std::fabs(m[5]) > kTiny || std::fabs(m[2]) > kTiny) {
-    *azimuth = std::atan2(m[5], m[2]);
+    *azimuth = portable::atan2(m[5], m[2]);
   } else if (std::fabs(m[1]) > kTiny || std::fabs(m[0]) > kTiny) {  // the origin is a pole
-    *azimuth = lat0 >= 0 ? std::atan2(m[1], -m[0]) + lon0 : std::atan2(m[1], m[0]) - lon0;
+    *azimuth = lat0 >= 0 ? portable::atan2(m[1], -m[0]) + lon0 : portable::atan2(m[1], m[0]) - lon0;
   } else {
     *status = TW_BAD_PARAMETER;
   }

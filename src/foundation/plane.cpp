@@ -2,9 +2,9 @@
 
 #include <cmath>
 
-#include "foundation/plane_points.hpp"
 #include "formulas/interpolation.hpp"
-#include "tidewater/foundation.h"
+#include "foundation/plane_points.hpp"
+#include "tidewater/plane.h"
 
 using namespace tidewater::detail;
 

@@ -4,7 +4,8 @@
 #include <cstdint>
 #include <limits>
 
-#include "tidewater/lines.h"
+#include "tidewater/geodesic.h"
+#include "tidewater/rhumb.h"
 
 namespace {
 

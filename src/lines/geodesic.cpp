@@ -16,8 +16,9 @@
 #include <cstdint>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/lines.h"
+#include "points/portable.hpp"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/geodesic.h"
 
 using namespace tidewater::detail;
 namespace points = tidewater::points;
@@ -207,25 +208,26 @@ void direct_on_sphere(CoordinateTriple start, double azimuth, double angle, Coor
                       double* back_azimuth) {
   const double lon1 = start.x;
   const double lat1 = start.y;
-  const double sin1 = std::sin(lat1);
-  const double cos1 = std::cos(lat1);
-  const double sin_t = std::sin(angle);
-  const double cos_t = std::cos(angle);
-  const double sin_az = std::sin(azimuth);
-  const double cos_az = std::cos(azimuth);
-  const double lat2 = std::asin(cos1 * sin_t * cos_az + sin1 * cos_t);
+  const double sin1 = portable::sin(lat1);
+  const double cos1 = portable::cos(lat1);
+  const double sin_t = portable::sin(angle);
+  const double cos_t = portable::cos(angle);
+  const double sin_az = portable::sin(azimuth);
+  const double cos_az = portable::cos(azimuth);
+  const double lat2 = portable::asin(cos1 * sin_t * cos_az + sin1 * cos_t);
   double lon2 = 0;
   if (lat1 == kHalfPi) {
     lon2 = lon1 - azimuth;
   } else if (lat1 == -kHalfPi) {
     lon2 = lon1 + azimuth;
   } else {
-    lon2 = lon1 + std::atan2(sin_az * sin_t, cos1 * cos_t - sin1 * sin_t * cos_az);
+    lon2 = lon1 + portable::atan2(sin_az * sin_t, cos1 * cos_t - sin1 * sin_t * cos_az);
   }
   // By contract: in the range of the arc tangent, not of a full turn.
   const double d = lon1 - lon2;
   *back_azimuth =
-      std::atan2(std::sin(d) * cos1, sin1 * std::cos(lat2) - std::cos(d) * std::sin(lat2) * cos1);
+      portable::atan2(portable::sin(d) * cos1,
+                      sin1 * portable::cos(lat2) - portable::cos(d) * portable::sin(lat2) * cos1);
   end->x = lon2;
   end->y = lat2;
 }
@@ -266,16 +268,17 @@ void inverse_on_sphere(double dl, CoordinateTriple start, CoordinateTriple end, 
                        double* azimuth, double* back_azimuth, double* distance) {
   // By contract: no such step for a difference below -pi.
   dl = add_turns_while(dl, -kTwoPi, [](double v) { return v > kPi; });
-  const double sin1 = std::sin(start.y);
-  const double cos1 = std::cos(start.y);
-  const double sin2 = std::sin(end.y);
-  const double cos2 = std::cos(end.y);
-  const double cos_dl = std::cos(dl);
-  const double h =
-      std::sqrt(square(std::sin(dl / 2)) * cos2 * cos1 + square(std::sin((start.y - end.y) / 2)));
-  *distance = std::fabs(2 * a * std::asin(clamp_to_one(h)));
-  *azimuth = std::atan2(std::sin(end.x - start.x) * cos2, sin2 * cos1 - cos_dl * cos2 * sin1);
-  *back_azimuth = std::atan2(std::sin(dl) * cos1, cos2 * sin1 - cos_dl * sin2 * cos1);
+  const double sin1 = portable::sin(start.y);
+  const double cos1 = portable::cos(start.y);
+  const double sin2 = portable::sin(end.y);
+  const double cos2 = portable::cos(end.y);
+  const double cos_dl = portable::cos(dl);
+  const double h = std::sqrt(square(portable::sin(dl / 2)) * cos2 * cos1 +
+                             square(portable::sin((start.y - end.y) / 2)));
+  *distance = std::fabs(2 * a * portable::asin(clamp_to_one(h)));
+  *azimuth =
+      portable::atan2(portable::sin(end.x - start.x) * cos2, sin2 * cos1 - cos_dl * cos2 * sin1);
+  *back_azimuth = portable::atan2(portable::sin(dl) * cos1, cos2 * sin1 - cos_dl * sin2 * cos1);
 }
 
 void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double e, double* azimuth,
@@ -366,7 +369,7 @@ void inverse_on_ellipsoid(double dl, double lat1, double lat2, double a, double 
     k = points::sincos(step + v).sin;
     if (k <= highest) {
       k = pad + highest;
-      v = std::asin(k);
+      v = portable::asin(k);
       pad /= 3;
     } else {
       v += step;

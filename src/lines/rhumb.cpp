@@ -1,18 +1,20 @@
 // Direct and inverse problem of the rhumb line, the straight line on the Mercator map.
+// J. P. Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 46-47.
 
 #include <cmath>
 
 #include "formulas/constants.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
-#include "tidewater/lines.h"
+#include "points/portable.hpp"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/mercator.h"
+#include "tidewater/rhumb.h"
 
 using namespace tidewater::detail;
 
 namespace {
 
 double parallel_radius(double a, double e, double lat) {
-  return std::cos(lat) * a / std::sqrt(1 - e * e * square(std::sin(lat)));
+  return portable::cos(lat) * a / std::sqrt(1 - e * e * square(portable::sin(lat)));
 }
 
 double into_full_turn(double azimuth) {
@@ -34,12 +36,12 @@ void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distance, dou
   if (azimuth != kHalfPi && azimuth != 4.71238898038469) {  // 3 pi / 2
     double arc = 0;
     TWmerid_dist_f(a, e, lat1, &arc, status);
-    TWmerid_dist_i(a, e, arc + std::cos(azimuth) * distance, &end->y, status);
+    TWmerid_dist_i(a, e, arc + portable::cos(azimuth) * distance, &end->y, status);
     double y1 = 0;
     double y2 = 0;
     TWmerc_c(e, end->y, &y2, status);
     TWmerc_c(e, lat1, &y1, status);
-    end->x = lon1 + (y2 - y1) * std::tan(azimuth);
+    end->x = lon1 + (y2 - y1) * portable::tan(azimuth);
   } else {
     // By contract: a positive distance goes east for azimuth 3 pi / 2 too.
     end->x = lon1 + distance / parallel_radius(a, e, lat1);
@@ -64,12 +66,12 @@ void TWrhmbline_inv(CoordinateTriple start, CoordinateTriple end, double a, doub
     TWmerc_c(e, lat2, &y2, status);
     TWmerc_c(e, lat1, &y1, status);
     // By contract: the longitude difference as it stands, not the short way round.
-    forward = std::atan2(end.x - start.x, y2 - y1);
+    forward = portable::atan2(end.x - start.x, y2 - y1);
     double m1 = 0;
     double m2 = 0;
     TWmerid_dist_f(a, e, lat2, &m2, status);
     TWmerid_dist_f(a, e, lat1, &m1, status);
-    length = (m2 - m1) / std::cos(forward);
+    length = (m2 - m1) / portable::cos(forward);
   } else {
     forward = end.x <= start.x ? 3 * kHalfPi : kHalfPi;
     length = parallel_radius(a, e, lat1) * (end.x - start.x);

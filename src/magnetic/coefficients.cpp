@@ -1,5 +1,8 @@
 // Coefficient sets of a spherical-harmonic model: row tables, recursion constants, normalisation,
 // and the coefficients of a date.
+// S. A. Holmes and W. E. Featherstone, A unified approach to the Clenshaw summation and the
+// recursive computation of very high degree and order normalised associated Legendre functions,
+// Journal of Geodesy 76 (2002), 279-299, eq. 12.
 
 #include <algorithm>
 #include <cmath>
@@ -7,7 +10,7 @@
 #include <cstdlib>
 #include <initializer_list>
 
-#include "tidewater/magnetic.h"
+#include "tidewater/harmonic_synthesis.h"
 
 namespace {
 
@@ -15,21 +18,20 @@ namespace {
 constexpr double kExtrapolation = 5.0;
 
 // Doubles in front of row n of a triangular array.
-constexpr std::ptrdiff_t row_offset(std::ptrdiff_t n) { return n * (n + 1) / 2; }
+constexpr int64_t row_offset(int64_t n) { return n * (n + 1) / 2; }
 
-constexpr std::ptrdiff_t row_count(int32_t degree) {
-  return std::max<std::ptrdiff_t>(std::ptrdiff_t{degree} + 1, 0);
-}
+constexpr int64_t row_count(int32_t degree) { return std::max<int64_t>(int64_t{degree} + 1, 0); }
 
 // The rows of a triangular array that begins so many doubles into a block, from the C allocator;
 // null where that fails.  The block is not read: the rows of a null one are null.
-double** make_row_table(int32_t degree, double* block, std::ptrdiff_t first = 0) {
-  const std::ptrdiff_t rows = row_count(degree);
+double** make_row_table(int32_t degree, double* block, int64_t first = 0) {
+  const int64_t rows = row_count(degree);
   // Room for one pointer at least, so that null means a failure and nothing else.
-  const auto places = static_cast<std::size_t>(std::max<std::ptrdiff_t>(rows, 1));
-  auto** table = static_cast<double**>(std::malloc(places * sizeof(double*)));
+  const auto places = static_cast<std::size_t>(std::max<int64_t>(rows, 1));
+  // Where a pointer has 32 bits the product may be more than it counts: calloc looks.
+  auto** table = static_cast<double**>(std::calloc(places, sizeof(double*)));
   if (!table) return nullptr;
-  for (std::ptrdiff_t n = 0; n < rows; ++n) {
+  for (int64_t n = 0; n < rows; ++n) {
     table[n] = block ? block + first + row_offset(n) : nullptr;
   }
   return table;
@@ -58,7 +60,7 @@ void TWhar_aloc_Cnm(int32_t N, double* block1, double* block2, double* block3, d
 void TWhar_alocCtnm(int32_t k, const int32_t* degrees, double* c_block, double* s_block,
                     double*** c_sets, double*** s_sets, TWstatus* status) {
   *status = TW_SUCCESS;
-  std::ptrdiff_t offset = 0;
+  int64_t offset = 0;
   for (int32_t i = 0; i < k; ++i) {
     c_sets[i] = make_row_table(degrees[i], c_block, offset);
     s_sets[i] = make_row_table(degrees[i], s_block, offset);

@@ -1,4 +1,6 @@
 // The magnetic field in the geodetic frame, its elements, and their change in one unit of time.
+// The US/UK World Magnetic Model for 2025-2030: Technical Report, NOAA National Centers for
+// Environmental Information, on elements and their rates.
 
 #include <algorithm>
 #include <cmath>
@@ -7,8 +9,10 @@
 #include <new>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/magnetic.h"
+#include "points/portable.hpp"
+#include "tidewater/geocentric.h"
+#include "tidewater/harmonic_synthesis.h"
+#include "tidewater/magnetic_elements.h"
 
 using namespace tidewater::detail;
 
@@ -40,9 +44,9 @@ class Places {
     for (std::size_t i = 0; i < count_; ++i) {
       const auto [x, y, z] = positions()[i];
       const double r = std::sqrt(x * x + y * y + z * z);
-      const double delta = geodetic(i).y - std::asin(z / r);
-      const double s = std::sin(delta);
-      const double c = std::cos(delta);
+      const double delta = geodetic(i).y - portable::asin(z / r);
+      const double s = portable::sin(delta);
+      const double c = portable::cos(delta);
       const auto [north, east, down] = field[i];
       field[i] = {s * down + c * north, east, -s * north + c * down};
     }
@@ -56,9 +60,9 @@ class Places {
 // Elements of a field, with the declination from the meridian of the point.
 MagneticElements elements_of(const CoordinateTriple& field) {
   const auto [north, east, down] = field;
-  const double horizontal = std::hypot(north, east);
-  return {horizontal > kTiny ? std::atan2(east, north) : 0, std::atan2(down, horizontal),
-          horizontal, std::hypot(horizontal, down)};
+  const double horizontal = portable::hypot(north, east);
+  return {horizontal > kTiny ? portable::atan2(east, north) : 0, portable::atan2(down, horizontal),
+          horizontal, portable::hypot(horizontal, down)};
 }
 
 // At a pole, where north is defined by the longitude, a declination counts from Greenwich.
@@ -136,11 +140,12 @@ void TWhar_mag_var(int32_t N, double radius, double** C, double** S, double** re
     const auto [dx, dy, dz] = sec_field[i];
     MagneticElements now = elements_of(field[i]);
     // Differences over one unit of time, not derivatives.
-    const double horizontal = std::hypot(x + dx, y + dy);
+    const double horizontal = portable::hypot(x + dx, y + dy);
     // By contract: the declination to come is formed however small its horizontal intensity is.
-    const double turn = std::atan2(y + dy, x + dx) - now.declination;
-    rates[i] = {wrap_at_or_below_then_above(turn), std::atan2(z + dz, horizontal) - now.inclination,
-                horizontal - now.horizontal, std::hypot(horizontal, z + dz) - now.total};
+    const double turn = portable::atan2(y + dy, x + dx) - now.declination;
+    rates[i] = {wrap_at_or_below_then_above(turn),
+                portable::atan2(z + dz, horizontal) - now.inclination, horizontal - now.horizontal,
+                portable::hypot(horizontal, z + dz) - now.total};
     now.declination = at_poles_from_greenwich(now.declination, places.geodetic(i));
     elements[i] = now;
   }

@@ -6,8 +6,9 @@
 #include <initializer_list>
 
 #include "magnetic/synthesis_points.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/magnetic.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/geocentric.h"
+#include "tidewater/harmonic_synthesis.h"
 
 namespace tidewater::detail {
 

@@ -1,46 +1,32 @@
 // Elementary functions that give the same bits at every width.
 //
 // Only +, -, *, /, the square root and bits, in one order.  Where a function's short road ends, the
-// lanes concerned, and only they, are asked of the standard library, so that every function is
-// total.  The worst errors are those of tests/points/elementary_test.cpp against MPFR, in units in
-// the last place.  Coefficients by scripts/elementary.sollya.
+// lanes concerned, and only they, go a longer one of the same operations (elementary.cpp), so that
+// every function is total and no platform's library has a say.  The worst errors are those of
+// tests/points/elementary_test.cpp against MPFR, in units in the last place.  Coefficients by
+// scripts/elementary.sollya.
 #pragma once
 
 #include "points/lanes.hpp"
 
 namespace tidewater::points {
 
-// The standard library's functions, compiled once for the plainest processor.
-double standard_sin(double v);
-double standard_cos(double v);
-double standard_log(double v);
-double standard_exp(double v);
-double standard_atan2(double y, double x);
-
 template <class V>
 struct SinCos {
   V sin, cos;
 };
 
-// Sine and cosine.  0.80 ulp up to 1e5 radians, the standard library's beyond.
-template <Number V>
-TW_INLINE SinCos<V> sincos(V x) {
-  constexpr double kTwoOverPi = 0x1.45f306dc9c883p-1;
-  // pi / 2 in three parts; a whole number of up to 17 bits times one of the first two is exact
-  constexpr double kFirst = 0x1.921fb54440000p+0, kSecond = 0x1.68c234c4c0000p-39,
-                   kThird = 0x1.98a2e03707345p-77;
-  constexpr double kShift = 0x1.8p52;
-  const auto far = !(abs(x) <= 1e5);
-  const V near = select(far, 0.0, x);
-  const V shifted = near * kTwoOverPi + kShift;
-  const Bits<V> quadrant = bits(shifted);
-  const V k = shifted - kShift;
-  // r + low, low being what the rounding of r leaves
-  const V a = near - k * kFirst;
-  const V b = k * kSecond;
-  const V r = a - b;
-  const V low = ((a - r) - b) - k * kThird;
+// The longer roads, compiled once for the plainest processor: angles beyond 1e5 radians, infinite
+// ones and not-a-numbers; what is no normal positive number; exponents beyond 708; two zeros and
+// sizes beyond 1e290 or below 1e-290.
+SinCos<double> far_sincos(double v);
+double odd_log(double v);
+double far_exp(double v);
+double odd_atan2(double y, double x);
 
+// Sine and cosine of r + low, |r| up to pi/4, after a whole number of quadrants.
+template <Number V>
+TW_INLINE SinCos<V> sincos_of_rest(V r, V low, Bits<V> quadrant) {
   const V z = r * r;
   const V z2 = z * z;
   const V s_high =
@@ -60,16 +46,37 @@ TW_INLINE SinCos<V> sincos(V x) {
   const Bits<V> kSign = Bits<V>(INT64_MIN);
   const Bits<V> sine_sign = shift_left(quadrant, 62) & kSign;
   const Bits<V> cosine_sign = shift_left(quadrant + Bits<V>(int64_t{1}), 62) & kSign;
-  SinCos<V> at = {number(bits(select(odd, cosine, sine)) ^ sine_sign),
-                  number(bits(select(odd, sine, cosine)) ^ cosine_sign)};
+  return {number(bits(select(odd, cosine, sine)) ^ sine_sign),
+          number(bits(select(odd, sine, cosine)) ^ cosine_sign)};
+}
+
+// Sine and cosine.  0.80 ulp.
+template <Number V>
+TW_INLINE SinCos<V> sincos(V x) {
+  constexpr double kTwoOverPi = 0x1.45f306dc9c883p-1;
+  // pi / 2 in three parts; a whole number of up to 17 bits times one of the first two is exact
+  constexpr double kFirst = 0x1.921fb54440000p+0, kSecond = 0x1.68c234c4c0000p-39,
+                   kThird = 0x1.98a2e03707345p-77;
+  constexpr double kShift = 0x1.8p52;
+  const auto far = !(abs(x) <= 1e5);
+  const V near = select(far, 0.0, x);
+  const V shifted = near * kTwoOverPi + kShift;
+  const Bits<V> quadrant = bits(shifted);
+  const V k = shifted - kShift;
+  // r + low, low being what the rounding of r leaves
+  const V a = near - k * kFirst;
+  const V b = k * kSecond;
+  const V r = a - b;
+  const V low = ((a - r) - b) - k * kThird;
+
+  SinCos<V> at = sincos_of_rest(r, low, quadrant);
   at.sin = select(near == 0.0, near, at.sin);  // keeps the sign of zero
-  mend(far, at.sin, [&](int i) { return standard_sin(lane(x, i)); });
-  mend(far, at.cos, [&](int i) { return standard_cos(lane(x, i)); });
+  mend(far, at.sin, [&](int i) { return far_sincos(lane(x, i)).sin; });
+  mend(far, at.cos, [&](int i) { return far_sincos(lane(x, i)).cos; });
   return at;
 }
 
-// Natural logarithm.  0.85 ulp; zero, negative, subnormal and infinite numbers by the standard
-// library.
+// Natural logarithm.  0.85 ulp.
 template <Number V>
 TW_INLINE V log(V x) {
   constexpr double kLn2High = 0x1.62e42fee00000p-1, kLn2Low = 0x1.a39ef35793c76p-33;
@@ -90,7 +97,7 @@ TW_INLINE V log(V x) {
                    z2 * ((0x1.2492492deec42p-2 + z * 0x1.c71c62e683353p-3) + z2 * high));
   const V half = 0.5 * f * f;
   V result = k * kLn2High - ((half - (s * (half + r) + k * kLn2Low)) - f);
-  mend(odd, result, [&](int i) { return standard_log(lane(x, i)); });
+  mend(odd, result, [&](int i) { return odd_log(lane(x, i)); });
   return result;
 }
 
@@ -125,14 +132,14 @@ TW_INLINE Expm1Parts<V> expm1_parts(V x) {
   return {k, r, z * e + (low + low * r)};
 }
 
-// Exponential.  0.95 ulp; beyond 708 either way by the standard library.
+// Exponential.  0.95 ulp.
 template <Number V>
 TW_INLINE V exp(V x) {
   const auto far = !(abs(x) <= 708.0);
   const V near = select(far, 0.0, x);
   const auto p = expm1_parts(near);
   V result = (1.0 + (p.r + p.tail)) * power_of_two(p.k);
-  mend(far, result, [&](int i) { return standard_exp(lane(x, i)); });
+  mend(far, result, [&](int i) { return far_exp(lane(x, i)); });
   return result;
 }
 
@@ -167,8 +174,7 @@ TW_INLINE V octant_angle(V low, V top) {
   return select(octant.upper, kQuarter + (octant.arc + kQuarterLow), octant.arc);
 }
 
-// The angle of (x, y), from -pi to pi.  1.9 ulp; extremes, two zeros, infinities and not-a-numbers
-// by the standard library.
+// The angle of (x, y), from -pi to pi.  1.9 ulp.
 template <Number V>
 TW_INLINE V atan2(V y, V x) {
   constexpr double kPi = 0x1.921fb54442d18p+1, kPiLow = 0x1.1a62633145c07p-53;
@@ -188,7 +194,7 @@ TW_INLINE V atan2(V y, V x) {
   const auto minus = steep != back;
   const V signed_arc = select(minus, -arc, arc);
   V result = copysign(turned * kPi + (signed_arc + turned * kPiLow), y);
-  mend(odd, result, [&](int i) { return standard_atan2(lane(y, i), lane(x, i)); });
+  mend(odd, result, [&](int i) { return odd_atan2(lane(y, i), lane(x, i)); });
   return result;
 }
 
@@ -260,7 +266,7 @@ TW_INLINE V expm1(V x) {
   const V inner = p.r + p.tail;
   V result = select(p.k == 0.0, inner, (scale - 1.0) + scale * inner);
   result = select(near == 0.0, near, result);
-  mend(far, result, [&](int i) { return standard_exp(lane(x, i)) - 1.0; });
+  mend(far, result, [&](int i) { return far_exp(lane(x, i)) - 1.0; });
   return result;
 }
 

@@ -8,6 +8,7 @@
 // Comparisons give a Mask<V>, combined by &, | and !, and used by select().
 #pragma once
 
+#include <float.h>
 #include <stdint.h>
 
 #if defined(__SSE2__)
@@ -21,6 +22,10 @@
 // On every function of a formula: a function that stayed a symbol of its own could be linked from
 // an object that was compiled for a wider processor.
 #define TW_INLINE [[gnu::always_inline]] inline
+
+#if FLT_EVAL_METHOD != 0 && FLT_EVAL_METHOD != 1
+#error "Doubles must be rounded at each step: x87 arithmetic gives other figures (-msse2 -mfpmath=sse)"
+#endif
 
 namespace tidewater::points {
 
@@ -65,7 +70,7 @@ TW_INLINE int64_t shift_right(int64_t b, int n) { return b >> n; }  // keeps the
 TW_INLINE double lane(double v, int) { return v; }
 TW_INLINE bool lane(bool m, int) { return m; }
 
-// f(v), for the few values that only the standard library can serve.
+// f(i), for the few values that a formula's short road does not cover.
 template <class F>
 TW_INLINE void mend(bool m, double& result, F f) {
   if (m) [[unlikely]] {
@@ -192,6 +197,8 @@ TW_INLINE bool any(LanesMask<N> a) {
 #endif
 #if defined(__SSE2__)
   if constexpr (N == 2) return _mm_movemask_pd(__builtin_bit_cast(__m128d, a.m)) != 0;
+#elif defined(__wasm_simd128__)
+  if constexpr (N == 2) return wasm_v128_any_true(__builtin_bit_cast(v128_t, a.m));
 #endif
   int64_t either = 0;
   for (int i = 0; i < N; ++i) either |= a.m[i];
@@ -223,7 +230,12 @@ TW_INLINE Lanes<N> select(LanesMask<N> m, double a, Lanes<N> b) {
 
 template <int N>
 TW_INLINE Lanes<N> abs(Lanes<N> a) {
+#if defined(__wasm_simd128__)
+  return __builtin_bit_cast(typename Lanes<N>::Vector,
+                            wasm_f64x2_abs(__builtin_bit_cast(v128_t, a.v)));
+#else
   return number(bits(a) & LanesBits<N>(INT64_MAX));
+#endif
 }
 template <int N>
 TW_INLINE Lanes<N> copysign(Lanes<N> a, Lanes<N> sign) {

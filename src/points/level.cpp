@@ -17,7 +17,7 @@ bool has(Level wanted) {
     case Level::baseline:
       return true;
 #endif
-#if defined(__x86_64__) || defined(__i386__)
+#if defined(TIDEWATER_WIDE_LANES)
     case Level::avx2:
       return __builtin_cpu_supports("avx2");
     case Level::avx512:
@@ -33,7 +33,7 @@ bool has(Level wanted) {
 constexpr const char* kNames[kLevels] = {"one_by_one", "baseline", "avx2", "avx512"};
 
 Level widest() {
-#if defined(__x86_64__) || defined(__i386__)
+#if defined(TIDEWATER_WIDE_LANES)
   __builtin_cpu_init();
 #endif
   int most = kLevels - 1;

@@ -50,8 +50,13 @@ Level level() noexcept;
 // or the build lacks it.
 bool ask_for_level(Level wanted) noexcept;
 
-// Up to this many points are done one by one.
+// Up to this many points are done one by one.  Where every byte counts a kernel is compiled for
+// blocks alone, and few points fill one up.
+#if defined(TIDEWATER_ONE_WIDTH)
+inline constexpr int32_t kFew = 0;
+#else
 inline constexpr int32_t kFew = 4;
+#endif
 
 template <class Kernel>
 concept TakesThree = requires(const Kernel& kernel, double v) {
@@ -76,7 +81,10 @@ TW_INLINE Next one_point(const Kernel& kernel, const CoordinateTriple& in, Coord
     }
   }();
   if constexpr (requires { &Kernel::other; }) {
-    if (!answer.plain) return kernel.other(in, out, status);
+    if (!answer.plain) [[unlikely]] {
+      const Kernel kept = kernel;  // so that the kernel itself may stay in registers
+      return kept.other(in, out, status);
+    }
   }
   out->x = answer.x;
   out->y = answer.y;
@@ -84,34 +92,54 @@ TW_INLINE Next one_point(const Kernel& kernel, const CoordinateTriple& in, Coord
   return Next::point;
 }
 
-// The loop over points of every array function: the status word of the whole array.
+// A block or more of points: as over_points().
 template <class Kernel>
-TWstatus over_points(const Kernel& kernel, int32_t count, const CoordinateTriple* in,
-                     CoordinateTriple* out) {
+[[gnu::noinline]] TWstatus over_many_points(const Kernel& kernel, int32_t count,
+                                            const CoordinateTriple* in, CoordinateTriple* out) {
   TWstatus status = TW_SUCCESS;
+#if defined(TIDEWATER_ONE_WIDTH)
+  run<Level::baseline>(kernel, count, in, out, &status);
+#else
   int32_t i = 0;
-  if (count > kFew) {
-    switch (level()) {
-#if defined(__x86_64__) || defined(__i386__)
-      case Level::avx512:
-        // Below one block of it the narrower one wastes less.
-        i = count >= 16 ? run<Level::avx512>(kernel, count, in, out, &status)
-                        : run<Level::avx2>(kernel, count, in, out, &status);
-        break;
-      case Level::avx2:
-        i = run<Level::avx2>(kernel, count, in, out, &status);
-        break;
+  switch (level()) {
+#if defined(TIDEWATER_WIDE_LANES)
+    case Level::avx512:
+      // Below one block of it the narrower one wastes less.
+      i = count >= 16 ? run<Level::avx512>(kernel, count, in, out, &status)
+                      : run<Level::avx2>(kernel, count, in, out, &status);
+      break;
+    case Level::avx2:
+      i = run<Level::avx2>(kernel, count, in, out, &status);
+      break;
 #endif
 #if defined(TIDEWATER_BASELINE_LANES)
-      case Level::baseline:
-        i = run<Level::baseline>(kernel, count, in, out, &status);
-        break;
+    case Level::baseline:
+      i = run<Level::baseline>(kernel, count, in, out, &status);
+      break;
 #endif
-      default:
-        break;
-    }
+    default:
+      break;
   }
   for (; i < count; ++i) {
+    if (one_point(kernel, in[i], out + i, &status) == Next::none) break;
+  }
+#endif
+  return status;
+}
+
+// The loop over points of every array function: the status word of the whole array.
+//
+// Inline, and with a copy of the kernel for the road of many points: a kernel of a few points whose
+// address nobody takes stays in registers.
+template <class Kernel>
+TW_INLINE TWstatus over_points(const Kernel& kernel, int32_t count, const CoordinateTriple* in,
+                               CoordinateTriple* out) {
+  if (count > kFew) {
+    const Kernel kept = kernel;
+    return over_many_points(kept, count, in, out);
+  }
+  TWstatus status = TW_SUCCESS;
+  for (int32_t i = 0; i < count; ++i) {
     if (one_point(kernel, in[i], out + i, &status) == Next::none) break;
   }
   return status;

@@ -9,6 +9,7 @@
 #include <string>
 #include <string_view>
 
+#include "points/portable.hpp"
 #include "text/locale.hpp"
 #include "text/wide.hpp"
 
@@ -139,7 +140,7 @@ std::string sexagesimal_text(double v, int precision, Form form) {
   // Seconds that would be rounded to 60 go to the next minute.  The bound is included, with an
   // allowance for its own rounding; it does not grow with the value, the double alone decides.
   constexpr double kBoundRounding = 4 * std::numeric_limits<double>::epsilon() * 60;
-  const double half_unit = std::pow(10.0, -precision) * 0.5;
+  const double half_unit = portable::pow(10.0, -precision) * 0.5;
   if (std::fabs(60 - sec) <= half_unit + kBoundRounding) {
     sec = 0;
     min += 1;
@@ -151,11 +152,12 @@ std::string sexagesimal_text(double v, int precision, Form form) {
 
   const bool packed = form == Form::packed;
   if (precision == 0) {
-    const char* format = packed ? "%.0f.%.2d%.2d" : "%.0f:%.2d:%.2d";
-    return formatted(format, deg, truncated(min), truncated(sec + 0.5));
+    const char* format = packed ? "%d.%.2d%.2d" : "%d:%.2d:%.2d";
+    return formatted(format, truncated(deg), truncated(min), truncated(sec + 0.5));
   }
-  const char* format = packed ? "%.0f.%02.0f%0*.*f" : "%.0f:%02.0f:%0*.*f";
-  std::string text = formatted(format, deg, min, precision + 3, precision, sec);
+  const char* format = packed ? "%d.%02d%0*.*f" : "%d:%02d:%0*.*f";
+  std::string text =
+      formatted(format, truncated(deg), truncated(min), precision + 3, precision, sec);
   if (packed) {
     // Only the first full stop stays, that of the degrees.
     const auto behind_first = text.begin() + static_cast<std::ptrdiff_t>(text.find('.')) + 1;
@@ -190,6 +192,55 @@ std::string angle_text(double value, const AngleUnit& unit, int16_t axis) {
   return text;
 }
 
+// The text has room for one character more than it holds; the unit's format is wide.
+void read_angle(char16_t* text, const AngleUnit& unit, int16_t axis, const LocaleSigns& signs,
+                double* value, TWstatus* status) {
+  *status = TW_SUCCESS;
+  const std::u16string_view given = text;
+  const auto allowed = [&](char16_t c) {
+    if (c >= u'0' && c <= u'9') return true;
+    constexpr std::u16string_view kAllowed = u"NEWSnews-+ :\n";
+    return kAllowed.find(c) != kAllowed.npos ||
+           signs.decimal_separator.find(c) != std::u16string::npos ||
+           signs.positive.find(c) != std::u16string::npos ||
+           signs.negative.find(c) != std::u16string::npos;
+  };
+  if (!std::all_of(given.begin(), given.end(), allowed)) {
+    *status = TW_BAD_TEXT;
+    return;
+  }
+  const bool in_front = unit.hemisphere_mode == kLetterInFront;
+  const bool behind = unit.hemisphere_mode == kLetterBehind;
+  if (in_front || behind) {
+    const std::size_t letter = given.find_first_of(u"NEWSnews");
+    if (letter == given.npos || letter != (in_front ? 0 : given.size() - 1)) {
+      *status = TW_BAD_TEXT;
+      return;
+    }
+    // By contract: with a letter of the other axis the value is still read and written.
+    if (!replace_letter(text, given.size(), letter, axis, signs.negative)) *status = TW_BAD_TEXT;
+  }
+
+  const std::u16string_view number = text;
+  double result = 0;
+  switch (form_of(unit)) {
+    case Form::decimal:
+      if (number.find(u':') != number.npos) {
+        *status = TW_BAD_TEXT;
+        return;
+      }
+      scan_number(number, &result);
+      break;
+    case Form::packed:
+      result = read_packed(number).total();
+      break;
+    case Form::colon:
+      result = read_colon(number, signs.negative).total();
+      break;
+  }
+  *value = with_axis_sense(result * unit.factor, unit, axis);
+}
+
 }  // namespace
 
 AngleUnit tidewater::detail::with_wide_format(const AngleUnit& unit) {
@@ -203,63 +254,18 @@ AngleUnit tidewater::detail::with_wide_format(const AngleUnit& unit) {
 
 void TWascii_to_rad(const char* text, AngleUnit unit, int16_t axis, double* value,
                     TWstatus* status) {
-  *status = TW_SUCCESS;
   without_exceptions(status, [&] {
-    adopt_user_locale();
+    const LocaleSigns signs = adopt_user_locale_signs();
     std::u16string wide = widen(text, kReadLimit);
     wide += u'\0';  // room for the sign
-    TWascii_to_rad_wide(wide.data(), with_wide_format(unit), axis, value, status);
+    read_angle(wide.data(), with_wide_format(unit), axis, signs, value, status);
   });
 }
 
 void TWascii_to_rad_wide(TWchar16* text, AngleUnit unit, int16_t axis, double* value,
                          TWstatus* status) {
-  without_exceptions(status, [&] {
-    const LocaleSigns signs = adopt_user_locale_signs();
-    *status = TW_SUCCESS;
-    const std::u16string_view given = text;
-    const auto allowed = [&](char16_t c) {
-      constexpr std::u16string_view kAllowed = u"0123456789NEWSnews-+ :\n";
-      return kAllowed.find(c) != kAllowed.npos ||
-             signs.decimal_separator.find(c) != std::u16string::npos ||
-             signs.positive.find(c) != std::u16string::npos ||
-             signs.negative.find(c) != std::u16string::npos;
-    };
-    if (!std::all_of(given.begin(), given.end(), allowed)) {
-      *status = TW_BAD_TEXT;
-      return;
-    }
-    const bool in_front = unit.hemisphere_mode == kLetterInFront;
-    const bool behind = unit.hemisphere_mode == kLetterBehind;
-    if (in_front || behind) {
-      const std::size_t letter = given.find_first_of(u"NEWSnews");
-      if (letter == given.npos || letter != (in_front ? 0 : given.size() - 1)) {
-        *status = TW_BAD_TEXT;
-        return;
-      }
-      // By contract: with a letter of the other axis the value is still read and written.
-      if (!replace_letter(text, given.size(), letter, axis, signs.negative)) *status = TW_BAD_TEXT;
-    }
-
-    const std::u16string_view number = text;
-    double result = 0;
-    switch (form_of(unit)) {
-      case Form::decimal:
-        if (number.find(u':') != number.npos) {
-          *status = TW_BAD_TEXT;
-          return;
-        }
-        scan_number(number, &result);
-        break;
-      case Form::packed:
-        result = read_packed(number).total();
-        break;
-      case Form::colon:
-        result = read_colon(number, signs.negative).total();
-        break;
-    }
-    *value = with_axis_sense(result * unit.factor, unit, axis);
-  });
+  without_exceptions(
+      status, [&] { read_angle(text, unit, axis, adopt_user_locale_signs(), value, status); });
 }
 
 void TWrad_to_ascii(double value, AngleUnit unit, int16_t axis, char* text, TWstatus* status) {

@@ -1,7 +1,7 @@
 // What the coordinate texts need of the angle texts.
 #pragma once
 
-#include "tidewater/text.h"
+#include "tidewater/angle_text.h"
 
 namespace tidewater::detail {
 

@@ -7,7 +7,9 @@
 #include "text/angle.hpp"
 #include "text/measure.hpp"
 #include "text/wide.hpp"
-#include "tidewater/text.h"
+#include "tidewater/angle_text.h"
+#include "tidewater/coordinate_text.h"
+#include "tidewater/measure_text.h"
 
 using namespace tidewater::detail;
 

@@ -7,7 +7,7 @@
 
 #include "text/locale.hpp"
 #include "text/wide.hpp"
-#include "tidewater/text.h"
+#include "tidewater/measure_text.h"
 
 using namespace tidewater::detail;
 

@@ -18,6 +18,7 @@
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
 #include "tidewater/datum.h"
+#include "tidewater/transformation.hpp"
 
 #ifdef TIDEWATER_HAVE_TIFF
 #include <tiffio.h>
@@ -842,6 +843,198 @@ TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
   }
 }
 
+// --- grids in the registry's operations ----------------------------------------------------------
+
+Transformation by_operation(const char* source, const char* target, const char* operation,
+                            const fs::path& folder) {
+  TransformationOptions options;
+  options.operation = operation;
+  options.grid_folders = {folder.string()};
+  return Transformation(System(source), System(target), options);
+}
+
+// Translations about those of the whole country, over France as the institute's grid lies.
+TiffImage translations() {
+  const auto band = [](const char* name, double mean, double along, double across) {
+    return Band{name, "metre", "", [=](int row, int column) {
+                  return static_cast<float>(mean + along * std::sin(0.3 * column) +
+                                            across * std::cos(0.2 * row));
+                }};
+  };
+  TiffImage image{-5.5, 41, 0.5, 0.5, 32, 23, {}};
+  image.type = "GEOCENTRIC_TRANSLATION";
+  image.bands = {band("x_translation", -168, 1.5, 0.7), band("y_translation", -60, -0.8, 1.1),
+                 band("z_translation", 320, 0.4, -0.9)};
+  return image;
+}
+
+TEST(GridOperations, GeocentricTranslationsGoThereAndBack) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "fr_ign_gr3df97a.tif").string();
+  write_tiff(path, {translations()});
+  const Transformation map = by_operation("EPSG:4807", "EPSG:4171", "EPSG:9327", folder.path());
+  EXPECT_NE(map.describe().find("EPSG:9327"), std::string::npos);
+  const Transformation plain = by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+  for (const Point& p : points_in({-5, 42, 9, 51}, 300)) {
+    const Point there = plain.forward({p.x, p.y, 0});
+    const Point back = plain.inverse(there);
+    // Systems without heights lose some tens of metres of it on the way, which is worth 1 mm.
+    EXPECT_LT(apart(back.x, p.x), 1.5e-8);
+    EXPECT_NEAR(back.y, p.y, 1.5e-8);
+    // The same from the meridian of Paris, whose degrees are the system's own.
+    const Point paris = map.forward({p.x - 2.33722917, p.y, 0});
+    EXPECT_LT(apart(paris.x, there.x), 1e-9);
+    EXPECT_NEAR(paris.y, there.y, 1e-9);
+  }
+  TWstatus word = TW_SUCCESS;
+  double x = 20, y = 45;
+  const Summary outside =
+      plain.forward(1, Coordinates<const double>{&x, &y}, Coordinates<double>{&x, &y}, {&word, 1});
+  EXPECT_EQ(outside.failed, 1u);
+  EXPECT_EQ(word, TW_I_OUTSIDE_CNT);
+  EXPECT_TRUE(std::isnan(x));
+#ifdef TIDEWATER_HAVE_PROJ
+  const std::string pipeline =
+      "+proj=pipeline +step +proj=unitconvert +xy_in=deg +xy_out=rad +step +proj=push +v_3 +step "
+      "+proj=cart +ellps=clrk80ign +step +proj=xyzgridshift +grids=" +
+      path +
+      " +grid_ref=output_crs +ellps=GRS80 +step +inv +proj=cart +ellps=GRS80 +step +proj=pop +v_3 "
+      "+step +proj=unitconvert +xy_in=rad +xy_out=deg";
+  PJ_CONTEXT* const context = proj_context_create();
+  PJ* const peer = proj_create(context, pipeline.c_str());
+  ASSERT_NE(peer, nullptr);
+  double worst = 0;
+  for (const Point& p : points_in({-5, 42, 9, 51}, 300)) {
+    const Point there = plain.forward({p.x, p.y, 0});
+    const PJ_COORD expected = proj_trans(peer, PJ_FWD, proj_coord(p.x, p.y, 0, 0));
+    worst = std::max({worst, apart(there.x, expected.xy.x), std::fabs(there.y - expected.xy.y)});
+    const PJ_COORD back = proj_trans(peer, PJ_INV, proj_coord(there.x, there.y, 0, 0));
+    const Point ours = plain.inverse(there);
+    worst = std::max({worst, apart(ours.x, back.xy.x), std::fabs(ours.y - back.xy.y)});
+  }
+  proj_destroy(peer);
+  proj_context_destroy(context);
+  std::printf("geocentric translations beside the peer: within %.2g m\n", worst * 111e3);
+  EXPECT_LT(worst, kTenthOfMillimetre);
 #endif
+  // Without the grid the refusal names it; a file of another kind is refused.
+  fs::remove(path);
+  try {
+    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+    ADD_FAILURE();
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find("gr3df97a"), std::string::npos) << error.what();
+  }
+  TiffImage shifts{-5.5,
+                   41,
+                   0.5,
+                   0.5,
+                   32,
+                   23,
+                   {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  write_tiff(path, {shifts});
+  try {
+    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+    ADD_FAILURE();
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find("no bands of geocentric translations"),
+              std::string::npos)
+        << error.what();
+  }
+}
+
+// The form in which the grid of NTv1 is handed out today.
+TEST(GridOperations, FirstNationalTransformationOfCanada) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "ca_nrc_ntv1_can.tif").string();
+  const auto plane = [](float at, float east, float north) {
+    return [=](int row, int column) {
+      return at + east * static_cast<float>(column) + north * static_cast<float>(row);
+    };
+  };
+  TiffImage image{-142, 40, 1, 1, 95, 45, {}};
+  image.bands = {{"latitude_offset", "arc-second", "", plane(0.5F, 0.015625F, -0.03125F)},
+                 {"longitude_offset", "arc-second", "east", plane(-2, 0.0625F, 0.125F)}};
+  write_tiff(path, {image});
+  const Transformation map = by_operation("EPSG:4267", "EPSG:4269", "EPSG:1312", folder.path());
+  for (const Point& p : points_in({-140, 45, -55, 80}, 200)) {
+    const Point there = map.forward(p);
+    const double column = p.x + 142, row = p.y - 40;
+    EXPECT_NEAR(there.x, p.x + (-2 + 0.0625 * column + 0.125 * row) / 3600, 1e-12);
+    EXPECT_NEAR(there.y, p.y + (0.5 + 0.015625 * column - 0.03125 * row) / 3600, 1e-12);
+    const Point back = map.inverse(there);
+    EXPECT_NEAR(back.x, p.x, 1e-10);
+    EXPECT_NEAR(back.y, p.y, 1e-10);
+  }
+}
+
+#endif
+
+// A .gtx file: a header of four doubles and two counts, then the rows from the south, big-endian.
+std::string gtx(double west, double south, double step, int rows, int columns,
+                const std::function<float(int row, int column)>& value) {
+  std::string bytes;
+  const auto put = [&](auto bits) {
+    for (int shift = 8 * static_cast<int>(sizeof bits) - 8; shift >= 0; shift -= 8) {
+      bytes += static_cast<char>(bits >> shift & 0xff);
+    }
+  };
+  for (const double v : {south, west, step, step}) put(std::bit_cast<std::uint64_t>(v));
+  put(static_cast<std::uint32_t>(rows));
+  put(static_cast<std::uint32_t>(columns));
+  for (int r = 0; r < rows; ++r) {
+    for (int c = 0; c < columns; ++c) put(std::bit_cast<std::uint32_t>(value(r, c)));
+  }
+  return bytes;
+}
+
+// NZVD2016 to the heights of Auckland 1946: what the grid has is added on the way there.
+TEST(GridOperations, OffsetsBetweenVerticalDatums) {
+  const ScratchFolder folder;
+  const auto plane = [](int row, int column) {
+    return 0.25F + 0.03125F * static_cast<float>(column) - 0.0625F * static_cast<float>(row);
+  };
+  folder.write("auckht1946-nzvd2016.gtx", gtx(173, -38, 0.25, 17, 17, plane));
+  const auto expected = [](const Point& p) {
+    return 0.25 + 0.03125 * (p.x - 173) / 0.25 - 0.0625 * (p.y + 38) / 0.25;
+  };
+  const auto map = [&](const char* source, const char* target, const char* operation = "") {
+    TransformationOptions options;
+    options.operation = operation;
+    options.grid_folders = {folder.path().string()};
+    return Transformation(System(source), System(target), options);
+  };
+  const Transformation there = map("EPSG:4167+7839", "EPSG:4167+5759");
+  EXPECT_NE(there.describe().find("EPSG:9312"), std::string::npos) << there.describe();
+  EXPECT_NEAR(there.accuracy(), 0.02, 1e-12);
+  const Transformation back = map("EPSG:4167+5759", "EPSG:4167+7839");
+  const Transformation named = map("EPSG:4167+7839", "EPSG:4167+5759", "EPSG:9312");
+  const Transformation own =
+      map("EPSG:4167+7839", "EPSG:4167+5759", "offset:auckht1946-nzvd2016.gtx");
+  for (const Point& p : points_in({173.5, -37.5, 176.5, -34.5}, 100)) {
+    const Point to = there.forward(p);
+    EXPECT_NEAR(to.x, p.x, 1e-13);
+    EXPECT_NEAR(to.z, p.z + expected(p), 1e-9);
+    EXPECT_NEAR(there.inverse(to).z, p.z, 1e-12);
+    EXPECT_NEAR(back.forward(to).z, p.z, 1e-12);
+    EXPECT_EQ(named.forward(p).z, to.z);
+    EXPECT_EQ(own.forward(p).z, to.z);
+  }
+  EXPECT_TRUE(std::isnan(own.accuracy()));
+  EXPECT_TRUE(std::isnan(there.forward({160, -36, 5}).z));
+#ifdef TIDEWATER_HAVE_PROJ
+  const std::string definition = "+proj=vgridshift +multiplier=1 +grids=" +
+                                 (folder.path() / "auckht1946-nzvd2016.gtx").string();
+  PJ_CONTEXT* const context = proj_context_create();
+  PJ* const peer = proj_create(context, definition.c_str());
+  ASSERT_NE(peer, nullptr);
+  for (const Point& p : points_in({173.5, -37.5, 176.5, -34.5}, 100)) {
+    const PJ_COORD to = proj_trans(peer, PJ_FWD, proj_coord(p.x * kDegree, p.y * kDegree, p.z, 0));
+    EXPECT_NEAR(there.forward(p).z, to.xyz.z, 1e-6);
+  }
+  proj_destroy(peer);
+  proj_context_destroy(context);
+#endif
+}
 
 }  // namespace

@@ -106,7 +106,8 @@ TEST(Heights, ByOffsetsAgreeWithThePeer) {
 #endif
 
 // Guidance note 7-2 of the registry, example of method 1046: LN02 height 473 m at 47 20 N, 9 40 E
-// is EVRF2000 height 472.69 m.
+// is EVRF2000 height 472.69 m; PROJ, to which ByOffsetsAgreeWithThePeer holds the same operation,
+// has it too.
 TEST(Heights, OffsetAndSlopeOfTheGuidanceNote) {
   const Transformation map = between("EPSG:4258+5728", "EPSG:4258+5730");
   const Point there = map.forward({9 + 40.0 / 60, 47 + 20.0 / 60, 473});

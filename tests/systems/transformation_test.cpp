@@ -303,6 +303,16 @@ TEST(Systems, NamesThatUsersType) {
   EXPECT_EQ(System("utm", -3.7, 40.4).code(), 32630);
   EXPECT_EQ(System("utm", 5, 60).code(), 32632);  // Norway's wider zone
   EXPECT_EQ(System("ups:S").code(), 5042);
+  EXPECT_EQ(System("mgrs", 2.35, 48.85).code(), 32631);
+  EXPECT_EQ(System("usng", -77, 38.9).code(), 32618);
+  EXPECT_EQ(System("mgrs", 10, 88).code(), 5041);
+  EXPECT_EQ(System("mgrs", 10, -85).code(), 5042);
+  EXPECT_EQ(System("mgrs:31U").code(), 32631);
+  EXPECT_EQ(System("mgrs:56H").code(), 32756);
+  EXPECT_EQ(System("mgrs:Z").code(), 5041);
+  EXPECT_EQ(System("mgrs:a").code(), 5042);
+  EXPECT_EQ(System("mgrs:31UDQ4811").code(), 32631);
+  EXPECT_EQ(System("usng 18S UJ 23480 06470").code(), 32618);
   EXPECT_EQ(System("web mercator").code(), 3857);
   EXPECT_EQ(System("WGS84").code(), 4326);
   EXPECT_EQ(System("rgf93 v1 / lambert 93").code(), 2154);
@@ -329,6 +339,10 @@ TEST(Systems, RefusalsAreSentences) {
   EXPECT_TRUE(has(why("EPSG:99999999"), "99999999"));
   EXPECT_TRUE(has(why("utm"), "zone"));
   EXPECT_TRUE(has(why("utm:61N"), "1 to 60"));
+  EXPECT_TRUE(has(why("mgrs"), "parse_mgrs()"));
+  EXPECT_FALSE(has(why("mgrs:61U"), "not refused"));
+  EXPECT_FALSE(has(why("mgrs:31I"), "not refused"));
+  EXPECT_FALSE(has(why("mgrs:31UDQ48251"), "not refused"));
   EXPECT_TRUE(has(why("utm:31"), "N or S"));
   EXPECT_TRUE(has(why("spcs83:1"), "state plane"));
   EXPECT_TRUE(has(why("no such system anywhere"), "no such system anywhere"));

@@ -10,6 +10,7 @@
 #include "command.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
+#include "tidewater/version.h"
 
 using namespace tidewater::test;
 

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "command.hpp"
+#include "tidewater/version.h"
 
 using namespace tidewater::test;
 

@@ -42,15 +42,6 @@ std::string text_after_reading(std::string_view text, const AngleUnit& unit, int
   return plain(block.get());
 }
 
-TEST_F(AngleText, UnitHasTheLayoutOfItsFields) {
-  EXPECT_EQ(offsetof(AngleUnit, format), 0u);
-  EXPECT_EQ(offsetof(AngleUnit, wide_format), 0u);
-  EXPECT_EQ(offsetof(AngleUnit, precision), 32u);
-  EXPECT_EQ(offsetof(AngleUnit, hemisphere_mode), 34u);
-  EXPECT_EQ(offsetof(AngleUnit, factor), 40u);
-  EXPECT_EQ(sizeof(AngleUnit), 48u);
-}
-
 TEST_F(AngleText, ReadsTheColonForm) {
   const AngleUnit unit = colon_form(0);
   expect_read("12:30:00", unit, 0, degrees(12.5));

@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstddef>
 #include <cstring>
 
 #include "support/fake_store.hpp"
@@ -115,22 +114,6 @@ TEST_F(CatalogueLists, ZonesOfTheTwoSystems) {
   TWsp_nam_t_num("p", 83, "California VII", &number, &status_);
   EXPECT_EQ(status_, TW_BAD_ZONE);
   EXPECT_EQ(number, 407);
-}
-
-TEST(CatalogueRecords, HaveTheLayoutOfTheirRows) {
-  EXPECT_EQ(sizeof(ZoneRecord), 44u);
-  EXPECT_EQ(offsetof(ZoneRecord, zone_name), 2u);
-  EXPECT_EQ(sizeof(SatelliteRecord), 120u);
-  EXPECT_EQ(offsetof(SatelliteRecord, real1), 32u);
-  EXPECT_EQ(offsetof(SatelliteRecord, angle1), 48u);
-  EXPECT_EQ(offsetof(SatelliteRecord, real3), 64u);
-  EXPECT_EQ(offsetof(SatelliteRecord, angle3), 88u);
-  EXPECT_EQ(offsetof(SatelliteRecord, count1), 96u);
-  EXPECT_EQ(offsetof(SatelliteRecord, short1), 100u);
-  EXPECT_EQ(offsetof(SatelliteRecord, id), 106u);
-  EXPECT_EQ(sizeof(MreTerm), 16u);
-  EXPECT_EQ(offsetof(MreTerm, power_u), 8u);
-  EXPECT_EQ(offsetof(MreTerm, power_v), 10u);
 }
 
 TEST_F(CatalogueLists, SatellitesComeWithTheirAnglesInRadians) {

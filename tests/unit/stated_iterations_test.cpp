@@ -156,7 +156,8 @@ TEST(StatedIterations, Albers) {
         long_ones += s.steps > 12;
         TWalbers_i(e, 0.1, n, C, rho0, 1, &p, &out, &status);
         EXPECT_EQ(status, s.limited ? TW_I_LATITUDE_LIMITED : TW_SUCCESS) << e << " " << lat;
-        expect_near(out, 0.7, s.lat, 1e-13);
+        // A step divides the rounding of its terms by the cosine.
+        expect_near(out, 0.7, s.lat, 1e-13 + 1e-16 / std::cos(s.lat));
       }
     }
   }

@@ -11,6 +11,7 @@
 
 #include "commands.hpp"
 #include "stream.hpp"
+#include "tidewater/version.h"
 
 namespace tidewater::command {
 

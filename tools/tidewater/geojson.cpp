@@ -437,9 +437,9 @@ int convert_geojson(const ConvertOptions& given) {
     counts.refused += converter.counts().refused;
   }
   flush_out();
-  std::fprintf(stderr, "%lld geometries converted, %lld outside the grids, %lld refused\n",
-               static_cast<long long>(counts.done), static_cast<long long>(counts.outside),
-               static_cast<long long>(counts.refused));
+  std::fprintf(stderr, "%lld %s converted, %lld outside the grids, %lld refused\n",
+               static_cast<long long>(counts.done), counts.done == 1 ? "geometry" : "geometries",
+               static_cast<long long>(counts.outside), static_cast<long long>(counts.refused));
   return counts.outside + counts.refused > 0 ? kSomeRefused : 0;
 }
 

@@ -17,6 +17,7 @@
 #include "stream.hpp"
 #include "tidewater/magnetic_model.hpp"
 #include "tidewater/systems.h"
+#include "tidewater/version.h"
 
 namespace tidewater::command {
 

@@ -538,7 +538,8 @@ class Areas : public Job {
     return std::string(out.text());
   }
   std::string summary(const Counts& counts) const override {
-    return std::to_string(counts.done) + " positions, " + std::to_string(rings_) + " areas, " +
+    return std::to_string(counts.done) + (counts.done == 1 ? " position, " : " positions, ") +
+           std::to_string(rings_) + (rings_ == 1 ? " area, " : " areas, ") +
            std::to_string(counts.refused) + " refused";
   }
 

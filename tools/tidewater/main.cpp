@@ -9,6 +9,7 @@
 
 #include "commands.hpp"
 #include "stream.hpp"
+#include "tidewater/version.h"
 
 namespace {
 

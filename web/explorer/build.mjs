@@ -1,4 +1,4 @@
-// Cuts the coastlines of world-atlas into cells of five degrees, which the map can take one by one.
+// Cuts the coastlines of world-atlas into cells, which the map can take one by one.
 //   node build.mjs FOLDER   writes land-110.bin and land-50.bin
 //
 // A file: the number of pieces, then of lines, as 32-bit words; the number of points of each piece
@@ -9,8 +9,9 @@ import { readFileSync, writeFileSync, mkdirSync } from "node:fs";
 import { createRequire } from "node:module";
 import { feature } from "topojson-client";
 
-const CELL = 5;
-const STEP = 2.5; // edges are this long at most, and of the same points on both sides of a cell's edge
+// By the scale of the coastlines: the size of a cell, and the longest edge, degrees.  A cell's edges
+// have the same points on both sides.
+const CELLS = { 50: { cell: 5, step: 2.5 }, 110: { cell: 10, step: 5 } };
 
 const { resolve } = createRequire(import.meta.url);
 // Where maps are stretched most, the only land being in the south.
@@ -37,7 +38,7 @@ function keep(ring, axis, sign, limit) {
 }
 
 // Points at multiples of the step, so that neighbours have the same ones.
-function dense(points, closed) {
+function dense(points, closed, step) {
   const out = [];
   const count = closed ? points.length : points.length - 1;
   for (let i = 0; i < count; ++i) {
@@ -48,7 +49,7 @@ function dense(points, closed) {
     const low = Math.min(a[axis], b[axis]);
     const high = Math.max(a[axis], b[axis]);
     const between = [];
-    for (let v = (Math.floor(low / STEP) + 1) * STEP; v < high - 1e-9; v += STEP) {
+    for (let v = (Math.floor(low / step) + 1) * step; v < high - 1e-9; v += step) {
       const t = (v - a[axis]) / (b[axis] - a[axis]);
       between.push([a[0] + t * (b[0] - a[0]), a[1] + t * (b[1] - a[1])]);
     }
@@ -85,20 +86,20 @@ function unwrapped(ring) {
   return out;
 }
 
-function cells(rings) {
+function cells(rings, { cell, step }) {
   const pieces = [];
   for (const ring of rings) {
     const open = ring.slice(0, -1);
     let [west, east] = [Infinity, -Infinity];
     for (const p of open) [west, east] = [Math.min(west, p[0]), Math.max(east, p[0])];
-    for (let x = Math.floor(west / CELL) * CELL; x < east; x += CELL) {
-      const strip = keep(keep(open, 0, 1, x), 0, -1, x + CELL);
+    for (let x = Math.floor(west / cell) * cell; x < east; x += cell) {
+      const strip = keep(keep(open, 0, 1, x), 0, -1, x + cell);
       if (strip.length < 3) continue;
       let [south, north] = [90, -90];
       for (const p of strip) [south, north] = [Math.min(south, p[1]), Math.max(north, p[1])];
-      for (let y = Math.floor(south / CELL) * CELL; y < north; y += CELL) {
-        const piece = keep(keep(strip, 1, 1, y), 1, -1, y + CELL);
-        if (piece.length >= 3 && Math.abs(area(piece)) > 1e-6) pieces.push(dense(piece, true));
+      for (let y = Math.floor(south / cell) * cell; y < north; y += cell) {
+        const piece = keep(keep(strip, 1, 1, y), 1, -1, y + cell);
+        if (piece.length >= 3 && Math.abs(area(piece)) > 1e-6) pieces.push(dense(piece, true, step));
       }
     }
   }
@@ -106,7 +107,7 @@ function cells(rings) {
 }
 
 // Coastlines without the edges that only close a polygon at the 180th meridian and the pole.
-function coasts(rings) {
+function coasts(rings, { step }) {
   const lines = [];
   const edge = (p) => Math.abs(Math.abs(p[0]) - 180) < 0.01;
   for (const ring of rings) {
@@ -114,18 +115,18 @@ function coasts(rings) {
     for (let i = 0; i + 1 < ring.length; ++i) {
       const pole = Math.min(ring[i][1], ring[i + 1][1]) < -89.9;
       if (pole || (edge(ring[i]) && edge(ring[i + 1]))) {
-        if (line.length > 1) lines.push(dense(line, false));
+        if (line.length > 1) lines.push(dense(line, false, step));
         line = [];
         continue;
       }
       if (line.length === 0) line.push(ring[i]);
       line.push(ring[i + 1]);
       if (line.length === 60 || Math.abs(Math.abs(ring[i + 1][0]) - 180) < 0.01) {
-        lines.push(dense(line, false));
+        lines.push(dense(line, false, step));
         line = [ring[i + 1]];
       }
     }
-    if (line.length > 1) lines.push(dense(line, false));
+    if (line.length > 1) lines.push(dense(line, false, step));
   }
   return lines;
 }
@@ -161,5 +162,5 @@ for (const scale of [110, 50]) {
     // Outer rings and holes turn against each other, which the map's filling rule goes by.
     for (const polygon of polygons) rings.push(...polygon.map(unwrapped));
   }
-  write(`${folder}/land-${scale}.bin`, cells(rings), coasts(rings));
+  write(`${folder}/land-${scale}.bin`, cells(rings, CELLS[scale]), coasts(rings, CELLS[scale]));
 }

@@ -128,19 +128,21 @@ class Band {
   area(piece, emit) {
     const { lon0, reach } = this;
     const first = wrapped(piece[0] - lon0);
-    const relative = new Array(piece.length);
     let [west, east, south, north] = [Infinity, -Infinity, Infinity, -Infinity];
     for (let i = 0; i < piece.length; i += 2) {
       const x = first + wrapped(piece[i] - piece[0]);
       const y = piece[i + 1];
-      relative[i] = x;
-      relative[i + 1] = y;
       if (x < west) west = x;
       if (x > east) east = x;
       if (y < south) south = y;
       if (y > north) north = y;
     }
     if (north < this.south || south > this.north) return;
+    if (west >= -reach && east <= reach && south >= this.south && north <= this.north) {
+      emit(piece);
+      return;
+    }
+    const relative = Array.from(piece, (v, i) => (i % 2 === 0 ? first + wrapped(v - piece[0]) : v));
     for (const turn of [0, 360, -360]) {
       if (west + turn > reach || east + turn < -reach) continue;
       let part = turn === 0 ? relative : relative.map((v, i) => (i % 2 === 0 ? v + turn : v));
@@ -156,6 +158,10 @@ class Band {
   // The same for a line.
   line(points, emit) {
     const { lon0, reach, south, north } = this;
+    if (this.#whole(points)) {
+      emit(points);
+      return;
+    }
     let run = [];
     const end = () => {
       if (run.length >= 4) emit(run);
@@ -187,6 +193,18 @@ class Band {
       y = ny;
     }
     end();
+  }
+
+  // Whether a line stays within the edges from beginning to end.
+  #whole(points) {
+    let x = wrapped(points[0] - this.lon0);
+    for (let i = 0; i < points.length; i += 2) {
+      if (i > 0) x += wrapped(points[i] - points[i - 2]);
+      if (!(Math.abs(x) <= this.reach && points[i + 1] >= this.south && points[i + 1] <= this.north)) {
+        return false;
+      }
+    }
+    return true;
   }
 }
 
@@ -224,6 +242,17 @@ function side(points, axis, sign, limit) {
   return out;
 }
 
+// Unit vectors of the points of a line or an area, formed once.
+const formed = new WeakMap();
+function vectorsOf(points) {
+  let vectors = formed.get(points);
+  if (!vectors) {
+    vectors = Array.from({ length: points.length / 2 }, (_, i) => vector(points[2 * i], points[2 * i + 1]));
+    formed.set(points, vectors);
+  }
+  return vectors;
+}
+
 class Cut {
   constructor(planes, border) {
     this.planes = planes;
@@ -246,8 +275,7 @@ class Cut {
 
   area(piece, emit) {
     let whole = true;
-    const vectors = [];
-    for (let i = 0; i < piece.length; i += 2) vectors.push(vector(piece[i], piece[i + 1]));
+    const vectors = vectorsOf(piece);
     for (const { n, d } of this.planes) {
       let any = false;
       for (const v of vectors) {
@@ -255,7 +283,7 @@ class Cut {
         else whole = false;
       }
       // Nothing of a piece is inside while all its corners are far out.
-      if (!any && vectors.every((v) => dot(v, n) < d)) return;
+      if (!any) return;
     }
     if (whole) {
       emit(piece);
@@ -275,9 +303,14 @@ class Cut {
       if (run.length >= 4) emit(run);
       run = [];
     };
-    let a = vector(points[0], points[1]);
+    const vectors = vectorsOf(points);
+    if (this.planes.every(({ n, d }) => vectors.every((v) => dot(v, n) >= d))) {
+      emit(points);
+      return;
+    }
+    let a = vectors[0];
     for (let i = 2; i < points.length; i += 2) {
-      const b = vector(points[i], points[i + 1]);
+      const b = vectors[i / 2];
       let [t, u] = [0, 1];
       for (const { n, d } of this.planes) {
         const [p, q] = [dot(a, n) - d, dot(b, n) - d];

@@ -61,24 +61,34 @@ function indicatrices(geodesics, { step, radius }, domain) {
   return circles;
 }
 
-// Anything of parts, cut and projected: where each begins, and plane coordinates in metres.
+// Room for what the cutting hands out, kept from one layer to the next.
+let room = [new Float64Array(1 << 16), new Float64Array(1 << 16)];
+
+// Anything of parts, cut and projected: where each begins, degrees, and plane coordinates in metres.
 function projected(parts, cut, mapping) {
   const starts = [0];
-  const lon = [];
-  const lat = [];
-  for (const part of parts) {
-    cut(part, (points) => {
-      for (let i = 0; i < points.length; i += 2) {
-        lon.push(points[i]);
-        lat.push(points[i + 1]);
-      }
-      starts.push(lon.length);
-    });
-  }
-  const x = Float64Array.from(lon);
-  const y = Float64Array.from(lat);
+  let count = 0;
+  const emit = (points) => {
+    const most = count + points.length / 2;
+    if (most > room[0].length) {
+      room = room.map((old) => {
+        const wider = new Float64Array(2 * most);
+        wider.set(old);
+        return wider;
+      });
+    }
+    const [lon, lat] = room;
+    for (let i = 0; i < points.length; i += 2) {
+      lon[count] = points[i];
+      lat[count++] = points[i + 1];
+    }
+    starts.push(count);
+  };
+  for (const part of parts) cut(part, emit);
+  const [lon, lat] = room.map((all) => all.slice(0, count));
+  const [x, y] = [lon.slice(), lat.slice()];
   mapping.forward(x, y);
-  return { starts, x, y };
+  return { starts, lon, lat, x, y };
 }
 
 // One hue from low to high for what only grows, two that meet in the middle for scale and area.
@@ -103,9 +113,8 @@ export const gradient = ({ stops }) =>
   `linear-gradient(90deg, ${stops.map((c) => `rgb(${c.join(" ")})`).join(", ")})`;
 
 export class MapView {
-  // What the last drawing did, for the tests: the longest step between neighbours of one line, as a
-  // part of the map's diagonal.
-  longest = 0;
+  // Layers as the present mapping has them: moving the map in its window projects nothing anew.
+  #shapes = new WeakMap();
 
   constructor(canvas, layers) {
     this.canvas = canvas;
@@ -123,6 +132,7 @@ export class MapView {
     this.mapping = mapping;
     this.domain = domain;
     this.frame = frame;
+    this.#shapes = new WeakMap();
     const border = projected([domain.border().flat()], (part, emit) => emit(part), mapping);
     this.outline = border;
     let shown = border;
@@ -138,9 +148,7 @@ export class MapView {
       }
     };
     take(shown);
-    if (!frame) {
-      take(projected(this.layers.graticule, (part, emit) => domain.line(part, emit), mapping));
-    }
+    if (!frame) take(this.shape(this.layers.graticule, false));
     this.box = box;
     this.fit();
   }
@@ -183,8 +191,7 @@ export class MapView {
   }
 
   draw(style, show, moving) {
-    const { context, domain } = this;
-    this.longest = 0;
+    const { context } = this;
     context.setTransform(this.ratio, 0, 0, this.ratio, 0, 0);
     context.clearRect(0, 0, this.width, this.height);
     context.lineJoin = "round";
@@ -192,15 +199,14 @@ export class MapView {
     // The sea is the map's own shape; nothing leaves it.
     context.save();
     const outline = new Path2D();
-    this.trace(outline, this.outline, true, false);
+    this.trace(outline, this.outline, true);
     context.fillStyle = style.sea;
     context.fill(outline);
-    context.clip(outline);
+    // While the map moves the clip costs more than the half of a thin line that it takes off.
+    if (show.distortion || !moving) context.clip(outline);
 
     const land = moving || !this.layers.landFine ? this.layers.land : this.layers.landFine;
-    const area = (part, emit) => domain.area(part, emit);
-    const line = (part, emit) => domain.line(part, emit);
-    this.path(land.pieces, area, true, (path) => {
+    this.path(land.pieces, true, (path) => {
       context.fillStyle = style.land;
       context.fill(path);
     });
@@ -208,19 +214,19 @@ export class MapView {
       this.distortion(show.distortion, moving);
     }
     if (show.graticule) {
-      this.path(this.regional ? this.layers.graticuleFine : this.layers.graticule, line, false, (path) => {
+      this.path(this.regional ? this.layers.graticuleFine : this.layers.graticule, false, (path) => {
         context.strokeStyle = show.distortion ? style.graticuleOver : style.graticule;
         context.lineWidth = 0.7;
         context.stroke(path);
       });
     }
-    this.path(land.lines, line, false, (path) => {
+    this.path(land.lines, false, (path) => {
       context.strokeStyle = show.distortion ? style.coastOver : style.coast;
       context.lineWidth = 0.8;
       context.stroke(path);
     });
     if (show.indicatrices) {
-      this.path(this.circles(), area, true, (path) => {
+      this.path(this.circles(), true, (path) => {
         context.fillStyle = style.indicatrix;
         context.fill(path);
         context.strokeStyle = style.indicatrixEdge;
@@ -229,7 +235,7 @@ export class MapView {
       });
     }
     for (const { points, color, dash = [], width = 1.5 } of show.lines ?? []) {
-      this.path([points], line, false, (path) => {
+      this.path([points], false, (path) => {
         context.setLineDash(dash);
         context.strokeStyle = color;
         context.lineWidth = width;
@@ -264,34 +270,44 @@ export class MapView {
     return this.worldCircles;
   }
 
-  path(parts, cut, closed, paint) {
+  // Areas or lines, cut at the edges and projected.
+  shape(parts, closed) {
+    let shape = this.#shapes.get(parts);
+    if (!shape) {
+      const { domain } = this;
+      const cut = closed ? (part, emit) => domain.area(part, emit) : (part, emit) => domain.line(part, emit);
+      shape = projected(parts, cut, this.mapping);
+      this.#shapes.set(parts, shape);
+    }
+    return shape;
+  }
+
+  path(parts, closed, paint) {
     const path = new Path2D();
-    this.trace(path, projected(parts, cut, this.mapping), closed, true);
+    this.trace(path, this.shape(parts, closed), closed);
     paint(path);
   }
 
-  trace(path, { starts, x, y }, closed, measured) {
+  trace(path, { starts, x, y }, closed) {
     const { originX, originY, scale } = this;
-    const diagonal = Math.hypot(this.box[2] - this.box[0], this.box[3] - this.box[1]);
     for (let k = 0; k + 1 < starts.length; ++k) {
-      let open = false;
-      for (let i = starts[k]; i < starts[k + 1]; ++i) {
+      let [first, last] = [-1, -1];
+      const end = starts[k + 1];
+      for (let i = starts[k]; i < end; ++i) {
         if (!Number.isFinite(x[i]) || !Number.isFinite(y[i])) {
-          if (!closed) open = false;
+          if (!closed) last = -1;
           continue;
         }
-        const [px, py] = [originX + scale * x[i], originY - scale * y[i]];
-        if (open) {
-          path.lineTo(px, py);
-          if (measured) {
-            this.longest = Math.max(this.longest, Math.hypot(x[i] - x[i - 1], y[i] - y[i - 1]) / diagonal || 0);
-          }
+        if (last < 0) {
+          path.moveTo(originX + scale * x[i], originY - scale * y[i]);
+          first = i;
         } else {
-          path.moveTo(px, py);
+          path.lineTo(originX + scale * x[i], originY - scale * y[i]);
         }
-        open = true;
+        last = i;
       }
-      if (closed && open) path.closePath();
+      // Not by closePath(), for which some browsers look at the whole path each time.
+      if (closed && last >= 0) path.lineTo(originX + scale * x[first], originY - scale * y[first]);
     }
   }
 

@@ -322,12 +322,15 @@ function interfaceOf(library) {
   // Numbers give a point; arrays are changed in place and give the number of points that failed.
   function points(transform, handle, inverse, x, y, z) {
     if (typeof x === "number") {
-      return memory.scoped(() => {
-        const at = memory.put([x, y, z ?? 0]);
-        const view = memory.view(at, at + 8, z === undefined ? 0 : at + 16, 1);
-        transform(handle, inverse, 1, view, view, 0, 1);
-        return Array.from(memory.doubles(at, z === undefined ? 2 : 3));
-      });
+      const { place, flat, high } = memory.point;
+      library.HEAPF64[place] = x;
+      library.HEAPF64[place + 1] = y;
+      if (z !== undefined) library.HEAPF64[place + 2] = z;
+      const view = z === undefined ? flat : high;
+      transform(handle, inverse, 1, view, view, 0, 1);
+      const values = library.HEAPF64; // the memory may have grown
+      return z === undefined ? [values[place], values[place + 1]]
+        : [values[place], values[place + 1], values[place + 2]];
     }
     const count = sameLength(x, y, z);
     let failed = 0;
@@ -462,6 +465,10 @@ class Memory {
   constructor(library) {
     this.#library = library;
     this.#base = library._malloc(this.#size);
+    // The room of a lone point, for good: where it stands in HEAPF64, and views with and without z.
+    const at = this.room(24);
+    this.point = {
+      place: at / 8, flat: this.view(at, at + 8, 0, 1), high: this.view(at, at + 8, at + 16, 1) };
   }
 
   scoped(work) {

@@ -134,7 +134,7 @@ class Ufuncs:
 
 
 KEYWORDS = """errors : {"nan", "raise", "words"}
-        What becomes of points without a result: not-a-numbers in silence, a
+        What becomes of points without a result: NaN in silence, a
         `PointError` for the first, or an array of status words as one result more
         (`tidewater.SUCCESS`, or what `tidewater.status_text` says of it).
     threads : int

@@ -51,7 +51,7 @@ def parse(text: Any, axis: Optional[str] = None, *, decimal_comma: bool = False,
     decimal_comma : bool
         The comma is a decimal mark.
     errors : {"nan", "raise", "words"}
-        What becomes of texts that are no angles: not-a-numbers, a `tidewater.Error`, or one
+        What becomes of texts that are no angles: NaN, a `tidewater.Error`, or one
         result more, which holds the reason in a sentence for each text and is empty where there
         is none.
 
@@ -79,7 +79,7 @@ def parse_position(text: Any, order: Optional[str] = None, *, decimal_comma: boo
     Returns
     -------
     tuple
-        Longitude and latitude in degrees, and height in metres, not-a-number without one.
+        Longitude and latitude in degrees, and height in metres, NaN without one.
     """
     number = _choice("order", _ORDERS, order)
     return _read(text, errors,

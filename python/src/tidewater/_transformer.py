@@ -30,7 +30,7 @@ class Transformer:
     - Without a usable operation between two datums construction fails with a sentence instead of
       leaving positions as they are; ``allow_ballpark=True`` leaves them.
     - `tt` is refused: give ``epoch`` to ``from_crs``.
-    - ``from_pipeline`` and ``from_proj`` pipelines are not served.
+    - ``from_pipeline`` and ``from_proj`` pipelines are not supported.
     - Systems may be anything that `tidewater.System` takes; grids come from the same folders.
     """
 
@@ -86,8 +86,8 @@ class Transformer:
 
     @classmethod
     def from_pipeline(cls, pipeline: str) -> "Transformer":
-        """Not served; raises `tidewater.Error`."""
-        raise _core.Error("Pipelines are not served: make a Transformer from two systems.")
+        """Not supported; raises `tidewater.Error`."""
+        raise _core.Error("Pipelines are not supported: make a Transformer from two systems.")
 
     @property
     def source_crs(self) -> System:
@@ -131,7 +131,7 @@ class Transformer:
         xx, yy, zz : numbers, lists, tuples or arrays
             Results are of the same kind.
         tt
-            Not served.
+            Not supported.
         radians : bool
             Geographic coordinates in radians.
         errcheck : bool
@@ -141,7 +141,7 @@ class Transformer:
             Results go into the arrays that are given, where those are of float64.
         """
         if tt is not None:
-            raise _core.Error("A time for each point is not served: give epoch to from_crs.")
+            raise _core.Error("A time for each point is not supported: give epoch to from_crs.")
         if zz is None and direction is TransformDirection.FORWARD and not radians \
                 and type(xx) is float and type(yy) is float:
             x, y = self._degrees(xx, yy)
@@ -173,7 +173,7 @@ class Transformer:
                    ) -> Iterator[tuple]:
         """Transforms an iterable of tuples, one tuple a point."""
         if time_3rd:
-            raise _core.Error("A time for each point is not served: give epoch to from_crs.")
+            raise _core.Error("A time for each point is not supported: give epoch to from_crs.")
         points = [tuple(point) for point in points]
         if not points:
             return

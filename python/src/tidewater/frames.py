@@ -26,7 +26,7 @@ def to_system(frame: Any, target: Any, *, threads: int = 0, errors: str = "nan",
     threads : int
         How many at most; 0 for all cores.
     errors : {"nan", "raise"}
-        A point that fails becomes not-a-number, or raises `tidewater.PointError`.
+        A point that fails becomes NaN, or raises `tidewater.PointError`.
     **options
         As `Transformation` takes them, such as ``operation`` or ``area``.
 

@@ -6,7 +6,8 @@
 #include <algorithm>
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "points/portable.hpp"
+#include "tidewater/albers.h"
 
 using namespace tidewater::detail;
 
@@ -22,11 +23,11 @@ constexpr int kMostSteps = 30;
 // sphere, the course of the steps hangs on the last digit: the terms stand as they are printed.
 double newton_step(double e, double Q, double lat) {
   const double e2 = square(e);
-  const double s = std::sin(lat);
+  const double s = portable::sin(lat);
   const double W = 1 - e2 * square(s);
-  const double logarithm = 0.5 / e * std::log((1 - e * s) / (1 + e * s));
+  const double logarithm = 0.5 / e * portable::log((1 - e * s) / (1 + e * s));
   const double T = Q / (1 - e2) - s / W + logarithm;
-  return T * square(W) / (2 * std::cos(lat));
+  return T * square(W) / (2 * portable::cos(lat));
 }
 
 // Latitude whose authalic function is Q, by Newton steps from the authalic latitude.  At a pole the
@@ -165,8 +166,8 @@ Next AlbersInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
                           TWstatus* status) const {
   const double sign = n_ < 0 ? -1 : 1;
   const double from_apex = rho0_ - in.y;
-  const double rho = std::hypot(in.x, from_apex) * sign;
-  const double theta = std::fabs(rho) > 0 ? std::atan2(sign * in.x, sign * from_apex) : 0;
+  const double rho = portable::hypot(in.x, from_apex) * sign;
+  const double theta = std::fabs(rho) > 0 ? portable::atan2(sign * in.x, sign * from_apex) : 0;
   const double d = theta / n_;
   if (d < -kPi || d > kPi) {
     *status = TW_NOT_CONVERGED;  // outside the cone's fan
@@ -182,7 +183,7 @@ Next AlbersInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
     B = std::copysign(1.0, B);
     *status = TW_I_LATITUDE_LIMITED;
   }
-  double lat = std::asin(B);
+  double lat = portable::asin(B);
   if (sphere_) {
     lat = hold_at_poles_of_sphere(lat);
   } else {

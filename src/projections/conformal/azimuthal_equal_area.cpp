@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "points/portable.hpp"
+#include "tidewater/azimuthal_equal_area.h"
 
 using namespace tidewater::detail;
 
@@ -29,7 +30,7 @@ double side_of(double lat0) { return lat0 >= 0 ? 1 : -1; }
 // Callers hold its value at the pole, which may have been worked out elsewhere, and one more or
 // less in its last digit decides whether a point is held.
 double q_of(double e, double e2, double s) {
-  return (s / (1 - e2 * s * s) - std::log((1 - e * s) / (1 + e * s)) / (2 * e)) * (1 - e2);
+  return (s / (1 - e2 * s * s) - portable::log((1 - e * s) / (1 + e * s)) / (2 * e)) * (1 - e2);
 }
 
 // Holds a sine at 1 or -1.  False, with the word, when it lies beyond the limit.
@@ -67,17 +68,18 @@ bool is_q_of_pole(double e, double e2, double qp) {
 // any more.
 double newton_step(double e, double e2, double qp, bool from_pole, double q, double lat) {
   constexpr double kNearPole = 0.9;
-  const double sin_lat = std::sin(lat);
-  const double c = std::cos(lat);
+  const double sin_lat = portable::sin(lat);
+  const double c = portable::cos(lat);
   const double w = 1 - e2 * (sin_lat * sin_lat);
   double t = 0;
   if (!from_pole || std::fabs(sin_lat) < kNearPole) {
-    t = std::log((1 - e * sin_lat) / (1 + e * sin_lat)) / (2 * e) + q / (1 - e2) - sin_lat / w;
+    t = portable::log((1 - e * sin_lat) / (1 + e * sin_lat)) / (2 * e) + q / (1 - e2) - sin_lat / w;
   } else {
     const double side = lat < 0 ? -1 : 1;
     const double s = side * sin_lat;
     const double u = c * c / (1 + s);  // 1 - sin
-    const double rest = u * (1 + e2 * s) / (w * (1 - e2)) + std::atanh(e * u / (1 - e2 * s)) / e;
+    const double rest =
+        u * (1 + e2 * s) / (w * (1 - e2)) + portable::atanh(e * u / (1 - e2 * s)) / e;
     t = side * ((side * q - qp) / (1 - e2) + rest);
   }
   return t * (w * w) / (2 * c);
@@ -88,7 +90,7 @@ double newton_step(double e, double e2, double qp, bool from_pole, double q, dou
 bool latitude_of_q(const EqualAreaOrigin& o, double q, double u, double& lat) {
   constexpr int kMostPasses = 50;
   const bool from_pole = is_q_of_pole(o.e, o.e2, o.qp);
-  lat = std::asin(u);
+  lat = portable::asin(u);
   if (from_pole) {
     // Beyond the pole by more than rounding there is no root, and the passes would be used up.
     const double sine = q / o.qp;
@@ -126,15 +128,16 @@ Next inverse_as_stated(const EqualAreaOrigin& o, const CoordinateTriple& in, Coo
     if (rho != 0) {
       double u = rho / 2;
       if (!hold_sine(kTightLimit, u, status)) return Next::none;
-      const double c = 2 * std::asin(u);
-      const double sin_c = std::sin(c);
-      const double cos_c = std::cos(c);
+      const double c = 2 * portable::asin(u);
+      const double sin_c = portable::sin(c);
+      const double cos_c = portable::cos(c);
       if (o.polar) {
-        lon = std::atan2(x, o.lat0 < 0 ? y : -y) + o.lon0;
+        lon = portable::atan2(x, o.lat0 < 0 ? y : -y) + o.lon0;
       } else {
-        lon = std::atan2(x * sin_c, o.cos_lat0 * cos_c * rho - o.sin_lat0 * sin_c * y) + o.lon0;
+        lon =
+            portable::atan2(x * sin_c, o.cos_lat0 * cos_c * rho - o.sin_lat0 * sin_c * y) + o.lon0;
       }
-      lat = std::asin(o.cos_lat0 * sin_c * y / rho + o.sin_lat0 * cos_c);
+      lat = portable::asin(o.cos_lat0 * sin_c * y / rho + o.sin_lat0 * cos_c);
     }
   } else {
     double q = 0;
@@ -142,7 +145,7 @@ Next inverse_as_stated(const EqualAreaOrigin& o, const CoordinateTriple& in, Coo
       const double rho = std::sqrt(x * x + y * y);
       q = std::fabs(o.qp - rho * rho);
       if (o.lat0 < 0) q = -q;
-      lon = std::atan2(x, o.lat0 < 0 ? y : -y) + o.lon0;
+      lon = portable::atan2(x, o.lat0 < 0 ? y : -y) + o.lon0;
     } else {
       const double rho = std::sqrt(square(x / o.D) + square(o.D * y));
       if (rho == 0) {
@@ -150,12 +153,12 @@ Next inverse_as_stated(const EqualAreaOrigin& o, const CoordinateTriple& in, Coo
       } else {
         double u = rho / (2 * o.rq);
         if (!hold_sine(kLooseLimit, u, status)) return Next::none;
-        const double ce = 2 * std::asin(u);
-        const double sin_ce = std::sin(ce);
-        const double cos_ce = std::cos(ce);
+        const double ce = 2 * portable::asin(u);
+        const double sin_ce = portable::sin(ce);
+        const double cos_ce = portable::cos(ce);
         q = (o.D * sin_ce * o.cos_b1 * y / rho + cos_ce * o.sin_b1) * o.qp;
-        lon = std::atan2(x * sin_ce,
-                         o.D * cos_ce * o.cos_b1 * rho - o.D * o.D * sin_ce * o.sin_b1 * y) +
+        lon = portable::atan2(x * sin_ce,
+                              o.D * cos_ce * o.cos_b1 * rho - o.D * o.D * sin_ce * o.sin_b1 * y) +
               o.lon0;
       }
     }
@@ -177,17 +180,17 @@ Next EqualAreaForward::other(const CoordinateTriple& in, CoordinateTriple* out,
   double lat = in.y;
   leave_antipode(false, lat0, lat, d);
   const auto at_d = sincos(d);
-  double s = std::sin(lat);
-  double c = std::cos(lat);
+  double s = portable::sin(lat);
+  double c = portable::cos(lat);
   if (!sphere) {
     s = q_of(e, e2, s) * over_qp;
     if (!hold_sine(kTightLimit, s, status)) return Next::none;
     c = std::sqrt((1 - s) * (1 + s));
     if (sum(at_d.cos, s, c) < kNearAntipode) {
       // What is left of the sum hangs on the last bit of c, so the angle itself is taken.
-      const double beta = std::asin(s);
-      s = std::sin(beta);
-      c = std::cos(beta);
+      const double beta = portable::asin(s);
+      s = portable::sin(beta);
+      c = portable::cos(beta);
     }
   }
   const auto answer = place(at_d, s, c);
@@ -202,8 +205,8 @@ Next EqualAreaPolarForward::other(const CoordinateTriple& in, CoordinateTriple* 
   double d = 0;
   leave_antipode(true, lat0, lat, d);
   const double w = kQuarterPi - lat / 2;
-  const double r = sphere ? 2 * (side > 0 ? std::sin(w) : std::cos(w))
-                          : std::sqrt(qp - side * q_of(e, e2, std::sin(lat)));
+  const double r = sphere ? 2 * (side > 0 ? portable::sin(w) : portable::cos(w))
+                          : std::sqrt(qp - side * q_of(e, e2, portable::sin(lat)));
   const auto answer = place(in.x, r);
   out->x = answer.x;
   out->y = answer.y;
@@ -221,9 +224,9 @@ Next EqualAreaPolarInverse::other(const CoordinateTriple& in, CoordinateTriple* 
 }
 
 Next EqualAreaScale::other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus*) const {
-  const double s = std::sin(in.y);
+  const double s = portable::sin(in.y);
   const auto at =
-      triple(std::sqrt(qp - side * q_of(e, e2, s)) / parallel_radius(e2, s, std::cos(in.y)));
+      triple(std::sqrt(qp - side * q_of(e, e2, s)) / parallel_radius(e2, s, portable::cos(in.y)));
   *out = {at.x, at.y, at.z};
   return Next::point;
 }
@@ -234,8 +237,8 @@ void TWlam_az_eq_c(double e, double /*lon0*/, double lat0, double* e2, double* q
                    double* rq, double* m1, double* sin_b1, double* cos_b1, double* sin_lat0,
                    double* cos_lat0, double* D, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double sin_0 = std::sin(lat0);
-  const double cos_0 = std::cos(lat0);
+  const double sin_0 = portable::sin(lat0);
+  const double cos_0 = portable::cos(lat0);
   *sin_lat0 = sin_0;
   *cos_lat0 = cos_0;
   if (e == 0) return;
@@ -248,10 +251,10 @@ void TWlam_az_eq_c(double e, double /*lon0*/, double lat0, double* e2, double* q
   *rq = radius;
   if (is_polar(lat0)) return;
   const double m_origin = parallel_radius(e * e, sin_0, cos_0);
-  const double b1 = std::asin(q_origin / q_pole);
-  const double cos_b = std::cos(b1);
+  const double b1 = portable::asin(q_origin / q_pole);
+  const double cos_b = portable::cos(b1);
   *m1 = m_origin;
-  *sin_b1 = std::sin(b1);
+  *sin_b1 = portable::sin(b1);
   *cos_b1 = cos_b;
   *D = m_origin / (cos_b * radius);
 }

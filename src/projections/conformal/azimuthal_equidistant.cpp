@@ -6,7 +6,8 @@
 #include <algorithm>
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "points/portable.hpp"
+#include "tidewater/azimuthal_equidistant.h"
 
 using namespace tidewater::detail;
 
@@ -36,10 +37,10 @@ Next AzimuthalEquidistantForward::other(const CoordinateTriple& in, CoordinateTr
   const double d = in.x - lon0;
   const double lat = in.y;
   const bool polar = std::fabs(std::fabs(lat0) - kHalfPi) < kEquidistantNothing;
-  const double sin_lat = std::sin(lat);
-  const double cos_lat = std::cos(lat);
-  const double sin_d = std::sin(d);
-  const double cos_d = std::cos(d);
+  const double sin_lat = portable::sin(lat);
+  const double cos_lat = portable::cos(lat);
+  const double sin_d = portable::sin(d);
+  const double cos_d = portable::cos(d);
 
   // psi is the latitude of the point as seen along the normal of the origin.
   double psi = lat;
@@ -47,18 +48,19 @@ Next AzimuthalEquidistantForward::other(const CoordinateTriple& in, CoordinateTr
   if (std::fabs(std::fabs(lat) - kHalfPi) < kEquidistantNothing) {
     if (std::fabs(lat + kHalfPi) < kEquidistantNothing) azimuth = -kPi;
   } else {
-    psi = std::atan(sin0 * e2 * n1 / (cos_lat * nu(e2, sin_lat)) + std::tan(lat) * (1 - e2));
+    psi = portable::atan(sin0 * e2 * n1 / (cos_lat * nu(e2, sin_lat)) +
+                         portable::tan(lat) * (1 - e2));
     // The tangent is that of the rounded psi, as its cosine is below: a quarter turn away, the
     // arc sine of their quotient magnifies what they differ by.
-    azimuth = std::atan2(sin_d, std::tan(psi) * cos0 - cos_d * sin0);
+    azimuth = portable::atan2(sin_d, portable::tan(psi) * cos0 - cos_d * sin0);
   }
-  double sin_az = std::sin(azimuth);
-  double cos_az = std::cos(azimuth);
+  double sin_az = portable::sin(azimuth);
+  double cos_az = portable::cos(azimuth);
   const bool on_meridian = std::fabs(sin_az) < kEquidistantNothing;
   // By contract: the arc cosine is not held, and is not a number a hair beyond the antipode.
   // Below zero alone it can be more than a quarter turn.
   const double cc = cos_d * cos_lat * cos0 + sin_lat * sin0;
-  const bool far_side = cc <= 0 && std::acos(cc) > kHalfPi;
+  const bool far_side = cc <= 0 && portable::acos(cc) > kHalfPi;
 
   double c = 0;
   if (on_meridian && (far_side || std::fabs(d) > kHalfPi)) {
@@ -75,8 +77,8 @@ Next AzimuthalEquidistantForward::other(const CoordinateTriple& in, CoordinateTr
     } else {
       c = std::fabs(m1 - m0);
       if (lat0 > kPolarOrigin) {
-        sin_az = std::sin(kPi - d);
-        cos_az = std::cos(kPi - d);
+        sin_az = portable::sin(kPi - d);
+        cos_az = portable::cos(kPi - d);
       } else if (lat0 < -kPolarOrigin) {
         sin_az = sin_d;
         cos_az = cos_d;
@@ -85,11 +87,11 @@ Next AzimuthalEquidistantForward::other(const CoordinateTriple& in, CoordinateTr
   } else {
     double s = 0;
     if (on_meridian) {
-      s = std::asin(std::sin(psi) * cos0 - std::cos(psi) * sin0);
+      s = portable::asin(portable::sin(psi) * cos0 - portable::cos(psi) * sin0);
       if (!(cos_az >= 0)) s = -s;
       if (polar) s = std::fabs(s);
     } else {
-      s = std::asin(std::clamp(sin_d * std::cos(psi) / sin_az, -1.0, 1.0));
+      s = portable::asin(std::clamp(sin_d * portable::cos(psi) / sin_az, -1.0, 1.0));
     }
     if (far_side) s = beyond_quarter(s);
     c = distance(s, cos_az);
@@ -109,7 +111,7 @@ Next AzimuthalEquidistantScale::other(const CoordinateTriple&, CoordinateTriple*
 }  // namespace tidewater::detail
 
 void TWaz_eq_c(double e, double lat0, double* n1, double* g) {
-  const double s = std::sin(lat0);
+  const double s = portable::sin(lat0);
   *n1 = nu(e * e, s);
   *g = e * s / std::sqrt(1 - e * e);
 }

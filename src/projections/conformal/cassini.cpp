@@ -1,8 +1,8 @@
 // Cassini projection: constants, what the contract says of the points that the formulas do not
 // cover, and the exported functions.
 
+#include "tidewater/cassini.h"
 #include "projections/conformal/cassini_points.hpp"
-#include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
 

@@ -1,9 +1,12 @@
 // Double stereographic: the ellipsoid onto the Gauss sphere, that turned to its pole, that
 // projected.
+// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2, method 9809.
 
+#include "tidewater/double_stereographic.h"
 #include "formulas/constants.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/special.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/rotated_graticule.h"
+#include "tidewater/stereographic.h"
 
 using namespace tidewater::detail;
 

@@ -1,7 +1,7 @@
 // Equidistant conic projection: constants and the exported functions.
 
+#include "tidewater/equidistant_conic.h"
 #include "projections/conformal/equidistant_conic_points.hpp"
-#include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
 

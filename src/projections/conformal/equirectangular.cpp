@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "tidewater/equirectangular.h"
 
 using namespace tidewater::detail;
 

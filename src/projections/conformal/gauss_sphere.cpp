@@ -5,8 +5,11 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
+#include "points/portable.hpp"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/mercator.h"
+#include "tidewater/transverse_mercator.h"
 
 using namespace tidewater::detail;
 
@@ -33,17 +36,17 @@ void TWgaussII_c(double e, double lat0, double* chi0, double* c, double* t, doub
     *c = 1.0;
     lat0 = lat0 > 0 ? kPolarOrigin : -kPolarOrigin;
     TWmerc_c(e, lat0, &y0, status);
-    const double s = std::sin(lat0);
-    *t = std::log((s + 1) / (1 - s)) / 2 - y0;
+    const double s = portable::sin(lat0);
+    *t = portable::log((s + 1) / (1 - s)) / 2 - y0;
   } else {
     TWmerc_c(e, lat0, &y0, status);
-    const double s = std::sin(lat0);
+    const double s = portable::sin(lat0);
     const double e2 = square(e);
-    const double ratio = std::sqrt(e2 * square(square(std::cos(lat0))) / (1 - e2) + 1);
+    const double ratio = std::sqrt(e2 * square(square(portable::cos(lat0))) / (1 - e2) + 1);
     const double sin_chi = s / ratio;
     *c = ratio;
-    *t = std::log((sin_chi + 1) / (1 - sin_chi)) / 2 / ratio - y0;
-    *chi0 = std::asin(sin_chi);
+    *t = portable::log((sin_chi + 1) / (1 - sin_chi)) / 2 / ratio - y0;
+    *chi0 = portable::asin(sin_chi);
   }
   TWgaussian_R(1.0, e, lat0, R, status);
 }

@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "points/portable.hpp"
+#include "tidewater/gnomonic.h"
 
 using namespace tidewater::detail;
 
@@ -37,8 +38,8 @@ Next GnomonicScale::other(const CoordinateTriple&, CoordinateTriple* out, TWstat
 
 void TWgnomon_c(double lat0, double* cos_lat0, double* sin_lat0, TWstatus* status) {
   *status = TW_SUCCESS;
-  *cos_lat0 = std::cos(lat0);
-  *sin_lat0 = std::sin(lat0);
+  *cos_lat0 = portable::cos(lat0);
+  *sin_lat0 = portable::sin(lat0);
 }
 
 void TWgnomon_param(double* value1, double* value2, double* value3, TWstatus* status) {

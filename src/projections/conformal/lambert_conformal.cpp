@@ -6,7 +6,8 @@
 #include <cmath>
 
 #include "formulas/pole_hold.hpp"
-#include "tidewater/conformal.h"
+#include "points/portable.hpp"
+#include "tidewater/lambert_conformal.h"
 
 using namespace tidewater::detail;
 
@@ -22,19 +23,19 @@ double radius_of_parallel(double e, double lat) {
 // t(p) as it is printed: at a pole exactly 0, just past it negative, as the constants and the
 // scale's held latitude need it.
 double printed_tangent(double e, double lat) {
-  return std::tan(kQuarterPi - lat / 2) / eccentric_factor(e, std::sin(lat));
+  return portable::tan(kQuarterPi - lat / 2) / eccentric_factor(e, portable::sin(lat));
 }
 
 // The latitude whose t(p) is w, by passes of the fixed point, fifteen at most.
 double latitude_of(double e, double w, TWstatus* status) {
   if (std::fabs(e) <= kSeriesEccentricity) return ConformalInverse(e).of_tangent(w);
   constexpr int kMostPasses = 15;
-  double lat = kHalfPi - 2 * std::atan(w);
+  double lat = kHalfPi - 2 * portable::atan(w);
   double old = 0;
   int passes = 0;
   do {
     old = lat;
-    lat = kHalfPi - 2 * std::atan(w * eccentric_factor(e, std::sin(old)));
+    lat = kHalfPi - 2 * portable::atan(w * eccentric_factor(e, portable::sin(old)));
     if (++passes == kMostPasses) {
       // By contract: a point that comes to rest in this very pass is told so too.
       *status = TW_I_LATITUDE_LIMITED;
@@ -63,14 +64,14 @@ void TWlam_c(double e, double /*lon0*/, double lat0, double lat1, double lat2, d
   if (std::fabs(lat2 - lat1) > 1e-12) {
     const double t2 = printed_tangent(e, lat2);
     const double m2 = radius_of_parallel(e, lat2);
-    const double apart = std::log(t1) - std::log(t2);
+    const double apart = portable::log(t1) - portable::log(t2);
     if (std::fabs(apart) < 1e-12) {
       *status = TW_BAD_PARAMETER;
       return;
     }
-    *n = (std::log(m1) - std::log(m2)) / apart;
+    *n = (portable::log(m1) - portable::log(m2)) / apart;
   } else {
-    *n = std::sin(lat1);
+    *n = portable::sin(lat1);
   }
 
   if (one_parallel && std::fabs(lat1) > kPolarParallel) {
@@ -78,7 +79,7 @@ void TWlam_c(double e, double /*lon0*/, double lat0, double lat1, double lat2, d
     const double value = 2 * eccentric_factor(e, 1.0) / std::sqrt(1 - square(e));
     *C = *n < 0 ? -value : value;
   } else {
-    const double w = std::pow(t1, *n);
+    const double w = portable::pow(t1, *n);
     if (std::fabs(w * *n) < 1e-12) {
       *status = TW_BAD_PARAMETER;  // n stays written: parallels symmetric about the equator
       return;
@@ -94,7 +95,7 @@ void TWlam_c(double e, double /*lon0*/, double lat0, double lat1, double lat2, d
       *status = TW_BAD_LATITUDE;  // n and C stay written
     }
   } else {
-    *rho0 = std::pow(printed_tangent(e, lat0), *n) * *C;
+    *rho0 = portable::pow(printed_tangent(e, lat0), *n) * *C;
   }
 }
 
@@ -120,17 +121,17 @@ Next LambertInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
                            TWstatus* status) const {
   double lon = lon0_;
   double lat = 0;
-  if (rho0_ == 0 && std::hypot(in.x, in.y) < 1e-13) {
+  if (rho0_ == 0 && portable::hypot(in.x, in.y) < 1e-13) {
     lat = n_ < 0 ? -kHalfPi : kHalfPi;
   } else {
     const double from_apex = rho0_ - in.y;
-    const double rho = std::hypot(in.x, from_apex) * (n_ < 0 ? -1 : 1);
+    const double rho = portable::hypot(in.x, from_apex) * (n_ < 0 ? -1 : 1);
     double theta = 0;
     if (std::fabs(rho) > 1e-13) {
-      theta = n_ > 0 ? std::atan2(in.x, from_apex) : std::atan2(-in.x, -from_apex);
+      theta = n_ > 0 ? portable::atan2(in.x, from_apex) : portable::atan2(-in.x, -from_apex);
     }
     lon = theta * over_n_ + lon0_;
-    lat = latitude_of(e_, std::pow(rho / C_, over_n_), status);
+    lat = latitude_of(e_, portable::pow(rho / C_, over_n_), status);
   }
   out->x = at_pole(lat) ? lon0_ : wrap_at_or_below_then_above(lon);
   out->y = lat;
@@ -152,7 +153,7 @@ Next LambertScale::other(const CoordinateTriple& in, CoordinateTriple* out,
     const double m = radius_of_parallel(e, lat);
     if (std::fabs(m) >= 1e-10) {
       // Held just past the pole, t is negative: its power stands for integer n alone.
-      k = n * k0 * (std::pow(printed_tangent(e, lat), n) * C) / m;
+      k = n * k0 * (portable::pow(printed_tangent(e, lat), n) * C) / m;
     } else {
       *status = TW_BAD_LATITUDE;
     }

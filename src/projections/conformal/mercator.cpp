@@ -4,7 +4,7 @@
 #include <cmath>
 
 #include "projections/conformal/mercator_points.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/mercator.h"
 
 using namespace tidewater::detail;
 

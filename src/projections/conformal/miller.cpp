@@ -1,8 +1,8 @@
 // Miller cylindrical projection: what the contract says of the points that the formulas do not
 // cover, and the exported functions.
 
+#include "tidewater/miller.h"
 #include "projections/conformal/miller_points.hpp"
-#include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
 

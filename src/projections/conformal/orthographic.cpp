@@ -6,8 +6,9 @@
 #include <algorithm>
 #include <cmath>
 
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
+#include "points/portable.hpp"
+#include "tidewater/geocentric.h"
+#include "tidewater/orthographic.h"
 
 using namespace tidewater::detail;
 
@@ -56,11 +57,11 @@ Next OrthographicInverse::other(const CoordinateTriple& in, CoordinateTriple* ou
                                          origin.y + east.y * x + north.y * y + up.y * z,
                                          origin.z + east.z * x + north.z * y + up.z * z};
     TWxyz_to_llh(1.0, e, 1, &geocentric, &llh, status);
-    const double sin_lat = std::sin(llh.y);
-    const double cos_lat = std::cos(llh.y);
+    const double sin_lat = portable::sin(llh.y);
+    const double cos_lat = portable::cos(llh.y);
     const double nu = 1 / std::sqrt(1 - e2 * (sin_lat * sin_lat));
-    const Vector3 offset = {nu * std::cos(llh.x) * cos_lat - origin.x,
-                            nu * std::sin(llh.x) * cos_lat - origin.y,
+    const Vector3 offset = {nu * portable::cos(llh.x) * cos_lat - origin.x,
+                            nu * portable::sin(llh.x) * cos_lat - origin.y,
                             (1 - e2) * nu * sin_lat - origin.z};
     const double dz = dot(up, offset) - z;
     const double g2 = llh.z * llh.z;
@@ -95,10 +96,10 @@ Next OrthographicScale::other(const CoordinateTriple&, CoordinateTriple* out,
 void TWortho_c(double e, double lon0, double lat0, double* x0, double* y0, double* z0, double* r,
                TWstatus* status) {
   *status = TW_SUCCESS;
-  const double sin_lon = std::sin(lon0);
-  const double cos_lon = std::cos(lon0);
-  const double sin_lat = std::sin(lat0);
-  const double cos_lat = std::cos(lat0);
+  const double sin_lon = portable::sin(lon0);
+  const double cos_lon = portable::cos(lon0);
+  const double sin_lat = portable::sin(lat0);
+  const double cos_lat = portable::cos(lat0);
   r[0] = -sin_lon;
   r[1] = cos_lon;
   r[2] = 0.0;

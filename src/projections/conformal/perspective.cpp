@@ -5,8 +5,9 @@
 
 #include <cmath>
 
+#include "points/portable.hpp"
 #include "projections/turn_points.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/perspective.h"
 
 using namespace tidewater::detail;
 
@@ -23,8 +24,16 @@ PerspectiveForward forward_of(double a, double e, double lon0, double lat0, doub
   const auto at = sincos(lat0);
   // On the sphere the geocentric latitude is the geodetic one.
   const double off = sphere ? 0 : lat0 - phi_g;
-  return {sphere,           a, e * e, lon0, at.sin, at.cos, h / a, 1 / p, std::cos(off) * p,
-          std::sin(off) * p};
+  return {sphere,
+          a,
+          e * e,
+          lon0,
+          at.sin,
+          at.cos,
+          h / a,
+          1 / p,
+          portable::cos(off) * p,
+          portable::sin(off) * p};
 }
 
 PerspectiveInverse inverse_of(double a, double e, double lon0, double lat0, double h, double p,
@@ -38,13 +47,13 @@ PerspectiveInverse inverse_of(double a, double e, double lon0, double lat0, doub
           h,
           at.sin,
           at.cos,
-          std::cos(off) * p,
-          std::sin(off) * p,
+          portable::cos(off) * p,
+          portable::sin(off) * p,
           1 - at.cos * at.cos * e2,
           1 - at.sin * at.sin * e2,
           2 * at.cos * at.sin * e2,
           1 - e2,
-          (1 - square(std::cos(phi_g)) * e2) * p * p};
+          (1 - square(portable::cos(phi_g)) * e2) * p * p};
 }
 
 }  // namespace
@@ -74,8 +83,8 @@ void TWpersp_c(double a, double e, double lat0, double h, double h0, double* p, 
     return;
   }
   const double e2 = e * e;
-  const double sin0 = std::sin(lat0);
-  const double cos0 = std::cos(lat0);
+  const double sin0 = portable::sin(lat0);
+  const double cos0 = portable::cos(lat0);
   const double n1 = a / std::sqrt(1 - sin0 * sin0 * e2);
   double latitude = lat0;
   double distance = 0;
@@ -84,8 +93,8 @@ void TWpersp_c(double a, double e, double lat0, double h, double h0, double* p, 
   for (int pass = 0; pass < kPerspectivePasses; ++pass) {
     const double previous_latitude = latitude;
     const double previous_distance = distance;
-    distance = cos0 / std::cos(latitude) * (height + n1) / a;
-    latitude = lat0 - std::asin(sin0 * n1 * e2 * cos0 / (distance * a));
+    distance = cos0 / portable::cos(latitude) * (height + n1) / a;
+    latitude = lat0 - portable::asin(sin0 * n1 * e2 * cos0 / (distance * a));
     latitude_step = std::fabs(latitude - previous_latitude);
     distance_step = std::fabs(distance - previous_distance);
     if (latitude_step < 1e-15 && distance_step < 1e-15) break;

@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
+#include "points/portable.hpp"
+#include "tidewater/polyconic.h"
 
 using namespace tidewater::detail;
 
@@ -39,7 +40,7 @@ Next PolyconicInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
     }
     lat = step.next;
   }
-  out->x = at_pole(lat) ? lon0_ : std::asin(in.x * step.C) / step.sin_lat + lon0_;
+  out->x = at_pole(lat) ? lon0_ : portable::asin(in.x * step.C) / step.sin_lat + lon0_;
   out->y = step.next;
   return Next::point;
 }

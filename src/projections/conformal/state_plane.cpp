@@ -1,12 +1,14 @@
 // State plane zones: the projection parameters of a zone number.
+// C. N. Claire, State Plane Coordinates by Automatic Data Processing, C&GS Publication 62-4 (1968);
+// J. E. Stem, State Plane Coordinate System of 1983, NOAA Manual NOS NGS 5 (1989).
 
-#include <cmath>
 #include <cstdlib>
 #include <span>
 
 #include "formulas/constants.hpp"
+#include "points/portable.hpp"
 #include "projections/conformal/state_plane_zones.hpp"
-#include "tidewater/conformal.h"
+#include "tidewater/state_plane.h"
 
 using namespace tidewater::detail;
 
@@ -53,7 +55,7 @@ void write_zone(const StatePlaneZone* zone, double unit, int16_t* type, double* 
   } else if (zone->type == kOmerc) {
     *lon_center = kObliqueCenterLon * kRadiansPerDegree;
     *lat_center = kObliqueCenterLat * kRadiansPerDegree;
-    *azimuth = std::atan(kObliqueAzimuthTangent);
+    *azimuth = portable::atan(kObliqueAzimuthTangent);
   }
 }
 

@@ -4,9 +4,10 @@
 #include <cmath>
 #include <utility>
 
+#include "points/portable.hpp"
 #include "projections/conformal/stereographic_points.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/foundation.h"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/stereographic.h"
 
 using namespace tidewater::detail;
 
@@ -24,12 +25,12 @@ double side_of(double C) { return C < 0 ? -1 : 1; }
 // The latitude p with t(p) = w, by at most ten passes.  False when they were used up.
 bool latitude_in_ten_passes(double e, double w, double& lat) {
   constexpr int kMostPasses = 10;
-  lat = kHalfPi - 2 * std::atan(w);
+  lat = kHalfPi - 2 * portable::atan(w);
   double previous = 0;
   int passes = 0;
   do {
     previous = lat;
-    lat = kHalfPi - 2 * std::atan(w * eccentric_factor(e, std::sin(previous)));
+    lat = kHalfPi - 2 * portable::atan(w * eccentric_factor(e, portable::sin(previous)));
     ++passes;
   } while (!(std::fabs(lat - previous) <= kStereographicEpsilon) && passes < kMostPasses);
   // By contract: the count alone decides, also when the last pass did converge.
@@ -123,12 +124,12 @@ TWstatus south_polar_inverse(StereographicPolarInverse kernel, int32_t count,
 void TWstereo_c(double e, double lat0, double* C, double* m0, double* chi0, TWstatus* status) {
   *status = TW_SUCCESS;
   if (std::fabs(std::fabs(lat0) - kHalfPi) < 1e-14) {
-    const double size = 2 / std::sqrt(std::pow(1 + e, 1 + e) * std::pow(1 - e, 1 - e));
+    const double size = 2 / std::sqrt(portable::pow(1 + e, 1 + e) * portable::pow(1 - e, 1 - e));
     *C = lat0 < 0 ? -size : size;
     return;
   }
   *C = 0.0;
-  *m0 = parallel_radius(e * e, std::sin(lat0), std::cos(lat0));
+  *m0 = parallel_radius(e * e, portable::sin(lat0), portable::cos(lat0));
   TWgeod_conflat(e, lat0, chi0, status);
 }
 

@@ -1,9 +1,9 @@
 // Transverse Mercator projection of the ellipsoid: constants, what the contract says of the points
 // that the formulas do not cover, and the exported functions.
 
+#include "tidewater/transverse_mercator.h"
 #include "points/over_heights.hpp"
 #include "projections/conformal/transverse_mercator_points.hpp"
-#include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
 

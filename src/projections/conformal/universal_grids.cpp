@@ -1,7 +1,9 @@
 // Parameters of the universal grids and of the British national grid.
+// Defense Mapping Agency Technical Manual 8358.2, The Universal Grids (1989); Ordnance Survey, A
+// Guide to Coordinate Systems in Great Britain.
 
+#include "tidewater/universal_grids.h"
 #include "formulas/constants.hpp"
-#include "tidewater/conformal.h"
 
 using namespace tidewater::detail;
 

@@ -4,8 +4,8 @@
 #include "projections/special/bipolar_conic_points.hpp"
 
 #include <cmath>
-
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/bipolar_conic.h"
 
 using namespace tidewater::detail;
 
@@ -14,7 +14,9 @@ namespace {
 constexpr double kDegree = kPi / 180;
 
 // What the cone makes of a half-angle.
-double tan_power(double half_angle, double n) { return std::pow(std::tan(half_angle), n); }
+double tan_power(double half_angle, double n) {
+  return portable::pow(portable::tan(half_angle), n);
+}
 
 }  // namespace
 
@@ -39,7 +41,7 @@ BipolarCone cone_of(double lon_a, double lat_a, double lon_b, double lat_b, doub
           t,
           rho_c,
           f,
-          std::tan(ab / 2),
+          portable::tan(ab / 2),
           at.sin,
           at.cos};
 }
@@ -84,31 +86,33 @@ void TWbipocc_c(double lon_a, double lat_a, double lat_b, double ab, double z1, 
                 double* lon_b, double* n, double* k, double* f, double* az_ab, double* az_ba,
                 double* t, double* rho_c, double* z_c, double* az_c, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double sin_a = std::sin(lat_a);
-  const double cos_a = std::cos(lat_a);
-  const double sin_b = std::sin(lat_b);
-  const double cos_b = std::cos(lat_b);
-  const double sin_ab = std::sin(ab);
-  *lon_b = std::acos((std::cos(ab) - sin_b * sin_a) / (cos_b * cos_a)) + lon_a;
-  const double cone = (std::log(std::sin(z1)) - std::log(std::sin(z2))) /
-                      (std::log(std::tan(z1 / 2)) - std::log(std::tan(z2 / 2)));
+  const double sin_a = portable::sin(lat_a);
+  const double cos_a = portable::cos(lat_a);
+  const double sin_b = portable::sin(lat_b);
+  const double cos_b = portable::cos(lat_b);
+  const double sin_ab = portable::sin(ab);
+  *lon_b = portable::acos((portable::cos(ab) - sin_b * sin_a) / (cos_b * cos_a)) + lon_a;
+  const double cone = (portable::log(portable::sin(z1)) - portable::log(portable::sin(z2))) /
+                      (portable::log(portable::tan(z1 / 2)) - portable::log(portable::tan(z2 / 2)));
   const double t1 = tan_power(z1 / 2, cone);
-  const double size = std::sin(z1) / (cone * t1);
+  const double size = portable::sin(z1) / (cone * t1);
   *n = cone;
   *f = size;
   // By contract: the two angles are fixed, whatever the arguments.
-  *k = 2 / (1 + std::sin(z1) * tan_power(26 * kDegree, cone) / (std::sin(52 * kDegree) * t1));
-  const double cos_d = std::cos(*lon_b - lon_a);
-  const double at_a = std::acos((sin_b * cos_a - cos_d * sin_a * cos_b) / sin_ab);
+  *k = 2 /
+       (1 + portable::sin(z1) * tan_power(26 * kDegree, cone) / (portable::sin(52 * kDegree) * t1));
+  const double cos_d = portable::cos(*lon_b - lon_a);
+  const double at_a = portable::acos((sin_b * cos_a - cos_d * sin_a * cos_b) / sin_ab);
   *az_ab = at_a;
-  *az_ba = std::acos((cos_b * sin_a - cos_d * sin_b * cos_a) / sin_ab);
+  *az_ba = portable::acos((cos_b * sin_a - cos_d * sin_b * cos_a) / sin_ab);
   const double sum = tan_power(z2 / 2, cone) + t1;
   *t = sum;
   *rho_c = sum * size / 2;
-  const double z = 2 * std::atan(std::pow(sum / 2, 1 / cone));
+  const double z = 2 * portable::atan(portable::pow(sum / 2, 1 / cone));
   *z_c = z;
-  const double p = std::asin(std::sin(z) * std::cos(at_a) * cos_a + std::cos(z) * sin_a);
-  *az_c = std::asin(std::sin(at_a) * cos_a / std::cos(p));
+  const double p =
+      portable::asin(portable::sin(z) * portable::cos(at_a) * cos_a + portable::cos(z) * sin_a);
+  *az_c = portable::asin(portable::sin(at_a) * cos_a / portable::cos(p));
 }
 
 void TWbipocc_f(double lon_a, double lat_a, double lon_b, double lat_b, double az_ab, double az_ba,

@@ -4,8 +4,8 @@
 #include "projections/special/bonne_points.hpp"
 
 #include <cmath>
-
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/bonne.h"
 
 using namespace tidewater::detail;
 
@@ -26,7 +26,7 @@ void TWbonne_c(double e, double* lat1, double* e2, double* c1, double* r0, TWsta
   if (-kLeast < *lat1 && *lat1 < 0) *lat1 = -kLeast;
   if (e < kLeast) {
     *e2 = 0;
-    *c1 = 1 / std::tan(*lat1);
+    *c1 = 1 / portable::tan(*lat1);
     *r0 = *c1 + *lat1;
     return;
   }
@@ -86,6 +86,6 @@ void TWbonne_s(double k0, double lat1, double lon0, double e2, double r0, int32_
                const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
   // By contract: on the ellipsoid, too, the scale is that of the sphere, and the argument is
   // discarded.
-  if (e2 != 0) r0 = 1 / std::tan(lat1) + lat1;
+  if (e2 != 0) r0 = 1 / portable::tan(lat1) + lat1;
   *status = over_points(BonneScale{k0, lat1, lon0, r0}, count, in, out);
 }

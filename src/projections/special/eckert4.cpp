@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/eckert4.h"
 
 using namespace tidewater::detail;
 
@@ -15,8 +16,8 @@ namespace {
 
 // Newton's step towards the root t of t + sin t cos t + 2 sin t = (2 + pi/2) sin p.
 double newton_step(double t, double target) {
-  const double s = std::sin(t);
-  const double c = std::cos(t);
+  const double s = portable::sin(t);
+  const double c = portable::cos(t);
   return -(c * s + 2 * s + t - target) / (2 * (c + 1) * c);
 }
 
@@ -26,7 +27,7 @@ double newton_step(double t, double target) {
 Next EckertForward::other(const CoordinateTriple& in, CoordinateTriple* out,
                           TWstatus* status) const {
   constexpr int kMostPasses = 50;
-  const double target = kEckertTarget * std::sin(in.y);
+  const double target = kEckertTarget * portable::sin(in.y);
   double t = in.y / 2;
   double step = 0;
   int passes = 0;
@@ -41,7 +42,7 @@ Next EckertForward::other(const CoordinateTriple& in, CoordinateTriple* out,
     *status = TW_NOT_CONVERGED;
     return Next::none;
   }
-  const auto answer = place(in.x, std::sin(t), std::cos(t));
+  const auto answer = place(in.x, portable::sin(t), portable::cos(t));
   out->x = answer.x;
   out->y = answer.y;
   return Next::point;
@@ -51,14 +52,14 @@ Next EckertForward::other(const CoordinateTriple& in, CoordinateTriple* out,
 
 void TWeckertIV_c(double lat0, double* y0, TWstatus* status) {
   *status = TW_SUCCESS;
-  const double target = kEckertTarget * std::sin(lat0);
+  const double target = kEckertTarget * portable::sin(lat0);
   double t = lat0 / 2;
   double step = 0;
   do {
     step = newton_step(t, target);
     t += step;
   } while (step > 1e-12);  // By contract: a negative step of any size ends the loop
-  *y0 = std::sin(t) * std::sqrt(kEckertYSquare) * 2;
+  *y0 = portable::sin(t) * std::sqrt(kEckertYSquare) * 2;
 }
 
 void TWeckertIV_f(double lon0, double y0, int32_t count, const CoordinateTriple* in,

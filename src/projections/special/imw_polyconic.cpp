@@ -5,8 +5,9 @@
 
 #include <cmath>
 
+#include "points/portable.hpp"
 #include "tidewater/frame.h"
-#include "tidewater/special.h"
+#include "tidewater/imw_polyconic.h"
 
 using namespace tidewater::detail;
 
@@ -28,7 +29,7 @@ bool is_south_edge(double lat) { return !(lat > kHalfPi - kFourDegrees || lat < 
 
 // Radius of the polyconic arc of a parallel.
 double arc_radius(double e2, double lat) {
-  return 1 / std::sqrt(1 - e2 * square(std::sin(lat))) / std::tan(lat);
+  return 1 / std::sqrt(1 - e2 * square(portable::sin(lat))) / portable::tan(lat);
 }
 
 double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
@@ -49,8 +50,8 @@ Sheet::Sheet(double e, double lon0_, double lat1_, double r1_, double r2_, doubl
       q(q_),
       s(s_),
       t(t_),
-      sin1(std::sin(lat1)),
-      sin2(std::sin(lat1 + kFourDegrees)),
+      sin1(portable::sin(lat1)),
+      sin2(portable::sin(lat1 + kFourDegrees)),
       meridian(1, e) {}
 
 TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
@@ -91,10 +92,10 @@ TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
   double xb = d;
   double yb = c;
   if (!(std::fabs(sin2) < kSheetNothing)) {
-    xb = std::sin(sin2 * d) * r2;
-    yb = (1 - std::cos(sin2 * d)) * r2 + c;
+    xb = portable::sin(sin2 * d) * r2;
+    yb = (1 - portable::cos(sin2 * d)) * r2 + c;
   }
-  const double xa = std::fabs(sin1) < kSheetNothing ? d : std::sin(sin1 * d) * r1;
+  const double xa = std::fabs(sin1) < kSheetNothing ? d : portable::sin(sin1 * d) * r1;
   const double ya = south_edge_y(d);
   const double slope = (xb - xa) / (yb - ya);
   const double b = (yc + r - ya) * slope + xa;
@@ -180,17 +181,17 @@ void TWIMWmodPoly_c(double e, double, double lat1, double* r1, double* r2, doubl
   for (int i = 0; i < 2; ++i) {
     const double lat = i == 0 ? lat1 : lat1 + kFourDegrees;
     double angle = 0;
-    if (std::fabs(std::tan(lat)) >= kSheetNothing) {
+    if (std::fabs(portable::tan(lat)) >= kSheetNothing) {
       r[i] = arc_radius(e * e, lat);
-      angle = std::sin(lat) * dl;
-      x[i] = std::sin(angle) * r[i];
+      angle = portable::sin(lat) * dl;
+      x[i] = portable::sin(angle) * r[i];
       const TWstatus word = meridian.forward(lat, &m[i]);
       if (word != TW_SUCCESS) *status = word;
     } else {
       r[i] = 0;
       x[i] = dl;
     }
-    y[i] = (1 - std::cos(angle)) * r[i];
+    y[i] = (1 - portable::cos(angle)) * r[i];
   }
   const double d = m[1] - m[0];
   const double yc = std::sqrt(d * d - square(x[1] - x[0])) + y[0];
@@ -214,6 +215,6 @@ void TWIMWmodPoly_i(double e, double lon0, double lat1, double r1, double r2, do
                     CoordinateTriple* out, TWstatus* status) {
   const double lat2 = lat1 + kFourDegrees;
   *status = over_points(
-      SheetInverse{Sheet(e, lon0, lat1, r1, r2, c, p, q, s, t), lat2, 1 / std::cos(lat2)}, count,
-      in, out);
+      SheetInverse{Sheet(e, lon0, lat1, r1, r2, c, p, q, s, t), lat2, 1 / portable::cos(lat2)},
+      count, in, out);
 }

@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/indian_polyhedric.h"
 
 using namespace tidewater::detail;
 
@@ -38,12 +39,12 @@ void TWind_phed_c(double e, double lat0, double* c1, double* c2, double* c3, dou
                   double* c6, TWstatus* status) {
   *status = TW_SUCCESS;
   const double e2 = e * e;
-  const double s = std::sin(lat0);
+  const double s = portable::sin(lat0);
   const double w = 1 / std::sqrt(1 - e2 * s * s);
-  *c1 = std::cos(lat0) * w;
+  *c1 = portable::cos(lat0) * w;
   *c2 = w * w * w * (1 - e2);
   *c3 = *c2 * s;
-  *c4 = std::sin(2 * lat0) * w * 0.25;
+  *c4 = portable::sin(2 * lat0) * w * 0.25;
   *c5 = (1 - e2) * e2 * 3;
   *c6 = (e2 + 1 - 2 * e2 * e2) / 6;
 }

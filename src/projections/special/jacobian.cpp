@@ -1,11 +1,14 @@
 // Local distortion of any transformation of points, by finite differences.  Points go one by one:
 // the time is the caller's transformation's, and the records of nine are not points.
+// J. P. Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 20-26,
+// for the scale factors.
 
 #include <cmath>
 
 #include "formulas/wraps.hpp"
-#include "tidewater/foundation.h"
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/jacobian.h"
 
 using namespace tidewater::detail;
 
@@ -23,7 +26,7 @@ void difference(const CoordinateTriple& from, const CoordinateTriple& to, double
 }
 
 // Azimuthal slope of the north-going axis.
-double north_slope(const double* record) { return std::atan2(record[4], record[3]); }
+double north_slope(const double* record) { return portable::atan2(record[4], record[3]); }
 
 }  // namespace
 
@@ -32,6 +35,7 @@ void TWget_jacobian(TWtransform_ptr transform, void* context, double step0, doub
                     TWstatus* status) {
   *status = TW_SUCCESS;
   const double steps[3] = {step0, step1, step2};
+  // A point at a time: the caller's function takes the time, and sees six points a call.
   for (int32_t i = 0; i < count; ++i, jacobians += kRecord) {
     const CoordinateTriple p = in[i];
     // minus and plus along each of the three axes
@@ -105,7 +109,7 @@ void TWJ_to_slopes(int32_t count, const double* jacobians, CoordinateTriple* out
   for (int32_t i = 0; i < count; ++i, jacobians += kRecord) {
     const double t2 = north_slope(jacobians);
     // By contract: element 3 and not element 1, the slope of the east-going axis.
-    const double t1 = std::atan2(jacobians[3], jacobians[0]);
+    const double t1 = portable::atan2(jacobians[3], jacobians[0]);
     out[i] = {t1, t2, t2 - t1};
   }
 }

@@ -1,12 +1,12 @@
 // Laborde projection: the ellipsoid on the Gauss conformal sphere, its transverse Mercator plane,
 // and a complex cubic.  The exported functions, and a point whose refinement does not end.
 
-#include <cmath>
-
 #include "points/over_heights.hpp"
+#include "points/portable.hpp"
 #include "projections/special/laborde_points.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/special.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/laborde.h"
+#include "tidewater/transverse_mercator.h"
 
 using namespace tidewater::detail;
 
@@ -23,8 +23,8 @@ void TWlab_param(double* lon_c, double* lat_c, double* azimuth, double* false_ea
 
 void TWlabor_c(double azimuth, double* A, double* B, double* C, double* D, TWstatus* status) {
   *status = TW_SUCCESS;
-  *A = (1 - std::cos(2 * azimuth)) / 12;
-  *B = std::sin(2 * azimuth) / 12;
+  *A = (1 - portable::cos(2 * azimuth)) / 12;
+  *B = portable::sin(2 * azimuth) / 12;
   *C = 3 * (square(*A) - square(*B));
   *D = 6 * *A * *B;
 }

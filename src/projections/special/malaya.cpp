@@ -5,7 +5,8 @@
 #include <algorithm>
 #include <iterator>
 
-#include "tidewater/special.h"
+#include "tidewater/malaya.h"
+#include "tidewater/skew_orthomorphic.h"
 
 using namespace tidewater::detail;
 

@@ -1,4 +1,6 @@
-// Grid of Malaya as a pair of bivariate polynomials.
+// Grid of Malaya as a pair of bivariate polynomials, fitted to the rectified skew orthomorphic
+// projection: M. Hotine, The orthomorphic projection of the spheroid, Empire Survey Review 8-9
+// (1946-47).
 #pragma once
 
 #include "formulas/constants.hpp"

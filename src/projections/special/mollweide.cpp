@@ -5,7 +5,7 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "tidewater/mollweide.h"
 
 using namespace tidewater::detail;
 

@@ -5,8 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/conformal.h"
-#include "tidewater/special.h"
+#include "tidewater/mercator.h"
+#include "tidewater/new_zealand.h"
 
 using namespace tidewater::detail;
 

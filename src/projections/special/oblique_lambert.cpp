@@ -1,5 +1,6 @@
 // Oblique Lambert conformal projection: the ellipsoid on a conformal sphere, the graticule of the
 // sphere turned about a pole, and a Lambert conic on it; with the constants of the Krovak case.
+// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2, method 9819.
 // Each stage goes through the whole array, several points at once: where one fails, what the
 // earlier ones have written is seen.
 
@@ -7,9 +8,11 @@
 
 #include "formulas/wraps.hpp"
 #include "projections/turn_points.hpp"
-#include "tidewater/conformal.h"
-#include "tidewater/lines.h"
-#include "tidewater/special.h"
+#include "tidewater/gauss_sphere.h"
+#include "tidewater/geodesic.h"
+#include "tidewater/lambert_conformal.h"
+#include "tidewater/oblique_lambert.h"
+#include "tidewater/rotated_graticule.h"
 
 using namespace tidewater::detail;
 

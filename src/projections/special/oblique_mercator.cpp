@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/oblique_mercator.h"
 
 using namespace tidewater::detail;
 
@@ -17,7 +18,7 @@ constexpr double kSineLimit = 1.00000000000001;
 // Arc sine that holds a value beyond 1 by rounding; false beyond that, and for a not-a-number.
 bool held_asin(double sine, double* angle) {
   if (std::fabs(sine) <= 1) {
-    *angle = std::asin(sine);
+    *angle = portable::asin(sine);
     return true;
   }
   if (std::fabs(sine) <= kSineLimit) {
@@ -41,9 +42,9 @@ struct Constants {
 bool solve_azimuth(double lon_c, double alpha, Constants& k) {
   const double H = k.D + k.F * std::sqrt(k.D * k.D - 1);
   const double G = (H - 1 / H) / 2;
-  if (!held_asin(std::sin(alpha) / k.D, &k.gamma0)) return false;
+  if (!held_asin(portable::sin(alpha) / k.D, &k.gamma0)) return false;
   double angle = 0;
-  if (!held_asin(std::tan(k.gamma0) * G, &angle)) return false;
+  if (!held_asin(portable::tan(k.gamma0) * G, &angle)) return false;
   k.lon0 = lon_c - angle / k.B;
   return true;
 }
@@ -52,8 +53,8 @@ bool solve_two_points(double e, double lon1, double lat1, double lon2, double la
                       Constants& k) {
   if (std::fabs(lat1 - lat2) < 1e-14 && std::fabs(lon1 - lon2) < 1e-14) return false;
   const double dl = wrap_above_then_below(lon1 - lon2);
-  const double H = std::pow(tangent_at(e, lat1), k.B);
-  const double L = std::pow(tangent_at(e, lat2), k.B);
+  const double H = portable::pow(tangent_at(e, lat1), k.B);
+  const double L = portable::pow(tangent_at(e, lat2), k.B);
   if (H == 0) return false;
   const double Q = k.E / H;
   if (Q == 0) return false;
@@ -63,10 +64,10 @@ bool solve_two_points(double e, double lon1, double lat1, double lon2, double la
   const double P = (L - H) / (L + H);
   // By contract: the mean is of the longitudes as they came, also where their difference was
   // wrapped.
-  k.lon0 = (lon1 + lon2) / 2 - std::atan(std::tan(k.B * dl / 2) * J / P) / k.B;
+  k.lon0 = (lon1 + lon2) / 2 - portable::atan(portable::tan(k.B * dl / 2) * J / P) / k.B;
   const double d = wrap_above_then_below(lon1 - k.lon0);
-  k.gamma0 = std::atan(std::sin(k.B * d) / G);
-  return held_asin(std::sin(k.gamma0) * k.D, alpha);
+  k.gamma0 = portable::atan(portable::sin(k.B * d) / G);
+  return held_asin(portable::sin(k.gamma0) * k.D, alpha);
 }
 
 }  // namespace
@@ -78,15 +79,15 @@ void TWo_merc_c(int16_t mode, double e, double lon_c, double lat_c, double lon2,
   const double origin = mode == 1 ? lat_c : *lat0;
   double azimuth = *alpha;
   const double e2 = e * e;
-  const double sin0 = std::sin(origin);
-  const double cos0 = std::cos(origin);
+  const double sin0 = portable::sin(origin);
+  const double cos0 = portable::cos(origin);
   Constants k;
   k.B = std::sqrt(1 + e2 * square(square(cos0)) / (1 - e2));
   k.A = std::sqrt(1 - e2) * k.B / (1 - e2 * sin0 * sin0);
   k.D = k.B * std::sqrt(1 - e2) / (std::sqrt(1 - e2 * sin0 * sin0) * cos0);
   if (k.D * k.D < 1) k.D = 1;
   k.F = origin < 0 ? -1 : 1;
-  k.E = (k.D + k.F * std::sqrt(k.D * k.D - 1)) * std::pow(tangent_at(e, origin), k.B);
+  k.E = (k.D + k.F * std::sqrt(k.D * k.D - 1)) * portable::pow(tangent_at(e, origin), k.B);
   const bool solved = mode == 2 ? solve_two_points(e, lon_c, lat_c, lon2, lat2, &azimuth, k)
                                 : solve_azimuth(lon_c, azimuth, k);
   if (!solved) *status = TW_BAD_PARAMETER;
@@ -108,7 +109,7 @@ HotineForward forward_of(double e, double gamma0, double lon0, double E, double 
                          const CoordinateTriple* out) {
   const auto at = sincos(gamma0);
   const auto at_pole = [&](double side) {
-    return std::log(std::tan(kQuarterPi - side * gamma0 / 2)) * A / B;
+    return portable::log(portable::tan(kQuarterPi - side * gamma0 / 2)) * A / B;
   };
   return {e, lon0, E, B, A, at.sin, at.cos, at_pole(1), at_pole(-1), out};
 }
@@ -165,7 +166,7 @@ void TWo_merc_i(double e, double alpha, double gamma0, double lon0, double E, do
   // The stated iteration ends when fifteen of its steps, not one, have been small, and so at rest,
   // where the inverse of the isometric latitude takes it at once.
   *status = over_points(
-      HotineInverse{a.sin, a.cos, g.sin, g.cos, lon0, std::log(E), B, A, ConformalInverse(e)},
+      HotineInverse{a.sin, a.cos, g.sin, g.cos, lon0, portable::log(E), B, A, ConformalInverse(e)},
       count, in, out);
 }
 

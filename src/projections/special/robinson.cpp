@@ -5,8 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/foundation.h"
-#include "tidewater/special.h"
+#include "tidewater/robinson.h"
+#include "tidewater/spline.h"
 
 using namespace tidewater::detail;
 

@@ -4,17 +4,18 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/rotated_graticule.h"
 
 using namespace tidewater::detail;
 
 void TWrotgrat_c(double lon0, double lat0, double pole_lon, double pole_lat, double* offset,
                  TWstatus* status) {
   *status = TW_SUCCESS;
-  const double a = std::sin(pole_lon - lon0) * std::cos(lat0);
-  const double b = std::cos(pole_lat) * std::sin(lat0) -
-                   std::cos(pole_lon - lon0) * std::sin(pole_lat) * std::cos(lat0);
-  *offset = std::hypot(a, b) <= kRotationPoleMargin ? 0 : kPi - std::atan2(a, b);
+  const double a = portable::sin(pole_lon - lon0) * portable::cos(lat0);
+  const double b = portable::cos(pole_lat) * portable::sin(lat0) -
+                   portable::cos(pole_lon - lon0) * portable::sin(pole_lat) * portable::cos(lat0);
+  *offset = portable::hypot(a, b) <= kRotationPoleMargin ? 0 : kPi - portable::atan2(a, b);
 }
 
 void TWrotgrat_f(double lon0, double /*lat0*/, double pole_lon, double pole_lat, double offset,

@@ -5,8 +5,9 @@
 
 #include <cmath>
 
-#include "tidewater/foundation.h"
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/ellipsoid.h"
+#include "tidewater/sinusoidal.h"
 
 using namespace tidewater::detail;
 
@@ -51,7 +52,7 @@ Next SinusoidalScale::other(const CoordinateTriple& in, CoordinateTriple* out,
   TWdM_dphi(1.0, e2, lat, &slope, &word);
   if (word != TW_SUCCESS) *status = word;
   if (!TW_OK(word)) return Next::none;
-  const auto at = scales(wrap_turns_below_then_above(in.x - lon0), std::sin(lat), slope);
+  const auto at = scales(wrap_turns_below_then_above(in.x - lon0), portable::sin(lat), slope);
   *out = {at.x, at.y, at.z};
   return Next::point;
 }

@@ -5,7 +5,8 @@
 
 #include <cmath>
 
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/skew_orthomorphic.h"
 
 using namespace tidewater::detail;
 
@@ -39,9 +40,9 @@ Next SkewScale::other(const CoordinateTriple& in, CoordinateTriple* out, TWstatu
   if (d.cos == 0) {
     const double v = half_log_ratio((-(cos_g * d.sin) - h.sinh * sin_g) / h.cosh);
     if (std::fabs(v) > kHyperbolicLimit) return refuse_range(status);
-    k = k * std::cosh(v) / h.cosh;
+    k = k * portable::cosh(v) / h.cosh;
   } else {
-    k = k * std::cos(std::atan((h.sinh * cos_g - d.sin * sin_g) / d.cos)) / d.cos;
+    k = k * portable::cos(portable::atan((h.sinh * cos_g - d.sin * sin_g) / d.cos)) / d.cos;
   }
   *out = {k, k, k * k};
   return Next::point;
@@ -53,8 +54,8 @@ void TWrso_c(double e, double lon_c, double lat_c, double skew, double* A, doubl
              double* lon0, TWstatus* status) {
   *status = TW_SUCCESS;
   const double e2 = e * e;
-  const double s = std::sin(lat_c);
-  const double c = std::cos(lat_c);
+  const double s = portable::sin(lat_c);
+  const double c = portable::cos(lat_c);
   const double w = std::sqrt(1 - e2 * s * s);
   const double rho = (1 - e2) / cube(w);
   const double nu = 1 / w;
@@ -63,18 +64,18 @@ void TWrso_c(double e, double lon_c, double lat_c, double skew, double* A, doubl
   const double psi = isometric_latitude(e, sincos(lat_c));
   const double r = *A / nu / c;
   // By contract: r below 1, near the equator, is not tested for.
-  *C = std::log(std::sqrt(r * r - 1) + r) - *B * psi;
+  *C = portable::log(std::sqrt(r * r - 1) + r) - *B * psi;
   const double W = *B * psi + *C;
   if (std::fabs(W) > kHyperbolicLimit) {
     *status = TW_RANGE_ERROR;
     return;
   }
-  const double q = std::sinh(W) * std::tan(skew);
+  const double q = portable::sinh(W) * portable::tan(skew);
   if (std::fabs(q) > 1) {
     *status = TW_BAD_PARAMETER;
     return;
   }
-  *lon0 = lon_c - std::asin(q) / *B;
+  *lon0 = lon_c - portable::asin(q) / *B;
 }
 
 void TWrso_f(double lon0, double skew, double A, double B, double C, double e, int32_t count,
@@ -102,7 +103,7 @@ void TWrso_param(double* lon_c, double* lat_c, double* skew, double* false_easti
   *status = TW_SUCCESS;
   *lon_c = 102.25 * kRadiansPerDegree;
   *lat_c = 4 * kRadiansPerDegree;
-  *skew = std::asin(-0.6);
+  *skew = portable::asin(-0.6);
   *false_easting = 804671.2998;
   *false_northing = 0;
   *k0 = 0.99984;

@@ -9,7 +9,8 @@
 #include <memory>
 #include <new>
 
-#include "tidewater/special.h"
+#include "points/portable.hpp"
+#include "tidewater/space_oblique_mercator.h"
 
 using namespace tidewater::detail;
 
@@ -62,8 +63,8 @@ Next SpaceInverse::other(const CoordinateTriple& in, CoordinateTriple* out,
     const double r = std::sqrt((c2 - c_inc2 * e2) * G);
     const double width = std::sqrt(4 * a * a + b * b);
     const double side = at.at.sin < 0 ? -1 : 1;
-    lat =
-        std::asin(side * std::sqrt(2 * a * (a + side * at.sin_ph * r) - (c2 - c_inc2) * b) / width);
+    lat = portable::asin(side * std::sqrt(2 * a * (a + side * at.sin_ph * r) - (c2 - c_inc2) * b) /
+                         width);
   }
   out->x = at.lon;
   out->y = lat;
@@ -94,8 +95,8 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
   }
 
   const double e2 = e * e;
-  const double s_inc = std::sin(inc);
-  const double c_inc = std::cos(inc);
+  const double s_inc = portable::sin(inc);
+  const double c_inc = portable::cos(inc);
   const double g = 1 - e2;
   *Q = e2 * square(s_inc) / (1 - e2);
   *T = square(s_inc) * (2 - e2) * e2 / square(1 - e2);
@@ -105,17 +106,17 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
   // s: speed of the ground track with respect to L; c: turning of its tangent per unit of track
   const Orbit orbit(eps, om);
   const Track track = {*Q, *T, *W, P, s_inc, c_inc};
-  const double tan2_inc = square(std::tan(inc));
+  const double tan2_inc = square(portable::tan(inc));
   for (int32_t j = 0; j <= N; ++j) {
     const double L = j * h;
-    const double sin_L = std::sin(L);
-    const double cos_L = std::cos(L);
-    const double ph = std::asin(sin_L * s_inc);
-    const double ps = std::atan2(std::tan(ph), g);
-    const double sin_ph = std::sin(ph);
-    const double cos_ph = std::cos(ph);
-    const double sin_ps = std::sin(ps);
-    const double cos_ps = std::cos(ps);
+    const double sin_L = portable::sin(L);
+    const double cos_L = portable::cos(L);
+    const double ph = portable::asin(sin_L * s_inc);
+    const double ps = portable::atan2(portable::tan(ph), g);
+    const double sin_ph = portable::sin(ph);
+    const double cos_ph = portable::cos(ph);
+    const double sin_ps = portable::sin(ps);
+    const double cos_ps = portable::cos(ps);
     const double c2 = square(cos_ph);
     const double cp2 = square(cos_ps);
     const double cl2 = square(cos_L);
@@ -125,7 +126,8 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
     const double Hd = 2 * e2 * (2 - e2) * H * cos_ph * sin_ph / g;
     const double E = orbit.eccentric_anomaly(L);
     const double U = orbit.rate(E);
-    const double Ud = 2 * eps * std::sin(E) * square(1 - eps * std::cos(E)) / (1 - eps * eps);
+    const double Ud =
+        2 * eps * portable::sin(E) * square(1 - eps * portable::cos(E)) / (1 - eps * eps);
     const double L2 = c_inc / c2 - P * U;
     const double L1 = cos_ph * L2 * H / s_inc;
     const double M = sin_ph * square(H) / tan2_inc + cos_ph * Hd * cl2;
@@ -146,7 +148,7 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
     const auto z = simpson<2>(N, [&](int32_t j) {
       const double angle = n * j * h;
       const double turn = s[j] * c[j];
-      return std::array{std::cos(angle) * turn, std::sin(angle) * turn};
+      return std::array{portable::cos(angle) * turn, portable::sin(angle) * turn};
     });
     C[n - 1] = factor * z[0];
     S[n - 1] = factor * z[1];
@@ -157,11 +159,11 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
     double theta = 0;
     for (int32_t n = 1; n <= n_terms; ++n) {
       const double angle = n * j * h;
-      theta += (1 - std::cos(angle)) * S[n - 1] + std::sin(angle) * C[n - 1];
+      theta += (1 - portable::cos(angle)) * S[n - 1] + portable::sin(angle) * C[n - 1];
     }
     const double speed = s[j];
-    c[j] = std::cos(theta) * speed;
-    s[j] = std::sin(theta) * speed;
+    c[j] = portable::cos(theta) * speed;
+    s[j] = portable::sin(theta) * speed;
   }
   const auto mean = simpson<2>(N, [&](int32_t j) { return std::array{s[j], c[j]}; });
   *m_sin = third * (1 / (2 * kPi)) * mean[0];
@@ -173,8 +175,8 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
   for (int32_t n = 1; n <= n_terms; ++n) {
     const auto z = simpson<4>(N, [&](int32_t j) {
       const double angle = n * j * h;
-      const double cos_n = std::cos(angle);
-      const double sin_n = std::sin(angle);
+      const double cos_n = portable::cos(angle);
+      const double sin_n = portable::sin(angle);
       return std::array{cos_n * s[j], sin_n * s[j], sin_n * c[j], cos_n * c[j]};
     });
     const double Cs = k * z[0];
@@ -221,10 +223,10 @@ void TWsom_f(int16_t orbit, int16_t side, int16_t n_terms, double lon_n, double 
                               sum3,
                               sum4,
                               Orbit(eps, om),
-                              {Q, T, W, P, std::sin(inc), std::cos(inc)}};
+                              {Q, T, W, P, portable::sin(inc), portable::cos(inc)}};
   *status = over_points(
-      SpaceForward{series, lon_n, e * e, G, start, std::sin(start) * kHalfPi, axes == 1}, count, in,
-      out);
+      SpaceForward{series, lon_n, e * e, G, start, portable::sin(start) * kHalfPi, axes == 1},
+      count, in, out);
 }
 
 void TWsom_i(int16_t n_terms, double lon_n, double e, double inc, double P, double eps, double om,
@@ -250,7 +252,7 @@ void TWsom_i(int16_t n_terms, double lon_n, double e, double inc, double P, doub
                               sum3,
                               sum4,
                               Orbit(eps, om),
-                              {Q, T, W, P, std::sin(inc), std::cos(inc)}};
+                              {Q, T, W, P, portable::sin(inc), portable::cos(inc)}};
   *status = over_points(SpaceInverse{series, lon_n, e * e, inc, G, axes == 1}, count, in, out);
 }
 

@@ -6,7 +6,7 @@
 #include <memory>
 #include <new>
 
-#include "tidewater/special.h"
+#include "tidewater/spline.h"
 
 namespace {
 

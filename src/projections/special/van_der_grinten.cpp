@@ -5,8 +5,9 @@
 
 #include <cmath>
 
+#include "points/portable.hpp"
 #include "projections/special/cycle_watch.hpp"
-#include "tidewater/special.h"
+#include "tidewater/van_der_grinten.h"
 
 using namespace tidewater::detail;
 
@@ -16,7 +17,7 @@ namespace {
 
 // Latitude of (X, Y) in units of pi, by Newton; Y is the size of the ordinate.
 double latitude_of(double X, double Y, TWstatus* status) {
-  double p = 2 * std::atan(Y);
+  double p = 2 * portable::atan(Y);
   double previous = p + 1;
   CycleWatch watch;
   while (std::fabs(p - previous) > 1e-12) {
