@@ -95,9 +95,9 @@ TEST(MagneticModelObject, RefusalsNameWhatThereIs) {
   EXPECT_FALSE(MagneticModel::models().empty());
 }
 
-// A model that many threads share gives what one gives alone.
 Point place(unsigned i) { return {-180 + 0.7 * (i % 500), -80 + 1.3 * (i % 120), 100}; }
 
+// A model that many threads share gives what one gives alone.
 TEST(MagneticModelObject, ThreadsThatShareItDoNotMeet) {
   const MagneticModel model("", 2026.5);
   constexpr unsigned kThreads = 4;
