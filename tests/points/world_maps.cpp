@@ -34,7 +34,22 @@ struct Double {
   }
 };
 
+// A triangle and the map of it.
+struct Chamberlin {
+  CoordinateTriple control[3] = {{-0.3, 0.5, 0}, {0.4, 0.5, 0}, {0, 1, 0}}, plane[3] = {};
+  double sides[3] = {}, azimuths[3] = {};
+  Chamberlin() {
+    double lon = 0, lat = 0.7, rotation = kHalfPi;
+    TWstatus word = 0;
+    TWchamtri_c(nullptr, 0, 1, kE, control, sides, azimuths, plane, &lon, &lat, &rotation, &word);
+  }
+};
+
 const Operations world_maps = {
+    {"TWchamtri_f", geographic(-15, 32, -100), geographic(20, 55, 100),
+     [c = Chamberlin()](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
+       TWchamtri_f(kE, c.control, c.sides, c.azimuths, c.plane, n, in, out, status);
+     }},
     {"TWrobin_f", geographic(-180, -90), geographic(180, 90),
      [](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
        const Robinson& r = robinson();
