@@ -41,6 +41,11 @@ class Triangle {
     for (std::size_t n = 0; n < rows; ++n) rows_.push_back(block_.data() + n * (n + 1) / 2);
   }
   Triangle(Triangle&&) = default;
+  Triangle(const Triangle& other) : Triangle(static_cast<int32_t>(other.rows_.size()) - 1) {
+    block_ = other.block_;
+    for (std::size_t n = 0; n < rows_.size(); ++n) rows_[n] = block_.data() + n * (n + 1) / 2;
+  }
+  Triangle& operator=(const Triangle&) = delete;
 
   // The functions of the library take tables that they do not change without const.
   double** rows() const { return const_cast<double**>(rows_.data()); }
@@ -226,23 +231,26 @@ class MagneticModelImpl {
   }
 
   // At points that are radians and metres; the words of those that fail are set.
-  void at(Block& block, MagneticValue* out, Sums& main, Sums& rates, double& last_lon) const {
+  // What the library writes beside its results is the caller's, so that threads do not meet: the
+  // sums, and a copy of recursion(), in which it keeps the sines of a longitude.
+  void at(Block& block, MagneticValue* out, Sums& main, Sums& rates, const Triangle& rec_b,
+          double& last_lon) const {
     CoordinateTriple vectors[kBlockSize];
     CoordinateTriple changes[kBlockSize];
     MagneticElements elements[kBlockSize];
     MagneticElements element_rates[kBlockSize];
     TWstatus status = TW_SUCCESS;
-    TWhar_mag_var(degree_, info.radius, cosines_.rows(), sines_.rows(), rec_a_.rows(),
-                  rec_b_.rows(), main.dC.data(), main.dS.data(), main.lC.data(), main.lS.data(),
-                  main.rC.data(), main.rS.data(), main.C.data(), main.S.data(), &main.last_colat,
-                  &main.last_radius, &last_lon, kSameParallel, &main.tcos, &main.tsin,
-                  &main.scale_theta, &main.scale_lambda, &main.scale_r, rate_degree_,
-                  cosine_rates_.rows(), sine_rates_.rows(), rates.dC.data(), rates.dS.data(),
-                  rates.lC.data(), rates.lS.data(), rates.rC.data(), rates.rS.data(),
-                  rates.C.data(), rates.S.data(), &rates.last_colat, &rates.last_radius,
-                  &rates.tcos, &rates.tsin, &rates.scale_theta, &rates.scale_lambda, &rates.scale_r,
-                  kWgs84A, std::sqrt(kWgs84F * (2 - kWgs84F)), block.count, block.now, vectors,
-                  elements, changes, element_rates, &status);
+    TWhar_mag_var(degree_, info.radius, cosines_.rows(), sines_.rows(), rec_a_.rows(), rec_b.rows(),
+                  main.dC.data(), main.dS.data(), main.lC.data(), main.lS.data(), main.rC.data(),
+                  main.rS.data(), main.C.data(), main.S.data(), &main.last_colat, &main.last_radius,
+                  &last_lon, kSameParallel, &main.tcos, &main.tsin, &main.scale_theta,
+                  &main.scale_lambda, &main.scale_r, rate_degree_, cosine_rates_.rows(),
+                  sine_rates_.rows(), rates.dC.data(), rates.dS.data(), rates.lC.data(),
+                  rates.lS.data(), rates.rC.data(), rates.rS.data(), rates.C.data(), rates.S.data(),
+                  &rates.last_colat, &rates.last_radius, &rates.tcos, &rates.tsin,
+                  &rates.scale_theta, &rates.scale_lambda, &rates.scale_r, kWgs84A,
+                  std::sqrt(kWgs84F * (2 - kWgs84F)), block.count, block.now, vectors, elements,
+                  changes, element_rates, &status);
     for (int i = 0; i < block.count; ++i) {
       if (!TW_OK(status)) block.fail(i, status);
       if (!std::isfinite(elements[i].total)) block.fail(i, TW_RANGE_ERROR);
@@ -265,6 +273,7 @@ class MagneticModelImpl {
   }
 
   int32_t most() const { return most_; }
+  const Triangle& recursion() const { return rec_b_; }
 
   const Info info;
   const double year;
@@ -304,8 +313,9 @@ Summary MagneticModel::field(std::size_t count, Coordinates<const double> in, Ma
         try {
           detail::Sums main(impl_->most());
           detail::Sums rates(impl_->most());
+          const detail::Triangle rec_b = impl_->recursion();
           double last_lon = detail::kNowhere;
-          impl_->at(block, out + at, main, rates, last_lon);
+          impl_->at(block, out + at, main, rates, rec_b, last_lon);
         } catch (const std::bad_alloc&) {
           for (int i = 0; i < block.count; ++i) block.fail(i, TW_NO_MEMORY);
         }

@@ -21,6 +21,7 @@
 #include "points/operations.hpp"
 #include "support/grids.hpp"
 #include "tidewater/catalogue.h"
+#include "tidewater/conformal.h"
 #include "tidewater/datum.h"
 #include "tidewater/foundation.h"
 #include "tidewater/grids.hpp"
@@ -152,7 +153,8 @@ void systems_layer(const std::string& folder) {
   // The registry is read by the first that asks.
   together("System and Transformation of each thread's own", [] {
     const Transformation map{System("EPSG:4230"), System("EPSG:2154")};
-    return Bytes().add(map.forward({3, 46, 0})).all + map.describe() + System("EPSG:27700").to_wkt();
+    return Bytes().add(map.forward({3, 46, 0})).all + map.describe() +
+           System("EPSG:27700").to_wkt();
   });
   const Transformation map{System("EPSG:27572"), System("EPSG:2154")};
   together("Transformation, shared, in threads of its own", [&] {
@@ -167,21 +169,21 @@ void systems_layer(const std::string& folder) {
     return Bytes().add(x[4999]).add(y[4999]).add(map.inverse({x[7], y[7], 0})).all;
   });
   const ShiftGrid grid(folder + "g.las");
-  const GeoidGrid geoid(folder + "g.geo");
+  const tidewater::GeoidGrid geoid(folder + "g.geo");
   together("grids, shared", [&] {
     const Point there = grid.forward({-70.3, 40.2, 0});
     return Bytes().add(there).add(grid.inverse(there)).add(geoid.undulation(-70, 40)).all;
   });
   together("grids of each thread's own", [&] {
-    return ShiftGrid(folder + "g.las").describe() + GeoidGrid(folder + "g.geo").describe();
+    return ShiftGrid(folder + "g.las").describe() +
+           tidewater::GeoidGrid(folder + "g.geo").describe();
   });
   const MagneticModel model("", 2026);
   together("MagneticModel", [&] {
     return Bytes().add(model.field(Point{2, 48, 0})).add(MagneticModel("", 2027).year()).all;
   });
   together("texts", [] {
-    const ParsedPosition position =
-        parse_position("48 51 24 N 2 21 E", Order::unknown, false);
+    const ParsedPosition position = parse_position("48 51 24 N 2 21 E", Order::unknown, false);
     return Bytes().add(position.latitude).add(parse_mgrs("31UDQ4825111932").easting).all;
   });
   together("C interface", [] {

@@ -404,6 +404,21 @@ TEST(Passes, StereographicLatitudeOfTrueScale) {
   EXPECT_GT(south, 0);
 }
 
+// The pass that gives points at a pole the central meridian ends with the array.
+TEST(Stereographic, WhatFollowsTheArrayIsNotLookedAt) {
+  double C = 0, m0 = 0, chi0 = 0;
+  TWstatus status = 0;
+  TWstereo_c(kE, -kHalf, &C, &m0, &chi0, &status);
+  for (const int32_t count : {1, 3, 8, 20}) {
+    Points in(static_cast<std::size_t>(count), {0.1, 0.2, 0});
+    Points out = untouched(in.size() + 1);
+    out.back() = {kUntouched, kHalf, 7};
+    TWstereo_i(kE, 0.4, -kHalf, C, m0, chi0, count, in.data(), out.data(), &status);
+    EXPECT_EQ(out.back().x, kUntouched) << count;
+    EXPECT_NE(out[0].x, kUntouched);
+  }
+}
+
 // --- Chamberlin: what is no cosine is rounded, not held; north by probes of 1e-4 -----------------
 
 TEST(Chamberlin, WhatIsNoCosineIsRoundedToAWholeNumber) {
@@ -443,6 +458,29 @@ TEST(Chamberlin, WhatIsNoCosineIsRoundedToAWholeNumber) {
     const double first = side_for(1.2);
     EXPECT_NEAR(3 * (out.x - one.x), (rounded / side - 1 / first) * plane[1].x * d0, 1e-12) << c;
     EXPECT_NEAR(3 * (out.y - one.y), (rounded / side - 1 / first) * plane[1].y * d0, 1e-12) << c;
+  }
+}
+
+// Corners on one meridian, where the cosines of the set-up are 1 or -1 but for rounding: an angle
+// of none or of half a turn, not none at all.
+TEST(Chamberlin, CornersInALine) {
+  const TWtransform never = [](TWcontext, int32_t, const CoordinateTriple*, CoordinateTriple*,
+                               TWstatus* status) { *status = TW_RANGE_ERROR; };
+  for (int i = 1; i < 40; ++i) {
+    const double step = 0.01 * i;
+    // In the first the corners follow each other, in the second the first lies between the others.
+    for (const bool between : {false, true}) {
+      const CoordinateTriple control[3] = {{0.3, between ? step : 0, 0},
+                                           {0.3, between ? 0 : step, 0},
+                                           {0.3, (between ? 3 : 2) * step, 0}};
+      double sides[3], azimuths[3], lon = 0, lat = 0, rotation = 0;
+      CoordinateTriple plane[3] = {};
+      TWstatus status = 0;
+      TWchamtri_c(never, 0, 0, 0, control, sides, azimuths, plane, &lon, &lat, &rotation, &status);
+      EXPECT_NEAR(plane[1].x - plane[0].x, between ? -step : step, 1e-7) << i;
+      EXPECT_NEAR(plane[2].x - plane[0].x, 2 * step, 1e-7) << i;
+      EXPECT_NEAR(plane[1].y, 0, 1e-7) << i;
+    }
   }
 }
 
