@@ -282,7 +282,8 @@ TEST(Edges, ObliqueMercatorHoldsASineOfOneAndABit) {
     EXPECT_EQ(status, r <= 1.00000000000001 ? TW_SUCCESS : TW_BAD_PARAMETER) << lat0;
     if (r > 1 && r <= 1.00000000000001) {
       ++held;
-      EXPECT_EQ(lon0, 0.3 - kHalf / B);
+      // What the library rounds to 1 or just below gives the arc sine of that.
+      EXPECT_NEAR(lon0, 0.3 - kHalf / B, 1e-7);
     }
   }
   EXPECT_GT(held, 20);
