@@ -198,7 +198,7 @@ def lines():
         end = np.array([[p["lon2"], p["lat2"]] for p in ends])
         lon, lat, _ = ours.direct(start[:, 0], start[:, 1], azimuth, length)
         along = ours.inverse(start[:, 0], start[:, 1], *end.T)[0]
-        row = Row(f"Geodesics, {name}", "`Geodesics`", "all azimuths", "GeographicLib", 1000,
+        row = Row(f"Geodesics, {name}", "`Geodesic`", "all azimuths", "GeographicLib", 1000,
                   Error.of(on_the_ground(A, end * DEGREE, np.column_stack([lon, lat]) * DEGREE)),
                   Error.of(np.abs(along - length)), note="direct; length of the inverse")
         row.extra.update(azimuth=azimuth, along=np.abs(along - length), length=length)
@@ -208,7 +208,7 @@ def lines():
              zip(179 + (pairs[:, 0] + 180) / 360, pairs[:, 1])]
     got = ours.inverse(np.zeros(400), pairs[:, 1], 179 + (pairs[:, 0] + 180) / 360,
                        -pairs[:, 1] + 0.3)[0]
-    yield Row("Geodesics, nearly antipodal", "`Geodesics`", "within a degree of the antipode",
+    yield Row("Geodesics, nearly antipodal", "`Geodesic`", "within a degree of the antipode",
               "GeographicLib", 400, None, Error.of(np.abs(got - [t["s12"] for t in truth])))
     corners = np.array([[-5, 48], [10, 40], [40, 55], [20, 70], [-10, 65.0]])
     p = g.Polygon()
@@ -216,7 +216,7 @@ def lines():
         p.AddPoint(lat, lon)
     _, perimeter, area = p.Compute()
     got = ours.polygon(*corners.T)
-    yield Row("Polygon", "`Geodesics`", "a polygon of 6 million km²", "GeographicLib", 1,
+    yield Row("Polygon", "`Geodesic`", "a polygon of 6 million km²", "GeographicLib", 1,
               Error.of(np.array([abs(got[0] - perimeter)])), None,
               Error.of(np.array([abs(got[1] / area - 1)]), ""), note="perimeter; area, relative")
     count = 200
@@ -228,7 +228,7 @@ def lines():
     rhumb = Lines(1, A, FLAT)
     lon, lat, _ = rhumb.direct(start[:, 0], start[:, 1], azimuth, length)
     along = rhumb.inverse(start[:, 0], start[:, 1], *(end / DEGREE).T)[0]
-    yield Row("Rhumb lines", "`RhumbLines`", "lat -60 to 60, to 2,000 km", MP, count,
+    yield Row("Rhumb lines", "`Rhumb`", "lat -60 to 60, to 2,000 km", MP, count,
               Error.of(on_the_ground(A, end, np.column_stack([lon, lat]) * DEGREE)),
               Error.of(np.abs(along - length)), note="direct; length of the inverse")
 

@@ -458,6 +458,55 @@ const ParameterKind* parameter_kind(int code) {
   return nullptr;
 }
 
+std::string_view truth_of(int method) {
+  switch (method) {
+    case 9807:
+    case 9808:
+    case 1111:
+    case 9824:
+      return "within 5 nm of the exact projection to 3,900 km from the central meridian, refused "
+             "beyond";
+    case kAzimuthalEquidistant:
+      return "within 10 nm by geodesics";
+    case kSpaceOblique:
+    case kLandsat:
+      return "true along the track within 2e-11";
+    case kChamberlin:
+      return "the mean of three distances, each within 10 nm; inverse within 5 cm along the sides";
+    case 9806:
+    case 9811:
+    case 9813:
+    case 9816:
+    case 9817:
+    case 9818:
+    case 9831:
+    case 9832:
+    case 9833:
+    case 1052:
+    case 1042:
+    case 1043:
+    case kImwPolyconic:
+    case kIndianPolyhedric:
+    case kMalaya:
+      return "the method is defined by its own series, which are taken whole";
+    case 1024:
+    case 1029:
+    case 9834:
+    case kRobinson:
+    case kMollweide:
+    case kEckert4:
+    case kVanDerGrinten:
+    case kMiller:
+    case kGnomonic:
+    case kBipolarConic:
+      return "formulas of a sphere of the semi-major axis, to rounding";
+    case 1027:
+      return "formulas of the sphere of equal area, to rounding";
+    default:
+      return "closed formulas and series to rounding: within a micrometre in the area of use";
+  }
+}
+
 void require(bool good, const MethodArguments& given, const char* why) {
   if (good) return;
   const Method* method = method_by_code(given.definition.method);

@@ -98,4 +98,7 @@ const Method* method_by_code(int code);
 const Method* method_by_words(std::string_view words);
 const ParameterKind* parameter_kind(int code);
 
+// How true a method's formulas are, in words; docs/systems.md says how it was measured.
+std::string_view truth_of(int method);
+
 }  // namespace tidewater::detail

@@ -28,8 +28,8 @@ MethodArguments arguments(const Definition& definition) {
   return {definition, a, std::sqrt(e2), e2, f};
 }
 
-// An inverse whose result must lead back: some formulas answer with success beyond their map.  Within
-// `sure` of the plane's origin all points are the map's.
+// An inverse whose result must lead back: some formulas answer with success beyond their map.
+// Within `sure` of the plane's origin all points are the map's.
 class CheckedFormula final : public Formula {
  public:
   CheckedFormula(std::unique_ptr<const Formula> formula, double sure)
@@ -121,8 +121,8 @@ ProjectionImpl::ProjectionImpl(const Definition& definition)
   }
   formula_ = method_->make(arguments(definition_));
   if (needs_check(method_->code)) {
-    formula_ = std::make_unique<const CheckedFormula>(std::move(formula_),
-                                                      sure_radius(method_->code));
+    formula_ =
+        std::make_unique<const CheckedFormula>(std::move(formula_), sure_radius(method_->code));
   }
   const Plane& plane = formula_->plane;
   if (!(std::isfinite(plane.sx) && std::isfinite(plane.sy) && std::isfinite(plane.x0) &&
@@ -337,6 +337,8 @@ std::vector<std::pair<std::string, double>> Projection::parameters() const {
   }
   return list;
 }
+
+std::string Projection::truth() const { return impl_->truth(); }
 
 Ellipsoid Projection::ellipsoid() const {
   const auto& ellipsoid = impl_->definition().datum.ellipsoid;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <memory>
+#include <string>
 
 #include "block.hpp"
 #include "methods.hpp"
@@ -19,6 +20,7 @@ class ProjectionImpl final : public Step {
 
   const Definition& definition() const { return definition_; }
   const Method& method() const { return *method_; }
+  std::string truth() const { return std::string(truth_of(method_->code)); }
 
  private:
   void forward(Block& block) const;

@@ -155,6 +155,7 @@ std::string System::describe() const {
   if (impl_->projection != nullptr) {
     text += "\nmethod: " + method();
     for (const auto& [name, value] : parameters()) text += "\n  " + name + ": " + shown(value);
+    text += "\nformulas: " + impl_->projection->truth();
   }
   if (!definition.vertical_name.empty()) {
     text += "\nheights: " + definition.vertical_name + " (" + definition.vertical_unit.name + ")";

@@ -1,6 +1,6 @@
 /**
  * @file ellipsoid.hpp
- * Ellipsoids, prime meridians and units: small values.
+ * Ellipsoids, prime meridians and units: small values, which any number of threads may read.
  */
 #ifndef TIDEWATER_ELLIPSOID_HPP
 #define TIDEWATER_ELLIPSOID_HPP

@@ -38,6 +38,10 @@ struct MagneticValue {
 /**
  * A spherical harmonic model of the geomagnetic field at a date.
  *
+ * The published test values of WMM2025 come out to their last digit, 0.1 nT and 0.01 degrees.  What
+ * a model leaves out, crust and currents, is some 150 nT and half a degree of declination at a
+ * place, more near the magnetic poles.
+ *
  * A shared handle: copies are cheap, and any number of threads may use one at once.
  */
 class TW_SYSTEMS_API MagneticModel {

@@ -46,7 +46,7 @@ TW_API void TWmalaya_c(double* table, TWstatus* status);
  * @param lat0    latitude of the origin
  * @param count   number of points
  * @param in      longitude, latitude
- * @param out     x, y in units of the semi-major axis of Everest 1830, 6377304.063 m
+ * @param out     x, y in units of the semi-major axis of Everest 1830 Modified, 6377304.063 m
  * @param status  always #TW_SUCCESS
  */
 TW_API void TWmalaya_f(const double* table, double lon0, double lat0, int32_t count,

@@ -33,6 +33,9 @@ struct Factors {
  * A map projection of an ellipsoid: longitude and latitude in degrees to easting and northing in
  * metres, both counted as the method's definition says (westing and southing where it has those).
  *
+ * Measured against PROJ 9.1 on all projected systems of the registry: within 1 mm, nearly all
+ * within a micrometre; truth() says what holds for a method, docs/systems.md how it was measured.
+ *
  * A shared handle: copies are cheap, and any number of threads may use one at once.
  */
 class TW_SYSTEMS_API Projection {
@@ -57,6 +60,8 @@ class TW_SYSTEMS_API Projection {
   /** The parameters by the registry's names; degrees, metres. */
   std::vector<std::pair<std::string, double>> parameters() const;
   Ellipsoid ellipsoid() const; /**< what is projected */
+  /** How true the formulas are, in words: "within 5 nm of the exact projection to 3,900 km ...". */
+  std::string truth() const;
 
   /**
    * Longitude, latitude in degrees to easting, northing in metres.

@@ -40,7 +40,9 @@ struct FoundSystem {
 };
 
 /**
- * A coordinate system.
+ * A coordinate system: what its coordinates are counted from, in which units and along which axes.
+ *
+ * Nothing is computed here; Projection and Transformation say how true their figures are.
  *
  * A shared handle: copies are cheap, and any number of threads may use one at once.
  */
@@ -89,7 +91,7 @@ class TW_SYSTEMS_API System {
   std::string to_proj() const;
   std::string to_wkt() const;                         /**< WKT 2 */
   std::string to_wkt(std::string_view dialect) const; /**< "wkt1", "esri" or "wkt2" */
-  /** All of the above in words, a line each. */
+  /** All of the above in words, a line each, and how true the projection's formulas are. */
   std::string describe() const;
 
   /**

@@ -71,7 +71,7 @@ typedef enum tw_kind {
  * @return null where the text is not understood
  */
 TW_SYSTEMS_C_API tw_system* tw_system_create(const char* text);
-/** The same, where the zone of "utm" or "ups" is found from a point in degrees. */
+/** The same, where the zone of "utm", "ups" or "mgrs" is found from a point in degrees. */
 TW_SYSTEMS_C_API tw_system* tw_system_create_at(const char* text, double longitude,
                                                 double latitude);
 /** Takes a system back. */
@@ -163,7 +163,7 @@ typedef struct tw_points_f {
   float* x;
   float* y;
   float* z;
-  ptrdiff_t stride;
+  ptrdiff_t stride; /**< in floats */
 } tw_points_f;
 
 /**
@@ -254,7 +254,7 @@ typedef struct tw_factors {
   double angular;     /**< largest angular distortion, degrees */
 } tw_factors;
 
-/** Distortion at points in degrees; as tw_transform(). */
+/** Distortion at points in degrees, NaN where there is none; as tw_transform(). */
 TW_SYSTEMS_C_API size_t tw_project_factors(const tw_projection* projection, size_t count,
                                            const tw_points* in, tw_factors* out, TWstatus* status);
 
@@ -318,7 +318,7 @@ typedef struct tw_lines tw_lines;
 /**
  * @param rhumb  0: geodesics; else rhumb lines
  * @param a      semi-major axis
- * @param f      flattening, from -0.02 to 0.02
+ * @param f      flattening, from -0.01 to 0.01
  */
 TW_SYSTEMS_C_API tw_lines* tw_lines_create(int32_t rhumb, double a, double f);
 /** Takes lines back. */
@@ -362,7 +362,8 @@ typedef struct tw_magnetic_value {
   double yearly_declination, yearly_inclination;
 } tw_magnetic_value;
 
-/** The field at points of degrees and metres above WGS 84; as tw_transform(). */
+/** The field at points of degrees and metres above WGS 84, NaN for one that fails; as
+ *  tw_transform(). */
 TW_SYSTEMS_C_API size_t tw_magnetic_field(const tw_magnetic_model* model, size_t count,
                                           const tw_points* in, tw_magnetic_value* out,
                                           TWstatus* status);

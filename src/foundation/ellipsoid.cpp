@@ -63,11 +63,11 @@ MeridianFoot::MeridianFoot(const MeridianArc& arc)
   const double n5 = n4 * n;
   const double n6 = n5 * n;
   // The terms in n^5 of the arc that its series leaves out are added to those of the inverse.
-  series_ = SineSeries<6>::of({3 * n / 2 - 27 * n3 / 32 + (269.0 / 512 + 3.0 / 128) * n5,
-                               21 * n2 / 16 - 55 * n4 / 32 + 6759 * n6 / 4096,
-                               151 * n3 / 96 + (175.0 / 768 - 417.0 / 128) * n5,
-                               1097 * n4 / 512 - 15543 * n6 / 2560,
-                               (8011.0 / 2560 - 693.0 / 1280) * n5, 293393 * n6 / 61440});
+  series_ = SineSeries<6>::of({1.5 * n - 27.0 / 32 * n3 + (269.0 / 512 + 3.0 / 128) * n5,
+                               21.0 / 16 * n2 - 55.0 / 32 * n4 + 6759.0 / 4096 * n6,
+                               151.0 / 96 * n3 + (175.0 / 768 - 417.0 / 128) * n5,
+                               1097.0 / 512 * n4 - 15543.0 / 2560 * n6,
+                               (8011.0 / 2560 - 693.0 / 1280) * n5, 293393.0 / 61440 * n6});
 }
 
 double MeridianArc::tail(double lat) const {

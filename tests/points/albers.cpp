@@ -22,7 +22,7 @@ Operation inverse(const char* name, double e, double lat1, double lat2, Coordina
           [e, lat1, lat2](int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                           TWstatus* status) {
             double n, C, rho0;
-            TWalbers_c(e, 0, lat1, lat1, lat2, &n, &C, &rho0);
+            TWalbers_c(e, 0, 0.4, lat1, lat2, &n, &C, &rho0);
             TWalbers_i(e, -1.7, n, C, rho0, count, in, out, status);
           }};
 }

@@ -52,12 +52,9 @@ Operation synthesis(const char* name, int16_t mode, double tolerance) {
 }
 
 const Operations harmonic = {
-    synthesis("TWhar_sum, gradient", 0, 0),
-    synthesis("TWhar_sum, gradient, tolerance", 0, 2e6),
-    synthesis("TWhar_sum, along theta", 1, 0),
-    synthesis("TWhar_sum, along lambda", 2, 0),
-    synthesis("TWhar_sum, radial", 3, 0),
-    synthesis("TWhar_sum, gravity", 4, 0),
+    synthesis("TWhar_sum, gradient", 0, 0),    synthesis("TWhar_sum, gradient, tolerance", 0, 2e6),
+    synthesis("TWhar_sum, along theta", 1, 0), synthesis("TWhar_sum, along lambda", 2, 0),
+    synthesis("TWhar_sum, radial", 3, 0),      synthesis("TWhar_sum, gravity", 4, 0),
 };
 
 }  // namespace

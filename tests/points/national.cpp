@@ -126,6 +126,14 @@ const Operations national = {
        TWlaborde_i(kE, 0.8, k.chi0, k.c, k.t, k.A0, k.M0, k.B2, k.B4, k.B6, 1, k.A, k.B, k.C, k.D,
                    n, in, out, status);
      }},
+    // In place only: it writes to its input.
+    {"TWlaborde_s", geographic(40, -30), geographic(52, -8),
+     [](int32_t n, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
+       const Laborde& k = laborde;
+       std::vector<CoordinateTriple> copy(in, in + (n > 0 ? n : 0));
+       TWlaborde_s(kE, 0.8, k.c, k.t, k.R, k.A0, k.A2, k.A4, k.A6, k.A8, k.M0, k.A, k.B, 0.9995, n,
+                   in == out ? out : copy.data(), out, status);
+     }},
     {"TWmalaya_f", geographic(100, 0), geographic(105, 8),
      [](int32_t n, const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status) {
        TWmalaya_f(malaya_table(), 1.78, 0.07, n, in, out, status);

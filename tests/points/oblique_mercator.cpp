@@ -26,6 +26,12 @@ void add_hotine(const std::string& which, double e) {
                           [=](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
                             TWo_merc_uv_k(e, alpha, g, lon0, E, B, A, 1, n, in, out, status);
                           }});
+  operations().push_back({"TWo_merc_rot, " + which,
+                          {-1, -1, 0},
+                          {1, 1, 0},
+                          [=](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
+                            TWo_merc_rot(alpha, n, in, out, status);
+                          }});
   operations().push_back({"TWo_merc_i, " + which,
                           {-1, -1, 0},
                           {1, 1, 0},

@@ -66,7 +66,7 @@ std::array<Operation, 3> orthographic(const char* which, double e, double lat0) 
             }}}};
 }
 
-std::array<Operation, 4> perspective(const char* which, double e) {
+std::array<Operation, 5> perspective(const char* which, double e) {
   constexpr double kLat0 = 0.7;
   constexpr double kView = 5e6;
   double p = 0;
@@ -93,6 +93,15 @@ std::array<Operation, 4> perspective(const char* which, double e) {
            {name("TWpersp_f"), geographic(-10, 10, -1000), geographic(40, 70, 9000),
             [=](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
               TWpersp_f(kA, e, 0.3, kLat0, 100, kView, p, g, 0.2, 0.1, 0.4, n, in, out, status);
+            }},
+           // Writes to its input.
+           {name("TWpersp_i"),
+            {-0.3, -0.3, -1000},
+            {0.3, 0.3, 9000},
+            [=](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
+              std::vector<CoordinateTriple> copy(in, in + (n > 0 ? n : 0));
+              TWpersp_i(kA, e, 0.3, kLat0, 100, kView, p, g, 0.2, 0.1, 0.4, n,
+                        in == out ? out : copy.data(), out, status);
             }}}};
 }
 

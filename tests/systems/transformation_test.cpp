@@ -319,6 +319,8 @@ TEST(Systems, NamesThatUsersType) {
   EXPECT_EQ(System("geocentric:wgs84").kind(), SystemKind::geocentric);
   EXPECT_EQ(System("spcs83:2900").method(), "Transverse Mercator");
   EXPECT_EQ(System("spcs27:0401").unit(), "US survey foot");
+  EXPECT_TRUE(has(System("2154").describe(), "formulas: closed formulas"));
+  EXPECT_TRUE(has(System("32631").describe(), "formulas: within 5 nm"));
   const System inline_definition(
       "lambert conformal lat1=44 lat2=49 lat0=46.5 lon0=3 x0=700000 y0=6600000 ellps=GRS80");
   const Point a = inline_definition.projection()->forward({2.3, 48.8});

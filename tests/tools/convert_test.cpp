@@ -24,6 +24,18 @@ struct NationalGrid : ScratchFolder {
   }
 };
 
+// The figures are those of proj and invproj, which know of no datum.
+TEST(Convert, GeodeticIsOnADatumThatHasNoName) {
+  const std::string map = " '+proj=tmerc +lat_0=45 +lon_0=5 +ellps=bessel'";
+  EXPECT_EQ(shell("tidewater convert --from geodetic --to" + map, "45.19 5.72\n").out,
+            "56574.928 21365.242\n");
+  EXPECT_EQ(shell("tidewater convert -p 6 --to geodetic --from" + map, "56574.928 21365.242\n").out,
+            "45.190000 5.720000\n");
+  const std::string utm = " '+proj=utm +zone=30 +datum=WGS84'";
+  EXPECT_EQ(shell("tidewater convert --from geodetic --to" + utm, "48.3903 -4.4863\n").out,
+            "389969.007 5360749.100\n");
+}
+
 TEST(Convert, DecimalDegreesToUtm) {
   // EPSG Guidance Note 7-2 has no UTM example; these are PROJ's figures for +proj=utm +zone=30.
   const Outcome r = shell("tidewater convert", "48.3903 -4.4863 Brest\n");

@@ -3,7 +3,6 @@
 #include <random>
 
 #include "support/points.hpp"
-#include "support/proj_peer.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::test;
@@ -359,22 +358,6 @@ TEST(Albers, ScaleStopsBeyondThePoles) {
   }
 }
 
-TEST(Albers, NothingToDo) {
-  for (const int32_t count : {0, -1}) {
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWalbers_f(0.08, 0, 0.5, 1, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWalbers_i(0.08, 0, 0.5, 1, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWalbers_s(0.08, 1, 1, 0.5, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(Albers, NotANumberGoesThrough) {
   const Cone cone(0.0818, 0.3, 0.4, 0.5, 0.7);
   Points out = {{0.1, kNaN, 0}, {kNaN, 0.1, 0}};
@@ -387,27 +370,6 @@ TEST(Albers, NotANumberGoesThrough) {
   out = {{0.1, kNaN, 0}};
   EXPECT_EQ(cone.scale(1, out, out), TW_SUCCESS);
   expect_near(out[0], -1, 0, 0, 0);
-}
-
-TEST(Albers, AgreesWithProj) {
-  TIDEWATER_NEED_PROJ();
-#ifdef TIDEWATER_HAVE_PROJ
-  const ProjPeer peer("+proj=aea +lon_0=10 +lat_0=40 +lat_1=43 +lat_2=62 +ellps=GRS80");
-  ASSERT_TRUE(peer.ok());
-  const auto [a, e] = Ellipsoid::grs80();
-  const Cone cone(e, degrees(10), degrees(40), degrees(43), degrees(62));
-  for (double lat = -80; lat < 85; lat += 10) {
-    for (double lon = -150; lon < 180; lon += 37) {
-      const Points in = {{degrees(lon), degrees(lat), 0}};
-      Points out = in;
-      EXPECT_EQ(cone.forward(in, out), TW_SUCCESS);
-      const CoordinateTriple expected = peer.forward(in[0]);
-      expect_near(out[0], expected.x / a, expected.y / a, 1e-13);
-      EXPECT_EQ(cone.inverse(out, out), TW_SUCCESS);
-      expect_near(out[0], in[0].x, in[0].y, 3e-14);
-    }
-  }
-#endif
 }
 
 }  // namespace

@@ -58,43 +58,6 @@ struct EqualArea {
   }
 };
 
-TEST(AzimuthalEqualArea, SnydersObliqueExample) {
-  // Snyder 1987, p. 333: Clarke 1866, origin 40 N 100 W, point 30 N 110 W.
-  const auto [a, e] = Ellipsoid::clarke_1866();
-  const EqualArea p(e, degrees(-100), degrees(40));
-  const CoordinateTriple in = {degrees(-110), degrees(30), 0};
-  const CoordinateTriple out = p.forward(in);
-  expect_near(out, -965932.1 / a, -1056814.9 / a, 0.06 / a);
-  expect_near(p.inverse(out), in.x, in.y, 2e-14);
-}
-
-TEST(AzimuthalEqualArea, SnydersPolarExample) {
-  // Snyder 1987, p. 334: International ellipsoid, north pole, 100 W, point 80 N 5 E.
-  const double a = 6378388;
-  const EqualArea p(std::sqrt(0.00672267), degrees(-100), kPi / 2);
-  const CoordinateTriple in = {degrees(5), degrees(80), 0};
-  const CoordinateTriple out = p.forward(in);
-  expect_near(out, 1077459.7 / a, 288704.5 / a, 0.06 / a);
-  expect_near(p.inverse(out), in.x, in.y, 2e-14);
-}
-
-TEST(AzimuthalEqualArea, SnydersSphericalExample) {
-  // Snyder 1987, p. 332: radius 3, origin 40 N 100 W, point 20 S 100 E.
-  const EqualArea p(0, degrees(-100), degrees(40));
-  const CoordinateTriple out = p.forward({degrees(100), degrees(-20), 0});
-  expect_near(out, -4.2339303 / 3, 4.0257775 / 3, 2e-8);
-  expect_near(p.inverse(out), degrees(100), degrees(-20), 1e-14);
-}
-
-TEST(AzimuthalEqualArea, EuropeanExample) {
-  // EPSG Guidance Note 7-2: GRS 80, origin 52 N 10 E, point 50 N 5 E.
-  const auto [a, e] = Ellipsoid::grs80();
-  const EqualArea p(e, degrees(10), degrees(52));
-  const CoordinateTriple out = p.forward({degrees(5), degrees(50), 0});
-  EXPECT_NEAR(out.x * a + 4321000, 3962799.45, 0.006);
-  EXPECT_NEAR(out.y * a + 3210000, 2999718.85, 0.006);
-}
-
 TEST(AzimuthalEqualArea, Constants) {
   const EqualArea sphere(0, 0, 0.6);
   for (const double v : {sphere.e2, sphere.q1, sphere.qp, sphere.rq, sphere.m1, sphere.sin_b1,

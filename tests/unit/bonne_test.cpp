@@ -259,13 +259,4 @@ TEST(Bonne, EveryInputEnds) {
   EXPECT_EQ(nothing.status, TW_SUCCESS);
 }
 
-TEST(Bonne, NothingToDo) {
-  const Bonne p(0.08, 0.7, 0);
-  Points none, guard = untouched(1);
-  EXPECT_EQ(p.forward(none, guard), TW_SUCCESS);
-  EXPECT_EQ(p.inverse(none, guard), TW_SUCCESS);
-  EXPECT_EQ(p.scale(1, none, guard), TW_SUCCESS);
-  expect_untouched(guard[0]);
-}
-
 }  // namespace

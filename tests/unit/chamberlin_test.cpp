@@ -197,12 +197,6 @@ TEST(Chamberlin, Failures) {
   EXPECT_EQ(bad.plane[1].y, 0);
 }
 
-TEST(Chamberlin, NothingToDo) {
-  Trimetric t = {0, kSmall};
-  t.set_up(0);
-  EXPECT_TRUE(t.forward({}).empty());
-}
-
 TEST(Chamberlin, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

@@ -151,16 +151,4 @@ TEST(Conformal2, NegligibleSecondDegreeIsDropped) {
   EXPECT_GT(std::fabs(p.x - 1e9), 1e5);
 }
 
-TEST(ComplexPolynomial, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  for (const int32_t count : {0, -1}) {
-    TWstatus status = 0;
-    TWcomplexpol_f(4, 0, 0, 1, 1, kCoefs, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWcomplexpol_i(4, 0, 0, 1, 1, kCoefs, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 }  // namespace

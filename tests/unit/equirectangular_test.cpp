@@ -68,14 +68,4 @@ TEST(Equirectangular, ScaleHasAWordOfItsOwn) {
   EXPECT_EQ(status, TW_SUCCESS);
 }
 
-TEST(Equirectangular, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  TWstatus status = 0;
-  TWcyl_eqr_f(0, 0, 1, 0, &p, &p, &status);
-  TWcyl_eqr_i(0, 0, 1, -1, &p, &p, &status);
-  TWcyl_eqr_s(1, 1, 0, &p, &p, &status);
-  EXPECT_EQ(status, TW_SUCCESS);
-  expect_untouched(p);
-}
-
 }  // namespace

@@ -331,29 +331,4 @@ TEST(GaussSphere, SchreiberEndsAfterAFailingFirstStage) {
   for (int i = 0; i < 2; ++i) expect_near(p[i], first[i].x, first[i].y, first[i].z, 0);
 }
 
-TEST(GaussSphere, NothingToDo) {
-  for (const int32_t count : {0, -1}) {
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWgaussII_f(0.08, 0, 1, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWgaussII_i(0.08, 0, 1, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWgaussII_s(0.08, 0, 1, 0, 1, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWg_schreiber(0.08, 0, 1, 0, 1, 1, 0, 0, 0, 0, 0, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWgauII_f(1, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWgauII_i(1, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 }  // namespace

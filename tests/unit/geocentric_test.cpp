@@ -104,14 +104,4 @@ TEST(Geocentric, AgreesWithProj) {
 #endif
 }
 
-TEST(Geocentric, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  TWstatus status = 0;
-  TWllh_to_xyz(1, 0, 0, &p, &p, &status);
-  EXPECT_EQ(status, TW_SUCCESS);
-  TWxyz_to_llh(1, 0, -3, &p, &p, &status);
-  EXPECT_EQ(status, TW_SUCCESS);
-  expect_untouched(p);
-}
-
 }  // namespace

@@ -390,22 +390,6 @@ TEST(LambertConformal, ScaleWhereTheParallelVanishes) {
   EXPECT_NEAR(out[2].x, 6 / (1 + std::sin(0.5)), 1e-14);
 }
 
-TEST(LambertConformal, NothingToDo) {
-  for (const int32_t count : {0, -1}) {
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWlam_f(0.08, 0, 1, 0.5, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWlam_i(0.08, 0, 1, 0.5, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWlam_s(0.08, 1, 1, 0.5, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(LambertConformal, NotANumberGoesThrough) {
   const Cone cone(0.0818, 0, 0.4, 0.5, 0.7);
   Points out = {{0.1, kNaN, 0}, {kNaN, 0.1, 0}};

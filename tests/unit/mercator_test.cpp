@@ -3,7 +3,6 @@
 #include <random>
 
 #include "support/points.hpp"
-#include "support/proj_peer.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::test;
@@ -145,20 +144,6 @@ TEST(Mercator, ScaleIsTheDerivativeOfTheOrdinate) {
   }
 }
 
-TEST(Mercator, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  for (const int32_t count : {0, -1, -2147483647}) {
-    TWstatus status = 0;
-    TWmerc_f(0.08, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWmerc_i(0.08, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWmerc_s(0.08, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(Mercator, NotANumberEndsTheInverse) {
   Points p = {{0, kNaN, 0}, {0, kInfinity, 0}, {kNaN, -kInfinity, 0}};
   TWstatus status = 0;
@@ -171,27 +156,6 @@ TEST(Mercator, NotANumberEndsTheInverse) {
   TWmerc_f(0.08, 0, 0, 1, p.data(), p.data(), &status);
   EXPECT_EQ(status, TW_SUCCESS);  // the limit is no barrier to a not-a-number
   EXPECT_TRUE(std::isnan(p[0].y));
-}
-
-TEST(Mercator, AgreesWithProj) {
-  TIDEWATER_NEED_PROJ();
-#ifdef TIDEWATER_HAVE_PROJ
-  const ProjPeer peer("+proj=merc +lon_0=10 +ellps=GRS80");
-  ASSERT_TRUE(peer.ok());
-  const auto [a, e] = Ellipsoid::grs80();
-  for (double lat = -89; lat < 89.5; lat += 7.3) {
-    for (double lon = -160; lon < 180; lon += 31) {
-      const CoordinateTriple in = {degrees(lon), degrees(lat), 0};
-      CoordinateTriple out = in;
-      TWstatus status = 0;
-      TWmerc_f(e, degrees(10), 0, 1, &out, &out, &status);
-      const CoordinateTriple expected = peer.forward(in);
-      expect_near(out, expected.x / a, expected.y / a, 1e-14);
-      TWmerc_i(e, degrees(10), 0, 1, &out, &out, &status);
-      expect_near(out, in.x, in.y, 1e-14);
-    }
-  }
-#endif
 }
 
 }  // namespace

@@ -1,7 +1,6 @@
 #include <gtest/gtest.h>
 
 #include "support/points.hpp"
-#include "support/proj_peer.hpp"
 #include "tidewater/conformal.h"
 
 using namespace tidewater::test;
@@ -83,32 +82,6 @@ TEST(Miller, ScaleIsTheDerivative) {
     EXPECT_NEAR((p[1].y - p[0].y) / (2 * step) / s.y, 1, 1e-8);
     EXPECT_NEAR(s.x * std::cos(lat), 1, 1e-14);
   }
-}
-
-TEST(Miller, AgreesWithProj) {
-  TIDEWATER_NEED_PROJ();
-#ifdef TIDEWATER_HAVE_PROJ
-  const ProjPeer peer("+proj=mill +R=1 +lon_0=-20");
-  ASSERT_TRUE(peer.ok());
-  for (double lat = -1.5; lat < 1.5; lat += 0.3) {
-    const CoordinateTriple in = {lat, lat, 0};
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWmiller_cyl_f(&in, 1, degrees(-20), 0, &p, &status);
-    const CoordinateTriple expected = peer.forward(in);
-    expect_near(p, expected.x, expected.y, 1e-14);
-  }
-#endif
-}
-
-TEST(Miller, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  TWstatus status = 0;
-  TWmiller_cyl_f(&p, 0, 0, 0, &p, &status);
-  TWmiller_cyl_i(&p, -1, 0, 0, &p, &status);
-  TWmiller_cyl_s(&p, 0, 1, &p, &status);
-  EXPECT_EQ(status, TW_SUCCESS);
-  expect_untouched(p);
 }
 
 }  // namespace

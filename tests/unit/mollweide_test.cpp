@@ -3,7 +3,6 @@
 #include <random>
 
 #include "support/points.hpp"
-#include "support/proj_peer.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::test;
@@ -22,15 +21,6 @@ CoordinateTriple forward(double lon, double lat, double lon0 = 0, double y0 = 0)
   return out;
 }
 
-TEST(Mollweide, SnydersNumericalExample) {
-  // Snyder 1987, p. 367: sphere of radius 1, 50 S, 75 W from 90 W.
-  CoordinateTriple out = forward(degrees(-75), degrees(-50), degrees(-90));
-  expect_near(out, 0.1788845, -0.9208758, 5e-8);
-  TWstatus status = 0;
-  TWmollweide_i(degrees(-90), 0, 1, &out, &out, &status);
-  expect_near(out, degrees(-75), degrees(-50), 1e-14);
-}
-
 TEST(Mollweide, AreaNorthOfAParallel) {
   // Another form of the condition: the ellipse's area south of y is that of the sphere's zone,
   // theta + sin(theta) cos(theta) = (pi / 2) sin(lat) with y = sqrt(2) sin(theta).
@@ -38,18 +28,6 @@ TEST(Mollweide, AreaNorthOfAParallel) {
     const double theta = std::asin(forward(0, lat).y / kRoot2);
     EXPECT_NEAR(theta + std::sin(theta) * std::cos(theta), kPi / 2 * std::sin(lat), 2e-15);
   }
-}
-
-TEST(Mollweide, AgreesWithProj) {
-  TIDEWATER_NEED_PROJ();
-#ifdef TIDEWATER_HAVE_PROJ
-  const ProjPeer peer("+proj=moll +R=1 +lon_0=10");
-  ASSERT_TRUE(peer.ok());
-  for (double lat = -86; lat < 87; lat += 4.3) {
-    const CoordinateTriple expected = peer.forward({degrees(50), degrees(lat), 0});
-    expect_near(forward(degrees(50), degrees(lat), degrees(10)), expected.x, expected.y, 1e-7);
-  }
-#endif
 }
 
 TEST(Mollweide, LongitudeIsNotWrapped) {

@@ -227,22 +227,6 @@ TEST(NewZealand, RoundTripInPlace) {
   for (std::size_t i = 0; i < in.size(); ++i) expect_near(out[i], in[i].x, in[i].y, 6, 1e-14);
 }
 
-TEST(NewZealand, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  for (const int32_t count : {0, -1}) {
-    TWstatus status = 0;
-    TWn_zeal_f(0.08, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWn_zeal_i(0.08, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWn_zeal_s(0.08, 0, 0, 0, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(NewZealand, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

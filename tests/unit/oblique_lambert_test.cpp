@@ -243,16 +243,6 @@ TEST(ObliqueLambert, Failures) {
   EXPECT_NE(out[1].y, kUntouched);
 }
 
-TEST(ObliqueLambert, NothingToDo) {
-  Cone cone = oblique(kE);
-  ASSERT_EQ(cone.set_up(), TW_SUCCESS);
-  Points none, out = untouched(1);
-  EXPECT_EQ(cone.forward(none, out), TW_SUCCESS);
-  EXPECT_EQ(cone.inverse(none, out), TW_SUCCESS);
-  EXPECT_EQ(cone.scale(1, none, out), TW_SUCCESS);
-  expect_untouched(out[0]);
-}
-
 // The published case: EPSG Guidance Note 7-2, method 9819.
 Cone krovak(double e) {
   Cone cone = {e, degrees(24, 50), degrees(49, 30), 0, 0};

@@ -403,23 +403,6 @@ TEST(ObliqueMercator, ScaleUsesTheRawDifferenceOfLongitude) {
   EXPECT_GT(std::fabs(out[1].z / out[0].z - 1), 1e-3);
 }
 
-TEST(ObliqueMercator, NothingToDo) {
-  const Oblique p(0, 0.08, 0.2, 0, 0, 0, 0.5, 0.9);
-  CoordinateTriple q = kUntouchedPoint;
-  for (const int32_t count : {0, -1, -2147483647}) {
-    TWstatus status = 0;
-    TWo_merc_f(p.e, p.alpha, p.gamma0, p.lon0, p.E, p.B, p.A, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWo_merc_i(p.e, p.alpha, p.gamma0, p.lon0, p.E, p.B, p.A, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWo_merc_s(p.e, 1, p.alpha, p.gamma0, p.lon0, p.E, p.B, p.A, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWo_merc_rot(1, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(q);
-  }
-}
-
 TEST(ObliqueMercator, EveryInputLeavesTheInverse) {
   Points in;
   for (const double v : {0.0, 0.5, -3.0, 1e3, 1e300, kInfinity, -kInfinity, kNaN}) {

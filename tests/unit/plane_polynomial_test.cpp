@@ -144,20 +144,4 @@ TEST(SecondDegree, NegligibleTermsAreDropped) {
   }
 }
 
-TEST(PlanePolynomial, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  for (const int32_t count : {0, -1}) {
-    TWstatus status = 0;
-    TWnpoly2d_f(kA, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWnpoly2d_i(kA, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWpoly2deg_f(1, 1, 2, 2, 1, 1, 1, 1, 1, 1, 1, 1, 1, 1, 1, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWpoly2deg_i(1, 1, 2, 2, 1, 1, 1, 1, 1, 1, 1, 1, 1, 1, 1, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 }  // namespace

@@ -276,22 +276,6 @@ TEST(Polyconic, ScaleBeyondThePolesRepeats) {
   expect_near(out[3], 2, out[1].y, out[1].z, 0);
 }
 
-TEST(Polyconic, NothingToDo) {
-  for (const int32_t count : {0, -1}) {
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWpolycon_f(0.08, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWpolycon_i(0.08, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWpolycon_s(0.08, 0, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(Polyconic, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

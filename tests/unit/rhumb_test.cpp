@@ -134,8 +134,8 @@ TEST(RhumbInverse, AlongAParallel) {
   EXPECT_NEAR(r.distance, parallel(wgs84, 0.9) * 0.5, 1e-8);
   EXPECT_DOUBLE_EQ(r.azimuth, 1.5 * kPi);
   EXPECT_DOUBLE_EQ(r.back, kPi / 2);
-  // Only an exact equality of latitudes is a parallel.  The step is several units in the last place,
-  // so that the ordinates differ too.
+  // Only an exact equality of latitudes is a parallel.  The step is several units in the last
+  // place, so that the ordinates differ too.
   const double near = 0.9 + 1e-15;
   r = inverse({0.6, 0.9, 0}, {0.7, near, 0}, wgs84);
   EXPECT_NE(r.azimuth, kPi / 2);

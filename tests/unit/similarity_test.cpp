@@ -134,23 +134,6 @@ TEST(Shifts, ThereAndBack) {
   expect_near(out[1], 0.5, 0.25, 0.125, 0);
 }
 
-TEST(Similarity, NothingToDo) {
-  CoordinateTriple p = kUntouchedPoint;
-  for (const int32_t count : {0, -3}) {
-    TWstatus status = 0;
-    TWbw_f(count, &p, 0, kIdentity.data(), 1, 1, 1, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWbw_i(count, &p, -1, kIdentity.data(), 1, 1, 1, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWmol_bdk_f(count, &p, 0, kIdentity.data(), 1, 1, 1, 2, 2, 2, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWshifts_f(count, &p, 1, 1, 1, &p, &status);
-    TWshifts_i(count, &p, 1, 1, 1, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(Similarity, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ

@@ -241,19 +241,4 @@ TEST(SkewOrthomorphic, EveryInputLeavesTheInverse) {
   EXPECT_TRUE(std::isnan(out[0].y));
 }
 
-TEST(SkewOrthomorphic, NothingToDo) {
-  const Skew p = malaya();
-  CoordinateTriple q = kUntouchedPoint;
-  for (const int32_t count : {0, -1, -2147483647}) {
-    TWstatus status = 0;
-    TWrso_f(p.lon0, p.skew, p.A, p.B, p.C, p.e, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWrso_i(p.lon0, p.skew, p.A, p.B, p.C, p.e, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    TWrso_s(p.e, 1, 0, 0, p.skew, p.lon0, p.A, p.B, p.C, count, &q, &q, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(q);
-  }
-}
-
 }  // namespace

@@ -334,14 +334,6 @@ TEST(SpaceObliqueMercator, EquatorialOrbitInverse) {
   EXPECT_NE(at[0].y, 0.05);
 }
 
-TEST(SpaceObliqueMercator, NothingToDo) {
-  const Som p = landsat();
-  Points none, guard = untouched(1);
-  EXPECT_EQ(p.forward(none, guard), TW_SUCCESS);
-  EXPECT_EQ(p.inverse(none, guard), TW_SUCCESS);
-  expect_untouched(guard[0]);
-}
-
 TEST(SpaceObliqueMercator, PathAndRow) {
   struct Case {
     int16_t row, side, orbit;

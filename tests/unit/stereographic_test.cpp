@@ -94,15 +94,6 @@ TEST(Stereographic, SnydersPolarExample) {
   EXPECT_NEAR(s.scale(k0, {0.3, degrees(-71), 0}), 1, 1e-15);
 }
 
-TEST(Stereographic, UniversalPolarExample) {
-  // EPSG Guidance Note 7-2, polar stereographic variant A: WGS 84, point 73 N 44 E.
-  const auto [a, e] = Ellipsoid::wgs84();
-  const Stereographic s(e, 0, kPi / 2);
-  const CoordinateTriple out = s.forward({degrees(44), degrees(73), 0});
-  EXPECT_NEAR(out.x * a * 0.994 + 2000000, 3320416.75, 0.005);
-  EXPECT_NEAR(out.y * a * 0.994 + 2000000, 632668.43, 0.005);
-}
-
 TEST(Stereographic, PolarConstant) {
   // On the sphere the factor is 2; the sign is that of the pole.
   EXPECT_DOUBLE_EQ(Stereographic(0, 0, kPi / 2).C, 2);

@@ -409,25 +409,6 @@ TEST(TransverseMercator, InverseDoesNotWrap) {
   EXPECT_NEAR(out[0].x, 3.15, 1e-10);
 }
 
-TEST(TransverseMercator, NothingToDo) {
-  for (const int32_t count : {0, -1}) {
-    CoordinateTriple p = kUntouchedPoint;
-    TWstatus status = 0;
-    TWt_merc_f(0.08, 0, 1, 0, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWt_merc_i(0.08, 0, 0, 1, 0, 0, 0, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWt_merc_s(0.08, 1, 0, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    status = 0;
-    TWt_merc_xyk(0.08, 0, 1, 0, 0, 0, 0, 0, 1, count, &p, &p, &status);
-    EXPECT_EQ(status, TW_SUCCESS);
-    expect_untouched(p);
-  }
-}
-
 TEST(TransverseMercator, NotANumberGoesThrough) {
   const Projection p(0.0818, 0, 0);
   Points out = {{kNaN, 0.5, 0}, {0.1, kNaN, 0}};

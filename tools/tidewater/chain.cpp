@@ -185,6 +185,7 @@ Side::Side(const std::string& text, const std::string& other,
     } else {
       System known(base);
       if (known.kind() == SystemKind::projected || known.kind() == SystemKind::geocentric) {
+        nameless_datum_ = known.code() == 0;
         system_ = known.code() != 0
                       ? System("geographic datum=EPSG:" + std::to_string(known.code()))
                       : plain_geographic(known.ellipsoid());
@@ -273,7 +274,9 @@ Chain::Chain(const ChainRequest& request)
     }
   } else {
     TransformationOptions options;
-    options.operation = same_figure ? "no shift" : request.operation;
+    options.operation = request.operation;
+    const bool one_datum = source_.nameless_datum() || target_.nameless_datum();
+    if (same_figure || (one_datum && request.operation.empty())) options.operation = "no shift";
     options.epoch = request.epoch;
     whole_.emplace(source_.system(), target_.system(), options);
   }

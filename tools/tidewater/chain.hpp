@@ -52,13 +52,16 @@ class Side {
   // Heights belong to its coordinates.
   bool has_height() const;
   std::string name() const;
+  // On the other side's datum, which no text can name.
+  bool nameless_datum() const { return nameless_datum_; }
   // From geographic coordinates to the zone.
   const Transformation& zone(int number) const;
 
  private:
   Kind kind_ = Kind::plane;
   std::optional<System> system_;  // geographic where the points have zones or references
-  std::string zones_on_;          // what stands behind the zone's name
+  bool nameless_datum_ = false;
+  std::string zones_on_;  // what stands behind the zone's name
   std::optional<Ellipsoid> zones_figure_;
   struct Zones {
     std::mutex lock;

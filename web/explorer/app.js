@@ -149,6 +149,7 @@ function readStyle() {
   style = {
     sea: color("sea"), land: color("land"), coast: color("coast"), graticule: color("graticule"),
     graticuleOver: "rgb(20 30 36 / 22%)", coastOver: "rgb(20 30 36 / 75%)",
+    indicatrixOver: "rgb(255 255 255 / 35%)", indicatrixEdgeOver: "rgb(20 30 36 / 85%)",
     outline: color("outline"), indicatrix: color("indicatrix"),
     indicatrixEdge: color("indicatrix-edge"), ink: color("ink"), markEdge: color("panel"),
     a: color("a"), b: color("b"), accent: color("accent"),
@@ -411,7 +412,7 @@ function showLegend() {
   $("legend").hidden = !scale;
   if (!scale) return;
   $("legend-label").textContent =
-    { area: "Area, times the true one", angle: "Largest change of an angle", scale: "Largest scale" }[state.distortion];
+    { area: "Area, true is 1", angle: "Largest change of an angle", scale: "Largest scale, true is 1" }[state.distortion];
   $("legend-bar").style.background = gradient(scale);
   $("legend-ticks").replaceChildren(...scale.ticks.map(([, text]) => element("span", { textContent: text })));
 }
@@ -451,6 +452,9 @@ function list(rows) {
     [element("dt", { textContent: name }), element("dd", { textContent: value })]));
 }
 
+// What stands there while there is no point.
+const invitation = $("figures").firstElementChild;
+
 function showFigures() {
   const parts = state.points.map(([lon, lat], i) => {
     const { x, y, factors, mgrs } = figuresAt(lon, lat);
@@ -489,7 +493,7 @@ function showFigures() {
         ["Constant bearing", bearing(rhumb.azimuth1)],
         ["Longer by", length(Math.max(0, rhumb.length - geodesic.length))]]));
   }
-  if (parts.length === 0) return;
+  if (parts.length === 0) parts.push(invitation);
   $("figures").replaceChildren(...parts);
 }
 

@@ -91,6 +91,14 @@ function capBorder(centre, radius) {
   });
 }
 
+// Latitudes along a map's edge, ever closer towards the poles, where some maps are stretched most.
+const EDGE = [];
+for (let y = -90; y < 90; ) {
+  EDGE.push(y);
+  y += Math.min(2, Math.max(0.01, 0.2 * (90 - Math.abs(y))));
+}
+EDGE.push(90);
+
 class Band {
   constructor(lon0, reach, south, north, whole) {
     Object.assign(this, { lon0, reach, south, north, whole });
@@ -109,13 +117,7 @@ class Band {
   border() {
     const { lon0, reach, south, north } = this;
     const out = [];
-    // Ever closer towards the poles, where some maps are stretched most.
-    const steps = [];
-    for (let y = south; y < north; ) {
-      steps.push(y);
-      y += Math.min(2, Math.max(0.01, 0.2 * (y - south)), Math.max(0.01, 0.2 * (north - y)));
-    }
-    steps.push(north);
+    const steps = [south, ...EDGE.filter((y) => y > south && y < north), north];
     for (const y of steps) out.push([lon0 - reach, y]);
     for (let x = -reach; x < reach; x += 2) out.push([lon0 + x, north]);
     for (const y of steps.reverse()) out.push([lon0 + reach, y]);
@@ -151,8 +153,25 @@ class Band {
       if (south < this.south) part = side(part, 1, 1, this.south);
       if (north > this.north) part = side(part, 1, -1, this.north);
       if (part.length < 6) continue;
+      part = this.#alongEdges(part);
       emit(part.map((v, i) => (i % 2 === 0 ? v + lon0 : v)));
     }
+  }
+
+  // The sides of a part that the cut has made follow the map's edge, which may be curved.
+  #alongEdges(part) {
+    const out = [];
+    for (let i = 0; i < part.length; i += 2) {
+      const [x, y] = [part[i], part[i + 1]];
+      const j = (i + 2) % part.length;
+      out.push(x, y);
+      if (Math.abs(x) !== this.reach || part[j] !== x) continue;
+      const [low, high] = [Math.min(y, part[j + 1]), Math.max(y, part[j + 1])];
+      const between = EDGE.filter((lat) => lat > low && lat < high);
+      if (part[j + 1] < y) between.reverse();
+      for (const lat of between) out.push(x, lat);
+    }
+    return out;
   }
 
   // The same for a line.

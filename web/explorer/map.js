@@ -227,9 +227,9 @@ export class MapView {
     });
     if (show.indicatrices) {
       this.path(this.circles(), true, (path) => {
-        context.fillStyle = style.indicatrix;
+        context.fillStyle = show.distortion ? style.indicatrixOver : style.indicatrix;
         context.fill(path);
-        context.strokeStyle = style.indicatrixEdge;
+        context.strokeStyle = show.distortion ? style.indicatrixEdgeOver : style.indicatrixEdge;
         context.lineWidth = 1;
         context.stroke(path);
       });

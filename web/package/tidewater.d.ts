@@ -7,7 +7,7 @@
 export function load(options?: LoadOptions): Promise<Tidewater>;
 
 export interface LoadOptions {
-  /** The bytes of library.wasm, where they are not read from beside the module. */
+  /** The bytes of library.wasm.gz, packed or not, where they are not read from beside the module. */
   wasm?: Uint8Array;
   /** The bytes of tables.bin.gz, packed or unpacked, likewise. */
   tables?: Uint8Array;

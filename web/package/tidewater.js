@@ -19,7 +19,8 @@ async function read(name) {
   return new Uint8Array(await response.arrayBuffer());
 }
 
-async function unpacked(bytes) {
+async function unpacked(given) {
+  const bytes = await given;
   // Some servers unpack what ends with .gz on its way.
   if (bytes[0] !== 0x1f || bytes[1] !== 0x8b) return bytes;
   const stream = new Blob([bytes]).stream().pipeThrough(new DecompressionStream("gzip"));
@@ -37,12 +38,11 @@ export function load(options = {}) {
 }
 
 async function start({ wasm, tables }) {
-  const [wasmBinary, packed] = await Promise.all([
-    wasm ?? read("library.wasm"),
-    tables ?? read("tables.bin.gz"),
+  const [wasmBinary, bytes] = await Promise.all([
+    unpacked(wasm ?? read("library.wasm.gz")),
+    unpacked(tables ?? read("tables.bin.gz")),
   ]);
   const library = await createLibrary({ wasmBinary });
-  const bytes = await unpacked(packed);
   const at = library._malloc(bytes.length);
   library.HEAPU8.set(bytes, at);
   const opened = library._tidewater_open(at, bytes.length);
@@ -58,33 +58,55 @@ function interfaceOf(library) {
   const finalizer = new FinalizationRegistry((destroy) => destroy());
 
   class Handle {
+    #pointer;
     #destroy;
     constructor(pointer, destroy) {
       if (pointer === 0) throw new Error(memory.lastError());
-      this.pointer = pointer;
+      this.#pointer = pointer;
       this.#destroy = () => destroy(pointer);
       finalizer.register(this, this.#destroy, this);
     }
+    get handle() {
+      if (this.#pointer === 0) throw new Error("It was given back by free().");
+      return this.#pointer;
+    }
     free() {
-      if (this.pointer === 0) return;
+      if (this.#pointer === 0) return;
       finalizer.unregister(this);
       this.#destroy();
-      this.pointer = 0;
+      this.#pointer = 0;
     }
-    get live() {
-      if (this.pointer === 0) throw new Error("It was given back by free().");
-      return this.pointer;
+    // What a function of the library's writes about it.
+    text(function_) {
+      return memory.scoped(() => memory.answer((at, size) => function_(this.handle, at, size)));
     }
   }
 
-  class System {
-    #handle;
-    constructor(text) {
-      const pointer = memory.scoped(() => library._tw_system_create(memory.text(String(text))));
-      this.#handle = new Handle(pointer, library._tw_system_destroy);
+  // What takes points there and back.
+  class Mapping extends Handle {
+    #run;
+    constructor(pointer, destroy, run) {
+      super(pointer, destroy);
+      this.#run = run;
     }
-    get handle() {
-      return this.#handle.live;
+    forward(x, y, z) {
+      return points(this.#run, this.handle, 0, x, y, z);
+    }
+    inverse(x, y, z) {
+      return points(this.#run, this.handle, 1, x, y, z);
+    }
+    forwardPoints(array, dimension = 2) {
+      return interleaved(this.#run, this.handle, 0, array, dimension);
+    }
+    inversePoints(array, dimension = 2) {
+      return interleaved(this.#run, this.handle, 1, array, dimension);
+    }
+  }
+
+  class System extends Handle {
+    constructor(text) {
+      super(memory.scoped(() => library._tw_system_create(memory.text(String(text)))),
+        library._tw_system_destroy);
     }
     get code() {
       return library._tw_system_code(this.handle);
@@ -104,7 +126,7 @@ function interfaceOf(library) {
       });
     }
     describe() {
-      return this.#text(library._tw_system_describe);
+      return this.text(library._tw_system_describe);
     }
     toText(form = "wkt2") {
       const text = memory.scoped(() => {
@@ -115,80 +137,50 @@ function interfaceOf(library) {
       return text;
     }
     get name() {
-      return this.#text(library._tw_system_name);
+      return this.text(library._tw_system_name);
     }
     get datum() {
-      return this.#text(library._tw_system_datum);
+      return this.text(library._tw_system_datum);
     }
     get method() {
-      return this.#text(library._tw_system_method);
+      return this.text(library._tw_system_method);
     }
     get unit() {
-      return this.#text(library._tw_system_unit);
+      return this.text(library._tw_system_unit);
     }
     get axes() {
-      return this.#text(library._tw_system_axes);
-    }
-    free() {
-      this.#handle.free();
-    }
-    #text(function_) {
-      return memory.scoped(() =>
-        memory.answer((at, size) => function_(this.handle, at, size)),
-      );
+      return this.text(library._tw_system_axes);
     }
   }
 
   const systemOf = (value) => (value instanceof System ? value : new System(value));
 
-  class Transformation {
-    #handle;
+  class Transformation extends Mapping {
     constructor(source, target, options = {}) {
       const from = systemOf(source);
       const to = systemOf(target);
-      const pointer = memory.scoped(() =>
-        library._tw_transformation_create(from.handle, to.handle, optionsAt(options)),
-      );
-      this.#handle = new Handle(pointer, library._tw_transformation_destroy);
+      super(
+        memory.scoped(() =>
+          library._tw_transformation_create(from.handle, to.handle, optionsAt(options))),
+        library._tw_transformation_destroy, library._tw_transform);
       this.source = from;
       this.target = to;
     }
-    forward(x, y, z) {
-      return points(library._tw_transform, this.#handle.live, 0, x, y, z);
-    }
-    inverse(x, y, z) {
-      return points(library._tw_transform, this.#handle.live, 1, x, y, z);
-    }
-    forwardPoints(array, dimension = 2) {
-      return interleaved(library._tw_transform, this.#handle.live, 0, array, dimension);
-    }
-    inversePoints(array, dimension = 2) {
-      return interleaved(library._tw_transform, this.#handle.live, 1, array, dimension);
-    }
     why(x, y, z = 0, inverse = false) {
-      return why(library._tw_transform, this.#handle.live, inverse ? 1 : 0, x, y, z);
+      return why(library._tw_transform, this.handle, inverse ? 1 : 0, x, y, z);
     }
     get accuracy() {
-      return library._tw_transformation_accuracy(this.#handle.live);
+      return library._tw_transformation_accuracy(this.handle);
     }
     get operation() {
-      return this.#text(library._tw_transformation_operation);
+      return this.text(library._tw_transformation_operation);
     }
     describe() {
-      return this.#text(library._tw_transformation_describe);
-    }
-    free() {
-      this.#handle.free();
-    }
-    #text(function_) {
-      return memory.scoped(() =>
-        memory.answer((at, size) => function_(this.#handle.live, at, size)),
-      );
+      return this.text(library._tw_transformation_describe);
     }
   }
 
-  class Projection {
-    #handle;
+  class Projection extends Mapping {
     constructor(method, parameters, ellipsoid = WGS84) {
       const pointer = memory.scoped(() => {
         if (method instanceof System) return library._tw_projection_of(method.handle);
@@ -202,22 +194,10 @@ function interfaceOf(library) {
         return library._tw_projection_create(
           memory.text(method), names.length, namesAt, valuesAt, a, inverseFlattening);
       });
-      this.#handle = new Handle(pointer, library._tw_projection_destroy);
-    }
-    forward(x, y) {
-      return points(library._tw_project, this.#handle.live, 0, x, y);
-    }
-    inverse(x, y) {
-      return points(library._tw_project, this.#handle.live, 1, x, y);
-    }
-    forwardPoints(array, dimension = 2) {
-      return interleaved(library._tw_project, this.#handle.live, 0, array, dimension);
-    }
-    inversePoints(array, dimension = 2) {
-      return interleaved(library._tw_project, this.#handle.live, 1, array, dimension);
+      super(pointer, library._tw_projection_destroy, library._tw_project);
     }
     why(x, y, inverse = false) {
-      return why(library._tw_project, this.#handle.live, inverse ? 1 : 0, x, y, 0);
+      return why(library._tw_project, this.handle, inverse ? 1 : 0, x, y, 0);
     }
     factors(longitude, latitude) {
       if (typeof longitude === "number") {
@@ -231,7 +211,7 @@ function interfaceOf(library) {
         memory.scoped(() => {
           const { view } = memory.load(begin, n, longitude, latitude);
           const answers = memory.room(40 * n);
-          library._tw_project_factors(this.#handle.live, n, view, answers, 0);
+          library._tw_project_factors(this.handle, n, view, answers, 0);
           const values = library.HEAPF64;
           FACTORS.forEach((name, k) => {
             for (let i = 0; i < n; ++i) out[name][begin + i] = values[answers / 8 + 5 * i + k];
@@ -240,23 +220,18 @@ function interfaceOf(library) {
       }
       return out;
     }
-    free() {
-      this.#handle.free();
-    }
   }
 
-  class Lines {
-    #handle;
+  class Lines extends Handle {
     constructor(rhumb, a, f) {
-      this.#handle = new Handle(
-        library._tw_lines_create(rhumb ? 1 : 0, a, f), library._tw_lines_destroy);
+      super(library._tw_lines_create(rhumb ? 1 : 0, a, f), library._tw_lines_destroy);
     }
     // From a point along an azimuth.
     direct(longitude, latitude, azimuth, length) {
       return memory.scoped(() => {
         const at = memory.put([longitude, latitude, azimuth, length, NaN, NaN, NaN]);
         const place = (i) => at + 8 * i;
-        library._tw_lines_direct(this.#handle.live, 1, ...[0, 1, 2, 3, 4, 5, 6].map(place));
+        library._tw_lines_direct(this.handle, 1, ...[0, 1, 2, 3, 4, 5, 6].map(place));
         const [endLongitude, endLatitude, endAzimuth] = memory.doubles(place(4), 3);
         return { longitude: endLongitude, latitude: endLatitude, azimuth: endAzimuth };
       });
@@ -266,7 +241,7 @@ function interfaceOf(library) {
       return memory.scoped(() => {
         const at = memory.put([longitude1, latitude1, longitude2, latitude2, NaN, NaN, NaN]);
         const place = (i) => at + 8 * i;
-        library._tw_lines_inverse(this.#handle.live, 1, ...[0, 1, 2, 3, 4, 5, 6].map(place));
+        library._tw_lines_inverse(this.handle, 1, ...[0, 1, 2, 3, 4, 5, 6].map(place));
         const [length, azimuth1, azimuth2] = memory.doubles(place(4), 3);
         return { length, azimuth1, azimuth2 };
       });
@@ -282,7 +257,7 @@ function interfaceOf(library) {
         const lengths = memory.put(
           Float64Array.from({ length: count }, (_, i) => (line.length * i) / (count - 1)));
         const ends = [filled(NaN), filled(NaN)];
-        library._tw_lines_direct(this.#handle.live, count, ...starts, lengths, ...ends, 0);
+        library._tw_lines_direct(this.handle, count, ...starts, lengths, ...ends, 0);
         longitudes.set(memory.doubles(ends[0], count));
         latitudes.set(memory.doubles(ends[1], count));
       });
@@ -294,13 +269,10 @@ function interfaceOf(library) {
         const lon = memory.put(longitudes);
         const lat = memory.put(latitudes);
         const out = memory.put([NaN, NaN]);
-        library._tw_lines_polygon(this.#handle.live, count, lon, lat, out, out + 8);
+        library._tw_lines_polygon(this.handle, count, lon, lat, out, out + 8);
         const [perimeter, area] = memory.doubles(out, 2);
         return { perimeter, area };
       });
-    }
-    free() {
-      this.#handle.free();
     }
   }
 

@@ -21,6 +21,15 @@ test("a square across the edge of a band comes in two parts, one on each side", 
   assert.equal(parts(band(170, 180, -90, 90), "area", [178, 0, 182, 0, 182, 4, 178, 4]).length, 1);
 });
 
+test("the sides that a cut has made follow the edge in small steps", () => {
+  const [a] = parts(band(0, 180, -90, 90), "area", [175, -80, 185, -80, 185, -90, 175, -90]);
+  const edge = [];
+  for (let i = 0; i < a.length; i += 2) if (Math.abs(a[i] - 180) < 1e-5) edge.push(a[i + 1]);
+  edge.sort((p, q) => p - q);
+  assert.deepEqual([edge[0], edge.at(-1)], [-90, -80]);
+  for (let i = 1; i < edge.length; ++i) assert.ok(edge[i] - edge[i - 1] <= 2);
+});
+
 test("what lies beyond a latitude goes", () => {
   assert.equal(parts(band(0, 180, -60, 60), "area", [0, 70, 4, 70, 4, 74]).length, 0);
   const [cut] = parts(band(0, 180, -60, 60), "area", [0, 58, 4, 58, 4, 62, 0, 62]);

@@ -3,6 +3,7 @@
 
 #include "projections/conformal/orthographic_points.hpp"
 
+#include <algorithm>
 #include <cmath>
 
 #include "points/portable.hpp"
@@ -136,7 +137,7 @@ void TWortho_i(double /*a*/, double e, double lon0, double lat0, double x0, doub
                                       &stopped};
   // Read before anything is written: in and out may be the same array.
   CoordinateTriple last = {0, 0, 0};
-  for (int32_t i = count - 1; i >= 0; --i) {
+  for (int32_t i = std::max(count, int32_t{0}) - 1; i >= 0; --i) {
     last = in[i];
     if (!(std::sqrt(last.x * last.x + last.y * last.y) < kOrthographicCentre)) break;
   }

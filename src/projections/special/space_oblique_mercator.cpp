@@ -87,8 +87,10 @@ void TWsom_c(double e, double inc, double P, double eps, double om, int16_t n_te
   if (N % 2 != 0) ++N;
   const double h = 2 * kPi / N;
   const std::size_t size = static_cast<std::size_t>(N) + 1;
-  const std::unique_ptr<double[]> s(new (std::nothrow) double[size]);
-  const std::unique_ptr<double[]> c(new (std::nothrow) double[size]);
+  const std::unique_ptr<double[]> speeds(new (std::nothrow) double[size]);
+  const std::unique_ptr<double[]> turns(new (std::nothrow) double[size]);
+  double* const s = speeds.get();
+  double* const c = turns.get();
   if (!s || !c) {
     *status = TW_NO_MEMORY;
     return;
