@@ -283,7 +283,8 @@ TEST(Edges, ObliqueMercatorHoldsASineOfOneAndABit) {
     // The functions here are the platform's, which differ from the library's in the last digits.
     if (r > 1 + 2e-15 && r <= 1.00000000000001) {
       ++held;
-      EXPECT_EQ(lon0, 0.3 - kHalf / B);
+      // What the library rounds to 1 or just below gives the arc sine of that.
+      EXPECT_NEAR(lon0, 0.3 - kHalf / B, 1e-7);
     }
   }
   EXPECT_GT(held, 20);
