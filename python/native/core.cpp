@@ -406,8 +406,8 @@ py::object named(PyTypeObject* type, Numbers... values) {
   return made;
 }
 PyTypeObject* tuple_type(const char* name) {
-  return reinterpret_cast<PyTypeObject*>(
-      py::module_::import("tidewater._lines").attr(name).release().ptr());
+  py::object type = py::module_::import("tidewater._lines").attr(name);
+  return reinterpret_cast<PyTypeObject*>(type.release().ptr());
 }
 
 template <class Lines>

@@ -63,8 +63,8 @@ bool may_hold(std::FILE* file, std::int64_t end);
 // True when all bytes could be read; what a shorter file has is in bytes then.
 bool read_exactly(std::FILE* file, void* bytes, std::size_t count);
 
-// Room for so many bytes, which a file may have told; null where there is none, also where a pointer
-// cannot count them.
+// Room for so many bytes, which a file may have told; null where there is none, also where a
+// pointer cannot count them.
 std::unique_ptr<unsigned char[]> make_buffer(std::int64_t size);
 
 // A file read whole, for the time of one array call.

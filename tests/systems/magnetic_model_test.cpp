@@ -10,25 +10,17 @@
 #include <thread>
 #include <vector>
 
+#include "support/magnetic_values.hpp"
+
 namespace tidewater::test {
 
 namespace {
 
-// Test values of the WMM2025 technical report, at height 0, to the digits printed.
 TEST(MagneticModelObject, PublishedTestValues) {
-  struct Published {
-    double year, lat, lon, X, Y, Z, F, I, D;
-  };
-  const Published rows[] = {
-      {2025, 80, 0, 6521.6, 145.9, 54791.5, 55178.5, 83.21, 1.28},
-      {2025, 0, 120, 39677.8, -109.6, -10580.2, 41064.3, -14.93, -0.16},
-      {2025, -80, 240, 6117.5, 15751.9, -52022.5, 54698.2, -72.00, 68.78},
-      {2027.5, 80, 0, 6500.8, 294.5, 54869.4, 55253.9, 83.24, 2.59},
-  };
-  for (const Published& row : rows) {
-    const MagneticModel model("WMM2025", row.year);
+  for (const PublishedField& row : kWmm2025Values) {
+    const MagneticModel model("WMM2025", row.date);
     EXPECT_EQ(model.name(), "WMM2025");
-    EXPECT_EQ(model.year(), row.year);
+    EXPECT_EQ(model.year(), row.date);
     const MagneticField field = model.field({row.lon, row.lat, 0}).field;
     EXPECT_NEAR(field.north, row.X, 0.0501);
     EXPECT_NEAR(field.east, row.Y, 0.0501);

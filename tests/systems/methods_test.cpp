@@ -6,8 +6,6 @@
 
 #include <algorithm>
 #include <cmath>
-
-#include <iterator>
 #include <string_view>
 
 #include "projection_impl.hpp"
@@ -48,6 +46,46 @@ TEST(Methods, WorkedOutOtherwise) {
 }
 
 }  // namespace
+
+// The zoned grid puts the zone's number before the eastings of its zones, which PROJ vouches for.
+TEST(Methods, ZonedGridIsItsZones) {
+  const Projection whole = System("32600").projection().value();
+  for (int zone = 1; zone <= 60; ++zone) {
+    const Projection map = System(std::to_string(32600 + zone)).projection().value();
+    for (const double off : {-2.999, -1.0, 0.5, 2.999}) {
+      const double lon = 6.0 * zone - 183 + off;
+      const Point there = map.forward({lon, 47.3});
+      const Point at = whole.forward({lon, 47.3});
+      EXPECT_NEAR(at.x, zone * 1e6 + there.x, 1e-6) << lon;
+      EXPECT_NEAR(at.y, there.y, 1e-8) << lon;
+      const Point back = whole.inverse(at);
+      EXPECT_NEAR(std::remainder(back.x - lon, 360), 0, 1e-11);
+      EXPECT_NEAR(back.y, 47.3, 1e-11);
+    }
+  }
+  EXPECT_TRUE(std::isnan(whole.inverse({500000, 5e6}).x));  // no zone
+}
+
+// The modified grid is the old one with its origin moved by 5,000 km each way, and bent by some
+// decimetres.
+TEST(Methods, ModifiedKrovakStaysByTheOldOne) {
+  const Projection bent = System("5515").projection().value();
+  const Projection plain = System("5513").projection().value();
+  double most = 0;
+  for (double lon = 12.5; lon <= 18.5; lon += 0.5) {
+    for (double lat = 48.8; lat <= 50.8; lat += 0.4) {
+      const Point there = bent.forward({lon, lat});
+      const Point old = plain.forward({lon, lat});
+      const double apart = std::hypot(there.x - 5e6 - old.x, there.y - 5e6 - old.y);
+      most = std::max(most, apart);
+      const Point back = bent.inverse(there);
+      EXPECT_NEAR(back.x, lon, 1e-11);
+      EXPECT_NEAR(back.y, lat, 1e-11);
+    }
+  }
+  EXPECT_LT(most, 1);
+  EXPECT_GT(most, 0.02);
+}
 
 // Every method has complete entries, can be made, goes forth and back, and has conformal,
 // equal-area or other factors that agree with its name.

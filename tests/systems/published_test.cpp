@@ -397,7 +397,10 @@ TEST(Published, PeerVouches) {
       map = proj_normalize_for_visualization(context, whole);
       degree = 1;
     } else {
-      map = proj_create(context, system.to_proj().c_str());
+      // The operation itself, not the system that it makes.
+      std::string text = system.to_proj();
+      if (const auto at = text.find(" +type=crs"); at != text.npos) text.erase(at);
+      map = proj_create(context, text.c_str());
     }
     ASSERT_NE(map, nullptr) << block.what;
     for (const auto& row : block.rows) {

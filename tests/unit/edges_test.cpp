@@ -280,9 +280,11 @@ TEST(Edges, ObliqueMercatorHoldsASineOfOneAndABit) {
     // The tangent loses where D is near 1: what lies beyond the bound is refused.
     if (std::fabs(std::fabs(r) - 1.00000000000001) < 2e-15) continue;
     EXPECT_EQ(status, r <= 1.00000000000001 ? TW_SUCCESS : TW_BAD_PARAMETER) << lat0;
-    if (r > 1 && r <= 1.00000000000001) {
+    // The functions here are the platform's, which differ from the library's in the last digits.
+    if (r > 1 + 2e-15 && r <= 1.00000000000001) {
       ++held;
-      EXPECT_EQ(lon0, 0.3 - kHalf / B);
+      // What the library rounds to 1 or just below gives the arc sine of that.
+      EXPECT_NEAR(lon0, 0.3 - kHalf / B, 1e-7);
     }
   }
   EXPECT_GT(held, 20);

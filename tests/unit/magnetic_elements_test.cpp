@@ -9,6 +9,7 @@
 #include "support/data.hpp"
 #include "support/harmonics.hpp"
 #include "support/little_memory.hpp"
+#include "support/magnetic_values.hpp"
 #include "tidewater/foundation.h"
 
 using namespace tidewater::test;
@@ -133,17 +134,7 @@ const double kSqrt3 = std::sqrt(3.0);
 
 TEST(MagneticElements, PublishedTestValuesOfTheWorldMagneticModel) {
   TIDEWATER_NEED_SHARED_DATA();
-  // Test values of the WMM2025 technical report, at height 0, to the digits printed.
-  struct Published {
-    double date, lat, lon, X, Y, Z, F, I, D;
-  };
-  const Published rows[] = {
-      {2025, 80, 0, 6521.6, 145.9, 54791.5, 55178.5, 83.21, 1.28},
-      {2025, 0, 120, 39677.8, -109.6, -10580.2, 41064.3, -14.93, -0.16},
-      {2025, -80, 240, 6117.5, 15751.9, -52022.5, 54698.2, -72.00, 68.78},
-      {2027.5, 80, 0, 6500.8, 294.5, 54869.4, 55253.9, 83.24, 2.59},
-  };
-  for (const Published& row : rows) {
+  for (const PublishedField& row : kWmm2025Values) {
     Field f(12);
     Model::read_wmm2025(f, row.date);
     ASSERT_EQ(f.val({{degrees(row.lon), degrees(row.lat), 0}}), TW_SUCCESS);
