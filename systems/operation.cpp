@@ -232,6 +232,23 @@ void rank(std::vector<Way>& list, const Area& wanted) {
                    [&](const Way& a, const Way& b) { return key(a) < key(b); });
 }
 
+bool same_links(const Way& a, const Way& b) {
+  return std::equal(a.links.begin(), a.links.end(), b.links.begin(), b.links.end(),
+                    [](const Link& one, const Link& other) {
+                      return one.operation.code == other.operation.code &&
+                             one.reversed == other.reversed;
+                    });
+}
+
+// The registry joins some steps itself: of ways with the same steps the better one stays.
+void drop_repeated(std::vector<Way>& list) {
+  for (std::size_t i = 0; i < list.size(); ++i) {
+    list.erase(std::remove_if(list.begin() + static_cast<std::ptrdiff_t>(i) + 1, list.end(),
+                              [&](const Way& way) { return same_links(list[i], way); }),
+               list.end());
+  }
+}
+
 bool usable(const std::vector<Way>& list, const Area& wanted) {
   return std::any_of(list.begin(), list.end(), [&](const Way& way) {
     return way.missing.empty() && coverage(wanted, way.area) > 0;
@@ -336,6 +353,7 @@ std::vector<Way> ways(const Definition& source, const Definition& target,
   std::vector<Way> list = ways_between(from, to, wanted, options);
   rank(list, wanted);
   std::erase_if(list, [&](const Way& way) { return !(coverage(wanted, way.area) > 0); });
+  drop_repeated(list);
   return list;
 }
 

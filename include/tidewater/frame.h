@@ -3,10 +3,15 @@
  * What all functions of the library have in common: points, status words, and the checks and
  * precision helpers of a call.
  *
- * Every function can be called at any time, from C or C++, without set-up.  Angles are radians,
- * longitude first and positive east, latitude positive north.  Points travel as arrays of
- * CoordinateTriple; the output array may be the input array, partial overlap is not supported.  A
- * count of zero or below does nothing and leaves #TW_SUCCESS.
+ * Every function can be called at any time, from C or C++, without set-up, and by any number of
+ * threads at once but for three groups: the shift and geoid grids (TWnadcon_..., TWcnt_...,
+ * TWgeo90_...) keep one window for the process, the text functions adopt the user's locale while
+ * they run, which is the process's, and the harmonic sums (TWhar_...) write work arrays that a
+ * thread must have for itself.
+ *
+ * Angles are radians, longitude first and positive east, latitude positive north.  Points travel as
+ * arrays of CoordinateTriple; the output array may be the input array, partial overlap is not
+ * supported.  A count of zero or below does nothing and leaves #TW_SUCCESS.
  *
  * The last argument is the caller's status word.  It is set to #TW_SUCCESS first and written again
  * only by a failure or an information event, so a status set for one point stands at the end of the

@@ -293,6 +293,15 @@ TEST(Transformation, CandidatesAreRankedAndNameWhatIsMissing) {
   }
 }
 
+// The registry has the way over Paris as one operation of two steps, which are also found one by one.
+TEST(Transformation, CandidatesOfTheSameStepsStandOnce) {
+  const auto list = Transformation::candidates(System("27572"), System("2154"));
+  ASSERT_GE(list.size(), 2u);
+  for (std::size_t i = 0; i < list.size(); ++i) {
+    for (std::size_t k = 0; k < i; ++k) EXPECT_NE(list[i].steps, list[k].steps);
+  }
+}
+
 TEST(Systems, NamesThatUsersType) {
   EXPECT_EQ(System("2154").code(), 2154);
   EXPECT_EQ(System("epsg:2154").code(), 2154);
