@@ -293,7 +293,7 @@ TEST(Transformation, CandidatesAreRankedAndNameWhatIsMissing) {
   }
 }
 
-// The registry has the way over Paris as one operation of two steps, which are also found one by one.
+// The registry has the way over Paris as one operation of two steps, found one by one as well.
 TEST(Transformation, CandidatesOfTheSameStepsStandOnce) {
   const auto list = Transformation::candidates(System("27572"), System("2154"));
   ASSERT_GE(list.size(), 2u);
