@@ -47,7 +47,7 @@ class Walk {
   // the last forward call.
   TWstatus to(double x, double y) {
     LonLat previous = estimate_;
-    previous.lat += estimate_.lat >= 1.5707913267948965 ? -kStartOffset : kStartOffset;
+    previous.lat += estimate_.lat >= kHalfPi - 5e-6 ? -kStartOffset : kStartOffset;
     CoordinateTriple p = {};
     TWstatus word = image(previous, p);
     double scale = 0.1;

@@ -44,7 +44,7 @@ struct EqualEarth {
     if (!(std::fabs(s) <= 1 + 1e-12)) return false;
     *beta = portable::asin(s > 1 ? 1 : s < -1 ? -1 : s);
     *lon = x * kHalfRoot3 * slope(t) / portable::cos(t);
-    return std::fabs(*lon) <= 3.14159265358979323846 + 1e-9;
+    return std::fabs(*lon) <= kPi + 1e-9;
   }
 };
 

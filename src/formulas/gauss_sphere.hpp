@@ -14,8 +14,8 @@ inline constexpr double kGaussSphereMark = -1.0;
 
 // Beyond these the pole maps onto itself.  By contract: forward and inverse draw the line
 // differently.
-inline constexpr double kGaussForwardLatLimit = 1.5707963267938965;  // pi/2 - 1e-12
-inline constexpr double kGaussInverseLatLimit = 1.5707963267947966;  // pi/2 - 1e-13
+inline constexpr double kGaussForwardLatLimit = kHalfPi - 1e-12;
+inline constexpr double kGaussInverseLatLimit = kHalfPi - 1e-13;
 
 // A latitude of the sphere whose sine and cosine are needed as well or instead: what is not used
 // is not computed.

@@ -20,8 +20,6 @@ constexpr double kSphereLimit = 1e-12;
 // Third flattening up to which the inverse takes its series; ellipsoids of the earth have 0.0017.
 constexpr double kSeriesLimit = 0.003;
 
-double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
-
 }  // namespace
 
 MeridianArc::MeridianArc(double a, double e) : a_(a), sphere_(e < kSphereLimit) {

@@ -8,6 +8,9 @@
 
 namespace tidewater::detail {
 
+// The pole of a latitude that lies beyond one.
+inline double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
+
 // The series in the third flattening n = (a - b) / (a + b), carried to n^4 and summed over cos 2p:
 // arc = G (A p + T(p)).  Helmert, Die mathematischen und physikalischen Theorieen der hoeheren
 // Geodaesie, vol. 1 (1880), p. 46.

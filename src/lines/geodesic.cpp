@@ -430,7 +430,7 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
   }
 
   const double size = std::fabs(into_half_turn(azimuth));
-  if (size < 1e-14 || size > 3.141592653589783) {  // pi - 1e-14
+  if (size < 1e-14 || size > kPi - 1e-14) {
     const double northward = size < 1e-14 ? distance : -distance;
     double arc = 0;
     TWmerid_dist_f(a, e, lat1, &arc, status);
@@ -503,7 +503,7 @@ void TWgeodesic_dir(CoordinateTriple start, double azimuth, double distance, dou
   double u = t < 0.999999 ? std::sqrt(1 - t * t) : std::sqrt((w + k) * (k - w)) / c2;
   if (mirrored != before_vertex) u = -u;
   double back = (points::atan2(u, t) + kHalfPi) * east + kPi;
-  if (back >= 6.283185307179585) back -= kTwoPi;  // 2 pi - 1e-15
+  if (back >= kTwoPi - 1e-15) back -= kTwoPi;
   *back_azimuth = back;
 }
 
@@ -519,7 +519,7 @@ void TWgeodesic_inv(CoordinateTriple start, CoordinateTriple end, double a, doub
     *back_azimuth = kPi;
     return;
   }
-  constexpr double kPole = 1.5707963267948866;  // pi/2 - 1e-14
+  constexpr double kPole = kHalfPi - 1e-14;
   if (std::fabs(dl) < 1e-14 || (std::fabs(std::fabs(dl) - kPi) < 1e-14 && lat1 == -lat2) ||
       std::fabs(lat1) > kPole || std::fabs(lat2) > kPole) {
     inverse_on_meridian(dl, lat1, lat2, a, e, azimuth, back_azimuth, distance, status);

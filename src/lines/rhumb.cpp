@@ -49,7 +49,7 @@ void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distance, dou
   }
   end->z = start.z;
   double back = azimuth + kPi;
-  if (back > 6.283185307179585) back -= kTwoPi;
+  if (back > kTwoPi - 1e-15) back -= kTwoPi;
   *back_azimuth = back;
 }
 

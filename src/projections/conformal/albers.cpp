@@ -14,7 +14,7 @@ using namespace tidewater::detail;
 namespace {
 
 constexpr double kConverged = 1e-13;
-constexpr double kLatLimit = 1.5707963267958966;  // a latitude up to here is held at the pole
+constexpr double kLatLimit = kHalfPi + 1e-12;  // a latitude up to here is held at the pole
 constexpr double kSineLimit = 1.0000000000001;
 constexpr int kNewtonSteps = 12;
 constexpr int kMostSteps = 30;

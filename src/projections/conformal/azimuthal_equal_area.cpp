@@ -114,7 +114,7 @@ bool latitude_of_q(const EqualAreaOrigin& o, double q, double u, double& lat) {
 // The stated inverse, word for word.
 Next inverse_as_stated(const EqualAreaOrigin& o, const CoordinateTriple& in, CoordinateTriple* out,
                        TWstatus* status) {
-  constexpr double kLatLimit = 1.5707963267958966;  // pi/2 and 1e-12
+  constexpr double kLatLimit = kHalfPi + 1e-12;
   const double x = in.x;
   const double y = in.y;
   double lon = o.lon0;

@@ -16,7 +16,7 @@ namespace tidewater::detail {
 namespace {
 
 // Nearer a pole than this, the meridian road takes the azimuth from the longitude.
-constexpr double kPolarOrigin = 1.5707963267938965;
+constexpr double kPolarOrigin = kHalfPi - 1e-12;
 // -(pi/2)^2: the product of two latitudes is never smaller, but for rounding.
 constexpr double kLeastProduct = -2.4674011002691976;
 

@@ -17,7 +17,7 @@ namespace {
 
 // Origins this close to a pole are replaced by one at this distance from it.
 constexpr double kPolarMargin = 2e-06;
-constexpr double kPolarOrigin = 1.5707943267948965;
+constexpr double kPolarOrigin = kHalfPi - kPolarMargin;
 
 bool is_sphere(double c) { return c < 0; }
 

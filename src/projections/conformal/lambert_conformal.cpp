@@ -13,7 +13,7 @@ using namespace tidewater::detail;
 
 namespace {
 
-constexpr double kPolarParallel = 1.5707963267938965;  // pi/2 - 1e-12
+constexpr double kPolarParallel = kHalfPi - 1e-12;
 
 double radius_of_parallel(double e, double lat) {
   const auto at = sincos(lat);

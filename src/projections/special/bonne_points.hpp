@@ -13,7 +13,7 @@ namespace tidewater::detail {
 // Differences up to this are none.
 inline constexpr double kBonneNothing = 1e-12;
 // Nearer to a pole every longitude is the central one.
-inline constexpr double kBonnePole = 1.5707963267938965;  // pi/2 - 1e-12
+inline constexpr double kBonnePole = kHalfPi - 1e-12;
 
 struct BonneForward {
   double lon0, lat1, e2, c1, r0;

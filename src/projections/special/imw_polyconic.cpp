@@ -32,8 +32,6 @@ double arc_radius(double e2, double lat) {
   return 1 / std::sqrt(1 - e2 * square(portable::sin(lat))) / portable::tan(lat);
 }
 
-double hold_at_pole(double lat) { return lat < 0 ? -kHalfPi : kHalfPi; }
-
 }  // namespace
 
 namespace tidewater::detail {
@@ -56,7 +54,7 @@ Sheet::Sheet(double e, double lon0_, double lat1_, double r1_, double r2_, doubl
 
 TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
   TWstatus status = TW_SUCCESS;
-  if (std::fabs(lat) > 1.5707963277948966) return TW_BAD_LATITUDE;  // pi/2 + 1e-9
+  if (std::fabs(lat) > kHalfPi + 1e-9) return TW_BAD_LATITUDE;
   if (std::fabs(lat) > kHalfPi) {
     lat = hold_at_pole(lat);
     status = TW_I_LATITUDE_LIMITED;
@@ -71,7 +69,7 @@ TWstatus Sheet::forward(double lon, double lat, double* x, double* y) const {
   double yc = yb_mid;
   if (curved) {
     const double g = lat >= 0 ? 1 : -1;
-    if (std::fabs(lat) <= 1.5707963267947966) r = arc_radius(e2, lat);
+    if (std::fabs(lat) <= kHalfPi - 1e-13) r = arc_radius(e2, lat);
     yc = 0;
     if (std::fabs(lat - lat1) >= kSheetNothing) {
       const double under = r * r - xb_mid * xb_mid;

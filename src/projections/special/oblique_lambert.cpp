@@ -30,7 +30,7 @@ double reflect_at_pole(double p) { return p > kHalfPi ? kHalfPi - (p - kHalfPi) 
 // The pole of the cone, as far from the origin as the nearer geographic pole, along an azimuth.
 void find_pole(double e, double lon0, double lat0, double azimuth, double* pole_lon,
                double* pole_lat, TWstatus* status) {
-  constexpr double kAtPole = 1.5707963267938965;  // pi/2 - 1e-12
+  constexpr double kAtPole = kHalfPi - 1e-12;
   if (lat0 > kAtPole || lat0 < -kAtPole) {
     *pole_lon = lon0;
     *pole_lat = lat0 > 0 ? kHalfPi : -kHalfPi;
