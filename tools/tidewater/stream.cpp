@@ -366,6 +366,7 @@ int run_stream(Job& job, std::vector<std::string> files, const StreamOptions& op
 int run_line(Job& job, const std::string& line) { return Stream::run_one(job, line); }
 
 void write_out(std::string_view text) {
+  if (text.empty()) return;  // of no place either
   if (std::fwrite(text.data(), 1, text.size(), stdout) != text.size()) {
     throw std::runtime_error("standard output cannot be written");
   }
