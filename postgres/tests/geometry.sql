@@ -30,8 +30,10 @@ SELECT check_that('the input is left alone', bool_and(shape = ST_GeomFromText(ki
 SELECT check_that('systems by text', ST_AsText(tw_transform(shape, 'utm:31N'), 3)
     = ST_AsText(tw_transform(shape, 32631), 3)
   AND ST_SRID(tw_transform(shape, 'EPSG:4326', 'EPSG:2154')) = 2154) FROM kinds LIMIT 1;
+-- Moved by a degree, as the last digit of a longitude of 0 would be written with an exponent.
 SELECT check_that('and the way back', bool_and(
-  ST_AsText(tw_transform(tw_transform(shape, 2154), 4326), 8) = ST_AsText(shape, 8))) FROM kinds;
+  ST_AsText(ST_Translate(tw_transform(tw_transform(shape, 2154), 4326), 1, 0), 8)
+    = ST_AsText(ST_Translate(shape, 1, 0), 8))) FROM kinds;
 SELECT check_that('a bad point makes null',
   tw_transform(ST_GeomFromText('LINESTRING(0 45, 0 95)', 4326), 2154) IS NULL);
 SELECT check_that('a shape without system', failure(
