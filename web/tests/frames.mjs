@@ -37,6 +37,7 @@ const [x, y] = [box.x + box.width / 2, box.y + box.height / 2];
 const idle = middle(await frames(x, y, 1));
 
 const all = [];
+console.log("milliseconds of a frame           median   worst");
 for (const id of await page.evaluate(() => explorer.projections.map((p) => p.id))) {
   await page.evaluate((chosen) => explorer.chooseProjection(chosen), id);
   await page.mouse.move(x, y + 60);
@@ -45,10 +46,8 @@ for (const id of await page.evaluate(() => explorer.projections.map((p) => p.id)
   const times = (await frames(x, y, 6)).map((time) => Math.max(0, time - idle));
   await page.mouse.up();
   await page.evaluate(() => (explorer.state.points = []));
-  all.push({ id, median: middle(times), worst: times.at(-1) });
-}
-console.log("milliseconds of a frame           median   worst");
-for (const { id, median, worst } of all) {
+  const [median, worst] = [middle(times), times.at(-1)];
+  all.push({ median, worst });
   console.log(id.padEnd(32), median.toFixed(1).padStart(7), worst.toFixed(1).padStart(7));
 }
 const late = (of) => all.filter((one) => one[of] > BUDGET).length;
