@@ -112,6 +112,7 @@ void expect_plane(double lon, double lat) {
 }
 
 TEST_F(NationalGrid, NothingOpenAtProcessStart) {
+  TIDEWATER_NEED_NEW_PROCESS();
   // A process of its own, whatever ran here before.
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   EXPECT_EXIT(leave_with_nothing_open(), testing::ExitedWithCode(0), "");
