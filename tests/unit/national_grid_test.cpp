@@ -121,7 +121,7 @@ TEST_F(NationalGrid, NothingOpenAtProcessStart) {
 TEST_F(NationalGrid, CanadasGridAgainstItsNodes) {
   TIDEWATER_NEED_SHARED_DATA();
   TWstatus status = 0;
-  TWcnt_c((shared_data() / "ntv2/").c_str(), 0, &status);
+  TWcnt_c((shared_data() / "ntv2/").string().c_str(), 0, &status);
   ASSERT_EQ(status, TW_SUCCESS);
   const std::string bytes = file_bytes(shared_data() / "ntv2/canada.gsb");
 
@@ -515,7 +515,7 @@ TEST_F(NationalGrid, HeadersByThemselves) {
   TWrd_cnt_fhdr((path + "x").c_str(), 0, &status);
   EXPECT_EQ(status, TW_GSB_READ_ERROR);
   expect_plane(107.25, 45.5);  // nothing was opened in its place
-  TWrd_cnt_fhdr(folder.path().c_str(), 0, &status);
+  TWrd_cnt_fhdr(folder.path().string().c_str(), 0, &status);
   EXPECT_EQ(status, TW_GSB_READ_ERROR);  // a folder
 }
 
