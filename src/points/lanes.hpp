@@ -111,7 +111,8 @@ struct Lanes {
 
   Lanes() = default;
   TW_INLINE Lanes(Vector vector) : v(vector) {}
-  TW_INLINE Lanes(double value) : v(Vector{} + value) {
+  // Less nothing, and not nothing plus it: a negative zero stays one.
+  TW_INLINE Lanes(double value) : v(value - Vector{}) {
 #if defined(__wasm_simd128__)
     // Constants that the compiler does not see through: in the browser the inverse of transverse
     // Mercator is quicker by a twelfth so, and nothing is slower.
