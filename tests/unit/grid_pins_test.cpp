@@ -101,4 +101,28 @@ TEST_F(NadconPins, ALongitudeShiftedPastHalfATurnComesRound) {
   expect_near(out, degrees(-179.5), in.y, 1e-12);
 }
 
+TEST_F(NadconPins, AGridThatCannotBeOpenedLeavesNoFileOpen) {
+  // Two grids of other shifts; the second lacks one of its files by the time of the call.  What
+  // comes after it, in a new window of the first, is read from the first.
+  for (const char* gone : {"h.los", "h.las"}) {
+    const auto constant = [](float seconds) { return [seconds](int, int) { return seconds; }; };
+    open({-100, 20, 30, 8, constant(10)}, {-100, 20, 30, 8, constant(20)});
+    folder.write("h.los", GridFile{-60, 20, 30, 8, constant(70)}.bytes());
+    folder.write("h.las", GridFile{-60, 20, 30, 8, constant(80)}.bytes());
+    folder.write("area.par", "g\nh\n");
+    TWstatus status = 0;
+    TWnadcon_c(folder.directory().c_str(), &control, &status);
+    ASSERT_EQ(status, TW_SUCCESS);
+    std::filesystem::remove(folder.path() / gone);
+    const Points in = {at(-95.5, 23.5), at(-55.5, 23.5), at(-85.5, 23.5)};
+    Points out = untouched(3);
+    TWnadcon_f(3, in.data(), &control, out.data(), &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    expect_untouched(out[1]);
+    for (const std::size_t k : {std::size_t{0}, std::size_t{2}}) {
+      expect_near(out[k], in[k].x - degrees(0, 0, 10), in[k].y + degrees(0, 0, 20), 5, 1e-14);
+    }
+  }
+}
+
 }  // namespace

@@ -3,13 +3,17 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <cstddef>
+#include <functional>
 #include <random>
 
 #include "support/points.hpp"
 #include "tidewater/conformal.h"
+#include "tidewater/datum.h"
+#include "tidewater/lines.h"
 #include "tidewater/special.h"
 
 using namespace tidewater::test;
@@ -36,13 +40,27 @@ struct Arc {
   }
 };
 
+double arc_azimuth(const CoordinateTriple& p, const CoordinateTriple& q) {
+  return static_cast<double>(Arc(p, q).azimuth);
+}
+
+// As the system's geodesics have it, which hold what is hard by a meridian.
+double geodesic_azimuth(const CoordinateTriple& p, const CoordinateTriple& q) {
+  double azimuth = 0, back = 0, distance = 0;
+  TWstatus status = 0;
+  TWgeodesic_inv(p, q, 6000000, 0, &azimuth, &back, &distance, &status);
+  return azimuth;
+}
+
 using Corners = std::array<CoordinateTriple, 3>;
 
 // From each corner a point lies at its distance, turned from the edge that begins there by the
 // angle that the cosine rule of the plane gives, to the side on which its azimuth points.
 CoordinateTriple mean_of_three(const Corners& control, const std::array<double, 3>& sides,
                                const std::array<double, 3>& azimuths, const Corners& plane,
-                               const CoordinateTriple& p) {
+                               const CoordinateTriple& p,
+                               double (*azimuth)(const CoordinateTriple&,
+                                                 const CoordinateTriple&) = arc_azimuth) {
   constexpr long double kHalfTurn = 3.141592653589793238462643383279502884L;
   long double x = 0, y = 0;
   for (std::size_t j = 0; j < 3; ++j) {
@@ -51,7 +69,7 @@ CoordinateTriple mean_of_three(const Corners& control, const std::array<double, 
     const long double other = Arc(control[next], p).distance;
     const long double side = sides[j];
     const long double angle = std::acos((d * d + side * side - other * other) / (2 * side * d));
-    const long double turn = Arc(control[j], p).azimuth - azimuths[j];
+    const long double turn = static_cast<long double>(azimuth(control[j], p)) - azimuths[j];
     const bool left = (turn > -kHalfTurn && turn < 0) || turn > kHalfTurn;
     const long double edge = std::atan2(static_cast<long double>(plane[next].y) - plane[j].y,
                                         static_cast<long double>(plane[next].x) - plane[j].x);
@@ -114,6 +132,39 @@ TEST(Chamberlin, TheSideOfAPointStraightBehindAnEdge) {
   EXPECT_EQ(behind.y, right.y);
   // Distances of 0.1 and 0.4: a cosine of -0.39, and a third of 0.1 times its sine on either side.
   EXPECT_GT(std::fabs(left.x - right.x), 0.05);
+}
+
+TEST(Chamberlin, HardByACornersMeridianTheGeodesicTells) {
+  // An edge due north and sides of the caller's own make the side of the point count.
+  const Corners control = {{{0.2, 0.4, 0}, {0.2, 0.7, 0}, {0.5, 0.5, 0}}};
+  const std::array<double, 3> azimuths = {0, 1, 2};
+  const Corners plane = {{{0, 0, 0}, {0.2, std::sqrt(0.1225 - 0.04), 0}, {0.4, -0.02, 0}}};
+  const std::array<double, 3> lengths = {0.35, std::hypot(0.2, plane[1].y + 0.02),
+                                         std::hypot(0.4, 0.02)};
+  for (const double dl : {-2e-9, -9e-10, -1e-10, -1e-13, 0.0, 1e-13, 1e-10, 9e-10, 2e-9}) {
+    for (const double lat : {0.3, 0.75}) {
+      const CoordinateTriple p = {0.2 + dl, lat, 3};
+      CoordinateTriple out = {};
+      TWstatus status = 0;
+      TWchamtri_f(0, control.data(), lengths.data(), azimuths.data(), plane.data(), 1, &p, &out,
+                  &status);
+      EXPECT_EQ(status, TW_SUCCESS);
+      const CoordinateTriple expected =
+          mean_of_three(control, lengths, azimuths, plane, p, geodesic_azimuth);
+      expect_near(out, expected.x, expected.y, 3, 1e-8);
+    }
+  }
+}
+
+TEST(Chamberlin, NoPointIsASuccess) {
+  const Corners control = {{{0.2, 0.4, 0}, {0.2, 0.7, 0}, {0.5, 0.5, 0}}};
+  const std::array<double, 3> three = {0.3, 0.4, 0.4};
+  TWstatus status = 77;
+  CoordinateTriple out = kUntouchedPoint;
+  TWchamtri_f(0, control.data(), three.data(), three.data(), control.data(), 0, &out, &out,
+              &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  expect_untouched(out);
 }
 
 // --- Hotine -------------------------------------------------------------------------------------
@@ -310,6 +361,169 @@ TEST(Cassini, TheInversePoleIsATrillionthWide) {
       EXPECT_NE(back(sign * std::nextafter(edge, 0)).y, sign * kHalf);
     }
   }
+}
+
+// --- Albers -------------------------------------------------------------------------------------
+
+TEST(Albers, WhatTheSpheresFanDoesNotHold) {
+  // (C - (rho n)^2) / n is twice the sine of the latitude: the caller's constants bring it
+  // beyond 2.
+  constexpr double n = 0.5, C = 1.2, rho0 = 1;
+  for (const double sine : {1.025, -1.025, 1.05, -1.05}) {
+    const double rho = std::sqrt((C / n - 2 * sine) / n);
+    const CoordinateTriple in[2] = {{0, rho0 - rho, 3}, {0, 0, 3}};
+    CoordinateTriple out[2] = {kUntouchedPoint, kUntouchedPoint};
+    TWstatus status = 0;
+    TWalbers_i(0, 0.1, n, C, rho0, 2, in, out, &status);
+    EXPECT_EQ(status, TW_NOT_CONVERGED) << sine;
+    expect_untouched(out[0]);
+    expect_untouched(out[1]);
+  }
+  for (const double sine : {0.999, -0.999}) {
+    const double rho = std::sqrt((C / n - 2 * sine) / n);
+    CoordinateTriple p = {0, rho0 - rho, 3};
+    TWstatus status = 0;
+    TWalbers_i(0, 0.1, n, C, rho0, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS) << sine;
+    expect_near(p, 0.1, std::asin(sine), 1e-13);
+  }
+}
+
+TEST(Albers, TheApexIsAHundredThousandthWide) {
+  // On the equator of a sphere rho is sqrt(C) for n = 1, and the parallel's radius is 1.
+  double edge = 1e-10;  // the last C whose root is 1e-5
+  while (std::sqrt(edge) < 1e-5) edge = std::nextafter(edge, 1);
+  while (std::sqrt(std::nextafter(edge, 1)) == 1e-5) edge = std::nextafter(edge, 1);
+  ASSERT_EQ(std::sqrt(edge), 1e-5);
+  double below = edge;
+  while (std::sqrt(below) == 1e-5) below = std::nextafter(below, 0);
+  const auto scale = [](double C) {
+    CoordinateTriple p = {0, 0, 0};
+    TWstatus status = 0;
+    TWalbers_s(0, 0.5, C, 1, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    return p;
+  };
+  EXPECT_EQ(scale(below).x, 0.5);  // k = h = 1
+  EXPECT_EQ(scale(below).y, 0.5);
+  const CoordinateTriple p = scale(edge);
+  EXPECT_NEAR(p.x, 0.5e-5, 1e-20);
+  EXPECT_NEAR(p.y, 0.5e5, 1e-9);
+  EXPECT_NEAR(p.z, 0.25, 1e-15);
+}
+
+// --- The general inverse, step by step
+// ------------------------------------------------------------
+
+using Plane = std::function<CoordinateTriple(double lon, double lat)>;
+
+// The points at which the map is asked on the way to one target.
+Points stated_walk(const Plane& map, double lon, double lat, double x, double y) {
+  Points asked;
+  const auto image = [&](double at_lon, double at_lat) {
+    asked.push_back({at_lon, at_lat, 0});
+    return map(at_lon, at_lat);
+  };
+  double old_lon = lon, old_lat = lat + (lat >= 1.5707913267948965 ? -5e-6 : 5e-6);
+  CoordinateTriple p = image(old_lon, old_lat);
+  double s = 0.1;
+  for (int pass = 0; pass < 100; ++pass) {
+    const CoordinateTriple f = image(lon, lat);
+    const double dx = x - f.x, dy = y - f.y;
+    if (std::fabs(dx) < 1e-14 && std::fabs(dy) < 1e-14) break;
+    double d = std::sqrt(dy * dy + dx * dx), angle = std::atan2(dy, dx);
+    const double u = std::cos(lat) * (lon - old_lon), v = lat - old_lat;
+    if (std::fabs(u) < 1e-14 && std::fabs(v) < 1e-14) break;
+    angle += std::atan2(v, u);
+    const double ex = f.x - p.x, ey = f.y - p.y;
+    if (ex != 0 || ey != 0) {
+      angle -= std::atan2(ey, ex);
+      s = std::sqrt(u * u + v * v) / std::sqrt(ex * ex + ey * ey);
+    }
+    old_lon = lon;
+    old_lat = lat;
+    p = f;
+    d = std::min(d * s, kPi);
+    const double du = std::cos(angle) * d;
+    if (std::fabs(du) < kPi * std::cos(lat)) lon += du / std::cos(lat);
+    lat += std::sin(angle) * d;
+    while (lat < -kHalf || lat > kHalf) {
+      lat = (lat < 0 ? -kPi : kPi) - lat;
+      lon += lon >= 0 ? -kPi : kPi;
+    }
+    for (; lon > kPi; lon -= 2 * kPi) old_lon -= 2 * kPi;
+    for (; lon < -kPi; lon += 2 * kPi) old_lon += 2 * kPi;
+  }
+  asked.push_back({lon, lat, 0});  // the answer
+  return asked;
+}
+
+TEST(GenericInverse, TheWalkAsStated) {
+  struct Asked {
+    Plane map;
+    Points points;
+    static void call(TWcontext context, int32_t, const CoordinateTriple* in, CoordinateTriple* out,
+                     TWstatus*) {
+      auto& self = *reinterpret_cast<Asked*>(context);  // NOLINT(performance-no-int-to-ptr)
+      self.points.push_back(*in);
+      *out = self.map(in->x, in->y);
+    }
+  };
+  const Plane plate = [](double lon, double lat) { return CoordinateTriple{lon, lat, 0}; };
+  const Plane constant = [](double, double) { return CoordinateTriple{0.25, 0.5, 0}; };
+  const Plane north = [](double lon, double lat) {
+    return CoordinateTriple{(kHalf - lat) * std::sin(lon), (lat - kHalf) * std::cos(lon), 0};
+  };
+  const Plane south = [](double lon, double lat) {
+    return CoordinateTriple{(kHalf + lat) * std::sin(lon), (kHalf + lat) * std::cos(lon), 0};
+  };
+  // One step's image lies one to the east of the other's.
+  const Plane stairs = [](double lon, double lat) { return CoordinateTriple{lat * 2e5, lon, 0}; };
+  struct Case {
+    Plane map;
+    double lon, lat, x, y;
+  };
+  int over = 0, round = 0;
+  for (const Case& c : {Case{plate, 0.5, 0.25, 0.6, 0.3},
+                        {plate, 3, 0.2, 3.3, 0.1},
+                        {plate, -3, 0.2, -3.3, 0.1},
+                        {constant, 0.1, 0.2, 0.5, 0.9},
+                        {north, 0.3, 1.3, -0.2, 0.2},
+                        {north, -0.3, 1.3, 0.2, 0.2},
+                        {north, 2, 1.4, 0.1, 0.2},
+                        {south, 0.3, -1.3, 0.2, -0.2},
+                        {south, -0.3, -1.3, 0.2, -0.2},
+                        {south, -2.5, -1.45, -0.1, 0.2},
+                        {stairs, 0.1, 0.2, 0.5, 0.3}}) {
+    const Points stated = stated_walk(c.map, c.lon, c.lat, c.x, c.y);
+    Asked asked = {c.map, {}};
+    CoordinateTriple p = {c.x, c.y, 0};
+    TWstatus status = 0;
+    TWgeneric_i(Asked::call, reinterpret_cast<TWcontext>(&asked), c.lon, c.lat, 0, 1, &p, &p,
+                &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    asked.points.push_back({p.x, p.y, 0});
+    // Of a walk without end the first steps; rounding grows from step to step.
+    const std::size_t steps = std::min<std::size_t>(stated.size(), 8);
+    ASSERT_GE(asked.points.size(), steps);
+    for (std::size_t i = 0; i < steps; ++i) {
+      expect_near(asked.points[i], stated[i].x, stated[i].y, 0, 1e-11 * std::pow(10.0, i / 2));
+      if (i < 2) continue;
+      over += std::fabs(stated[i].x - stated[i - 1].x) > 2.5;
+      round += std::fabs(stated[i].x - stated[i - 1].x) > 5;
+    }
+    EXPECT_NEAR(static_cast<double>(asked.points.size()), static_cast<double>(stated.size()), 1);
+  }
+  EXPECT_GT(over, 2);
+  EXPECT_GT(round, 1);
+}
+
+TEST(ComplexPolynomial, TheDerivativeSetsTheWord) {
+  const double coefs[4] = {1, 2, 3, 4};
+  double result[2] = {};
+  TWstatus status = 77;
+  TWcomplexpol_g(1, coefs, 0.5, 0.5, result, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
 }
 
 }  // namespace
