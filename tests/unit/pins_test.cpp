@@ -10,6 +10,7 @@
 #include <functional>
 #include <random>
 
+#include "support/failing_new.hpp"
 #include "support/points.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/datum.h"
@@ -300,6 +301,21 @@ TEST(Stereographic, TheOriginAndThePolesTakeTheCentralMeridian) {
   EXPECT_NE(lon(std::nextafter(within, 1), 0), 0.25);
 }
 
+TEST(Stereographic, AQuarterOfTheGlobeFromTheOrigin) {
+  // On the sphere about (0, 0) the quarter lies 2 away: the quotient of the arc tangent is one by
+  // 0.
+  double C = 0, m0 = 0, chi0 = 0;
+  TWstatus status = 0;
+  TWstereo_c(0, 0, &C, &m0, &chi0, &status);
+  for (const double side : {1.0, -1.0}) {
+    const CoordinateTriple in = {2 * side, 0, 0};
+    CoordinateTriple out = kUntouchedPoint;
+    TWstereo_i(0, 0.25, 0, C, m0, chi0, 1, &in, &out, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    expect_near(out, 0.25 + side * kHalf, 0, 1e-15);
+  }
+}
+
 // --- Cassini: the printed series with a flattening that shows every term
 // ---------------------------
 
@@ -524,6 +540,41 @@ TEST(ComplexPolynomial, TheDerivativeSetsTheWord) {
   TWstatus status = 77;
   TWcomplexpol_g(1, coefs, 0.5, 0.5, result, &status);
   EXPECT_EQ(status, TW_SUCCESS);
+}
+
+TEST(Similarity, AScaleOfNoneIsToldOfAnyPoint) {
+  const double rotation[3] = {};
+  for (const int32_t count : {0, 1, 2}) {
+    const Points in(2, {1, 2, 3});
+    Points out = untouched(2);
+    TWstatus status = 77;
+    TWbw_i(count, in.data(), -1, rotation, 0, 0, 0, out.data(), &status);
+    EXPECT_EQ(status, count > 0 ? TW_SINGULAR : TW_SUCCESS) << count;
+  }
+}
+
+// --- Points from a tolerance
+// ----------------------------------------------------------------------
+
+void straight(TWcontext, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
+              TWstatus*) {
+  std::copy_n(in, count, out);
+}
+
+TEST(ToleranceCount, TheWordIsSetAnew) {
+  int32_t count = 0;
+  TWstatus status = 77;
+  TWtoler_to_cnt(straight, 0, {0, 0, 0}, {0.1, 0, 0}, 1, 0, 0.1, 1, &count, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+}
+
+TEST(ToleranceCount, WithoutMemoryTheWordSaysSo) {
+  int32_t count = -77;
+  TWstatus status = 0;
+  const FailingNew failing;
+  TWtoler_to_cnt(straight, 0, {0, 0, 0}, {0.1, 0, 0}, 1, 0, 0.1, 1, &count, &status);
+  EXPECT_EQ(status, TW_NO_MEMORY);
+  EXPECT_EQ(failing.asked(), 65536);  // memory that is short may come back
 }
 
 }  // namespace
