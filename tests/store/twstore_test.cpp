@@ -93,7 +93,7 @@ TEST_F(Twstore, ErrorsNameFileLineAndColumn) {
       {"n,i,l,r\na,1,1\n", "rows1.csv:2: 3 cells, the header has 4"},
       {"n,i,l,r\n\"a\nb\",1,1,x\n", "rows1.csv:2: column r"},
       {"n,i,l,r\na,1,1,1\n\"a,1,1,1\n", "rows1.csv:3: a quote is not closed"},
-      {"n,i,l,r\n\"a\"b,1,1,1\n", "rows1.csv:2: text behind a closing quote"},
+      {"n,i,l,r\n\"a\"b,1,1,1\n", "rows1.csv:2: text after a closing quote"},
       {"n,i,r\na,1,1\n", "rows1.csv:1: no column \"l\""},
       {"n,i,l,r,s\na,1,1,1,1\n", "rows1.csv:1: columns that the layout does not have"},
       {"# nothing\n", "rows1.csv:1: no header"}};

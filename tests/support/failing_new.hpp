@@ -3,8 +3,8 @@
 
 namespace tidewater::test {
 
-// While one of these lives, the allocation of that number (0: the next one) by
-// new (std::nothrow) T[] gives null, and every later one too.
+// While one of these lives, the allocation of that number (0: the next one) by new (std::nothrow)
+// T[] gives null, and every later one too.
 class FailingNew {
  public:
   explicit FailingNew(int from = 0);

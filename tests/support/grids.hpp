@@ -15,6 +15,7 @@
 #include <string>
 #include <vector>
 
+#include "support/data.hpp"
 #include "tidewater/frame.h"
 
 namespace tidewater::test {
@@ -54,6 +55,26 @@ inline float f32_at(const std::string& bytes, std::size_t offset) {
 inline double f64_at(const std::string& bytes, std::size_t offset) {
   return std::bit_cast<double>(std::uint64_t{u32_at(bytes, offset + 4)} << 32 |
                                u32_at(bytes, offset));
+}
+
+// A control block and the word of the call that filled it.
+template <class Control>
+struct Opened {
+  TWstatus status = 0;
+  Control control = {};
+};
+
+// The control block of a directory, by the family's function for it; with a list, which is written.
+template <class Control, auto function>
+Opened<Control> opened_in(const ScratchFolder& folder) {
+  Opened<Control> opened;
+  function(folder.directory().c_str(), &opened.control, &opened.status);
+  return opened;
+}
+template <class Control, auto function>
+Opened<Control> opened_in(const ScratchFolder& folder, const std::string& list) {
+  folder.write("area.par", list);
+  return opened_in<Control, function>(folder);
 }
 
 // A .las, .los or .geo file.

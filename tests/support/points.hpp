@@ -28,6 +28,15 @@ using Points = std::vector<CoordinateTriple>;
 
 inline Points untouched(std::size_t count) { return Points(count, kUntouchedPoint); }
 
+// One point through a function of arrays, call(in, out), which must succeed and leave z unwritten.
+template <class Call>
+CoordinateTriple one_point(const CoordinateTriple& in, Call call) {
+  Points out = untouched(1);
+  EXPECT_EQ(call(Points{in}, out), TW_SUCCESS);
+  EXPECT_EQ(out[0].z, kUntouched);
+  return out[0];
+}
+
 inline void expect_near(const CoordinateTriple& p, double x, double y, double tolerance) {
   EXPECT_NEAR(p.x, x, tolerance);
   EXPECT_NEAR(p.y, y, tolerance);

@@ -144,7 +144,7 @@ TEST(Heights, UnitsAndDepthsOfOneSurface) {
 
 TEST(Heights, RefusalsNameWhatIsMissing) {
   EXPECT_TRUE(has(refusal("EPSG:4979", "EPSG:2154+5720"), "needs the grid RAF20.tac"));
-  EXPECT_TRUE(has(refusal("EPSG:5720", "EPSG:4979"), "A height alone is no position"));
+  EXPECT_TRUE(has(refusal("EPSG:5720", "EPSG:4979"), "A height alone is not a position"));
   EXPECT_TRUE(has(between("EPSG:4979", "EPSG:4326+5720", "no shift").describe(), "nothing"));
 }
 

@@ -95,7 +95,7 @@ TEST(Wkt, ErrorsNameWhatIsMissing) {
                      "not above zero");
   expect_wkt_refused(projcs(R"(PROJECTION["Transverse_Mercator"],AXIS["x",SIDEWAYS])"),
                      "no direction");
-  expect_wkt_refused(kGeogcs + "," + kGeogcs, "behind its system");
+  expect_wkt_refused(kGeogcs + "," + kGeogcs, "after its system");
   expect_wkt_refused("COMPD_CS[\"c\"," + kGeogcs + "]", "no horizontal or no vertical");
 }
 

@@ -5,6 +5,7 @@
 #include "support/numeric_scale.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
+#include "support/projection_checks.hpp"
 #include "tidewater/special.h"
 
 using namespace tidewater::test;
@@ -154,23 +155,7 @@ TEST(Bonne, PolesTakeTheCentralLongitude) {
   EXPECT_EQ(out[0].x, 0.2);
 }
 
-TEST(Bonne, ArcFailureStops) {
-  const Bonne p(0.08, 0.7, 0);
-  const Points in = {{0.1, 0.2, 0}, {0.1, kPi / 2 + 5e-13, 0}, {0.1, 2, 0}, {0.1, 0.2, 0}};
-  Points out = untouched(4);
-  EXPECT_EQ(p.forward(in, out), TW_BAD_LATITUDE);
-  EXPECT_NE(out[1].x, kUntouched);
-  expect_untouched(out[2]);
-  expect_untouched(out[3]);
-  const Points held = {{0.1, kPi / 2 + 5e-13, 0}, {0.1, 0.2, 0}};
-  EXPECT_EQ(p.forward(held, out), TW_I_LATITUDE_LIMITED);
-  const Points plane = {{0.1, 0.2, 0}, {0, 20, 0}, {0.1, 0.2, 0}};
-  out = untouched(3);
-  EXPECT_EQ(p.inverse(plane, out), TW_BAD_LATITUDE);
-  EXPECT_NE(out[0].x, kUntouched);
-  expect_untouched(out[1]);
-  expect_untouched(out[2]);
-}
+TEST(Bonne, ArcFailureStops) { expect_arc_failure_stops(Bonne(0.08, 0.7, 0), {0, 20, 0}); }
 
 TEST(Bonne, RoundTripAndWraps) {
   std::mt19937 random(13);

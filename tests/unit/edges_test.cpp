@@ -292,9 +292,8 @@ TEST(Edges, ObliqueMercatorHoldsASineOfOneAndABit) {
 
 // --- Counts of passes ---------------------------------------------------------------------------
 
-// Ascending side of a circular orbit on the sphere: lt = L P + lon, L = atan(sin i tan(lat) / cos
-// lt
-// + cos i tan lt) + base.
+// Ascending side of a circular orbit on the sphere: lt = L P + lon,
+// L = atan(sin i tan(lat) / cos lt + cos i tan lt) + base.
 TEST(Passes, SpaceObliqueMercatorForward) {
   int at_limit = 0, beyond = 0;
   for (int i = 0; i < 1000; ++i) {

@@ -3,6 +3,7 @@
 #include <random>
 
 #include "support/geographiclib_peer.hpp"
+#include "support/lines.hpp"
 #include "support/points.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/lines.h"
@@ -11,30 +12,8 @@ using namespace tidewater::test;
 
 namespace {
 
-struct Direct {
-  CoordinateTriple end = kUntouchedPoint;
-  double back = kUntouched;
-  TWstatus status = 0;
-};
-
-Direct direct(CoordinateTriple start, double azimuth, double distance, Ellipsoid ellipsoid) {
-  Direct r;
-  TWgeodesic_dir(start, azimuth, distance, ellipsoid.a, ellipsoid.e, &r.end, &r.back, &r.status);
-  return r;
-}
-
-struct Inverse {
-  double azimuth = kUntouched;
-  double back = kUntouched;
-  double distance = kUntouched;
-  TWstatus status = 0;
-};
-
-Inverse inverse(CoordinateTriple start, CoordinateTriple end, Ellipsoid ellipsoid) {
-  Inverse r;
-  TWgeodesic_inv(start, end, ellipsoid.a, ellipsoid.e, &r.azimuth, &r.back, &r.distance, &r.status);
-  return r;
-}
+constexpr auto direct = line_end<TWgeodesic_dir>;
+constexpr auto inverse = line_between<TWgeodesic_inv>;
 
 double arc_of(Ellipsoid ellipsoid, double lat) {
   double arc = kUntouched;
@@ -139,7 +118,7 @@ TEST(GeodesicIntegral, AtTheVertexAndBeyond) {
   EXPECT_NEAR(integrals(-0.5, 0.5, 1, 0).arc, 2 * kPi, 1e-15);
 }
 
-// ---- Direct problem.
+// ---- LineEnd problem.
 
 TEST(GeodesicDirect, NoDistanceIsTheStart) {
   for (const double e : {0.0, 0.08}) {
@@ -406,7 +385,7 @@ TEST(GeodesicDirect, AgreesWithGeographicLib) {
 #endif
 }
 
-// ---- Inverse problem.
+// ---- LineBetween problem.
 
 TEST(GeodesicInverse, OnePoint) {
   for (const double shift : {0.0, 9e-15, -9e-15}) {

@@ -38,23 +38,15 @@ void write_grid(const ScratchFolder& folder, const std::string& name, const Grid
   folder.write(name + ".geo", file.bytes());
 }
 
-struct Opened {
-  TWstatus status = 0;
-  GeoidControl control = {};
-};
-
-Opened open(const ScratchFolder& folder) {
-  Opened opened;
-  TWgeo90_c(folder.directory().c_str(), &opened.control, &opened.status);
-  return opened;
+Opened<GeoidControl> open(const ScratchFolder& folder) {
+  return opened_in<GeoidControl, TWgeo90_c>(folder);
 }
 
 // The list of a geoid directory: names from column 15 on.
-Opened open(const ScratchFolder& folder, const std::vector<std::string>& names) {
+Opened<GeoidControl> open(const ScratchFolder& folder, const std::vector<std::string>& names) {
   std::string list;
   for (const std::string& name : names) list += "0 2 4 6 8 10 12" + name + "\n";
-  folder.write("area.par", list);
-  return open(folder);
+  return opened_in<GeoidControl, TWgeo90_c>(folder, list);
 }
 
 struct Undulation {
@@ -129,7 +121,7 @@ TEST_F(Geoid, HeadersFillTheBlock) {
                "* a comment\n\n \t \n*\nsome free text  first  and more\n"
                "xxxxxxxxxxxxxxx   second\n               *first\n");
   write_grid(folder, "*first", {-10, -20, 25, 27, place});
-  const Opened opened = open(folder);
+  const Opened<GeoidControl> opened = open(folder);
   EXPECT_EQ(opened.status, TW_SUCCESS);
   const GeoidControl& control = opened.control;
   EXPECT_EQ(control.directory, folder.directory());
@@ -152,7 +144,7 @@ TEST_F(Geoid, HeadersFillTheBlock) {
 
 TEST_F(Geoid, RealGridsAtTheirNodesAndBetween) {
   TIDEWATER_NEED_SHARED_DATA();
-  Opened opened;
+  Opened<GeoidControl> opened;
   TWgeo90_c((shared_data() / "geoid/").string().c_str(), &opened.control, &opened.status);
   ASSERT_EQ(opened.status, TW_SUCCESS);
   ASSERT_EQ(opened.control.grid_count, 2);
@@ -198,7 +190,7 @@ TEST_F(Geoid, RealGridsAgainstProj) {
   if (!fs::exists(proj_data() / "egm96_15.gtx")) GTEST_SKIP() << "egm96_15.gtx is not installed";
   const ProjPeer peer("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1");
   ASSERT_TRUE(peer.ok());
-  Opened opened;
+  Opened<GeoidControl> opened;
   TWgeo90_c((shared_data() / "geoid/").string().c_str(), &opened.control, &opened.status);
   for (int i = 0; i < 200; ++i) {
     // nodes of the peer's grid and of ours
@@ -221,7 +213,7 @@ TEST_F(Geoid, RealGridsAgainstProj) {
 
 TEST_F(Geoid, HeightsThereAndBack) {
   write_grid(folder, "g", {-100, 20, 60, 50, curved_node});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   Points points = {at(-70.25, 45.5, 100), at(-10, 45, 200), at(-71.75, 44.25, -300)};
   const Points in = points;
   Points out = untouched(3);
@@ -254,7 +246,7 @@ TEST_F(Geoid, ThreeNearestNodes) {
   // One node stands out by 1; its weight shows which nodes are used.
   write_grid(folder, "g",
              {-100, 20, 60, 50, [](int r, int c) { return r == 25 && c == 30 ? 1.F : 0; }});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   const auto weight = [](double t) {  // at distance t from the node
     const double d = std::fabs(t);
     return d < 0.5 ? 1 - d * d : d < 1.5 ? (1 - d) * (2 - d) / 2 : 0;
@@ -271,7 +263,7 @@ TEST_F(Geoid, HalfwayTheNextNodeIsTaken) {
   // Exactly between nodes 30 and 31 (in figures without rounding) u is 0.5, which is not below it:
   // nodes 30, 31 and 32 serve.
   write_grid(folder, "g", {-64, 0, 60, 50, [](int, int c) { return c == 29 ? 1.F : 0; }});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   double lon = -33.5 / 57.29577951308232;
   while (lon * 57.29577951308232 < -33.5) lon = std::nextafter(lon, 0);
   double n = kUntouched;
@@ -286,7 +278,7 @@ TEST_F(Geoid, HalfwayTheNextNodeIsTaken) {
 
 TEST_F(Geoid, WindowStaysInsideTheGrid) {
   write_grid(folder, "g", {-100, 20, 60, 50, place});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   const auto expect = [&](double x, double y, int row, int col) {
     SCOPED_TRACE(testing::Message() << x << " " << y);
     const Loaded loaded(opened.control, x, y);
@@ -305,7 +297,7 @@ TEST_F(Geoid, WindowStaysInsideTheGrid) {
 
 TEST_F(Geoid, EdgesOfTheGrid) {
   write_grid(folder, "g", {-100, 20, 60, 50, curved_node});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   for (const auto& [x, y] : {std::pair{-100.0, 45.0},
                              {-41.0, 45.0},
                              {-70.0, 20.0},
@@ -333,7 +325,7 @@ TEST_F(Geoid, FirstGridOfTheListWins) {
   const Loaded wide(open(folder, {"wide", "fine"}).control, -60.5, 45.5);
   EXPECT_EQ(wide.index, 0);
   EXPECT_EQ(wide.data[0], 1);
-  const Opened opened = open(folder, {"fine", "wide"});
+  const Opened<GeoidControl> opened = open(folder, {"fine", "wide"});
   EXPECT_EQ(Loaded(opened.control, -60.5, 45.5).data[0], 2);
   const Loaded south(opened.control, -60.5, 15.5);
   EXPECT_EQ(south.index, 1);
@@ -342,7 +334,7 @@ TEST_F(Geoid, FirstGridOfTheListWins) {
 
 TEST_F(Geoid, OuterCellsOfTheWindowAreNotUsed) {
   write_grid(folder, "g", {-100, 20, 60, 50, level(1)});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   // Loads columns 19 to 40, -81 to -60, and rows 15 to 36, 35 to 56; then the values change.
   const auto value_after = [&](double x, double y) {
     write_grid(folder, "g", {-100, 20, 60, 50, level(1)});
@@ -363,7 +355,7 @@ TEST_F(Geoid, OuterCellsOfTheWindowAreNotUsed) {
 
 TEST_F(Geoid, LongitudesFromAllTurns) {
   write_grid(folder, "g", {-200, 20, 60, 50, curved_node});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   for (const double turns : {0.0, 360.0, -360.0, 1080.0}) {
     EXPECT_NEAR(Undulation(opened.control, -170.25 + turns, 45.5).n, curved(25.5, 29.75), 1e-4);
   }
@@ -422,7 +414,7 @@ TEST_F(GeoidMoves, JudgedFromThePointItself) {
 TEST_F(GeoidMoves, ClippedToTheGrid) {
   write_grid(folder, "wide", {-100, 0, 81, 81, place});
   write_grid(folder, "other", box(-85, 10, -30, 70));
-  const Opened opened = open(folder, {"wide", "other"});
+  const Opened<GeoidControl> opened = open(folder, {"wide", "other"});
   // Columns -100 to -79 give way by five: what lies before the grid is cut.
   const Loaded west(opened.control, -95.5, 5.5);
   west.expect_nodes(-100, 0, 0, 0, 22, 17);
@@ -439,7 +431,7 @@ TEST_F(GeoidMoves, ClippedToTheGrid) {
 TEST_F(GeoidMoves, ClippedWindowInterpolates) {
   write_grid(folder, "wide", {-100, 0, 81, 81, curved_node});
   write_grid(folder, "other", box(-85, 10, -30, 70));
-  const Opened opened = open(folder, {"wide", "other"});
+  const Opened<GeoidControl> opened = open(folder, {"wide", "other"});
   for (const double x : {-99.875, -95.5, -86.25}) {
     const Undulation n(opened.control, x, 5.5);
     EXPECT_EQ(n.status, TW_SUCCESS);
@@ -452,7 +444,7 @@ TEST_F(GeoidMoves, OffThePointIsAnError) {
   // left, which is too few to interpolate in.
   write_grid(folder, "wide", {-100, 0, 81, 81, place});
   write_grid(folder, "other", box(-99.5F, -5, -30, 70));
-  const Opened opened = open(folder, {"wide", "other"});
+  const Opened<GeoidControl> opened = open(folder, {"wide", "other"});
   Loaded(opened.control, -99.5, 5.5).expect_nodes(-100, 0, 0, 0, 22, 2);
   CoordinateTriple out = kUntouchedPoint;
   const CoordinateTriple in = {-99.5 / 57.29577951308232, degrees(5.5), 0};
@@ -468,14 +460,14 @@ TEST_F(Geoid, NarrowGrids) {
   for (const int n : {12, 15, 21}) {
     write_grid(folder, "columns", {-100, 20, n, 60, place});
     write_grid(folder, "rows", {-70, 20, 60, n, place});
-    const Opened opened = open(folder, {"columns", "rows"});
+    const Opened<GeoidControl> opened = open(folder, {"columns", "rows"});
     for (const double d : {0.5, 5.5, n - 1.5}) {
       Loaded(opened.control, -100 + d, 50.5).expect_nodes(-100, 20, 20, 0, 22, n);
       Loaded(opened.control, -40.5, 20 + d).expect_nodes(-70, 20, 0, 19, n, 22);
     }
   }
   write_grid(folder, "columns", {-100, 20, 12, 60, curved_node});
-  const Opened opened = open(folder, {"columns"});
+  const Opened<GeoidControl> opened = open(folder, {"columns"});
   for (double x = -99.875; x < -89; x += 0.25) {
     EXPECT_NEAR(Undulation(opened.control, x, 50.5).n, curved(30.5, x + 100), 1e-4);
   }
@@ -491,7 +483,7 @@ TEST_F(Geoid, OneCallAsOneForEachPoint) {
     write_grid(folder, "b", {-79, 21, 14, 15, node});
   };
   write();
-  const Opened opened = open(folder, {"fine", "a", "b"});
+  const Opened<GeoidControl> opened = open(folder, {"fine", "a", "b"});
   ASSERT_EQ(opened.status, TW_SUCCESS);
   for (const auto call : {TWgeo90_f, TWgeo90_i}) {
     const auto run = [&](std::int32_t n, const CoordinateTriple* from, CoordinateTriple* to) {
@@ -530,7 +522,7 @@ TEST_F(Geoid, OneCallAsOneForEachPoint) {
 TEST_F(Geoid, GridsOfTooFewNodes) {
   write_grid(folder, "columns", {-100, 20, 11, 60, place});
   write_grid(folder, "rows", {-70, 20, 60, 11, place});
-  const Opened opened = open(folder, {"columns", "rows"});
+  const Opened<GeoidControl> opened = open(folder, {"columns", "rows"});
   EXPECT_EQ(opened.status, TW_SUCCESS);
   for (const auto& [x, y] : {std::pair{-95.5, 50.5}, {-40.5, 25.5}}) {
     const Loaded loaded(opened.control, x, y);
@@ -543,7 +535,7 @@ TEST_F(Geoid, WindowOutlivesTheBlock) {
   write_grid(folder, "g", {-100, 20, 60, 50, level(1)});
   const ScratchFolder other;
   write_grid(other, "g", {-100, 20, 60, 50, level(2)});
-  const Opened first = open(folder, {"g"}), second = open(other, {"g"});
+  const Opened<GeoidControl> first = open(folder, {"g"}), second = open(other, {"g"});
   EXPECT_EQ(Undulation(first.control, -70.5, 45.5).n, 1);
   EXPECT_EQ(Undulation(second.control, -70.5, 45.5).n, 1);
   EXPECT_EQ(Undulation(second.control, -50.5, 45.5).n, 2);
@@ -558,7 +550,7 @@ TEST_F(Geoid, IndexFallsBackToTheFirstGrid) {
   // the first: half a node off, they shift the cell, and with it nothing but the node taken.
   write_grid(folder, "first", {-200.5F, 20, 30, 50, level(0)});
   write_grid(folder, "second", {-100, 20, 60, 50, [](int, int c) { return c == 30 ? 1.F : 0; }});
-  const Opened opened = open(folder, {"first", "second"});
+  const Opened<GeoidControl> opened = open(folder, {"first", "second"});
   const double before = Undulation(opened.control, -70, 45.25).n;
   EXPECT_EQ(before, 1);
   EXPECT_EQ(Undulation(opened.control, -10, 45.25).status, TW_I_OUTSIDE_GEOID);
@@ -570,7 +562,7 @@ TEST_F(Geoid, IndexFallsBackToTheFirstGrid) {
 TEST_F(Geoid, UnusableLists) {
   write_grid(folder, "good", {-100, 20, 60, 50, place});
   const std::string good = "               good\n";
-  Opened opened;
+  Opened<GeoidControl> opened;
   std::strcpy(opened.control.directory, "before");
   opened.control.grid_count = 17;
   const auto expect = [&](const std::string& directory, TWstatus status) {
@@ -622,7 +614,7 @@ TEST_F(Geoid, ListOfFiftyOneGrids) {
   write_grid(folder, "g", {-100, 20, 60, 50, place});
   std::vector<std::string> names(50, "g");
   names.emplace_back("missing");
-  Opened opened = open(folder, names);
+  Opened<GeoidControl> opened = open(folder, names);
   EXPECT_EQ(opened.status, TW_SUCCESS);
   EXPECT_EQ(opened.control.grid_count, 50);
   // Lines that are skipped take no slot.
@@ -649,7 +641,7 @@ TEST_F(Geoid, LongLinesAreReadInPieces) {
 TEST_F(Geoid, FileGoneAtTheLoad) {
   write_grid(folder, "g", {-100, 20, 60, 50, level(1)});
   write_grid(folder, "gone", {-200, 20, 60, 50, level(2)});
-  const Opened opened = open(folder, {"g", "gone"});
+  const Opened<GeoidControl> opened = open(folder, {"g", "gone"});
   fs::remove(folder.path() / "gone.geo");
   const Loaded loaded(opened.control, -170.5, 45.5);
   EXPECT_EQ(loaded.status, TW_GEOID_READ_ERROR);
@@ -670,7 +662,7 @@ TEST_F(Geoid, FileGoneAtTheLoad) {
 
 TEST_F(Geoid, FileCutAtEachRecord) {
   write_grid(folder, "g", {-100, 20, 60, 50, place});
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   const fs::path path = folder.path() / "g.geo";
   const auto full = fs::file_size(path);
   ASSERT_EQ(full, 244U * 51);
@@ -709,7 +701,7 @@ TEST_F(Geoid, HeadersOfImpossibleSizes) {
     for (const float f : {-100.0F, c.dx, 20.0F, c.dy, 0.0F}) append_f32(bytes, f);
     bytes.resize(4000);
     folder.write("g.geo", bytes);
-    const Opened opened = open(folder, {"g"});
+    const Opened<GeoidControl> opened = open(folder, {"g"});
     EXPECT_EQ(opened.status, TW_SUCCESS);
     const Loaded loaded(opened.control, -95.5, 23.5);
     EXPECT_EQ(loaded.status, TW_GEOID_READ_ERROR);
@@ -731,7 +723,7 @@ TEST_F(Geoid, NoMemoryForTheRecords) {
   for (const float f : {-100.0F, 4e-6F, 20.0F, 1.0F, 0.0F}) append_f32(bytes, f);
   folder.write("g.geo", bytes);
   fs::resize_file(folder.path() / "g.geo", 4 * (std::uintmax_t{kColumns} + 1) * 31);
-  const Opened opened = open(folder, {"g"});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
   EXPECT_EQ(opened.status, TW_SUCCESS);
   const auto fails = [&] {
     const Loaded loaded(opened.control, -95.5, 35.5);
@@ -760,7 +752,7 @@ TEST_F(Geoid, DamagedHeadersDoNoHarm) {
     }
     folder.write("better.geo", damaged[0]);
     folder.write("wide.geo", damaged[1]);
-    const Opened opened = open(folder, {"better", "wide"});
+    const Opened<GeoidControl> opened = open(folder, {"better", "wide"});
     if (opened.status != TW_SUCCESS) continue;
     Points points = {at(-98.5, 23.5), at(-90.1, 34), at(-99.9, 20.1), at(-50, 25), at(-1e-6, 0)};
     TWstatus status = 0;
@@ -778,7 +770,7 @@ TEST_F(Geoid, DamagedHeadersDoNoHarm) {
 TEST_F(Geoid, BlockOfOtherBoundsDoesNoHarm) {
   // The window serves under any block; its grid's bounds may then be anything.
   write_grid(folder, "g", {-100, 20, 60, 50, level(1)});
-  Opened opened = open(folder, {"g"});
+  Opened<GeoidControl> opened = open(folder, {"g"});
   EXPECT_EQ(Undulation(opened.control, -70.5, 45.5).n, 1);
   for (const float bound : {1e30F, -1e30F, std::numeric_limits<float>::quiet_NaN(),
                             std::numeric_limits<float>::infinity()}) {

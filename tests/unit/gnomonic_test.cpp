@@ -28,10 +28,7 @@ struct Gnomonic {
     return status;
   }
   CoordinateTriple forward(const CoordinateTriple& in) const {
-    Points out = untouched(1);
-    EXPECT_EQ(forward(Points{in}, out), TW_SUCCESS);
-    EXPECT_EQ(out[0].z, kUntouched);
-    return out[0];
+    return one_point(in, [&](const Points& i, Points& o) { return forward(i, o); });
   }
   CoordinateTriple inverse(const CoordinateTriple& in) const {
     CoordinateTriple out = kUntouchedPoint;

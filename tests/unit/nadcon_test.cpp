@@ -32,20 +32,12 @@ void write_pair(const ScratchFolder& folder, const std::string& name, GridFile f
   folder.write(name + ".las", file.bytes());
 }
 
-struct Opened {
-  TWstatus status = 0;
-  NadconControl control = {};
-};
-
-Opened open(const ScratchFolder& folder) {
-  Opened opened;
-  TWnadcon_c(folder.directory().c_str(), &opened.control, &opened.status);
-  return opened;
+Opened<NadconControl> open(const ScratchFolder& folder) {
+  return opened_in<NadconControl, TWnadcon_c>(folder);
 }
 
-Opened open(const ScratchFolder& folder, const std::string& list) {
-  folder.write("area.par", list);
-  return open(folder);
+Opened<NadconControl> open(const ScratchFolder& folder, const std::string& list) {
+  return opened_in<NadconControl, TWnadcon_c>(folder, list);
 }
 
 // The window belongs to the process: each test begins with one where no test's grid lies.
@@ -54,7 +46,7 @@ class Nadcon : public ::testing::Test {
   Nadcon() {
     const ScratchFolder far_away;
     write_pair(far_away, "far", {-30, -80, 25, 4, flat});
-    const Opened far = open(far_away, "far\n");
+    const Opened<NadconControl> far = open(far_away, "far\n");
     CoordinateTriple p = at(-8.5, -78.5);
     TWstatus status = 0;
     TWnadcon_f(1, &p, &far.control, &p, &status);
@@ -113,7 +105,7 @@ struct Loaded {
 TEST_F(Nadcon, HeadersFillTheBlock) {
   write_pair(folder, "first", {-100, 20, 11, 6, place, 0.25F, 0.5F});
   write_pair(folder, "second", {-50, -20, 5, 7, place, 2, 3});
-  const Opened opened = open(folder, "first  a comment\n  second\tanother\n");
+  const Opened<NadconControl> opened = open(folder, "first  a comment\n  second\tanother\n");
   EXPECT_EQ(opened.status, TW_SUCCESS);
   const NadconControl& control = opened.control;
   EXPECT_EQ(control.directory, folder.directory());
@@ -197,7 +189,7 @@ TEST_F(Nadcon, RealGridsThereAndBack) {
 TEST_F(Nadcon, ShiftIsPositiveWestAndNorth) {
   // Three seconds everywhere in .los, minus three in .las.
   write_pair(folder, "g", {-100, 20, 30, 8, [](int, int) { return 3.0F; }});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const CoordinateTriple in = at(-96.5, 23.25, 8);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
@@ -208,7 +200,7 @@ TEST_F(Nadcon, ShiftIsPositiveWestAndNorth) {
 
 TEST_F(Nadcon, EveryCellOfTheWindowServes) {
   write_pair(folder, "g", {-100, 20, 30, 20, flat});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   // The first point loads columns 9 to 12, rows 9 to 12; the others lie in its corner cells.
   Points points = {at(-89.5, 30.5), at(-90.75, 29.25), at(-88.25, 31.75), at(-88.25, 29.25)};
   const Points in = points;
@@ -227,7 +219,7 @@ TEST_F(Nadcon, EveryCellOfTheWindowServes) {
 
 TEST_F(Nadcon, WindowStaysInsideTheGrid) {
   write_pair(folder, "g", {-100, 20, 30, 8, place});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const auto expect = [&](double x, double y, int row, int col) {
     SCOPED_TRACE(testing::Message() << x << " " << y);
     const Loaded loaded(opened.control, x, y);
@@ -247,7 +239,7 @@ TEST_F(Nadcon, WindowStaysInsideTheGrid) {
 TEST_F(Nadcon, FourNodesAreEnough) {
   write_pair(folder, "rows", {-100, 20, 30, 4, place});
   write_pair(folder, "columns", {-60, 20, 4, 30, place});
-  const Opened opened = open(folder, "rows\ncolumns\n");
+  const Opened<NadconControl> opened = open(folder, "rows\ncolumns\n");
   for (const double d : {0.5, 1.5, 2.5}) {
     const Loaded rows(opened.control, -90.5, 20 + d);
     rows.expect_bounds(-92, 20);
@@ -260,7 +252,7 @@ TEST_F(Nadcon, FourNodesAreEnough) {
 
 TEST_F(Nadcon, PointInTheFirstCell) {
   write_pair(folder, "g", {-100, 20, 30, 8, flat});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const CoordinateTriple in = at(-99.75, 20.5);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
@@ -271,7 +263,7 @@ TEST_F(Nadcon, PointInTheFirstCell) {
 
 TEST_F(Nadcon, EdgesAreOutside) {
   write_pair(folder, "g", {-100, 20, 30, 8, place});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const double west = -100, east = -71, south = 20, north = 27;
   for (const auto& [x, y] : {std::pair{west, 23.0}, {east, 23.0}, {-95.0, south}, {-95.0, north}}) {
     const Loaded loaded(opened.control, x, y);
@@ -289,9 +281,9 @@ TEST_F(Nadcon, EdgesAreOutside) {
 TEST_F(Nadcon, FirstGridOfTheListWins) {
   write_pair(folder, "coarse", {-100, 20, 30, 8, place});
   write_pair(folder, "fine", {-98, 22, 25, 5, flat});
-  const Opened coarse_first = open(folder, "coarse\nfine\n");
+  const Opened<NadconControl> coarse_first = open(folder, "coarse\nfine\n");
   EXPECT_EQ(Loaded(coarse_first.control, -95.5, 24.5).lon[0], 303);
-  const Opened fine_first = open(folder, "fine\ncoarse\n");
+  const Opened<NadconControl> fine_first = open(folder, "fine\ncoarse\n");
   EXPECT_EQ(Loaded(fine_first.control, -95.5, 24.5).lon[0], 1.25);
   // On the edge of the first the second takes over, and gives way by the two columns beyond it.
   EXPECT_EQ(Loaded(fine_first.control, -98, 24.5).window.xmin, -99 - 2);
@@ -353,7 +345,7 @@ TEST_F(NadconMoves, EqualMovesGoTheWayOfTheSort) {
 TEST_F(NadconMoves, WorseGridsDoNotCount) {
   write_pair(folder, "wide", {-100, 0, 41, 41, place});
   write_pair(folder, "worse", {-80, 10, 11, 21, flat});
-  const Opened opened = open(folder, "wide\nworse\n");
+  const Opened<NadconControl> opened = open(folder, "wide\nworse\n");
   Loaded(opened.control, -80.5, 20.5).expect_bounds(-82, 19);
 }
 
@@ -415,7 +407,7 @@ TEST_F(NadconMoves, OffThePointByLessThanACellExtends) {
   // whose columns end between the two takes the window a column away from the point.
   write_pair(folder, "wide", {-100, 0, 41, 41, flat});
   write_pair(folder, "better", {-120, 20, 22, 11, flat});  // up to -99
-  const Opened opened = open(folder, "better\nwide\n");
+  const Opened<NadconControl> opened = open(folder, "better\nwide\n");
   const CoordinateTriple in = at(-99.75, 19.25);
   const CoordinateTriple near_edge = at(-100 + 1e-9, 19.25);
   // Judged from -98.75 and -99 + 1e-9, both beyond the better grid.
@@ -435,7 +427,7 @@ TEST_F(NadconMoves, OffThePointByMoreIsAnError) {
   // past the point.
   write_pair(folder, "wide", {-100, 0, 30, 41, flat});
   write_pair(folder, "better", {-73, 20.5F, 30, 11, flat});
-  const Opened opened = open(folder, "better\nwide\n");
+  const Opened<NadconControl> opened = open(folder, "better\nwide\n");
   Loaded(opened.control, -72, 19.25).expect_bounds(-76, 18);
   const CoordinateTriple in = at(-72, 19.25);
   CoordinateTriple out = kUntouchedPoint;
@@ -465,7 +457,7 @@ TEST_F(Nadcon, MarkerTakesTheMeanOfTheOthers) {
     // each its own longitudes, so that the last one's window does not serve
     const auto xmin = static_cast<float>(-170 + 20 * hole);
     write_pair(folder, "g", {xmin, 20, 30, 8, cell(hole)});
-    const Opened opened = open(folder, "g\n");
+    const Opened<NadconControl> opened = open(folder, "g\n");
     const CoordinateTriple in = at(static_cast<double>(xmin) + 3.25, 23.5);
     CoordinateTriple out = kUntouchedPoint;
     TWstatus status = 0;
@@ -478,7 +470,7 @@ TEST_F(Nadcon, MarkerTakesTheMeanOfTheOthers) {
 TEST_F(Nadcon, OneEightyIsNoMarker) {
   write_pair(folder, "g",
              {-100, 20, 30, 4, [](int r, int c) { return r == 1 && c == 1 ? 180.F : 0; }});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const CoordinateTriple in = at(-98.5, 21.5);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
@@ -494,7 +486,7 @@ TEST_F(Nadcon, SeveralMarkersAreRepairedInTurn) {
     return r == 3 ? 2.0F : 8.0F;
   };
   write_pair(folder, "g", {-100, 20, 30, 8, field});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const CoordinateTriple in = at(-96.75, 23.5);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
@@ -509,7 +501,7 @@ TEST_F(Nadcon, SeveralMarkersAreRepairedInTurn) {
 
 TEST_F(Nadcon, OutsidePointsAreCopied) {
   write_pair(folder, "g", {-100, 20, 30, 8, flat});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const Points in = {at(-95.5, 23.5, 1), at(-60 + 360, 23.5, 2), at(-96.5, 23.5, 3)};
   Points out = untouched(3);
   TWstatus status = 0;
@@ -531,7 +523,7 @@ TEST_F(Nadcon, OutsidePointsAreCopied) {
 
 TEST_F(Nadcon, OutsideLongitudeOfHalfATurn) {
   write_pair(folder, "g", {-100, 20, 30, 8, flat});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   Points points = {{kPi, 0, 0}, {-kPi, 0, 0}, {3 * kPi + 1e-9, 0, 0}};
   TWstatus status = 0;
   TWnadcon_f(3, points.data(), &opened.control, points.data(), &status);
@@ -543,7 +535,7 @@ TEST_F(Nadcon, OutsideLongitudeOfHalfATurn) {
 TEST_F(Nadcon, LongitudesFromAllTurns) {
   write_pair(folder, "g", {-165, 20, 30, 8, [](int, int) { return 3.6F; }});
   write_pair(folder, "west", {-205, 20, 30, 8, [](int, int) { return 3.6F; }});
-  const Opened opened = open(folder, "g\nwest\n");
+  const Opened<NadconControl> opened = open(folder, "g\nwest\n");
   const double shift = 3.6F / 3600.0;
   for (const double turns : {0.0, 360.0, -360.0, 720.0, -1080.0}) {
     CoordinateTriple p = at(-160.5 + turns, 23.5);
@@ -560,7 +552,7 @@ TEST_F(Nadcon, LongitudesFromAllTurns) {
 
 TEST_F(Nadcon, LongitudesWithoutEnd) {
   write_pair(folder, "g", {-100, 20, 30, 8, flat});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   Points points = {{kInfinity, 0.4, 1}, {-kInfinity, 0.4, 1}, {1e300, 0.4, 1}, {kNaN, 0.4, 1},
                    {-1.6, kNaN, 1},     {-1.6, kInfinity, 1}, {1e9, 0.1, 1}};
   TWstatus status = 0;
@@ -579,8 +571,8 @@ TEST_F(Nadcon, WindowOutlivesTheBlock) {
   write_pair(folder, "g", {-100, 20, 30, 8, [](int, int) { return 1.0F; }});
   const ScratchFolder other;
   write_pair(other, "g", {-100, 20, 30, 8, [](int, int) { return 2.0F; }});
-  const Opened first = open(folder, "g\n");
-  const Opened second = open(other, "g\n");
+  const Opened<NadconControl> first = open(folder, "g\n");
+  const Opened<NadconControl> second = open(other, "g\n");
   const CoordinateTriple in = at(-95.5, 23.5);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
@@ -623,7 +615,7 @@ TEST_F(Nadcon, InverseStopsWhenOneComponentIsNear) {
                                  [](int, int c) { return 10.0F + 18.0F * static_cast<float>(c); }}
                             .bytes());
   folder.write("g.las", GridFile{-100, 20, 30, 8, [](int, int) { return 18.0F; }}.bytes());
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   const CoordinateTriple target = at(-95.5, 23.5, 9);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
@@ -649,7 +641,7 @@ TEST_F(Nadcon, InverseTakesFourPassesAtMost) {
   folder.write("g.las", GridFile{-100, 20, 30, 8,
                                  [](int r, int) { return 9.0F + 18.0F * static_cast<float>(r); }}
                             .bytes());
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   CoordinateTriple p = at(-95.5, 23.5);
   TWstatus status = 0;
   TWnadcon_i(1, &p, &opened.control, &p, &status);
@@ -665,7 +657,7 @@ TEST_F(Nadcon, InverseTakesFourPassesAtMost) {
 
 TEST_F(Nadcon, InverseLongitudeComesBackInRange) {
   write_pair(folder, "g", {-205, 20, 30, 8, flat});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   for (const double lon : {160.0, -200.0, 520.0}) {
     CoordinateTriple p = at(lon, 23.5);
     TWstatus status = 0;
@@ -677,7 +669,7 @@ TEST_F(Nadcon, InverseLongitudeComesBackInRange) {
 }
 
 TEST_F(Nadcon, MissingListLeavesTheBlock) {
-  Opened opened;
+  Opened<NadconControl> opened;
   std::strcpy(opened.control.directory, "before");
   opened.control.grid_count = 17;
   const auto expect_untouched_block = [&](const std::string& directory) {
@@ -703,7 +695,7 @@ TEST_F(Nadcon, LongestDirectory) {
   folder.write("area.par", "g\n");
   std::string directory = folder.directory();
   directory.insert(0, 259 - directory.size(), '/');  // slashes in front change nothing
-  Opened opened;
+  Opened<NadconControl> opened;
   TWnadcon_c(directory.c_str(), &opened.control, &opened.status);
   EXPECT_EQ(opened.status, TW_SUCCESS);
   EXPECT_EQ(opened.control.directory, directory);
@@ -714,7 +706,7 @@ TEST_F(Nadcon, LongestDirectory) {
 }
 
 TEST_F(Nadcon, ListOfNoLines) {
-  Opened opened;
+  Opened<NadconControl> opened;
   opened.control.grid_count = 17;
   folder.write("area.par", "");
   TWnadcon_c(folder.directory().c_str(), &opened.control, &opened.status);
@@ -728,7 +720,7 @@ TEST_F(Nadcon, ListOfFiftyOneLines) {
     write_pair(folder, "g" + std::to_string(i), {-100, 20, 30, 8, flat});
     list += "g" + std::to_string(i) + "\n";
   }
-  const Opened opened = open(folder, list + "missing\n");
+  const Opened<NadconControl> opened = open(folder, list + "missing\n");
   EXPECT_EQ(opened.status, TW_SUCCESS);
   EXPECT_EQ(opened.control.grid_count, 50);
   EXPECT_STREQ(opened.control.grids[49].name, "g49");
@@ -737,7 +729,7 @@ TEST_F(Nadcon, ListOfFiftyOneLines) {
 TEST_F(Nadcon, LinesWithoutANameRepeatTheOneAbove) {
   write_pair(folder, "a", {-100, 20, 30, 8, flat});
   write_pair(folder, "b", {-90, 20, 10, 8, flat});
-  const Opened opened = open(folder, "a\n\n \t\nb");  // and no newline at the end
+  const Opened<NadconControl> opened = open(folder, "a\n\n \t\nb");  // and no newline at the end
   EXPECT_EQ(opened.status, TW_SUCCESS);
   ASSERT_EQ(opened.control.grid_count, 4);
   EXPECT_STREQ(opened.control.grids[1].name, "a");
@@ -751,7 +743,7 @@ TEST_F(Nadcon, LongLinesAreReadInPieces) {
   write_pair(folder, "b", {-90, 20, 10, 8, flat});
   // 259 characters with the newline are one line; of more, the rest is a line of its own.
   EXPECT_EQ(open(folder, "a" + std::string(257, ' ') + "\nb\n").control.grid_count, 2);
-  const Opened opened = open(folder, "a" + std::string(258, ' ') + "b\n");
+  const Opened<NadconControl> opened = open(folder, "a" + std::string(258, ' ') + "b\n");
   EXPECT_EQ(opened.status, TW_SUCCESS);
   ASSERT_EQ(opened.control.grid_count, 2);
   EXPECT_STREQ(opened.control.grids[1].name, "b");
@@ -763,7 +755,7 @@ TEST_F(Nadcon, UnusableHeaders) {
   folder.write("area.par", "good\nbad\n");
   const auto expect_error = [&](const char* what) {
     SCOPED_TRACE(what);
-    Opened opened;
+    Opened<NadconControl> opened;
     opened.control.grid_count = 17;
     TWnadcon_c(folder.directory().c_str(), &opened.control, &opened.status);
     EXPECT_EQ(opened.status, TW_GRID_FILE_ERROR);
@@ -810,7 +802,7 @@ TEST_F(Nadcon, FilesGoneAtTheLoad) {
   for (const char* extension : {".los", ".las"}) {
     write_pair(folder, "g", {-100, 20, 30, 8, flat});
     write_pair(folder, "gone", {-60, 20, 30, 8, flat});
-    const Opened opened = open(folder, "g\ngone\n");
+    const Opened<NadconControl> opened = open(folder, "g\ngone\n");
     fs::remove(folder.path() / ("gone" + std::string(extension)));
     const Loaded loaded(opened.control, -55.5, 23.5);
     EXPECT_EQ(loaded.status, TW_GRID_FILE_ERROR);
@@ -845,7 +837,7 @@ TEST_F(Nadcon, FilesGoneAtTheLoad) {
 TEST_F(Nadcon, InverseAfterAFailure) {
   write_pair(folder, "g", {-100, 20, 30, 8, flat});
   write_pair(folder, "gone", {-60, 20, 30, 8, flat});
-  const Opened opened = open(folder, "g\ngone\n");
+  const Opened<NadconControl> opened = open(folder, "g\ngone\n");
   fs::remove(folder.path() / "gone.los");
   const Points in = {at(-55.5, 23.5), at(-95.5, 23.5), at(-55.5, 23.5)};
   Points out = untouched(3);
@@ -868,7 +860,7 @@ TEST_F(Nadcon, FilesCutAtEachRecord) {
   const GridFile file = {-100, 20, 30, 8, place};  // records of 124 bytes
   for (const char* extension : {".los", ".las"}) {
     write_pair(folder, "g", file);
-    const Opened opened = open(folder, "g\n");
+    const Opened<NadconControl> opened = open(folder, "g\n");
     const fs::path path = folder.path() / ("g" + std::string(extension));
     const auto full = fs::file_size(path);
     ASSERT_EQ(full, 124U * 9);
@@ -892,7 +884,7 @@ TEST_F(Nadcon, FilesCutAtEachRecord) {
 TEST_F(Nadcon, LaterCallsUseWhatAShortReadLeft) {
   // The first window is good; the second cannot read .los, so its table of longitudes is the old.
   write_pair(folder, "g", {-100, 20, 30, 8, [](int r, int) { return r < 4 ? 1.0F : 2.0F; }});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   CoordinateTriple p = at(-85.5, 21.5);
   TWstatus status = 0;
   TWnadcon_f(1, &p, &opened.control, &p, &status);  // rows 0 to 3
@@ -919,7 +911,7 @@ TEST_F(Nadcon, OneCallAsOneForEachPoint) {
     write_pair(folder, "b", {-79, 21, 9, 12, node});
   };
   write();
-  const Opened opened = open(folder, "fine\na\nb\n");
+  const Opened<NadconControl> opened = open(folder, "fine\na\nb\n");
   ASSERT_EQ(opened.status, TW_SUCCESS);
   for (const auto call : {TWnadcon_f, TWnadcon_i}) {
     const auto run = [&](std::int32_t n, const CoordinateTriple* from, CoordinateTriple* to) {
@@ -943,7 +935,7 @@ TEST_F(Nadcon, ShortFilesInMemory) {
   // The rows that a file lacks are told also where the rest has been read whole.
   const auto node = [](int r, int c) { return static_cast<float>(r * r % 13 + c * c % 7) / 8; };
   write_pair(folder, "g", {-100, 20, 30, 30, node});
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   fs::resize_file(folder.path() / "g.las", 31 * 4 * 21);  // rows 0 to 19
   const auto run = [&](std::int32_t n, const CoordinateTriple* from, CoordinateTriple* to) {
     TWstatus status = 0;
@@ -976,7 +968,7 @@ TEST_F(Nadcon, ShortFilesInMemory) {
 TEST_F(Nadcon, GridsOfTooFewNodes) {
   for (const auto& [nc, nr] : {std::pair{3, 8}, {8, 3}, {1, 1}}) {
     write_pair(folder, "g", {-100, 20, 30, 8, flat});
-    Opened opened = open(folder, "g\n");
+    Opened<NadconControl> opened = open(folder, "g\n");
     opened.control.grids[0].nc = nc;  // bounds as before: the point is inside
     opened.control.grids[0].nr = nr;
     const Loaded loaded(opened.control, -95.5, 23.5);
@@ -1012,7 +1004,7 @@ TEST_F(Nadcon, HeadersOfImpossibleSizes) {
     bytes.resize(4000);
     folder.write("g.los", bytes);
     folder.write("g.las", bytes);
-    const Opened opened = open(folder, "g\n");
+    const Opened<NadconControl> opened = open(folder, "g\n");
     EXPECT_EQ(opened.status, TW_SUCCESS);
     const Loaded loaded(opened.control, -95.5, 23.5);
     EXPECT_EQ(loaded.status, TW_GRID_FILE_ERROR);
@@ -1021,14 +1013,14 @@ TEST_F(Nadcon, HeadersOfImpossibleSizes) {
   }
   for (const float spacing : {0.0F, -1.0F, nan}) {
     write_pair(folder, "g", {-100, 20, 30, 8, flat, spacing, 1});
-    const Opened opened = open(folder, "g\n");
+    const Opened<NadconControl> opened = open(folder, "g\n");
     if (opened.status != TW_SUCCESS) continue;  // not-a-numbers end it there
     EXPECT_EQ(Loaded(opened.control, -95.5, 23.5).status, TW_I_OUTSIDE_NADCON);
   }
 }
 
 TEST_F(Nadcon, CountThatNoBlockCanHold) {
-  Opened opened;
+  Opened<NadconControl> opened;
   opened.control.grid_count = 2147483647;  // no grid of the block holds the point
   EXPECT_EQ(Loaded(opened.control, -95.5, 23.5).status, TW_I_OUTSIDE_NADCON);
   opened.control.grid_count = -3;
@@ -1046,7 +1038,7 @@ TEST_F(Nadcon, NoMemoryForTheRecords) {
     folder.write(name, bytes);
     fs::resize_file(folder.path() / name, 4 * (std::uintmax_t{kColumns} + 1) * 7);
   }
-  const Opened opened = open(folder, "g\n");
+  const Opened<NadconControl> opened = open(folder, "g\n");
   EXPECT_EQ(opened.status, TW_SUCCESS);
   const auto fails = [&] {
     const Loaded loaded(opened.control, -95.5, 22.5);
@@ -1079,7 +1071,7 @@ TEST_F(Nadcon, DamagedHeadersDoNoHarm) {
       folder.write("better" + std::string(extension), damaged[0]);
       folder.write("wide" + std::string(extension), damaged[1]);
     }
-    const Opened opened = open(folder, "better\nwide\n");
+    const Opened<NadconControl> opened = open(folder, "better\nwide\n");
     if (opened.status != TW_SUCCESS) continue;
     Points points = {at(-97.5, 23.5), at(-95.1, 24), at(-99.9, 20.1), at(-80, 25), at(-1e-6, 0)};
     TWstatus status = 0;

@@ -3,6 +3,7 @@
 #include <random>
 
 #include "support/geographiclib_peer.hpp"
+#include "support/lines.hpp"
 #include "support/points.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/lines.h"
@@ -11,32 +12,10 @@ using namespace tidewater::test;
 
 namespace {
 
-struct Direct {
-  CoordinateTriple end = kUntouchedPoint;
-  double back = kUntouched;
-  TWstatus status = 0;
-};
+constexpr auto direct = line_end<TWrhmbline_dir>;
+constexpr auto inverse = line_between<TWrhmbline_inv>;
 
-Direct direct(CoordinateTriple start, double azimuth, double distance, Ellipsoid ellipsoid) {
-  Direct r;
-  TWrhmbline_dir(start, azimuth, distance, ellipsoid.a, ellipsoid.e, &r.end, &r.back, &r.status);
-  return r;
-}
-
-struct Inverse {
-  double azimuth = kUntouched;
-  double back = kUntouched;
-  double distance = kUntouched;
-  TWstatus status = 0;
-};
-
-Inverse inverse(CoordinateTriple start, CoordinateTriple end, Ellipsoid ellipsoid) {
-  Inverse r;
-  TWrhmbline_inv(start, end, ellipsoid.a, ellipsoid.e, &r.azimuth, &r.back, &r.distance, &r.status);
-  return r;
-}
-
-const double kThreeQuarters = 4.71238898038469;
+const double kThreeQuarters = 3 * kPi / 2;
 
 double parallel(Ellipsoid ellipsoid, double lat) {
   double radius = kUntouched;

@@ -5,6 +5,7 @@
 #include "support/numeric_scale.hpp"
 #include "support/points.hpp"
 #include "support/proj_peer.hpp"
+#include "support/projection_checks.hpp"
 #include "tidewater/foundation.h"
 #include "tidewater/special.h"
 
@@ -118,21 +119,7 @@ TEST(Sinusoidal, PolesTakeTheCentralLongitude) {
 }
 
 TEST(Sinusoidal, ArcFailureStops) {
-  const Sinusoidal p(0.08, 0, 0);
-  const Points in = {{0.1, 0.2, 0}, {0.1, kPi / 2 + 5e-13, 0}, {0.1, 2, 0}, {0.1, 0.2, 0}};
-  Points out = untouched(4);
-  EXPECT_EQ(p.forward(in, out), TW_BAD_LATITUDE);
-  EXPECT_NE(out[1].x, kUntouched);  // held, with a word that the failure replaces
-  expect_untouched(out[2]);
-  expect_untouched(out[3]);
-  const Points held = {{0.1, kPi / 2 + 5e-13, 0}, {0.1, 0.2, 0}};
-  EXPECT_EQ(p.forward(held, out), TW_I_LATITUDE_LIMITED);  // and stays
-  const Points plane = {{0.1, 0.2, 0}, {0.1, 1.7, 0}, {0.1, 0.2, 0}};
-  out = untouched(3);
-  EXPECT_EQ(p.inverse(plane, out), TW_BAD_LATITUDE);
-  EXPECT_NE(out[0].x, kUntouched);
-  expect_untouched(out[1]);
-  expect_untouched(out[2]);
+  expect_arc_failure_stops(Sinusoidal(0.08, 0, 0), {0.1, 1.7, 0});
 }
 
 TEST(Sinusoidal, RoundTrip) {

@@ -34,16 +34,10 @@ struct Stereographic {
     return status;
   }
   CoordinateTriple forward(const CoordinateTriple& in) const {
-    Points out = untouched(1);
-    EXPECT_EQ(forward(Points{in}, out), TW_SUCCESS);
-    EXPECT_EQ(out[0].z, kUntouched);
-    return out[0];
+    return one_point(in, [&](const Points& i, Points& o) { return forward(i, o); });
   }
   CoordinateTriple inverse(const CoordinateTriple& in) const {
-    Points out = untouched(1);
-    EXPECT_EQ(inverse(Points{in}, out), TW_SUCCESS);
-    EXPECT_EQ(out[0].z, kUntouched);
-    return out[0];
+    return one_point(in, [&](const Points& i, Points& o) { return inverse(i, o); });
   }
   double scale(double k0, const Points& in, Points& out, TWstatus& status) const {
     return TWstereo_s(e, k0, lon0, lat0, C, m0, chi0, static_cast<int32_t>(in.size()), in.data(),

@@ -8,6 +8,7 @@ import test from "node:test";
 import proj4 from "proj4";
 import { load } from "../../build/web/package/tidewater.js";
 import { LAMBERT, nativeFigures } from "./native.mjs";
+import { PEERS } from "./peers.mjs";
 
 const folder = fileURLToPath(new URL("../../build/web/package/", import.meta.url));
 const tw = await load();
@@ -50,17 +51,11 @@ test("a published example", () => {
 });
 
 test("systems agree with proj4's formulas", () => {
-  const definitions = {
-    "EPSG:32631": "+proj=utm +zone=31 +datum=WGS84 +units=m",
-    "EPSG:3857": "+proj=merc +a=6378137 +b=6378137 +lat_ts=0 +lon_0=0 +x_0=0 +y_0=0 +k=1 +units=m",
-    "EPSG:2154": "+proj=lcc +lat_0=46.5 +lon_0=3 +lat_1=49 +lat_2=44 +x_0=700000 +y_0=6600000 +ellps=GRS80 +towgs84=0,0,0 +units=m",
-    "EPSG:3035": "+proj=laea +lat_0=52 +lon_0=10 +x_0=4321000 +y_0=3210000 +ellps=GRS80 +towgs84=0,0,0 +units=m",
-  };
-  for (const [code, definition] of Object.entries(definitions)) {
+  for (const [code, definition] of Object.entries(PEERS)) {
     const peer = proj4("WGS84", definition);
     const ours = tw.transformation("EPSG:4326", code);
     for (let i = 0; i < 50; ++i) {
-      const [lon, lat] = [-4 + 0.2 * i, 42 + 0.17 * i];
+      const [lon, lat] = [(code === "EPSG:5070" ? -120 : -4) + 0.2 * i, 42 + 0.17 * i];
       const [x, y] = ours.forward(lon, lat);
       const [px, py] = peer.forward([lon, lat]);
       near(x, px, 0.001, code);
