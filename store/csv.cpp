@@ -60,7 +60,7 @@ class Reader {
     }
     if (at_ >= text_.size()) throw SourceError(path_, start, "a quote is not closed");
     ++at_;
-    if (!ends_cell()) throw SourceError(path_, line_, "text behind a closing quote");
+    if (!ends_cell()) throw SourceError(path_, line_, "text after a closing quote");
     return out;
   }
 

@@ -5,6 +5,7 @@
 #include <cmath>
 #include <cstddef>
 #include <limits>
+#include <numbers>
 #include <thread>
 #include <utility>
 #include <vector>
@@ -39,7 +40,7 @@ struct Block {
 // Brings an angle that is a few turns off into half a turn either way; what lies there stays as it
 // is.
 inline double within_half_turn(double angle) {
-  constexpr double kTurn = 6.283185307179586477;
+  constexpr double kTurn = 2 * std::numbers::pi;
   constexpr double kRound = 6755399441055744.0;  // 1.5 2^52: what is added to it is rounded
   const double turns = (angle * (1 / kTurn) + kRound) - kRound;
   return angle - turns * kTurn;

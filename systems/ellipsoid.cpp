@@ -2,6 +2,7 @@
 
 #include <cmath>
 #include <cstdlib>
+#include <numbers>
 #include <optional>
 #include <span>
 
@@ -105,7 +106,7 @@ PrimeMeridian::PrimeMeridian(std::string_view name) {
       name, {}, [&](auto key) { return registry.meridian(key); }, "prime meridian");
   name_ = record.name;
   code_ = record.code;
-  longitude_ = record.longitude * (180 / 3.14159265358979323846);
+  longitude_ = record.longitude * (180 / std::numbers::pi);
 }
 
 Unit::Unit(std::string_view name) {

@@ -450,7 +450,7 @@ GridContent read_grid(const std::string& name, const std::vector<std::string>& f
   plant(&content);
   return content;
 } catch (const std::length_error&) {
-  throw Error("The grid file " + name + " tells of more nodes than memory holds.");
+  throw Error("The grid file " + name + " claims more nodes than memory holds.");
 } catch (const std::bad_alloc&) {
   throw Error("There is not enough memory for the grid file " + name + ".");
 }

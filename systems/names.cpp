@@ -43,7 +43,7 @@ Definition geographic_named(std::string_view name) {
   }
   if (base.kind != SystemKind::geographic2d && base.kind != SystemKind::geographic3d &&
       base.kind != SystemKind::geocentric) {
-    throw Error(quoted(name) + " is no geographic system.");
+    throw Error(quoted(name) + " is not a geographic system.");
   }
   return base;
 }
@@ -73,7 +73,7 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
     const char letter = behind.empty() ? ' ' : behind[0];
     south = letter == 'S' || letter == 's';
     if (!south && letter != 'N' && letter != 'n') {
-      throw Error(quoted(text) + " must say N or S behind the zone, as in \"utm:30N\".");
+      throw Error(quoted(text) + " must say N or S after the zone, as in \"utm:30N\".");
     }
     behind.remove_prefix(1);
     if (zone < 1 || zone > 60) {
@@ -134,7 +134,9 @@ Definition military_grid(std::string_view rest, const std::optional<Where>& wher
                   "reference, \"mgrs:31UDQ\".");
     }
     const int zone = utm_zone(where->longitude, where->latitude);
-    if (zone < 0) throw Error("The point that tells the zone of " + quoted(text) + " is none.");
+    if (zone < 0)
+      throw Error("The point that should tell the zone of " + quoted(text) +
+                  " is not on the earth.");
     return zone_of(zone, where->latitude >= 0);
   }
   // A zone alone, "31U" or "Z", or a whole reference.

@@ -14,7 +14,7 @@ constexpr int32_t kMostRows = 1000000;
 
 StoreReader::StoreReader(const std::string& path) : path_(path) {
   if (OLB7R3_PF_open(path.c_str()) != TW_STORE_SUCCESS) {
-    throw Error("\"" + path + "\" is no parameter store that can be read.");
+    throw Error("\"" + path + "\" is not a parameter store, or cannot be read.");
   }
 }
 

@@ -1,6 +1,7 @@
 // What the readers and writers of PROJ strings and WKT share.
 #pragma once
 
+#include <numbers>
 #include <string>
 #include <string_view>
 
@@ -9,8 +10,8 @@
 
 namespace tidewater::detail {
 
-inline constexpr double kDegreeInRadians = 3.14159265358979323846 / 180;
-inline constexpr double kGradInRadians = 3.14159265358979323846 / 200;
+inline constexpr double kDegreeInRadians = std::numbers::pi / 180;
+inline constexpr double kGradInRadians = std::numbers::pi / 200;
 
 // Small letters and digits alone: "Bonne_(South_Orientated)" and "Bonne South Orientated" are one.
 std::string bare(std::string_view name);

@@ -261,7 +261,7 @@ class TransformationImpl {
                            const TransformationOptions& options) {
     for (const Definition* end : {&one, &other}) {
       if (end->kind == SystemKind::vertical) {
-        throw Error("A height alone is no position: give " + end->name +
+        throw Error("A height alone is not a position: give " + end->name +
                     " together with a horizontal system, as in \"EPSG:2154+5720\".");
       }
     }

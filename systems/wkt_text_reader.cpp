@@ -597,7 +597,7 @@ Definition definition_from_wkt(std::string_view text) {
   if (objects.size() == 1) return definition;
   // A .prj file may have the vertical system behind the horizontal one.
   if (objects.size() > 2 || !is_vertical(objects[1])) {
-    throw Error("The WKT has a " + objects[1].value.substr(0, 60) + " behind its system" +
+    throw Error("The WKT has a " + objects[1].value.substr(0, 60) + " after its system" +
                 place(objects[1]) + ".");
   }
   definition.horizontal_code = definition.code;

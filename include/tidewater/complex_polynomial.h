@@ -10,8 +10,8 @@
  * - Derivative of a complex polynomial, the unit square: 1.1e-16 (1.0e-16);
  * - Conformal polynomial, the unit square: forward 2.1e-16 (1.6e-16), inverse 3.3e-16 (2.2e-16).
  *
- * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), complex polynomial, methods 9652 and 9653;
- * Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), eq. 26-1.
+ * Source: IOGP Publication 373-7-2 (Guidance Note 7-2, 2022), complex polynomial, methods 9652 and
+ * 9653; Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), eq. 26-1.
  */
 #ifndef TIDEWATER_COMPLEX_POLYNOMIAL_H
 #define TIDEWATER_COMPLEX_POLYNOMIAL_H

@@ -14,7 +14,7 @@
  *   3.2 nm (2.9 nm);
  * - Gauss-Schreiber, lon within 6, lat 20 to 70: forward 12 um (6.2 um), scale 6.4e-11 (3.2e-11).
  *
- * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), oblique stereographic.
+ * Source: IOGP Publication 373-7-2 (Guidance Note 7-2, 2022), oblique stereographic.
  *
  * What all projections have in common (units, scale, and what skip, stop and fill mean) is told in
  * frame.h.

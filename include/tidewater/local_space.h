@@ -14,8 +14,8 @@
  * - East, north, up, within 1,500 km: forward 3.0 nm (2.1 nm), inverse 1.5 um (1.5 um);
  * - Local space rectangular, within 1,500 km: forward 3.0 nm (2.1 nm), inverse 1.5 um (1.5 um).
  *
- * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), geocentric to topocentric, methods 9836 and
- * 9837.
+ * Source: IOGP Publication 373-7-2 (Guidance Note 7-2, 2022), geocentric to topocentric, methods
+ * 9836 and 9837.
  */
 #ifndef TIDEWATER_LOCAL_SPACE_H
 #define TIDEWATER_LOCAL_SPACE_H

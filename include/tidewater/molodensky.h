@@ -3,8 +3,7 @@
  * Molodensky's datum shift.
  *
  * Points are longitude, latitude (radians) and ellipsoidal height.  A latitude beyond 89 degrees
- * (1.5533430342749535, itself excluded) goes by geocentric coordinates.  Nothing is wrapped or
- * refused.
+ * (itself excluded) goes by geocentric coordinates.  Nothing is wrapped or refused.
  *
  * The formula is of the first order: against the shift of geocentric coordinates itself its error
  * grows with the square of the shift and with the tangent of the latitude.  Where the shift carries
@@ -18,7 +17,7 @@
  *   (314 mm).
  *
  * Source: Defense Mapping Agency Technical Report 8350.2, Department of Defense World Geodetic
- * System 1984 (1991), section 7; IOGP Publication 373-7-2 (Guidance Note 7-2), method 9604.
+ * System 1984 (1991), section 7; IOGP Publication 373-7-2 (Guidance Note 7-2, 2022), method 9604.
  */
 #ifndef TIDEWATER_MOLODENSKY_H
 #define TIDEWATER_MOLODENSKY_H

@@ -11,8 +11,8 @@
  * - Oblique Lambert, lon within 12, lat 35 to 55: forward 3.1 nm (1.7 nm), inverse 2.8 nm
  *   (2.1 nm), scale 6.3e-05 (6.0e-05).
  *
- * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), Krovak, method 9819; the stages are those
- * of gauss_sphere.h, rotated_graticule.h and lambert_conformal.h.
+ * Source: IOGP Publication 373-7-2 (Guidance Note 7-2, 2022), Krovak, method 9819; the stages are
+ * those of gauss_sphere.h, rotated_graticule.h and lambert_conformal.h.
  *
  * What all projections have in common (units, scale, and what skip, stop and fill mean) is told in
  * frame.h.

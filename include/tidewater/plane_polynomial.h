@@ -12,7 +12,8 @@
  * - Polynomial of any degree, the unit square: forward 3.2e-16 (1.8e-16), inverse 3.3e-16
  *   (1.7e-16).
  *
- * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), general polynomial, methods 9645 to 9648.
+ * Source: IOGP Publication 373-7-2 (Guidance Note 7-2, 2022), general polynomial, methods 9645 to
+ * 9648.
  */
 #ifndef TIDEWATER_PLANE_POLYNOMIAL_H
 #define TIDEWATER_PLANE_POLYNOMIAL_H

@@ -29,7 +29,7 @@ extern "C" {
 /**
  * The end of a line from its start, azimuth and length.
  *
- * Exactly along a parallel (azimuth pi/2, or 4.71238898038469) a positive distance goes EAST for
+ * Exactly along a parallel (azimuth pi/2 or 3 pi/2) a positive distance goes EAST for
  * either azimuth.  The longitude is not wrapped.
  * @param start         start point
  * @param azimuth       azimuth, radians

@@ -11,7 +11,7 @@
  * - Molodensky-Badekas, the earth: forward 2.7 nm (1.8 nm), inverse 17 mm (14 mm);
  * - Three shifts, the earth: forward < 1 nm (< 1 nm), inverse < 1 nm (< 1 nm).
  *
- * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), coordinate frame rotation and
+ * Source: IOGP Publication 373-7-2 (Guidance Note 7-2, 2022), coordinate frame rotation and
  * Molodensky-Badekas.
  */
 #ifndef TIDEWATER_SIMILARITY_H

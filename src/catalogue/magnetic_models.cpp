@@ -120,7 +120,7 @@ void TWmm_coef_info(const char* store, int32_t k, const int32_t* degrees, const 
     Row row;
     for (int32_t i = 0; i < k; ++i) {
       char table[kTableSlot];
-      copy_text(table_names + static_cast<std::size_t>(i) * kTableSlot, kTableSlot, table);
+      copy_field(table_names + static_cast<std::size_t>(i) * kTableSlot, kTableSlot, table);
       const TWstatus begun = begin_walk(table, nullptr);
       if (!TW_OK(begun)) return begun;
       for (int32_t n = 0; n <= degrees[i]; ++n) {

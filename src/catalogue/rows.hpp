@@ -21,7 +21,7 @@ inline constexpr std::size_t kNameSlot = 41;
 
 // Copies a text and its terminator, at most size bytes of both: a field without a terminator is
 // cut.
-inline void copy_text(const char* field, std::size_t size, char* out) {
+inline void copy_field(const char* field, std::size_t size, char* out) {
   const void* end = std::memchr(field, '\0', size - 1);
   const std::size_t length =
       end ? static_cast<std::size_t>(static_cast<const char*>(end) - field) : size - 1;
@@ -43,13 +43,13 @@ class Row {
   }
 
   void text(const TextField& field, char* out) const {
-    copy_text(bytes_.data() + field.offset, field.size, out);
+    copy_field(bytes_.data() + field.offset, field.size, out);
   }
 
   // The text in entry index of a name list; what is longer than an entry is cut.
   void list_name(const TextField& field, char* names, std::size_t index) const {
-    copy_text(bytes_.data() + field.offset, field.size < kNameSlot ? field.size : kNameSlot,
-              names + index * kNameSlot);
+    copy_field(bytes_.data() + field.offset, field.size < kNameSlot ? field.size : kNameSlot,
+               names + index * kNameSlot);
   }
 
  private:

@@ -10,7 +10,7 @@
 namespace tidewater::detail {
 
 // Beyond 89 degrees the formula is ill-conditioned, and a point goes by geocentric coordinates.
-inline constexpr double kGeocentricLimit = 1.5533430342749535;
+inline constexpr double kGeocentricLimit = 89 * kPi / 180;
 
 struct MolodenskyDatum {
   double a, e, e2, r;  // of the source; r is b / a

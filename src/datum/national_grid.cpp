@@ -18,8 +18,8 @@ using namespace tidewater::detail;
 
 namespace {
 
-constexpr double kArcSecondsPerRadian = 206264.80624709636;
-constexpr double kRadiansPerArcSecond = 4.84813681109536e-06;
+constexpr double kArcSecondsPerRadian = 180 * 3600 / kPi;
+constexpr double kRadiansPerArcSecond = kPi / 180 / 3600;
 constexpr double kEdge = 2e-7;  // arc-seconds within which a point lies on an edge
 
 constexpr int kListLine = 260;
@@ -53,20 +53,22 @@ struct Node {
   float lat_shift, lon_shift, lat_accuracy, lon_accuracy;  // arc-seconds
 };
 
-// The open grid, which belongs to the process.
-std::FILE* cnt_file = nullptr;
-Name cnt_to_system = {};
-Name cnt_from_system = {};
-int32_t cnt_num_file = 0;  // sub-grids in the table; fewer than the file has where one failed
-int32_t cnt_block_grid = kNone;
-int64_t cnt_block_col = 0;
-int64_t cnt_block_row = 0;
-Node cnt_block[kSide][kSide] = {};
-CntSubGrid* cnt_subgrids = nullptr;
-Child* cnt_children = nullptr;  // sorted by parent, those of one parent in the order of the file
-int32_t cnt_first_root = 0;     // range of those without a parent
-int32_t cnt_last_root = 0;
-TWstatus cnt_read_status = TW_SUCCESS;
+// The open grid and the block of nodes around the last point.  They belong to the process.
+struct {
+  std::FILE* file;
+  Name to_system;
+  Name from_system;
+  int32_t count;  // sub-grids in the table; fewer than the file has where one failed
+  int32_t block_grid = kNone;
+  int64_t block_col;
+  int64_t block_row;
+  Node block[kSide][kSide];
+  CntSubGrid* subgrids;
+  Child* children;     // sorted by parent, those of one parent in the order of the file
+  int32_t first_root;  // range of those without a parent
+  int32_t last_root;
+  TWstatus read_status = TW_SUCCESS;
+} held;
 
 // By contract: an earlier grid is neither closed nor freed when another is opened.  This list keeps
 // what it leaves behind in reach, so that a leak checker tells it from memory lost by mistake.
@@ -141,16 +143,16 @@ struct Found {
 Found best_child(int32_t first, int32_t last, int32_t except, double x, double y) {
   Found best;
   for (int32_t k = first; k < last && best.code != kInside; ++k) {
-    const int32_t i = cnt_children[k].grid;
+    const int32_t i = held.children[k].grid;
     if (i == except) continue;
-    const Code code = classify(cnt_subgrids[i], x, y);
+    const Code code = classify(held.subgrids[i], x, y);
     if (code < best.code) best = {i, code};
   }
   return best;
 }
 
 Found find_subgrid(double x, double y) {
-  Found found = best_child(cnt_first_root, cnt_last_root, kNone, x, y);
+  Found found = best_child(held.first_root, held.last_root, kNone, x, y);
   // Names in a damaged file may run in a circle.  The way down is told by the last found sub-grid
   // alone, so that one which is met again ends it: of all that were passed the one at the last
   // power of two is kept for the comparison.
@@ -161,7 +163,7 @@ Found find_subgrid(double x, double y) {
       passed = found.grid;
       next_kept *= 2;
     }
-    const CntSubGrid& g = cnt_subgrids[found.grid];
+    const CntSubGrid& g = held.subgrids[found.grid];
     const Found deeper = best_child(g.first_child, g.last_child, found.grid, x, y);
     if (deeper.grid == kNone) break;
     found = deeper;
@@ -202,7 +204,7 @@ struct Call {
     if (!nodes) return;
     for (int r = 0; r < kSide; ++r) {
       for (int c = 0; c < kSide; ++c) {
-        cnt_block[r][c] = decode_node(nodes + r * row_bytes + c * kRecordBytes);
+        held.block[r][c] = decode_node(nodes + r * row_bytes + c * kRecordBytes);
       }
     }
     nodes = nullptr;
@@ -211,7 +213,7 @@ struct Call {
   FileImage image;
   std::int64_t budget = kImageBudget;
   // The first node of the block where it stands in the image; most blocks serve a single point, so
-  // that they are brought into cnt_block only when another is read or the call ends.
+  // that they are brought into held.block only when another is read or the call ends.
   const unsigned char* nodes = nullptr;
   int64_t row_bytes = 0;
   // That of the last point: the passes of an inverse, and points in a row, mostly stay in one.
@@ -221,14 +223,14 @@ struct Call {
 // Moves the block so that it begins one node south and east of a node of a sub-grid, as far as the
 // sub-grid reaches.
 void load_block(int32_t grid, int64_t node_row, int64_t node_col, Call* call) {
-  const CntSubGrid& g = cnt_subgrids[grid];
+  const CntSubGrid& g = held.subgrids[grid];
   const int64_t row = std::max<int64_t>(std::min(node_row - 1, g.rows - kSide), 0);
   const int64_t col = std::max<int64_t>(std::min(node_col - 1, g.cols - kSide), 0);
-  if (cnt_block_grid == grid && cnt_block_row == row && cnt_block_col == col) return;
+  if (held.block_grid == grid && held.block_row == row && held.block_col == col) return;
   // By contract: the block counts as moved even where it cannot be read.
-  cnt_block_grid = grid;
-  cnt_block_row = row;
-  cnt_block_col = col;
+  held.block_grid = grid;
+  held.block_row = row;
+  held.block_col = col;
   constexpr int64_t kNodesBytes = kSide * kRecordBytes;
   const int64_t row_bytes = g.cols * kRecordBytes;
   const int64_t offset = (g.first_record + row * g.cols + col) * kRecordBytes;
@@ -249,20 +251,20 @@ void load_block(int32_t grid, int64_t node_row, int64_t node_col, Call* call) {
   for (int r = 0; r < kSide; r += rows_at_once) {
     const int64_t span = (rows_at_once - 1) * row_bytes + kNodesBytes;
     std::size_t read = 0;
-    if (seek_to(cnt_file, offset + r * row_bytes)) {
-      read = std::fread(bytes, 1, static_cast<std::size_t>(span), cnt_file);
+    if (seek_to(held.file, offset + r * row_bytes)) {
+      read = std::fread(bytes, 1, static_cast<std::size_t>(span), held.file);
     }
     for (int k = 0; k < rows_at_once; ++k) {
       if (k * row_bytes + kNodesBytes > static_cast<int64_t>(read)) {
-        cnt_read_status = TW_GSB_READ_ERROR;  // the row keeps what it held
+        held.read_status = TW_GSB_READ_ERROR;  // the row keeps what it held
         continue;
       }
       for (int c = 0; c < kSide; ++c) {
-        cnt_block[r + k][c] = decode_node(bytes + k * row_bytes + c * kRecordBytes);
+        held.block[r + k][c] = decode_node(bytes + k * row_bytes + c * kRecordBytes);
       }
     }
   }
-  call->image.count_load(cnt_file, &call->budget);
+  call->image.count_load(held.file, &call->budget);
 }
 
 // Shifts in arc-seconds.
@@ -275,12 +277,12 @@ bool in_block(int64_t row, int64_t col) {
   const auto within = [](int64_t offset) {
     return static_cast<int>(static_cast<uint64_t>(offset) < uint64_t{kSide});
   };
-  return (within(row - cnt_block_row) & within(col - cnt_block_col)) != 0;
+  return (within(row - held.block_row) & within(col - held.block_col)) != 0;
 }
 
 // Reads the nodes of a cell, moving the block where it does not hold them.
 Cell cell_at(const Found& found, int64_t row, int64_t col, Call* call) {
-  const CntSubGrid& g = cnt_subgrids[found.grid];
+  const CntSubGrid& g = held.subgrids[found.grid];
   const int64_t to_west = found.code == kInside || found.code == kNorthEdge ? 1 : 0;
   const int64_t to_north = found.code == kInside || found.code == kWestEdge ? 1 : 0;
   // By contract: at the corner the fourth node is still that of the cell, which has all the weight
@@ -289,7 +291,7 @@ Cell cell_at(const Found& found, int64_t row, int64_t col, Call* call) {
   const bool own_corner = found.code == kNorthWestCorner && row + 1 < g.rows && col + 1 < g.cols;
   const int64_t to_corner_row = own_corner ? 1 : to_north;
   const int64_t to_corner_col = own_corner ? 1 : to_west;
-  const int held_already = static_cast<int>(cnt_block_grid == found.grid) &
+  const int held_already = static_cast<int>(held.block_grid == found.grid) &
                            static_cast<int>(in_block(row, col)) &
                            static_cast<int>(in_block(row + to_corner_row, col + to_corner_col));
   if (held_already == 0) {
@@ -297,17 +299,17 @@ Cell cell_at(const Found& found, int64_t row, int64_t col, Call* call) {
   }
 
   // Rounding may put a point a node beyond a sub-grid of absurdly small spacing.
-  const int64_t r = std::clamp<int64_t>(row - cnt_block_row, 0, kSide - 1);
-  const int64_t c = std::clamp<int64_t>(col - cnt_block_col, 0, kSide - 1);
-  const auto held = [](int64_t index) { return std::min<int64_t>(index, kSide - 1); };
+  const int64_t r = std::clamp<int64_t>(row - held.block_row, 0, kSide - 1);
+  const int64_t c = std::clamp<int64_t>(col - held.block_col, 0, kSide - 1);
+  const auto in_block = [](int64_t index) { return std::min<int64_t>(index, kSide - 1); };
   const auto node = [call](int64_t in_row, int64_t in_col) {
-    if (!call->nodes) return cnt_block[in_row][in_col];
+    if (!call->nodes) return held.block[in_row][in_col];
     return decode_node(call->nodes + in_row * call->row_bytes + in_col * kRecordBytes);
   };
   const Node base = node(r, c);
-  const Node west = node(r, held(c + to_west));
-  const Node north = node(held(r + to_north), c);
-  const Node northwest = node(held(r + to_corner_row), held(c + to_corner_col));
+  const Node west = node(r, in_block(c + to_west));
+  const Node north = node(in_block(r + to_north), c);
+  const Node northwest = node(in_block(r + to_corner_row), in_block(c + to_corner_col));
   const auto sides = [&](float Node::*field) {
     const auto b = static_cast<double>(base.*field);
     const auto n = static_cast<double>(north.*field);
@@ -318,7 +320,7 @@ Cell cell_at(const Found& found, int64_t row, int64_t col, Call* call) {
 }
 
 Shift interpolate(const Found& found, double x, double y, Call* call) {
-  const CntSubGrid& g = cnt_subgrids[found.grid];
+  const CntSubGrid& g = held.subgrids[found.grid];
   const double u = (x - g.e_long) / g.long_inc;
   const double v = (y - g.s_lat) / g.lat_inc;
   // The base node of the cell, from 0; on an edge it serves for the nodes beyond as well.
@@ -345,33 +347,33 @@ TWstatus shift_at(double lon, double lat, double* lon_shift, double* lat_shift, 
   const double y = lat * kArcSecondsPerRadian;
   const Found found = find_subgrid(x, y);
   if (found.grid == kNone) return TW_I_OUTSIDE_CNT;
-  cnt_read_status = TW_SUCCESS;
+  held.read_status = TW_SUCCESS;
   const Shift shift = interpolate(found, x, y, call);
   *lon_shift = shift.lon * sign * kRadiansPerArcSecond;
   *lat_shift = shift.lat * kRadiansPerArcSecond;
-  return cnt_read_status;
+  return held.read_status;
 }
 
 // Gives each sub-grid the range of its children.
 void index_children() {
-  Child* const end = cnt_children + cnt_num_file;
-  for (int32_t i = 0; i < cnt_num_file; ++i) cnt_children[i] = {cnt_subgrids[i].parent, i};
-  std::sort(cnt_children, end, [](const Child& a, const Child& b) {
+  Child* const end = held.children + held.count;
+  for (int32_t i = 0; i < held.count; ++i) held.children[i] = {held.subgrids[i].parent, i};
+  std::sort(held.children, end, [](const Child& a, const Child& b) {
     return a.parent != b.parent ? a.parent < b.parent : a.grid < b.grid;
   });
   const auto range_of = [end](const Name& parent, int32_t* first, int32_t* last) {
     const Child* const begin =
-        std::lower_bound(cnt_children, end, parent,
+        std::lower_bound(held.children, end, parent,
                          [](const Child& c, const Name& name) { return c.parent < name; });
     const Child* const behind =
-        std::upper_bound(cnt_children, end, parent,
+        std::upper_bound(held.children, end, parent,
                          [](const Name& name, const Child& c) { return name < c.parent; });
-    *first = static_cast<int32_t>(begin - cnt_children);
-    *last = static_cast<int32_t>(behind - cnt_children);
+    *first = static_cast<int32_t>(begin - held.children);
+    *last = static_cast<int32_t>(behind - held.children);
   };
-  range_of(kNoParent, &cnt_first_root, &cnt_last_root);
-  for (int32_t i = 0; i < cnt_num_file; ++i) {
-    CntSubGrid& g = cnt_subgrids[i];
+  range_of(kNoParent, &held.first_root, &held.last_root);
+  for (int32_t i = 0; i < held.count; ++i) {
+    CntSubGrid& g = held.subgrids[i];
     range_of(g.name, &g.first_child, &g.last_child);
   }
 }
@@ -379,32 +381,32 @@ void index_children() {
 // Reads the header of the file and those of its sub-grids.
 TWstatus read_headers() {
   unsigned char header[kHeaderBytes];
-  if (!read_exactly(cnt_file, header, kHeaderBytes) || decode_i32(header + 8) != kHeaderRecords ||
+  if (!read_exactly(held.file, header, kHeaderBytes) || decode_i32(header + 8) != kHeaderRecords ||
       decode_i32(header + 24) != kHeaderRecords) {
     return TW_GSB_READ_ERROR;
   }
-  cnt_to_system = decode_name(header + 104);
-  cnt_from_system = decode_name(header + 88);
+  held.to_system = decode_name(header + 104);
+  held.from_system = decode_name(header + 88);
   const int32_t num_file = decode_i32(header + 40);
   // Each sub-grid has a header: a damaged count must not ask for a table larger than the file.
   constexpr auto kBytes = static_cast<int64_t>(kHeaderBytes);
-  if (num_file < 0 || num_file > length_of(cnt_file) / kBytes - 1) return TW_GSB_READ_ERROR;
-  cnt_subgrids = new (std::nothrow) CntSubGrid[static_cast<std::size_t>(num_file)];
-  opened_grids->subgrids = cnt_subgrids;
-  cnt_children = new (std::nothrow) Child[static_cast<std::size_t>(num_file)];
-  opened_grids->children = cnt_children;
-  if (!cnt_subgrids || !cnt_children) return TW_NO_MEMORY;
+  if (num_file < 0 || num_file > length_of(held.file) / kBytes - 1) return TW_GSB_READ_ERROR;
+  held.subgrids = new (std::nothrow) CntSubGrid[static_cast<std::size_t>(num_file)];
+  opened_grids->subgrids = held.subgrids;
+  held.children = new (std::nothrow) Child[static_cast<std::size_t>(num_file)];
+  opened_grids->children = held.children;
+  if (!held.subgrids || !held.children) return TW_NO_MEMORY;
   int64_t record = kHeaderRecords;
   for (int32_t i = 0; i < num_file; ++i) {
     const int64_t first_node = record + kHeaderRecords;
-    if (first_node > kMostRecords || !seek_to(cnt_file, record * kRecordBytes) ||
-        !read_exactly(cnt_file, header, kHeaderBytes)) {
+    if (first_node > kMostRecords || !seek_to(held.file, record * kRecordBytes) ||
+        !read_exactly(held.file, header, kHeaderBytes)) {
       return TW_GSB_READ_ERROR;
     }
     const CntSubGrid grid = decode_subgrid(header, static_cast<int32_t>(first_node));
     if (!subgrid_can_be(grid)) return TW_GSB_READ_ERROR;
-    cnt_subgrids[i] = grid;
-    cnt_num_file = i + 1;
+    held.subgrids[i] = grid;
+    held.count = i + 1;
     record = first_node + grid.gs_count;
   }
   return TW_SUCCESS;
@@ -412,13 +414,13 @@ TWstatus read_headers() {
 
 // Forgets the open grid.
 void clear_state() {
-  cnt_num_file = 0;
-  cnt_file = nullptr;
-  cnt_subgrids = nullptr;
-  cnt_children = nullptr;
-  cnt_first_root = 0;
-  cnt_last_root = 0;
-  cnt_block_grid = kNone;
+  held.count = 0;
+  held.file = nullptr;
+  held.subgrids = nullptr;
+  held.children = nullptr;
+  held.first_root = 0;
+  held.last_root = 0;
+  held.block_grid = kNone;
 }
 
 }  // namespace
@@ -448,7 +450,7 @@ void TWrd_cnt_fhdr(const char* path, int32_t flag, TWstatus* status) {
   }
   opened_grids = opened;
   clear_state();
-  cnt_file = file.release();
+  held.file = file.release();
   *status = read_headers();
   index_children();  // also of a table that ends early
 }
@@ -463,13 +465,13 @@ void TWcnt_c(const char* directory, int32_t /*reserved*/, TWstatus* status) {
 
 void TWcnt_to_from(int32_t /*reserved*/, char* from, char* to, TWstatus* status) {
   *status = TW_SUCCESS;
-  *std::copy(cnt_from_system.begin(), cnt_from_system.end(), from) = '\0';
-  *std::copy(cnt_to_system.begin(), cnt_to_system.end(), to) = '\0';
+  *std::copy(held.from_system.begin(), held.from_system.end(), from) = '\0';
+  *std::copy(held.to_system.begin(), held.to_system.end(), to) = '\0';
 }
 
 void TWload_cnt_local_grid(int32_t sub_grid, int32_t record) {
-  if (sub_grid < 0 || sub_grid >= cnt_num_file) return;
-  const CntSubGrid& g = cnt_subgrids[sub_grid];
+  if (sub_grid < 0 || sub_grid >= held.count) return;
+  const CntSubGrid& g = held.subgrids[sub_grid];
   const int64_t offset = int64_t{record} - g.first_record - 1;
   Call call;
   load_block(sub_grid, offset / g.cols, offset % g.cols, &call);

@@ -13,8 +13,8 @@ inline constexpr double kPi = std::numbers::pi;
 inline constexpr double kHalfPi = kPi / 2;
 inline constexpr double kQuarterPi = kPi / 4;
 inline constexpr double kTwoPi = 2 * kPi;
-inline constexpr double kRadiansPerDegree = 0.017453292519943295;
-inline constexpr double kDegreesPerRadian = 57.29577951308232;
+inline constexpr double kRadiansPerDegree = kPi / 180;
+inline constexpr double kDegreesPerRadian = 180 / kPi;
 
 // Up to this eccentricity, above that of every ellipsoid of the earth, series serve.
 inline constexpr double kSeriesEccentricity = 0.1;

@@ -1,5 +1,5 @@
 // Krovak oblique conformal conic, and its modification by polynomials: IOGP Publication 373-7-2,
-// Geomatics Guidance Note 7, part 2, methods 9819, 1041, 1042 and 1043.
+// Geomatics Guidance Note 7, part 2 (2022), methods 9819, 1041, 1042 and 1043.
 #pragma once
 
 #include <cmath>

@@ -1,5 +1,5 @@
 // A local rectangular frame on a point of the ellipsoid: geodetic coordinates to and from it.
-// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2, method 9837.
+// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2 (2022), method 9837.
 #pragma once
 
 #include "foundation/geocentric_points.hpp"

@@ -33,7 +33,7 @@ void TWrhmbline_dir(CoordinateTriple start, double azimuth, double distance, dou
   *status = TW_SUCCESS;
   const double lon1 = start.x;
   const double lat1 = start.y;
-  if (azimuth != kHalfPi && azimuth != 4.71238898038469) {  // 3 pi / 2
+  if (azimuth != kHalfPi && azimuth != 3 * kHalfPi) {
     double arc = 0;
     TWmerid_dist_f(a, e, lat1, &arc, status);
     TWmerid_dist_i(a, e, arc + portable::cos(azimuth) * distance, &end->y, status);

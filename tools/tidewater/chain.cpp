@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <numbers>
 #include <sstream>
 #include <stdexcept>
 
@@ -13,7 +14,7 @@ namespace tidewater::command {
 
 namespace {
 
-constexpr double kDegree = 0.017453292519943295;
+constexpr double kDegree = std::numbers::pi / 180;
 // How far beyond an area of use a position is far outside.
 constexpr double kFarOutside = 10;  // degrees
 // UTM's reach in latitude.

@@ -3,6 +3,7 @@
 #include <array>
 #include <charconv>
 #include <cmath>
+#include <numbers>
 #include <stdexcept>
 #include <string_view>
 
@@ -13,7 +14,7 @@ namespace tidewater::command {
 
 namespace {
 
-constexpr double kPi = 3.141592653589793;
+constexpr double kPi = std::numbers::pi;
 constexpr double kHalfPi = kPi / 2;
 constexpr double kArcSecond = 4.84813681109536e-06;
 

@@ -1,6 +1,6 @@
 // Double stereographic: the ellipsoid onto the Gauss sphere, that turned to its pole, that
 // projected.
-// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2, method 9809.
+// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2 (2022), method 9809.
 
 #include "tidewater/double_stereographic.h"
 #include "formulas/constants.hpp"

@@ -1,5 +1,5 @@
 // Gauss's conformal mapping of the ellipsoid onto a sphere, by way of two Mercator planes.
-// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2, method 9809;
+// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2 (2022), method 9809;
 // formulas/gauss_sphere.hpp has the direct form.
 #pragma once
 

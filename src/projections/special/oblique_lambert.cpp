@@ -1,6 +1,6 @@
 // Oblique Lambert conformal projection: the ellipsoid on a conformal sphere, the graticule of the
 // sphere turned about a pole, and a Lambert conic on it; with the constants of the Krovak case.
-// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2, method 9819.
+// IOGP Publication 373-7-2, Geomatics Guidance Note 7, part 2 (2022), method 9819.
 // Each stage goes through the whole array, several points at once: where one fails, what the
 // earlier ones have written is seen.
 
