@@ -148,6 +148,7 @@ _system = _function("tw_system_create", _V, _T)
 _transformation = _function("tw_transformation_create", _V, _V, _V, _V)
 _transform = _function("tw_transform", _S, _V, _I, _S, _P, _P, _V, ctypes.c_uint32)
 _system_method = _function("tw_system_method", _S, _V, _T, _S)
+_system_describe = _function("tw_system_describe", _S, _V, _T, _S)
 _projection_of = _function("tw_projection_of", _V, _V)
 _projection = _function("tw_projection_create", _V, _T, _S, _V, _V, _D, _D)
 _method_count = _function("tw_projection_method_count", _S)
@@ -197,12 +198,15 @@ class Projection:
             text = ctypes.create_string_buffer(200)
             _system_method(system, text, 200)
             self.method = text.value.decode()
+            told = ctypes.create_string_buffer(2000)
+            _system_describe(system, told, 2000)
+            self.truth = told.value.decode().partition("\nformulas: ")[2]
         else:
             names = (ctypes.c_char_p * len(parameters))(*(name.encode() for name in parameters))
             values = (_D * len(parameters))(*parameters.values())
             self.handle = _made(_projection(definition.encode(), len(parameters), names, values, a,
                                             inverse_flattening), definition)
-            self.method = definition
+            self.method, self.truth = definition, ""
 
     def _run(self, inverse, array):
         given, out = _columns(array), _columns(np.zeros((len(array), 3)))

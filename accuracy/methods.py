@@ -1,5 +1,7 @@
 """Every method of projection of the systems layer."""
 
+import re
+
 import mpmath as mp
 import numpy as np
 from geographiclib.geodesic import Geodesic
@@ -58,6 +60,7 @@ def exact_row(definition, domain, box, reference, axis=A, ecc=E, count=200, scal
         row.scale = Error.of(np.maximum(relative([t["h"] for t in truth], factors[:, 0]),
                                         relative([t["k"] for t in truth], factors[:, 1])), "")
     row.extra.update(place=degrees * DEGREE, error=apart(exact, got), method=map_.method)
+    hold_to_its_word(map_, row)
     return row
 
 
@@ -71,6 +74,18 @@ def geodesic_row(definition, domain, box, reference, note="", tail=""):
               Error.of(on_the_ground(A, degrees * DEGREE, map_.inverse(exact) * DEGREE)), note=note)
     row.extra.update(place=degrees * DEGREE, error=error, method=map_.method)
     return row
+
+
+UNITS = {"nm": 1e-9, "micrometre": 1e-6, "mm": 1e-3, "cm": 1e-2}
+
+
+def hold_to_its_word(map_, row):
+    """What Projection::truth() promises must not be less than what is measured."""
+    forward, _, inverse = map_.truth.partition("; inverse ")
+    for told, error in ((forward, row.forward), (inverse or forward, row.inverse)):
+        found = re.search(r"within (a|\d+) (nm|micrometre|mm|cm)", told)
+        if found and error.worst > float(found[1].replace("a", "1")) * UNITS[found[2]]:
+            raise SystemExit(f"{row.family} says {told!r} and is off by {error}")
 
 
 def rows():

@@ -212,7 +212,7 @@ def orbit_picture(rows):
         axis.semilogy(angle, row.extra["error"][middle], label="TWsom_f, " + row.family.split(", ")[-1])
     axis.set_xlabel("degrees along the orbit, from the northernmost point to the equator")
     axis.set_ylabel("metres from the exact plane")
-    axis.legend(fontsize=8)
+    axis.legend(fontsize=8, loc="center")
     save(figure, "accuracy_space_oblique.svg")
 
 
