@@ -2,9 +2,9 @@
 // J. P. Snyder, Space Oblique Mercator Projection: Mathematical Development, USGS Bulletin 1518
 // (1981); Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), section 27.
 //
-// L is the satellite's angle from the ascending node.  Scan lines are found by Newton's method on L,
-// positions on them from the ellipsoid itself, so that nothing is lost where the track turns at its
-// northernmost and southernmost points.
+// L is the satellite's angle from the ascending node.  Scan lines are found by Newton's method on
+// L, positions on them from the ellipsoid itself, so that nothing is lost where the track turns at
+// its northernmost and southernmost points.
 #pragma once
 
 #include <algorithm>
