@@ -6,7 +6,7 @@
  *
  * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
  * - Lambert conformal conic, cone of 44 and 49 N, lat -60 to 89: forward 129 nm (70 nm), inverse
- *   36 nm (30 nm), scale 5.3e-15 (3.3e-15).
+ *   36 nm (30 nm), scale 5.3e-15 (3.2e-15).
  *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 104-110.

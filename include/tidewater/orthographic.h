@@ -7,7 +7,7 @@
  *
  * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
  * - Orthographic, scale, lat 10 to 80: scale 1.7e-16 (1.3e-16);
- * - Orthographic, within 75 degrees of 50 N: forward 1.5 nm (< 1 nm), inverse 2.6 nm (1.4 nm).
+ * - Orthographic, within 75 degrees of 50 N: forward 1.6 nm (1.0 nm), inverse 2.6 nm (1.4 nm).
  *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 145-153.

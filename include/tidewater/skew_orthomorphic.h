@@ -3,8 +3,8 @@
  * Rectified skew orthomorphic projection of the ellipsoid.
  *
  * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
- * - Rectified skew orthomorphic, lon within 10, lat -6 to 14: forward 12 nm (12 nm), inverse 12 nm
- *   (12 nm), scale 5.7e-16 (3.6e-16).
+ * - Rectified skew orthomorphic, lon within 10, lat -6 to 14: forward 11 nm (11 nm), inverse 12 nm
+ *   (11 nm), scale 5.7e-16 (3.6e-16).
  *
  * Source: Hotine, The Orthomorphic Projection of the Spheroid, Empire Survey Review 8 and 9
  * (1946-47).

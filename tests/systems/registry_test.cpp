@@ -798,7 +798,7 @@ TEST_F(RegistryStores, WhoseCellsDoNotPackAreNoStores) {
                           "UPDATE conversions SET value1 = 'a text' WHERE code = 18085",
                           "UPDATE datums SET code = 99999999999 WHERE code = 6326"}) {
     const std::string words = refused(altered(sql));
-    EXPECT_NE(words.find("is no parameter store"), std::string::npos) << sql << ": " << words;
+    EXPECT_NE(words.find("is not a parameter store"), std::string::npos) << sql << ": " << words;
   }
 }
 
