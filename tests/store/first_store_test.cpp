@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 
 #include <array>
-#include <bit>
 #include <cmath>
 #include <cstdio>
 #include <cstring>
@@ -14,6 +13,7 @@
 #include <vector>
 
 #include "support/data.hpp"
+#include "support/grids.hpp"
 #include "support/points.hpp"
 #include "tidewater/catalogue.h"
 
@@ -161,12 +161,8 @@ TEST_F(FirstStore, SatellitesFollowSnyder) {
 
 // A node of a NADCON-format file: 273 columns, record 0 is the header, value 0 of a record a label.
 double node(const std::string& bytes, int row, int column) {
-  uint32_t bits = 0;  // little-endian
-  for (int i = 3; i >= 0; --i) {
-    bits = bits << 8 | static_cast<uint8_t>(
-                           bytes[static_cast<std::size_t>(((row + 1) * 274 + column + 1) * 4 + i)]);
-  }
-  return static_cast<double>(std::bit_cast<float>(bits));
+  const auto offset = static_cast<std::size_t>(((row + 1) * 274 + column + 1) * 4);
+  return static_cast<double>(f32_at(bytes, offset));
 }
 
 std::string bytes_of(const std::filesystem::path& path) {
