@@ -289,7 +289,7 @@ TW_INLINE V expm1(V x) {
   const V scale = power_of_two(p.k);
   const V inner = p.r + p.tail;
   V result = (scale - 1.0) + scale * inner;
-  result = number(bits(result) | (bits(x) & Bits<V>(INT64_MIN)));  // of zero too
+  result = copysign(result, x);  // of zero too
   mend(far, result, [&](int i) { return far_exp(lane(x, i)) - 1.0; });
   return result;
 }
