@@ -1,9 +1,8 @@
 #include "support/data.hpp"
 
-#include <unistd.h>
-
 #include <cstdlib>
 #include <fstream>
+#include <random>
 
 namespace fs = std::filesystem;
 
@@ -21,9 +20,10 @@ fs::path proj_data() {
 }
 
 ScratchFolder::ScratchFolder() {
-  std::string name = (fs::temp_directory_path() / "tidewater-XXXXXX").string();
-  if (!mkdtemp(name.data())) throw std::runtime_error("no scratch folder");
-  path_ = name;
+  std::random_device any;
+  do {
+    path_ = fs::temp_directory_path() / ("tidewater-" + std::to_string(any()));
+  } while (!fs::create_directory(path_));
 }
 
 ScratchFolder::~ScratchFolder() {

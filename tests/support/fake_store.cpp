@@ -1,5 +1,7 @@
 #include "support/fake_store.hpp"
 
+#include <gtest/gtest.h>
+
 #include <algorithm>
 #include <cstring>
 
@@ -209,8 +211,9 @@ TWstoreword OLB7R3_PF_get_next_row(const char* table, void* row) {
   return FakeStore::current().get_next_row(table, row);
 }
 
-TWstoreword OLB7R3_PF_get_row_by_value(const char* table, int32_t, const char* column,
+TWstoreword OLB7R3_PF_get_row_by_value(const char* table, int32_t mode, const char* column,
                                        const void* key, void* row) {
+  EXPECT_EQ(mode, 0);
   return FakeStore::current().get_row_by_value(table, column, key, row);
 }
 
@@ -218,4 +221,7 @@ TWstoreword OLB7R3_PF_inq_num_rows(const char* table, int32_t* count) {
   return FakeStore::current().inq_num_rows(table, count);
 }
 
-TWstoreword OLB7R3_PF_close(int32_t) { return FakeStore::current().close(); }
+TWstoreword OLB7R3_PF_close(int32_t mode) {
+  EXPECT_EQ(mode, 0);
+  return FakeStore::current().close();
+}

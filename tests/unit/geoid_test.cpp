@@ -153,7 +153,7 @@ TEST_F(Geoid, HeadersFillTheBlock) {
 TEST_F(Geoid, RealGridsAtTheirNodesAndBetween) {
   TIDEWATER_NEED_SHARED_DATA();
   Opened opened;
-  TWgeo90_c((shared_data() / "geoid/").c_str(), &opened.control, &opened.status);
+  TWgeo90_c((shared_data() / "geoid/").string().c_str(), &opened.control, &opened.status);
   ASSERT_EQ(opened.status, TW_SUCCESS);
   ASSERT_EQ(opened.control.grid_count, 2);
   EXPECT_STREQ(opened.control.grids[0].name, "namer96");
@@ -199,7 +199,7 @@ TEST_F(Geoid, RealGridsAgainstProj) {
   const ProjPeer peer("+proj=vgridshift +grids=egm96_15.gtx +multiplier=1");
   ASSERT_TRUE(peer.ok());
   Opened opened;
-  TWgeo90_c((shared_data() / "geoid/").c_str(), &opened.control, &opened.status);
+  TWgeo90_c((shared_data() / "geoid/").string().c_str(), &opened.control, &opened.status);
   for (int i = 0; i < 200; ++i) {
     // nodes of the peer's grid and of ours
     CoordinateTriple p = at(-128 + 0.25 * (i * 37 % 250), 22 + 0.25 * (i * 53 % 120), 0);

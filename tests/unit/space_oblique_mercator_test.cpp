@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <array>
 #include <vector>
 
 #include "support/failing_new.hpp"
@@ -359,6 +360,141 @@ TEST(SpaceObliqueMercator, PathAndRow) {
   EXPECT_EQ(lon_n, 2.25);
   EXPECT_EQ(side, 1);
   EXPECT_EQ(orbit, 0);
+}
+
+// The integrals, series and places as they are stated, worked out once more at 50 digits (mpmath),
+// on a coarse grid of 33 points and with three terms, so that every term shows.
+struct Stated {
+  double eps, a0;
+  std::array<double, 3> C, S, X1, X2, X3, X4;
+  double m_sin, m_cos, sum3, sum4;
+  std::array<double, 4> R;
+  std::array<CoordinateTriple, 3> forward;  // of kGround
+  std::array<CoordinateTriple, 3> inverse;  // of kPlane
+  std::array<CoordinateTriple, 2>
+      equatorial;  // of kPlane's first and last, with an inclination of 0
+};
+const Points kGround = {{1.2, 0.5, 0}, {1, -0.6, 0}, {1.3, 1.2, 0}};
+const Points kPlane = {{2.5, 0.1, 0}, {3.4, -0.2, 0}, {0.1, 2.6, 0}};
+const Stated kCircular = {
+    0,
+    0,
+    {0, 0, 0},
+    {0.139064524097534431, 0, 0.0000108911720841987811},
+    {-0.138764611866568624, -0.000145556474476011117, -0.0000300646297295202392},
+    {0.0194241415308473023, -0.00103984454876697568, 4.20841895554938538e-6},
+    {0, 0, 0},
+    {0, 0, 0},
+    0.139146543932863994,
+    0.994052485189858906,
+    0,
+    0,
+    {kUntouched, kUntouched, kUntouched, kUntouched},
+    {{{6.98465478610739561, 0.683934821754984408, 0},
+      {5.40102621263965294, 0.956668404275818226, 0},
+      {7.57560682637581454, 0.221037911780803581, 0}}},
+    {{{-1.19922230953916192, 0.646996161317966733, 0},
+      {-1.58036942800677324, -0.231477364234521709, 0},
+      {0.557817478596056379, -0.0872192563481028117, 0}}},
+    {{{-1.96931480698865359, 0.0149639058296070754, 0},
+      {2.39367094835663571, 1.43971669828740796, 0}}}};
+const Stated kElliptical = {
+    0.05,
+    -0.00135388377287967438,
+    {3.56510233816692266e-6, 0.00200199876346588104, -0.000121164910258183676},
+    {0.139056631985375989, -0.00472928556724346033, 0.000128098604839699146},
+    {-0.138961144366253778, 0.00225714829779035503, -0.0000606461137722343678},
+    {0.017972278291848078, -0.00134836783960819222, 0.000083497987354001804},
+    {-0.0000652514872297202133, -0.000125285834342272861, 0.0000364504165231971423},
+    {-8.86050375678611564e-6, 0.00101186679289570957, -0.0000374738661299482512},
+    0.134627990884469364,
+    0.994679087651772291,
+    -0.000154086905048795932,
+    0.000965532423008975205,
+    {-99.4383665579499837, -734.685729733001094, -734.684764200578085, -99.4382124710449349},
+    {{{0.226864348594855135, 7.01031404522391738, 0},
+      {-0.238095760101219885, 5.47752500265060324, 0},
+      {0.759980424238225734, 7.53936880712458093, 0}}},
+    {{{-2.89076703599038293, 0.170173443996773972, 0},
+      {-2.78186384411664003, 0.130603485533200281, 0},
+      {-1.0411141628268261, 0.533890185883139563, 0}}},
+    {{{2.09202800890398602, -1.42819907727572192, 0},
+      {-1.89526939959992658, 0.167988790099139287, 0}}}};
+
+TEST(SpaceObliqueMercator, AsStated) {
+  for (const Stated& stated : {kCircular, kElliptical}) {
+    Som p(0.08, 1.7, 0.07, stated.eps, 0.4, 3, 33);
+    EXPECT_NEAR(p.Q, 0.006334293695908087, 2e-17);
+    EXPECT_NEAR(p.T, 0.0127093879953324902, 2e-17);
+    EXPECT_NEAR(p.W, 0.0127087106684421949, 5e-16);
+    EXPECT_NEAR(p.a0, stated.a0, 5e-16);
+    for (std::size_t n = 0; n < 3; ++n) {
+      EXPECT_NEAR(p.C[n], stated.C[n], 5e-16);
+      EXPECT_NEAR(p.S[n], stated.S[n], 5e-16);
+      EXPECT_NEAR(p.X1[n], stated.X1[n], 5e-16);
+      EXPECT_NEAR(p.X2[n], stated.X2[n], 5e-16);
+      EXPECT_NEAR(p.X3[n], stated.X3[n], 5e-16);
+      EXPECT_NEAR(p.X4[n], stated.X4[n], 5e-16);
+    }
+    EXPECT_NEAR(p.m_sin, stated.m_sin, 5e-16);
+    EXPECT_NEAR(p.m_cos, stated.m_cos, 1e-15);
+    EXPECT_NEAR(p.sum3, stated.sum3, 5e-16);
+    EXPECT_NEAR(p.sum4, stated.sum4, 5e-16);
+    const double R[] = {p.R1, p.R2, p.R3, p.R4};
+    // what rounding leaves of a0, 5e-16 of 1e-3
+    for (std::size_t k = 0; k < 4; ++k) EXPECT_NEAR(R[k], stated.R[k], 5e-10);
+
+    Points out = kGround;
+    EXPECT_EQ(p.forward(out, out), TW_SUCCESS);
+    for (std::size_t i = 0; i < 3; ++i) {
+      expect_near(out[i], stated.forward[i].x, stated.forward[i].y, 2e-12);
+    }
+    out = kPlane;
+    EXPECT_EQ(p.inverse(out, out), TW_SUCCESS);
+    for (std::size_t i = 0; i < 3; ++i) {
+      expect_near(out[i], stated.inverse[i].x, stated.inverse[i].y, 1e-11);
+    }
+    p.inc = 0;
+    out = {kPlane[0], kPlane[2]};
+    EXPECT_EQ(p.inverse(out, out), TW_SUCCESS);
+    for (std::size_t i = 0; i < 2; ++i) {
+      expect_near(out[i], stated.equatorial[i].x, stated.equatorial[i].y, 1e-10);
+    }
+  }
+}
+
+TEST(SpaceObliqueMercator, ATurningOfATenBillionthIsSteady) {
+  constexpr double kLimit = 1e-10;
+  Som p = landsat();
+  p.R1 = p.R2 = p.R3 = p.R4 = 1000;
+  const CoordinateTriple at = p.track(2.5);
+  const auto forward = [&](double a0) {
+    p.a0 = a0;
+    Points one = {at};
+    EXPECT_EQ(p.forward(one, one), TW_SUCCESS);
+    return one[0];
+  };
+  const auto inverse = [&](double a0, const CoordinateTriple& in) {
+    p.a0 = a0;
+    Points one = {in};
+    p.inverse(one, one);
+    return one[0];
+  };
+  for (const double sign : {1.0, -1.0}) {
+    // Forward: the linear road below the limit, at it that of the constants R.
+    const CoordinateTriple linear = forward(sign * std::nextafter(kLimit, 0));
+    EXPECT_NEAR(linear.x, forward(0).x, 1e-8);
+    EXPECT_GT(std::fabs(forward(sign * kLimit).x - linear.x), 0.01);
+    // Inverse, by contract: below the limit the plane is turned and the road linear; at it the road
+    // alone is, so that the caller has to turn.
+    const double D = std::hypot(p.m_cos, p.m_sin);
+    const CoordinateTriple turned = {(p.m_sin * linear.x - p.m_cos * linear.y) / D,
+                                     (p.m_sin * linear.y + p.m_cos * linear.x) / D, 0};
+    expect_near(inverse(sign * std::nextafter(kLimit, 0), linear), at.x, at.y, 1e-10);
+    expect_near(inverse(sign * kLimit, turned), at.x, at.y, 1e-10);
+    const CoordinateTriple other = inverse(sign * std::nextafter(kLimit, 1), turned);
+    EXPECT_FALSE(std::fabs(other.x - at.x) < 1e-3);
+  }
 }
 
 }  // namespace

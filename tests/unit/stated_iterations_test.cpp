@@ -170,16 +170,22 @@ TEST(StatedIterations, Albers) {
 
 // --- Polyconic: Newton's passes with two limits -------------------------------------------------
 
-Stated polyconic(double e, double lon0, double m0, double x, double y) {
+struct PolyconicStated : Stated {
+  int passes = 0;
+  bool far_at_three = false;  // pass 3 moved by more than 5, which is not looked at yet
+};
+
+PolyconicStated polyconic(double e, double lon0, double m0, double x, double y) {
   const double e2 = e * e, e4 = e2 * e2;
   const double f0 = 1 - ((e2 * 5 / 16 + 0.75) * e2 / 4 + 1) * e2 / 4;
   const double f2 = ((1.40625 * e2 + 3) * e2 / 4 + 3) * e2 / 8;
   const double f4 = (11.25 * e2 + 15) * e4 / 256;
   const double f6 = e2 * e4 * 0.011393229166666666, g6 = e2 * e4 * 0.068359375;
-  Stated out = {0, 0, TW_SUCCESS};
+  PolyconicStated out = {{0, 0, TW_SUCCESS}};
   const double A = y + m0, B = x * x + A * A;
   double lat = A, C = 0;
   for (int pass = 0;; ++pass) {
+    out.passes = pass;
     C = std::tan(lat) * std::sqrt(1 - std::sin(lat) * std::sin(lat) * e2);
     const double Ma =
         f0 * lat - f2 * std::sin(2 * lat) + f4 * std::sin(4 * lat) - f6 * std::sin(6 * lat);
@@ -192,7 +198,11 @@ Stated polyconic(double e, double lon0, double m0, double x, double y) {
     out.lat = lat - numerator / denominator;
     const double change = std::fabs(out.lat - lat);
     if (change < 1e-9) break;
-    if (pass > 3 && change > 5) return {0, 0, TW_DIVERGED};
+    if (pass == 3 && change > 5) out.far_at_three = true;
+    if (pass > 3 && change > 5) {
+      out.status = TW_DIVERGED;
+      return out;
+    }
     if (pass > 25) {
       out.status = TW_I_LATITUDE_LIMITED;
       break;
@@ -231,6 +241,66 @@ TEST(StatedIterations, Polyconic) {
   EXPECT_GT(diverged, 5000);
   // Before it runs away or comes back from afar an iteration magnifies the last digits.
   EXPECT_LT(unlike, 40);
+}
+
+TEST(StatedIterations, PolyconicWhereRoundingDecidesNothing) {
+  int far_and_well = 0, diverged = 0, more_than_twelve = 0;
+  for (int i = 1; i < 160; ++i) {
+    for (int j = 1; j < 120; ++j) {
+      const double x = 0.05 * i, y = 0.031 * j;
+      const PolyconicStated s = polyconic(kE, 0, 0, x, y);
+      const PolyconicStated aside = polyconic(kE, 0, 0, x, y * (1 + 1e-12));
+      if (aside.passes != s.passes || aside.status != s.status ||
+          std::fabs(aside.lat - s.lat) > 1e-9) {
+        continue;
+      }
+      const CoordinateTriple in = {x, y, 0};
+      CoordinateTriple out = kUntouchedPoint;
+      TWstatus status = 0;
+      TWpolycon_i(kE, 0, 0, 1, &in, &out, &status);
+      EXPECT_EQ(status, s.status) << x << " " << y;
+      if (s.status == TW_DIVERGED) {
+        expect_untouched(out);
+        ++diverged;
+        continue;
+      }
+      EXPECT_NEAR(out.y, s.lat, 1e-9) << x << " " << y;
+      const bool neither = std::isnan(out.x) && std::isnan(s.lon);  // an arc sine of more than 1
+      EXPECT_TRUE(neither || std::fabs(out.x - s.lon) < 1e-8) << x << " " << y;
+      far_and_well += s.far_at_three;
+      more_than_twelve += s.passes >= 12;
+    }
+  }
+  EXPECT_GT(far_and_well, 0);
+  EXPECT_GT(diverged, 0);
+  EXPECT_GT(more_than_twelve, 0);
+}
+
+TEST(StatedIterations, PolyconicsLastPasses) {
+  // Found by a search: starts that come to rest in the very last pass, and such as need one more.
+  // They stand although the start is moved by 1e-12 of itself.
+  struct Case {
+    double e, x, y;
+    TWstatus word;
+  };
+  for (const auto& [e, x, y, word] : {Case{kE, 1.234, 1.735, TW_SUCCESS},
+                                      {kE, 1.844, 0.568, TW_SUCCESS},
+                                      {kE, 1.940, 2.122, TW_SUCCESS},
+                                      {0, 1.370, 2.665, TW_SUCCESS},
+                                      {kE, 1.384, 3.607, TW_I_LATITUDE_LIMITED},
+                                      {kE, 1.410, 0.145, TW_I_LATITUDE_LIMITED},
+                                      {0, 1.414, 3.184, TW_I_LATITUDE_LIMITED},
+                                      {0.3, 0.408, 3.013, TW_I_LATITUDE_LIMITED}}) {
+    const PolyconicStated s = polyconic(e, 0.1, 0, x, y);
+    EXPECT_EQ(s.passes, 26);
+    EXPECT_EQ(s.status, word);
+    const CoordinateTriple in = {x, y, 0};
+    CoordinateTriple out = kUntouchedPoint;
+    TWstatus status = 0;
+    TWpolycon_i(e, 0.1, 0, 1, &in, &out, &status);
+    EXPECT_EQ(status, word) << x << " " << y;
+    EXPECT_NEAR(out.y, s.lat, 1e-6) << x << " " << y;
+  }
 }
 
 // --- Laborde: thirty passes, told by the count alone --------------------------------------------
