@@ -88,8 +88,9 @@ TEST(SystemNames, ObliqueStatePlaneZone) {
   const System alaska("spcs83:5001");
   EXPECT_NE(alaska.method().find("Oblique Mercator"), std::string::npos);
   const Point p = forward(alaska, -134, 55), q = forward(System("EPSG:26931"), -134, 55);
-  EXPECT_NEAR(p.x, q.x, 1e-4);
-  EXPECT_NEAR(p.y, q.y, 1e-4);
+  // The registry's azimuth is rounded to 1e-4 seconds, 0.7 mm at this distance.
+  EXPECT_NEAR(p.x, q.x, 1e-3);
+  EXPECT_NEAR(p.y, q.y, 1e-3);
   expect_refused("spcs83:9999", "There is no state plane zone");
 }
 
