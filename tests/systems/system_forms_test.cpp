@@ -3,11 +3,14 @@
 
 #include <gtest/gtest.h>
 
+#include <array>
 #include <cmath>
+#include <limits>
 #include <string>
 
 #include "tidewater/ellipsoid.hpp"
 #include "tidewater/error.hpp"
+#include "tidewater/lines.hpp"
 #include "tidewater/projection.hpp"
 #include "tidewater/system.hpp"
 #include "tidewater/systems.h"
@@ -129,6 +132,27 @@ TEST(SystemNames, ProjStrings) {
   EXPECT_EQ(flattening("+f=0"), 0);
   expect_refused("+proj=longlat +a=6378137 +es=1", "+es must be from zero up to one");
   expect_refused("+proj=longlat +a=6378137 +es=-0.1", "+es must be from zero up to one");
+}
+
+TEST(Lines, OfNoPlaceAreNone) {
+  constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+  const Geodesic geodesic(6378137, 1 / 298.257223563);
+  EXPECT_EQ(geodesic.f(), 1 / 298.257223563);
+  const Rhumb rhumb(6378137, 1 / 298.257223563);
+  EXPECT_EQ(rhumb.a(), 6378137);
+  for (const auto& [lon1, lat1, lon2, lat2] : {std::array{0.0, 95.0, 1.0, 1.0},
+                                               {0.0, 0.0, 1.0, -90.5},
+                                               {kNaN, 0.0, 1.0, 1.0},
+                                               {0.0, kNaN, 1.0, 1.0},
+                                               {0.0, 0.0, kNaN, 1.0},
+                                               {0.0, 0.0, 1.0, kNaN}}) {
+    EXPECT_TRUE(std::isnan(geodesic.inverse(lon1, lat1, lon2, lat2).length));
+    EXPECT_TRUE(std::isnan(rhumb.inverse(lon1, lat1, lon2, lat2).length));
+  }
+  // A quarter of the equator by a rhumb line.
+  const LineCourse course = rhumb.inverse(0, 0, 90, 0);
+  EXPECT_NEAR(course.length, 6378137 * 1.5707963267948966, 1e-6);
+  EXPECT_NEAR(course.azimuth1, 90, 1e-12);
 }
 
 TEST(SystemsC, EveryTextOfASystem) {

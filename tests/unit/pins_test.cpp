@@ -379,6 +379,25 @@ TEST(Cassini, TheInversePoleIsATrillionthWide) {
   }
 }
 
+TEST(AzimuthalEqualArea, TheOriginOfAnOblique) {
+  // rho = 0 has no azimuth.  On the large flattening the authalic latitude goes there and back.
+  for (const double e : {0.0, kE, 0.3}) {
+    double e2 = 0, q1 = 0, qp = 0, rq = 0, m1 = 0, sin_b1 = 0, cos_b1 = 0, sin_lat0 = 0;
+    double cos_lat0 = 0, D = 0;
+    TWstatus status = 0;
+    TWlam_az_eq_c(e, 0.25, 0.7, &e2, &q1, &qp, &rq, &m1, &sin_b1, &cos_b1, &sin_lat0, &cos_lat0, &D,
+                  &status);
+    for (const double y : {0.0, 1e-200}) {  // the square of which is 0
+      const CoordinateTriple in = {0, y, 0};
+      CoordinateTriple out = kUntouchedPoint;
+      TWlam_az_eq_i(&in, 1, e, 0.25, 0.7, e2, qp, rq, sin_b1, cos_b1, sin_lat0, cos_lat0, D, &out,
+                    &status);
+      EXPECT_EQ(status, TW_SUCCESS);
+      expect_near(out, 0.25, 0.7, 1e-12);
+    }
+  }
+}
+
 // --- Albers -------------------------------------------------------------------------------------
 
 TEST(Albers, WhatTheSpheresFanDoesNotHold) {
