@@ -229,6 +229,23 @@ TEST(ObliqueMercator, TheInverseOfThePoles) {
   expect_near(p, h.lon0, -kHalf, 0);
 }
 
+TEST(ObliqueMercator, ADistanceThatRoundsBelowOneIsHeld) {
+  // On the equator D = B sqrt(1 - e^2) is 1 in exact arithmetic, and E = D + sqrt(D^2 - 1) too.
+  int below = 0;
+  for (int i = 1; i < 300; ++i) {
+    const double e = 0.001 * i, e2 = e * e;
+    double lat0 = 0, alpha = 0.7, B = 0, A = 0, E = 0, lon0 = 0, gamma0 = 0;
+    TWstatus status = 0;
+    TWo_merc_c(0, e, 0.3, 0, 0, 0, &lat0, &alpha, &B, &A, &E, &lon0, &gamma0, &status);
+    EXPECT_EQ(status, TW_SUCCESS) << e;
+    EXPECT_NEAR(E, 1, 1e-7) << e;
+    EXPECT_NEAR(gamma0, 0.7, 1e-14) << e;
+    const double D = std::sqrt(1 + e2 / (1 - e2)) * std::sqrt(1 - e2);
+    below += D * D < 1;
+  }
+  EXPECT_GT(below, 10);
+}
+
 // --- Stereographic ------------------------------------------------------------------------------
 
 TEST(Stereographic, TheSecantsStartAtFortyFiveDegrees) {
@@ -445,6 +462,53 @@ TEST(Albers, TheApexIsAHundredThousandthWide) {
   EXPECT_NEAR(p.x, 0.5e-5, 1e-20);
   EXPECT_NEAR(p.y, 0.5e5, 1e-9);
   EXPECT_NEAR(p.z, 0.25, 1e-15);
+}
+
+// --- Sinusoidal ---------------------------------------------------------------------------------
+
+TEST(Sinusoidal, AnOriginBeyondThePoleHasNoArcBeforeIt) {
+  // The latitude is the origin's own: no arc is asked for, and none fails.
+  const CoordinateTriple in = {0.3, 1.6, 0};
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 77;
+  TWsinusoidal_f(0.1, 1.6, kE, kE * kE, 0.25, 1, &in, &out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_EQ(out.y, 0);
+}
+
+TEST(Sinusoidal, AnArcAHairBeyondTheQuarterIsHeldAndTold) {
+  const CoordinateTriple in = {0.2, kHalf + 5e-13, 0};
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 0;
+  TWsinusoidal_i(0.1, 0, 0, 0, 0, 1, &in, &out, &status);
+  EXPECT_EQ(status, TW_I_LATITUDE_LIMITED);
+  expect_near(out, 0.1, kHalf, 0);
+}
+
+TEST(Sinusoidal, TheCentralMeridianIsTrue) {
+  for (double lat = -1.5; lat < 1.6; lat += 0.25) {
+    CoordinateTriple p = {0.1, lat, 0};
+    TWstatus status = 0;
+    TWsinusoidal_s(1, 0.1, kE * kE, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    // The fifth power of n, where the arc's series ends, is 1e-14.
+    EXPECT_NEAR(p.x, 1, 1e-13) << lat;
+    EXPECT_NEAR(p.y, 1, 1e-13) << lat;
+  }
+}
+
+// --- Rotated graticule --------------------------------------------------------------------------
+
+TEST(RotatedGraticule, ASineOfOneIsThePole) {
+  // A billionth from the pole and from its antipode the sine is 1 to the last bit.
+  for (const double sign : {1.0, -1.0}) {
+    const CoordinateTriple in = {sign > 0 ? 0.5 : 0.5 + kPi, sign * (0.6 - 1e-9), 0};
+    CoordinateTriple out = kUntouchedPoint;
+    TWstatus status = 0;
+    TWrotgrat_f(0.1, 0.2, 0.5, 0.6, 0.3, 1, &in, &out, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    EXPECT_EQ(out.y, sign * kHalf);
+  }
 }
 
 // --- The general inverse, step by step
