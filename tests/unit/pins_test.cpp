@@ -94,9 +94,9 @@ TEST(Chamberlin, PlacesOfTheSphere) {
     ASSERT_EQ(status, TW_SUCCESS);
     std::mt19937 random(3);
     std::uniform_real_distribution<double> lon(-3, -0.6), lat(-0.6, 1.5);
-    Points in(40), out = untouched(40);
+    Points in(1000), out = untouched(1000);
     for (CoordinateTriple& p : in) p = {lon(random), lat(random), 7};
-    TWchamtri_f(0, corners.data(), sides.data(), azimuths.data(), plane.data(), 40, in.data(),
+    TWchamtri_f(0, corners.data(), sides.data(), azimuths.data(), plane.data(), 1000, in.data(),
                 out.data(), &status);
     EXPECT_EQ(status, TW_SUCCESS);
     int inside = 0;
@@ -106,7 +106,7 @@ TEST(Chamberlin, PlacesOfTheSphere) {
       ++inside;
       expect_near(out[i], p.x, p.y, 7, 1e-13);
     }
-    EXPECT_GT(inside, 30);
+    EXPECT_GT(inside, 800);
   }
 }
 
@@ -462,6 +462,27 @@ TEST(Albers, TheApexIsAHundredThousandthWide) {
   EXPECT_NEAR(p.x, 0.5e-5, 1e-20);
   EXPECT_NEAR(p.y, 0.5e5, 1e-9);
   EXPECT_NEAR(p.z, 0.25, 1e-15);
+}
+
+// --- Bonne --------------------------------------------------------------------------------------
+
+TEST(Bonne, OnlyTheStandardParallelItselfIsTrue) {
+  // The scale of the parallel's opposite is that of any other latitude.
+  constexpr double lat1 = 0.7, d = 0.4;
+  const double r0 = 1 / std::tan(lat1) + lat1;
+  const auto h = [&](double lat) {
+    CoordinateTriple p = {0.1 + d, lat, 0};
+    TWstatus status = 0;
+    TWbonne_s(1, lat1, 0.1, 0, r0, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    return p.y;
+  };
+  EXPECT_EQ(h(lat1), 1);
+  for (const double lat : {-lat1, 0.3}) {
+    const double r = r0 - lat, g = (std::cos(lat) - r * std::sin(lat)) / r * d;
+    EXPECT_NEAR(h(lat), std::sqrt(g * g + 1), 1e-15);
+    EXPECT_GT(h(lat), 1.001);
+  }
 }
 
 // --- Sinusoidal ---------------------------------------------------------------------------------
