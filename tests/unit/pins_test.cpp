@@ -464,6 +464,56 @@ TEST(Albers, TheApexIsAHundredThousandthWide) {
   EXPECT_NEAR(p.z, 0.25, 1e-15);
 }
 
+// --- Perspective
+// ----------------------------------------------------------------------------------
+
+TEST(Perspective, TenPassesForTheConstants) {
+  // On an ellipsoid of no planet they are all used up, and each moves the result.
+  constexpr double e2 = 0.8 * 0.8, lat0 = 0.7, height = -0.3;
+  const double s = std::sin(lat0), c = std::cos(lat0), n1 = 1 / std::sqrt(1 - s * s * e2);
+  double lat = lat0, distance = 0, before = 0;
+  for (int pass = 0; pass < 10; ++pass) {
+    before = lat;
+    distance = c / std::cos(lat) * (height + n1);
+    lat = lat0 - std::asin(s * n1 * e2 * c / distance);
+  }
+  double p = kUntouched, phi_g = kUntouched;
+  TWstatus status = 0;
+  TWpersp_c(1, 0.8, lat0, height, 0, &p, &phi_g, &status);
+  EXPECT_EQ(status, TW_BAD_PARAMETER);
+  EXPECT_NEAR(p, distance, 1e-12);
+  EXPECT_NEAR(phi_g, lat, 1e-12);
+  EXPECT_GT(std::fabs(lat - before), 1e-10);
+}
+
+TEST(Perspective, TheSpheresConstants) {
+  double p = kUntouched, phi_g = kUntouched;
+  TWstatus status = 77;
+  TWpersp_c(6371000, 0, 0.7, 500000, 1000, &p, &phi_g, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_EQ(p, 501000.0 / 6371000 + 1);
+  EXPECT_EQ(phi_g, 0.7);
+}
+
+// --- Polyconic
+// ------------------------------------------------------------------------------------
+
+TEST(Polyconic, TheEquatorsScaleEndsAtItsLimit) {
+  // By contract the sphere's tangent is 0 / 0 hard by the equator, where the equator's own form,
+  // 1 + d^2 / 2, no longer serves.
+  const auto h = [](double lat) {
+    CoordinateTriple p = {0.2, lat, 0};
+    TWstatus status = 0;
+    TWpolycon_s(0, 0, 1, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    return p.y;
+  };
+  for (const double sign : {1.0, -1.0}) {
+    EXPECT_NEAR(h(sign * std::nextafter(1e-14, 0)), 1.02, 1e-15);
+    EXPECT_TRUE(std::isnan(h(sign * 1e-14)));
+  }
+}
+
 // --- Bonne --------------------------------------------------------------------------------------
 
 TEST(Bonne, OnlyTheStandardParallelItselfIsTrue) {
