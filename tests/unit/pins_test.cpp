@@ -514,6 +514,23 @@ TEST(Polyconic, TheEquatorsScaleEndsAtItsLimit) {
   }
 }
 
+// --- Lambert conformal
+// ----------------------------------------------------------------------------
+
+TEST(LambertConformal, HardByTheApexIsTheCentralMeridian) {
+  // A cone of n = 1 on the sphere: 5e-14 from the apex the latitude is not yet the pole's, and the
+  // angle at the apex counts as none.
+  for (const double x : {0.0, 3e-14, -3e-14}) {
+    const CoordinateTriple in = {x, 0.5, 0};
+    CoordinateTriple out = kUntouchedPoint;
+    TWstatus status = 0;
+    TWlam_i(0, 0.25, 1, 1, 0.5 + 5e-14, 1, &out, &in, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    EXPECT_EQ(out.x, 0.25) << x;
+    EXPECT_NEAR(out.y, kHalf, 1e-12);
+  }
+}
+
 // --- Bonne --------------------------------------------------------------------------------------
 
 TEST(Bonne, OnlyTheStandardParallelItselfIsTrue) {
