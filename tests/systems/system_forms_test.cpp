@@ -134,6 +134,41 @@ TEST(SystemNames, ProjStrings) {
   expect_refused("+proj=longlat +a=6378137 +es=-0.1", "+es must be from zero up to one");
 }
 
+TEST(SystemNames, PolarProjString) {
+  const Point south = forward(System("+proj=ups +south +ellps=WGS84"), 0, -90);
+  EXPECT_NEAR(south.x, 2e6, 1e-6);
+  EXPECT_NEAR(south.y, 2e6, 1e-6);
+  // Along the meridian of Greenwich y grows in the south and falls in the north.
+  EXPECT_GT(forward(System("+proj=ups +south +ellps=WGS84"), 0, -89).y, 2e6);
+  EXPECT_LT(forward(System("+proj=ups +ellps=WGS84"), 0, 89).y, 2e6);
+}
+
+TEST(SystemNames, SevenParametersInAProjString) {
+  const System bessel("geographic ellps=bessel towgs84=598.1,73.7,418.2,0.202,0.045,-2.455,6.7");
+  EXPECT_NE(bessel.to_proj().find("+towgs84=598.1,73.7,418.2,0.202,0.045,-2.455,6.7"),
+            std::string::npos)
+      << bessel.to_proj();
+}
+
+TEST(Transformations, AnEnsembleAndItsMemberAreOne) {
+  // Within the 2 m that the registry states of the ensemble.
+  const Transformation map(System("EPSG:4326"), System("EPSG:9057"));
+  EXPECT_EQ(map.target().code(), 9057);
+  const Point p = map.forward({7, 51});
+  EXPECT_NEAR(p.x, 7, 2e-5);
+  EXPECT_NEAR(p.y, 51, 2e-5);
+  EXPECT_LE(map.accuracy(), 2);
+}
+
+TEST(Transformations, AnAreaMayBeAPoint) {
+  TransformationOptions options;
+  options.area = Area{"", 2, 47, 2, 47};
+  const Transformation map(System("EPSG:4230"), System("EPSG:4326"), options);
+  const Point p = map.forward({2, 47});
+  EXPECT_GT(std::fabs(p.x - 2), 1e-5);
+  EXPECT_LT(std::fabs(p.x - 2), 3e-3);
+}
+
 TEST(Lines, OfNoPlaceAreNone) {
   constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
   const Geodesic geodesic(6378137, 1 / 298.257223563);
