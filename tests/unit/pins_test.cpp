@@ -415,6 +415,33 @@ TEST(AzimuthalEqualArea, TheOriginOfAnOblique) {
   }
 }
 
+TEST(AzimuthalEquidistant, TheWholeSphereThereAndBack) {
+  // Distance and azimuth of the sphere forward; back, the side of the quarter turn is found again.
+  int beyond = 0;
+  for (const double lat0 : {0.0, 0.6, -0.6, 1.2, -1.3}) {
+    double n1 = 0, g = 0;
+    TWaz_eq_c(0, lat0, &n1, &g);
+    for (double lon = -3; lon < 3.1; lon += 0.37) {
+      for (double lat = -1.5; lat < 1.51; lat += 0.23) {
+        const CoordinateTriple in = {0.1 + lon, lat, 0};
+        const Arc arc({0.1, lat0, 0}, in);
+        if (arc.distance > 3) continue;  // the antipode is a circle
+        CoordinateTriple p = in;
+        TWstatus status = 0;
+        TWaz_eq_f(0, 0.1, lat0, n1, g, 1, &p, &p, &status);
+        EXPECT_EQ(status, TW_SUCCESS);
+        expect_near(p, static_cast<double>(arc.distance * std::sin(arc.azimuth)),
+                    static_cast<double>(arc.distance * std::cos(arc.azimuth)), 1e-12);
+        TWaz_eq_i(0, 0.1, lat0, n1, 1, &p, &p, &status);
+        EXPECT_EQ(status, TW_SUCCESS);
+        expect_near(p, in.x, in.y, 1e-11);
+        beyond += std::fabs(lon) > 1.6;
+      }
+    }
+  }
+  EXPECT_GT(beyond, 200);
+}
+
 // --- Albers -------------------------------------------------------------------------------------
 
 TEST(Albers, WhatTheSpheresFanDoesNotHold) {
