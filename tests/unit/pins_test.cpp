@@ -415,6 +415,24 @@ TEST(AzimuthalEqualArea, TheOriginOfAnOblique) {
   }
 }
 
+TEST(AzimuthalEqualArea, APolarMapIsTrueHardByItsPole) {
+  for (const double sign : {1.0, -1.0}) {
+    double e2 = 0, q1 = 0, qp = 0, rq = 0, m1 = 0, sin_b1 = 0, cos_b1 = 0, sin_lat0 = 0;
+    double cos_lat0 = 0, D = 0;
+    TWstatus status = 0;
+    TWlam_az_eq_c(kE, 0.25, sign * kHalf, &e2, &q1, &qp, &rq, &m1, &sin_b1, &cos_b1, &sin_lat0,
+                  &cos_lat0, &D, &status);
+    for (const double off : {1e-2, 1e-3, 1e-4, 1e-5}) {
+      CoordinateTriple p = {0.3, sign * (kHalf - off), 0};
+      TWlam_az_eq_s(&p, 1, 0.25, sign * kHalf, kE, e2, qp, 1, sin_lat0, cos_lat0, &p, &status);
+      EXPECT_EQ(status, TW_SUCCESS);
+      // What is left of qp - q has 16 digits less those of the square of the distance.
+      EXPECT_NEAR(p.x, 1, off * off + 1e-16 / (off * off) * 4);
+      EXPECT_NEAR(p.y, 1, off * off + 1e-16 / (off * off) * 4);
+    }
+  }
+}
+
 TEST(AzimuthalEquidistant, TheWholeSphereThereAndBack) {
   // Distance and azimuth of the sphere forward; back, the side of the quarter turn is found again.
   int beyond = 0;
