@@ -12,6 +12,7 @@
 
 #include "datum/grid_file.hpp"
 #include "formulas/wraps.hpp"
+#include "foundation/new_array.hpp"
 #include "tidewater/national_grid.h"
 
 using namespace tidewater::detail;
@@ -391,9 +392,9 @@ TWstatus read_headers() {
   // Each sub-grid has a header: a damaged count must not ask for a table larger than the file.
   constexpr auto kBytes = static_cast<int64_t>(kHeaderBytes);
   if (num_file < 0 || num_file > length_of(held.file) / kBytes - 1) return TW_GSB_READ_ERROR;
-  held.subgrids = new (std::nothrow) CntSubGrid[static_cast<std::size_t>(num_file)];
+  held.subgrids = new_array<CntSubGrid>(static_cast<uint64_t>(num_file)).release();
   opened_grids->subgrids = held.subgrids;
-  held.children = new (std::nothrow) Child[static_cast<std::size_t>(num_file)];
+  held.children = new_array<Child>(static_cast<uint64_t>(num_file)).release();
   opened_grids->children = held.children;
   if (!held.subgrids || !held.children) return TW_NO_MEMORY;
   int64_t record = kHeaderRecords;

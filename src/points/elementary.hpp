@@ -289,7 +289,7 @@ TW_INLINE V expm1(V x) {
   const V scale = power_of_two(p.k);
   const V inner = p.r + p.tail;
   V result = (scale - 1.0) + scale * inner;
-  result = number(bits(result) | (bits(x) & Bits<V>(INT64_MIN)));  // of zero too
+  result = copysign(result, x);  // of zero too
   mend(far, result, [&](int i) { return far_exp(lane(x, i)) - 1.0; });
   return result;
 }
@@ -313,7 +313,7 @@ TW_INLINE SinhCosh<V> sinhcosh(V x) {
 template <Number V>
 TW_INLINE V tanh(V x) {
   const V m = expm1(2.0 * lesser(abs(x), V(30.0)));
-  const V value = select(x == x, m / (m + 2.0), x);
+  const V value = select(x == x, m / (m + 2.0), x);  // NOLINT(misc-redundant-expression)
   return copysign(value, x);
 }
 

@@ -115,6 +115,7 @@ class Geoid : public ::testing::Test {
 };
 
 TEST_F(Geoid, HeadersFillTheBlock) {
+  TIDEWATER_NOT_ON_WINDOWS("no file name has an asterisk");
   write_grid(folder, "first", {-100.1F, 20, 60, 50, place, 0.1F, 0.5F});
   write_grid(folder, "second", {-50, -20, 25, 27, place, 2, 3});
   folder.write("area.par",
@@ -679,6 +680,18 @@ TEST_F(Geoid, FileCutAtEachRecord) {
       loaded.expect_data_untouched();
     }
   }
+}
+
+TEST_F(Geoid, TheSamePointAskedAgainIsServedFromTheOldNodes) {
+  // By contract: the bounds are those of the window that could not be read.
+  write_grid(folder, "g", {-100, 20, 60, 60, [](int r, int) { return r < 30 ? 1.0F : 2.0F; }});
+  const Opened<GeoidControl> opened = open(folder, {"g"});
+  EXPECT_EQ(Undulation(opened.control, -70, 25.25).n, 1);
+  fs::resize_file(folder.path() / "g.geo", 5);
+  EXPECT_EQ(Undulation(opened.control, -70, 70.25).status, TW_GEOID_READ_ERROR);
+  const Undulation again(opened.control, -70, 70.25);
+  EXPECT_EQ(again.status, TW_SUCCESS);
+  EXPECT_EQ(again.n, 1);
 }
 
 TEST_F(Geoid, HeadersOfImpossibleSizes) {
