@@ -144,6 +144,33 @@ def _skew(e, a, b, constant, lon0, gamma, rectified):
     return forward
 
 
+def two_point(e, lat_c, lat1, lon1, lat2, lon2):
+    """The oblique Mercator through two points (Snyder 1987, eq. 9-11 to 9-13, 9-15 to 9-24)."""
+    a, b, d = _aposphere(e, lat_c)
+    sign = -1 if lat_c < 0 else 1
+    constant = mp.log(d + sign * mp.sqrt(d * d - 1)) - b * isometric(e, lat_c)
+    h, l, big_e = (mp.exp(-b * isometric(e, lat1)), mp.exp(-b * isometric(e, lat2)), mp.exp(constant))
+    f = big_e / h
+    j = (big_e ** 2 - l * h) / (big_e ** 2 + l * h)
+    p = (l - h) / (l + h)
+    lon0 = (lon1 + lon2) / 2 - mp.atan(j * mp.tan(b * (lon1 - lon2) / 2) / p) / b
+    gamma = mp.atan(2 * mp.sin(b * (lon1 - lon0)) / (f - 1 / f))
+    return _skew(e, a, b, constant, lon0, gamma, mp.asin(d * mp.sin(gamma)))
+
+
+def swiss(e, lon0, lat0):
+    """Rosenmund 1903: the conformal sphere, and its oblique Mercator through the origin."""
+    _, _, radius, chi0, mapping = gauss_sphere(e, lat0)
+
+    def forward(lon, lat):
+        l, b = mapping(lon - lon0, lat)
+        u = mp.asin(mp.cos(chi0) * mp.sin(b) - mp.sin(chi0) * mp.cos(b) * mp.cos(l))
+        v = mp.asin(mp.cos(b) * mp.sin(l) / mp.cos(u))
+        return radius * v, radius * isometric(0, u)
+
+    return forward
+
+
 def rectified_skew(e, lon_c, lat_c, skew):
     """Hotine's rectified skew orthomorphic: the line's angle at the equator is given."""
     a, b, d = _aposphere(e, lat_c)
@@ -222,6 +249,36 @@ def equidistant_conic(e, lon0, lat0, lat1, lat2):
     return cone(lambda lat: g - arc(e, lat), n, lon0, lat0)
 
 
+def near_conformal(e, lon0, lat0, k0):
+    """Lambert's near-conformal cone: EPSG Guidance Note 7-2, method 9817, the arc exact."""
+    third = 1 / (6 * rho(e, lat0) * nu(e, lat0))
+    r0 = k0 * nu(e, lat0) * mp.cot(lat0)
+
+    def forward(lon, lat):
+        m = arc(e, lat) - arc(e, lat0)
+        along = k0 * (m + third * m ** 3)
+        theta = (lon - lon0) * mp.sin(lat0)
+        x = (r0 - along) * mp.sin(theta)
+        return x, along + x * mp.tan(theta / 2)
+
+    return forward
+
+
+def oblique_lambert(e, lon0, lat0, d1, d2, pole_lon, pole_lat):
+    """A cone about a pole: the conformal sphere, turned, and Lambert's cone, in the sphere's radius."""
+    _, _, _, _, mapping = gauss_sphere(e, lat0 + (d1 + d2) / 2)
+    turn = rotated(*mapping(pole_lon, pole_lat))
+    o_lon, o_lat = turn(*mapping(lon0, lat0))
+    plane = lambert_conformal(0, 0, o_lat, o_lat + d1, o_lat + d2)
+
+    def forward(lon, lat):
+        l, p = turn(*mapping(lon, lat))
+        d = l - o_lon
+        return plane(d - 2 * PI * mp.floor(d / (2 * PI) + mp.mpf(1) / 2), p)
+
+    return forward
+
+
 def polyconic(e, lon0, lat0):
     m0 = arc(e, lat0)
 
@@ -274,6 +331,30 @@ def krovak(e):
         theta = n * d
         r = r0 * (mp.tan(PI / 4 + lat_p / 2) / mp.tan(s / 2 + PI / 4)) ** n
         return -r * mp.sin(theta), -r * mp.cos(theta)
+
+    return forward
+
+
+def modified_krovak(e, a):
+    """EPSG Guidance Note 7-2, method 1042: a polynomial of degree four taken off Krovak's plane."""
+    c = [None] + [mp.mpf(v) for v in (
+        "2.946529277e-2", "2.515965696e-2", "1.193845912e-7", "-4.668270147e-7", "9.233980362e-12",
+        "1.523735715e-12", "1.696780024e-18", "4.408314235e-18", "-8.331083518e-24",
+        "-3.689471323e-24")]
+    plane = krovak(e)
+
+    def forward(lon, lat):
+        westing, southing = (-v * a for v in plane(lon, lat))
+        x, y = southing - 1089000, westing - 654000
+        dx = (c[1] + c[3] * x - c[4] * y - 2 * c[6] * x * y + c[5] * (x * x - y * y)
+              + c[7] * x * (x * x - 3 * y * y) - c[8] * y * (3 * x * x - y * y)
+              + 4 * c[9] * x * y * (x * x - y * y)
+              + c[10] * (x ** 4 + y ** 4 - 6 * x * x * y * y))
+        dy = (c[2] + c[3] * y + c[4] * x + 2 * c[5] * x * y + c[6] * (x * x - y * y)
+              + c[8] * x * (x * x - 3 * y * y) + c[7] * y * (3 * x * x - y * y)
+              - 4 * c[10] * x * y * (x * x - y * y)
+              + c[9] * (x ** 4 + y ** 4 - 6 * x * x * y * y))
+        return (dy - westing) / a, (dx - southing) / a
 
     return forward
 
@@ -485,6 +566,76 @@ def perspective(e, lon0, lat0, h):
     return forward
 
 
+def tilted_perspective(lon0, lat0, h, tilt, azimuth):
+    """On a camera's plane, of the sphere (Snyder 1987, eq. 23-3 and 23-11 to 23-13)."""
+    vertical = perspective(0, lon0, lat0, h)
+
+    def forward(lon, lat):
+        x, y = vertical(lon, lat)
+        up = y * mp.cos(azimuth) + x * mp.sin(azimuth)
+        size = up * mp.sin(tilt) / h + mp.cos(tilt)
+        return (x * mp.cos(azimuth) - y * mp.sin(azimuth)) * mp.cos(tilt) / size, up / size
+
+    return forward
+
+
+# --- series that define a method of the registry (EPSG Guidance Note 7-2) ----------------------
+
+
+def cassini_series(e, lon0, lat0, hyperbolic=False):
+    """Methods 9806 and 9833."""
+    def forward(lon, lat):
+        t, c = mp.tan(lat) ** 2, e * e * mp.cos(lat) ** 2 / (1 - e * e)
+        a = (lon - lon0) * mp.cos(lat)
+        x = nu(e, lat) * (a - t * a ** 3 / 6 - (8 - t + 8 * c) * t * a ** 5 / 120)
+        y = arc(e, lat) - arc(e, lat0) + nu(e, lat) * mp.tan(lat) * (
+            a ** 2 / 2 + (5 - t + 6 * c) * a ** 4 / 24)
+        return x, y - y ** 3 / (6 * rho(e, lat) * nu(e, lat)) if hyperbolic else y
+
+    return forward
+
+
+def modified_equidistant(e, lon0, lat0):
+    """Method 9832."""
+    n0 = nu(e, lat0)
+    g = e * mp.sin(lat0) / mp.sqrt(1 - e * e)
+
+    def forward(lon, lat):
+        d = lon - lon0
+        psi = mp.atan((1 - e * e) * mp.tan(lat)
+                      + e * e * n0 * mp.sin(lat0) / (nu(e, lat) * mp.cos(lat)))
+        alpha = mp.atan2(mp.sin(d), mp.cos(lat0) * mp.tan(psi) - mp.sin(lat0) * mp.cos(d))
+        h = e * mp.cos(lat0) * mp.cos(alpha) / mp.sqrt(1 - e * e)
+        s = mp.asin(mp.sin(d) * mp.cos(psi) / mp.sin(alpha))
+        c = n0 * s * (1 - s ** 2 * h ** 2 * (1 - h ** 2) / 6
+                      + s ** 3 / 8 * g * h * (1 - 2 * h ** 2)
+                      + s ** 4 / 120 * (h ** 2 * (4 - 7 * h ** 2) - 3 * g ** 2 * (1 - 7 * h ** 2))
+                      - s ** 5 / 48 * g * h)
+        return c * mp.sin(alpha), c * mp.cos(alpha)
+
+    return forward
+
+
+def guam(e, lon0, lat0):
+    """Method 9831."""
+    def forward(lon, lat):
+        x = nu(e, lat) * mp.cos(lat) * (lon - lon0)
+        return x, arc(e, lat) - arc(e, lat0) + x * x * mp.tan(lat) / (2 * nu(e, lat))
+
+    return forward
+
+
+def colombia_urban(e, lon0, lat0, h):
+    """Method 1052; h in units of the axis."""
+    def forward(lon, lat):
+        east = nu(e, lat) * mp.cos(lat) * (lon - lon0)
+        b = mp.tan(lat0) / (2 * rho(e, lat0) * nu(e, lat0))
+        g = 1 + h / rho(e, (lat + lat0) / 2)
+        return (1 + h / nu(e, lat0)) * east, g * rho(e, lat0) * (lat - lat0 + b * east ** 2)
+
+    return forward
+
+
 # --- world maps --------------------------------------------------------------------------------
 
 
@@ -572,8 +723,8 @@ class SpaceOblique:
         big_h = mp.sqrt(one / two) * (two / one ** 2 - self.p * self.c)
         return big_s, big_h, mp.sqrt(self.j ** 2 + big_s ** 2)
 
-    def forward(self, lon, lat, start):
-        """start: an angle along the orbit near that of the point."""
+    def along_and_across(self, lon, lat, start):
+        """Angle along the orbit, near start, and the distance from the track on the map."""
         tangent = (1 - self.e2) * self.s * mp.tan(lat)
         angle = start
         for _ in range(500):
@@ -584,7 +735,12 @@ class SpaceOblique:
             if step < mp.mpf(10) ** -40:
                 break
         sine = ((1 - self.e2) * self.c * mp.sin(lat) - self.s * mp.cos(lat) * mp.sin(turned))
-        y0 = mp.atanh(sine / mp.sqrt(1 - self.e2 * mp.sin(lat) ** 2))
+        return angle, mp.atanh(sine / mp.sqrt(1 - self.e2 * mp.sin(lat) ** 2))
+
+    def forward(self, lon, lat, start):
+        return self.plane(*self.along_and_across(lon, lat, start))
+
+    def plane(self, angle, offset):
         big_s, _, size = self.terms(angle)
 
         def along(v):
@@ -596,8 +752,76 @@ class SpaceOblique:
             return s * (h + self.j) / d
 
         pieces = [angle * k / 4 for k in range(5)]
-        return (mp.quad(along, pieces) - big_s / size * y0,
-                mp.quad(across, pieces) + self.j / size * y0)
+        return (mp.quad(along, pieces) - big_s / size * offset,
+                mp.quad(across, pieces) + self.j / size * offset)
+
+
+class RolledTrack(SpaceOblique):
+    """The same plane, on which the track bends as it bends on the ground.
+
+    Snyder 1981 (USGS Bulletin 1518), the general orbit: the direction of the track's image is the
+    integral of its geodesic curvature, the image that of its direction.  The curvature is taken from
+    the ellipsoid itself, by Liouville's formula; integrals by their Fourier series, whose terms fall
+    below the last digit.
+    """
+
+    SAMPLES = 96
+
+    def __init__(self, e, inclination, ratio, node):
+        super().__init__(e, inclination, ratio, node)
+        angles = [2 * PI * j / self.SAMPLES for j in range(self.SAMPLES)]
+        speed = [mp.hypot(*self.terms(v)[:2]) for v in angles]
+        self.turning = self._series([self._bend(v) for v in angles])
+        assert abs(self.turning[0]) < mp.mpf(10) ** -40  # the track closes on a circular orbit
+        way = [self.direction(v) for v in angles]
+        self.east = self._series([v * mp.sin(t) for v, t in zip(speed, way)])
+        self.north = self._series([v * mp.cos(t) for v, t in zip(speed, way)])
+
+    def _ground(self, angle):
+        """Velocity towards east and north of the point below the satellite; latitude, its meridian's."""
+        g = 1 - self.e2
+        e = mp.sqrt(self.e2)
+        geocentric_lat = mp.asin(self.s * mp.sin(angle))
+        c2 = mp.cos(geocentric_lat) ** 2
+        lat = mp.atan(mp.tan(geocentric_lat) / g)
+        lon_rate = self.c / c2 - self.p
+        lat_rate = mp.cos(lat) ** 2 / (g * c2) * self.s * mp.cos(angle) / mp.sqrt(c2)
+        return parallel(e, lat) * lon_rate, rho(e, lat) * lat_rate, mp.sin(lat) * lon_rate
+
+    def _bend(self, angle):
+        """How fast the track turns to its right."""
+        east, north, meridian = self._ground(angle)
+        d_east = mp.diff(lambda v: self._ground(v)[0], angle)
+        d_north = mp.diff(lambda v: self._ground(v)[1], angle)
+        return (d_east * north - east * d_north) / (east ** 2 + north ** 2) - meridian
+
+    def _series(self, values):
+        """Mean, cosine and sine coefficients of samples of a period."""
+        n = len(values)
+        unit = [mp.expjpi(mp.mpf(2 * j) / n) for j in range(n)]
+        terms = [2 * sum(v * unit[j * k % n] for j, v in enumerate(values)) / n
+                 for k in range(1, n // 2)]
+        return [sum(values) / n, [t.real for t in terms], [t.imag for t in terms]]
+
+    @staticmethod
+    def _integral(series, angle):
+        mean, cosines, sines = series
+        return mean * angle + sum((c * mp.sin(k * angle) + s * (1 - mp.cos(k * angle))) / k
+                                  for k, (c, s) in enumerate(zip(cosines, sines), 1))
+
+    def direction(self, angle):
+        """Of the track's image, to the right of the second axis."""
+        return self._integral(self.turning, angle)
+
+    def plane(self, angle, offset):
+        big_s, big_h, _ = self.terms(angle)
+        size, turn = mp.hypot(big_s, big_h), self.direction(angle)
+        left = (big_h * mp.cos(turn) - big_s * mp.sin(turn)) / size
+        ahead = (big_s * mp.cos(turn) + big_h * mp.sin(turn)) / size
+        x = self._integral(self.east, angle) - offset * left
+        y = self._integral(self.north, angle) + offset * ahead
+        m_x, m_y = self.east[0], self.north[0]
+        return (x * m_x + y * m_y) / mp.hypot(m_x, m_y), (y * m_x - x * m_y) / mp.hypot(m_x, m_y)
 
 
 # --- distortion --------------------------------------------------------------------------------

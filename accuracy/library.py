@@ -147,7 +147,11 @@ _last_error = _function("tw_last_error", _T)
 _system = _function("tw_system_create", _V, _T)
 _transformation = _function("tw_transformation_create", _V, _V, _V, _V)
 _transform = _function("tw_transform", _S, _V, _I, _S, _P, _P, _V, ctypes.c_uint32)
+_system_method = _function("tw_system_method", _S, _V, _T, _S)
 _projection_of = _function("tw_projection_of", _V, _V)
+_projection = _function("tw_projection_create", _V, _T, _S, _V, _V, _D, _D)
+_method_count = _function("tw_projection_method_count", _S)
+_method_name = _function("tw_projection_method", _S, _S, _T, _S)
 _project = _function("tw_project", _S, _V, _I, _S, _P, _P, _V, ctypes.c_uint32)
 _factors = _function("tw_project_factors", _S, _V, _S, _P, _V, _V)
 _lines = _function("tw_lines_create", _V, _I, _D, _D)
@@ -157,6 +161,7 @@ _polygon = _function("tw_lines_polygon", None, _V, _S, *[_V] * 4)
 _model = _function("tw_magnetic_model_create", _V, _T, _D)
 _field = _function("tw_magnetic_field", _S, _V, _S, _P, _V, _V)
 _parse_angle = _function("tw_parse_angle", _I, _T, _I, _I, _V)
+_parse_position = _function("tw_parse_position", _I, _T, _I, _I, _V)
 _format_mgrs = _function("tw_format_mgrs", _S, _D, _D, _I, _T, _S)
 _parse_mgrs = _function("tw_parse_mgrs", _I, _T, _V)
 
@@ -180,11 +185,24 @@ def _of(columns):
 
 
 class Projection:
-    """The projection of a definition ("albers lat1=44 ... ellps=GRS80"), degrees and metres."""
+    """The projection of a definition ("albers lat1=44 ... ellps=GRS80"), degrees and metres.
 
-    def __init__(self, definition):
-        self.system = _made(_system(definition.encode()), definition)
-        self.handle = _made(_projection_of(self.system), definition)
+    Or of a method and its parameters by their names, on an ellipsoid of that axis and flattening.
+    """
+
+    def __init__(self, definition, parameters=None, a=0.0, inverse_flattening=0.0):
+        if parameters is None:
+            system = _made(_system(definition.encode()), definition)
+            self.handle = _made(_projection_of(system), definition)
+            text = ctypes.create_string_buffer(200)
+            _system_method(system, text, 200)
+            self.method = text.value.decode()
+        else:
+            names = (ctypes.c_char_p * len(parameters))(*(name.encode() for name in parameters))
+            values = (_D * len(parameters))(*parameters.values())
+            self.handle = _made(_projection(definition.encode(), len(parameters), names, values, a,
+                                            inverse_flattening), definition)
+            self.method = definition
 
     def _run(self, inverse, array):
         given, out = _columns(array), _columns(np.zeros((len(array), 3)))
@@ -201,6 +219,16 @@ class Projection:
         given, out = _columns(array), (Factors * len(array))()
         _factors(self.handle, len(array), _of(given), out, None)
         return np.array([[getattr(f, name) for name, _ in Factors._fields_] for f in out])
+
+
+def methods():
+    """The names of the methods of projection."""
+    text = ctypes.create_string_buffer(200)
+    names = []
+    for i in range(_method_count()):
+        _method_name(i, text, 200)
+        names.append(text.value.decode())
+    return names
 
 
 class Options(ctypes.Structure):
@@ -260,6 +288,13 @@ def parse_angle(text):
     value = np.full(1, np.nan)
     _parse_angle(text.encode(), 0, 0, value.ctypes.data)
     return value[0]
+
+
+def parse_position(text):
+    """Longitude and latitude of a text that gives the latitude first."""
+    position = np.full(3, np.nan)
+    _parse_position(text.encode(), 2, 0, position.ctypes.data)
+    return position[:2]
 
 
 def mgrs_of(lon, lat, digits):

@@ -10,8 +10,11 @@ import formulas
 A, INVERSE_F = 6378137.0, 298.257222101  # GRS 1980
 E2 = (2 - 1 / INVERSE_F) / INVERSE_F
 E = float(np.sqrt(E2))
+FLAT = 1 / INVERSE_F
 DEGREE = np.pi / 180
 NONE = "–"
+MP = "formula, 50 digits"
+e = mp.mpf(E)  # as the library is given it
 
 
 def scatter(low, high, count):
@@ -104,6 +107,12 @@ class Row:
 def distortions(e, reference, points):
     return [formulas.distortion(e, reference, mp.mpf(float(p[0])), mp.mpf(float(p[1])))
             for p in points]
+
+
+def in_turn(*sources):
+    """The rows of several functions."""
+    for source in sources:
+        yield from source()
 
 
 def relative(truth, got):

@@ -6,11 +6,8 @@ from geographiclib.geodesic import Geodesic
 
 import formulas as f
 from library import contract, points
-from measure import (A, DEGREE, E, E2, Error, Row, apart, distortions, exactly, on_the_ground,
-                     relative, rounded, scatter)
-
-MP = "formula, 50 digits"
-e = mp.mpf(E)
+from measure import (A, DEGREE, E, MP, Error, Row, apart, distortions, e, exactly, in_turn,
+                     on_the_ground, relative, rounded, scatter)
 
 
 def geographic(low, high, count=400):
@@ -85,12 +82,7 @@ def geodesic_row(name, stem, domain, box, reference, constants, more, note, scal
 
 
 def rows():
-    yield from cylinders()
-    yield from cones()
-    yield from azimuthal()
-    yield from oblique()
-    yield from world()
-    yield from special()
+    return in_turn(cylinders, cones, azimuthal, oblique, world, special)
 
 
 def cylinders():
@@ -110,6 +102,9 @@ def cylinders():
                      f"lon within {width}, lat -84 to 84", ((-width, -84), (width, 84)),
                      f.transverse_mercator(e, 0, 0), tm, more={"lat0": 0.0}, scale=("k", "k"),
                      note=note or "meridian series; systems layer: nm", count=300)
+    yield family("Transverse Mercator, next to the poles", "TWt_merc", "lon within 3, lat 84 to 89.9",
+                 ((-3, 84), (3, 89.9)), f.transverse_mercator(e, 0, 0), tm, more={"lat0": 0.0},
+                 note="By contract the inverse takes the sphere where the series departs from it", count=200)
     yield scaled_transverse(tm)
     gauss = contract("TWgaussII_c", e=E, lat0=45 * DEGREE)
     _, _, _, _, mapping = f.gauss_sphere(e, rad(45)[0])
@@ -231,23 +226,11 @@ def krovak_row():
 
 
 def oblique_lambert_row():
-    """A cone about a pole: sphere, turn, Lambert, by the formulas of each."""
     lon0, lat0, pole_lon, pole_lat = (v * DEGREE for v in (0, 45, 0, 60))
     k = contract("TWo_lam_c", e=E, lon0=lon0, lat0=lat0, d1=-3 * DEGREE, d2=4 * DEGREE, azimuth=0.0,
                  use_azimuth=0, pole_lon=np.array([pole_lon]), pole_lat=np.array([pole_lat]))
-    at = mp.mpf(lat0) + (mp.mpf(-3 * DEGREE) + mp.mpf(4 * DEGREE)) / 2
-    _, _, _, _, mapping = f.gauss_sphere(e, at)
-    s_lon, s_lat = mapping(mp.mpf(pole_lon), mp.mpf(pole_lat))
-    turn = f.rotated(s_lon, s_lat)
-    o_lon, o_lat = turn(*mapping(mp.mpf(lon0), mp.mpf(lat0)))
-    cone = f.lambert_conformal(0, 0, o_lat, o_lat + mp.mpf(-3 * DEGREE), o_lat + mp.mpf(4 * DEGREE))
-
-    def reference(lon, lat):
-        l, p = turn(*mapping(lon, lat))
-        d = l - o_lon
-        d -= 2 * mp.pi * mp.floor(d / (2 * mp.pi) + mp.mpf(1) / 2)
-        return cone(d, p)
-
+    reference = f.oblique_lambert(e, *(mp.mpf(v) for v in (lon0, lat0, -3 * DEGREE, 4 * DEGREE,
+                                                            pole_lon, pole_lat)))
     row = family("Oblique Lambert", "TWo_lam", "lon within 12, lat 35 to 55", ((-12, 35), (12, 55)),
                  reference, k, more={"turn": 0.0}, scale=("k", "k"), count=200)
     row.note = "scale of the cone alone, without that of the conformal sphere"
@@ -262,11 +245,13 @@ def bipolar_row():
     exact = rounded(exactly(f.bipolar(), degrees * DEGREE))
     got = points("TWbipocc_f", degrees * DEGREE, **k)[:, :2]
     size = 6370997.0
-    return Row("Bipolar oblique conic", "`TWbipocc_f`, `TWbipocc_i`",
-               "sphere, 110 to 50 W, 40 S to 60 N", MP, 400,
-               Error.of(size * np.hypot(*(got - exact).T)),
-               Error.of(on_the_ground(size, degrees * DEGREE, points("TWbipocc_i", got, **k))),
-               note="inverse: the way back, whose iteration ends at 1e-10")
+    back = on_the_ground(size, degrees * DEGREE, points("TWbipocc_i", got, **k))
+    row = Row("Bipolar oblique conic", "`TWbipocc_f`, `TWbipocc_i`",
+              "sphere, 110 to 50 W, 40 S to 60 N", MP, 400,
+              Error.of(size * np.hypot(*(got - exact).T)), Error.of(back),
+              note="inverse: the way back, whose iteration ends at 1e-10")
+    row.extra.update(place=degrees * DEGREE, error=back)
+    return row
 
 
 def state_plane():
@@ -359,9 +344,10 @@ def azimuthal():
             line["azi1"] * DEGREE)
 
     k = contract("TWaz_eq_c", e=E, lat0=lat0)
-    for reach, box in ((600, ((-7, 45.5), (7, 54.5))), (2000, ((-25, 34), (25, 65)))):
-        yield geodesic_row(f"Azimuthal equidistant, {reach} km", "TWaz_eq",
-                           f"about {reach} km round 50 N", box, equidistant, k,
+    for reach, box in ((100, ((-1.2, 49.3), (1.2, 50.7))), (600, ((-7, 45.5), (7, 54.5))),
+                       (2000, ((-25, 34), (25, 65))), (5000, ((-60, 10), (60, 85)))):
+        yield geodesic_row(f"Azimuthal equidistant, {reach:,} km", "TWaz_eq",
+                           f"about {reach:,} km round 50 N", box, equidistant, k,
                            {"lon0": 0.0, "lat0": lat0},
                            "systems layer: the geodesics themselves, nm over the whole earth")
     cassini = contract("TWcassini_c", e=E, lat0=0.0)
@@ -473,6 +459,9 @@ def world():
     size = 6370997.0
     yield family("Mollweide", "TWmollweide", "sphere, lat -89.5 to 89.5", ((-180, -89.5), (180, 89.5)),
                  f.mollweide(0), contract("TWmollweide_c", lat0=0.0), axis=size, ecc=0.0)
+    yield family("Mollweide, next to the poles", "TWmollweide", "sphere, lat 89.5 to 89.999",
+                 ((-180, 89.5), (180, 89.999)), f.mollweide(0), contract("TWmollweide_c", lat0=0.0),
+                 axis=size, ecc=0.0, count=200)
     yield family("Eckert IV", "TWeckertIV", "sphere, lat -89.9 to 89.9", ((-180, -89.9), (180, 89.9)),
                  f.eckert4(0), contract("TWeckertIV_c", lat0=0.0), axis=size, ecc=0.0)
     yield family("Van der Grinten", "TWvdg", "sphere, lat -89 to 89, off the axes",
@@ -580,10 +569,12 @@ def malaya_row():
     k = {"table": table, "lon0": lon_c, "lat0": lat_c}
     got = points("TWmalaya_f", place, **k)[:, :2] * a * k0
     back = points("TWmalaya_i", got + [p["false_easting"][0], p["false_northing"][0]], **k)
-    return Row("Malaya grid", "`TWmalaya_f`, `TWmalaya_i`", "100 to 104 E, 1.3 to 6.5 N",
-               "the skew projection, 50 digits", 200, Error.of(np.hypot(*(got - exact).T)),
-               Error.of(on_the_ground(a, place, back)),
-               note="polynomials of degree five on the grid's own origin; `TWrso_f` is exact; inverse: the way back")
+    row = Row("Malaya grid", "`TWmalaya_f`, `TWmalaya_i`", "100 to 104 E, 1.3 to 6.5 N",
+              "the skew projection, 50 digits", 200, Error.of(np.hypot(*(got - exact).T)),
+              Error.of(on_the_ground(a, place, back)),
+              note="polynomials of degree five on the grid's own origin; `TWrso_f` is exact; inverse: the way back")
+    row.extra.update(place=place, error=np.hypot(*(got - exact).T))
+    return row
 
 
 def indian_row():
@@ -593,10 +584,12 @@ def indian_row():
     reference = f.polyconic(e, mp.mpf(78 * DEGREE), mp.mpf(20 * DEGREE))
     exact = exactly(reference, place)
     got = points("TWind_phed_f", place, **k)
-    return Row("Indian polyhedric", "`TWind_phed_f`, `TWind_phed_i`", "within 2 degrees of the origin",
-               "polyconic, 50 digits", 200, Error.of(A * apart(exact, got)),
-               Error.of(on_the_ground(A, place, points("TWind_phed_i", got[:, :2], **k))),
-               note="two orders of a series; inverse: the way back")
+    row = Row("Indian polyhedric", "`TWind_phed_f`, `TWind_phed_i`", "within 2 degrees of the origin",
+              "polyconic, 50 digits", 200, Error.of(A * apart(exact, got)),
+              Error.of(on_the_ground(A, place, points("TWind_phed_i", got[:, :2], **k))),
+              note="two orders of a series; inverse: the way back")
+    row.extra.update(place=place, error=A * apart(exact, got))
+    return row
 
 
 def rotated_row():
@@ -614,17 +607,9 @@ def rotated_row():
                Error.of(on_the_ground(A, exact, got)), Error.of(on_the_ground(A, place, back)))
 
 
-def chamberlin_row():
-    """By its definition: circles of the geodesic distances round the corners, and their mean."""
+def chamberlin_by_definition(corners, plane):
+    """Circles of the geodesic distances round the corners, and the mean of where they meet."""
     g = Geodesic(1.0, 1 / 298.257222101)
-    corners = np.array([[-20.0, 30.0], [20.0, 30.0], [0.0, 60.0]])
-    control = np.column_stack([corners * DEGREE, np.zeros(3)])
-    plane = np.zeros((3, 3))
-    k = contract("TWchamtri_c", forward=0, mode=1, e=E, control=control, plane=plane,
-                 sides=np.zeros(3), azimuths=np.zeros(3), lon_c=np.array([0.0]),
-                 lat_c=np.array([40 * DEGREE]), rotation=np.array([np.pi / 2]))
-    k["e"] = E
-    corner = k["plane"][:, :2]
 
     def reference(lon, lat):
         r = [g.Inverse(c[1], c[0], lat, lon)["s12"] for c in corners]
@@ -632,16 +617,27 @@ def chamberlin_row():
         met = []
         for i in range(3):
             j = (i + 1) % 3
-            side = corner[j] - corner[i]
+            side = plane[j] - plane[i]
             d = np.hypot(*side)
             along = (r[i] ** 2 - r[j] ** 2 + d * d) / (2 * d)
             across = np.sqrt(max(r[i] ** 2 - along ** 2, 0))
             base = g.Inverse(corners[i][1], corners[i][0], corners[j][1], corners[j][0])["azi1"]
             left = np.sin((azimuth[i] - base) * DEGREE) < 0
             normal = np.array([-side[1], side[0]]) / d
-            met.append(corner[i] + side / d * along + normal * across * (1 if left else -1))
+            met.append(plane[i] + side / d * along + normal * across * (1 if left else -1))
         return np.mean(met, axis=0)
 
+    return reference
+
+
+def chamberlin_row():
+    corners = np.array([[-20.0, 30.0], [20.0, 30.0], [0.0, 60.0]])
+    control = np.column_stack([corners * DEGREE, np.zeros(3)])
+    k = contract("TWchamtri_c", forward=0, mode=1, e=E, control=control, plane=np.zeros((3, 3)),
+                 sides=np.zeros(3), azimuths=np.zeros(3), lon_c=np.array([0.0]),
+                 lat_c=np.array([40 * DEGREE]), rotation=np.array([np.pi / 2]))
+    k["e"] = E
+    reference = chamberlin_by_definition(corners, k["plane"][:, :2])
     degrees = scatter((-15, 32), (15, 50), 150)
     exact = np.array([reference(*p) for p in degrees])
     got = points("TWchamtri_f", degrees * DEGREE, **k)[:, :2]
@@ -650,29 +646,82 @@ def chamberlin_row():
                note="inverse by `TWgeneric_i`")
 
 
+SATELLITES = {2: (99.092, 18, 251, 128.87), 5: (98.2, 16, 233, 129.3056)}
+CLARKE_A = 6378206.4
+CLARKE_E = float(np.sqrt(1 - (6356583.8 / CLARKE_A) ** 2))
+
+
+def orbit_of(satellite, path):
+    """Both planes of a path of Landsat; e, inclination, ratio of the periods and node as doubles."""
+    inclination, days, paths, first = SATELLITES[satellite]
+    node = np.remainder((first - 360 / paths * path) * DEGREE + np.pi, 2 * np.pi) - np.pi
+    given = (CLARKE_E, inclination * DEGREE, days / paths, node)
+    numbers = [mp.mpf(float(v)) for v in given]
+    return f.RolledTrack(*numbers), f.SpaceOblique(*numbers), given
+
+
+def scanned_strip(given, angles, width=0.0145):
+    """Longitude, latitude on the track and 92 km to its sides, and the angles along the orbit."""
+    ecc, inclination, ratio, node = given
+    where, along = [], []
+    for angle in angles:
+        ground = np.arcsin(np.sin(inclination) * np.sin(angle))
+        lat = np.arctan(np.tan(ground) / (1 - ecc ** 2))
+        turned = np.arctan2(np.cos(inclination) * np.sin(angle), np.cos(angle))
+        turned += 2 * np.pi * np.round((angle - turned) / (2 * np.pi))
+        east = np.cos(inclination) / np.cos(ground) ** 2 - ratio
+        north = np.sin(inclination) * np.cos(angle) / np.cos(ground)
+        way = np.arctan2(east * np.cos(lat), north)
+        for side in (-width, 0, width):
+            where.append((turned - ratio * angle + node + side * np.cos(way) / np.cos(lat),
+                          lat - side * np.sin(way)))
+            along.append(angle)
+    where = np.array(where)
+    where[:, 0] = np.remainder(where[:, 0] + np.pi, 2 * np.pi) - np.pi
+    return where, along
+
+
+def on_plane(plane, place, along):
+    return [plane.forward(mp.mpf(float(p[0])), mp.mpf(float(p[1])), mp.mpf(float(angle)))
+            for p, angle in zip(place, along)]
+
+
+def without_turn(one, other):
+    """Distances of two planes in doubles that are left when one is turned and moved onto the other."""
+    one, other = one @ [1, 1j], other @ [1, 1j]
+    one, other = one - one.mean(), other - other.mean()
+    turn = np.vdot(other, one)
+    return np.abs(one - other * turn / abs(turn))
+
+
 def space_rows():
     from pyproj import Proj
-    for satellite, inc, days in ((2, 99.092, (18, 251)), (5, 98.2, (16, 233))):
+    for satellite, terms, grid in ((2, 5, 65), (5, 5, 65), (5, 20, 513)):
         path = 15
-        node = {2: 128.87, 5: 129.30}[satellite] - 360 / days[1] * path
-        a, ecc = 6378206.4, float(np.sqrt(1 - (6356583.8 / 6378206.4) ** 2))
-        given = {"e": ecc, "inc": inc * DEGREE, "P": days[0] / days[1], "eps": 0.0, "om": 0.0,
-                 "n_terms": 5, "n_points": 65}
-        k = {**contract("TWsom_c", **given), **given, "axes": 1, "orbit": 0, "side": 1,
-             "lon_n": node * DEGREE}
-        track = points("TWsom_i", [[t, 0] for t in np.linspace(1.7, 3.1, 40)], **k)[:, :2]
-        place = np.repeat(track, 3, axis=0) + np.tile([[-0.7, 0], [0, 0], [0.7, 0]], (40, 1)) * DEGREE
-        got = points("TWsom_f", place, **k)[:, :2]
-        orbit = f.SpaceOblique(*(mp.mpf(k[n]) for n in ("e", "inc", "P", "lon_n")))
-        exact = [orbit.forward(mp.mpf(float(p[0])), mp.mpf(float(p[1])), mp.mpf(float(g[0])))
-                 for p, g in zip(place, got)]
-        north = np.abs(place[:, 1]) < 75 * DEGREE
-        peer = Proj(f"+proj=lsat +lsat={satellite} +path={path} +ellps=clrk66")
-        other = np.column_stack(peer(*(place / DEGREE).T)) / a
-        off = a * np.hypot(*(other - rounded(exact)).T)[north].max()
-        back = points("TWsom_i", got, **k)
-        yield Row(f"Space oblique Mercator, Landsat {satellite}", "`TWsom_f`, `TWsom_i`",
-                  "the scanned strip, northern half", "Snyder's form for circular orbits, 50 digits", len(place),
-                  Error.of(a * apart(exact, got)), Error.of(on_the_ground(a, place, back)),
-                  note="another form of the projection: ours integrates the curvature of the track, "
-                       f"PROJ has Snyder's (to {off:.2g} m); inverse: the way back")
+        rolled, closed, given = orbit_of(satellite, path)
+        constants = dict(zip(("e", "inc", "P"), given), eps=0.0, om=0.0, n_terms=terms, n_points=grid)
+        k = {**contract("TWsom_c", **constants), **constants, "axes": 1, "orbit": 0, "side": 1,
+             "lon_n": given[3]}
+        place, along = scanned_strip(given, np.linspace(1.7, 3.08, 40))
+        exact = on_plane(rolled, place, along)
+        error = CLARKE_A * apart(exact, points("TWsom_f", place, **k))
+        back = points("TWsom_i", rounded(exact), **k)
+        row = Row(f"Space oblique Mercator, Landsat {satellite}, {terms} terms", "`TWsom_f`, `TWsom_i`",
+                  "the scanned strip from its northernmost point to the equator",
+                  "the track rolled out by its curvature, 50 digits", len(place), Error.of(error),
+                  Error.of(on_the_ground(CLARKE_A, place, back)))
+        snyder = CLARKE_A * rounded(on_plane(closed, place, along))
+        turned = without_turn(CLARKE_A * rounded(exact), snyder)
+        if terms == 5:
+            peer = Proj(f"+proj=lsat +lsat={satellite} +path={path} +ellps=clrk66")
+            # PROJ counts the second system's node from 129.30 degrees
+            node = 0 if satellite == 2 else 129.3056 - 129.30
+            other = np.column_stack(peer((place[:, 0] / DEGREE) - node, place[:, 1] / DEGREE))
+            off = np.hypot(*(other - snyder).T).max()
+            far = np.hypot(*(CLARKE_A * rounded(exact) - snyder).T).max()
+            row.note = (f"Snyder's closed form for circular orbits, which PROJ has (to {1000 * off:.0f} "
+                        f"mm), lies {far:.0f} m from it, {turned.max():.0f} m without turn and shift")
+        else:
+            row.note = f"{grid} points of the orbit instead of 65"
+        row.extra.update(along=np.array(along), error=error, turned=turned)
+        yield row

@@ -280,31 +280,36 @@ Made make_cassini(const MethodArguments& given) {
   return map_formula(metric_plane(given), Cassini(given.a, given.f, given(kLat0)));
 }
 
-// The northing less its own cube: IOGP Publication 373-7-2, method 9833.
+// The northing less its own cube, by the radii at the point: IOGP Publication 373-7-2, method 9833.
 Made make_hyperbolic_cassini(const MethodArguments& given) {
-  const double lat0 = given(kLat0);
-  const MapForward<Cassini> forward{Cassini(given.a, given.f, lat0)};
+  const MapForward<Cassini> forward{Cassini(given.a, given.f, given(kLat0))};
   const MapInverse<Cassini> inverse{forward.map};
-  const double cube = 1 / (6 * meridional_radius(given, lat0) * transverse_radius(given, lat0));
+  const double a = given.a, e2 = given.e2;
+  const auto cube = [a, e2](double lat) {
+    const double w2 = 1 - e2 * std::sin(lat) * std::sin(lat);
+    return w2 * w2 / (6 * a * a * (1 - e2));
+  };
   return formula(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](TW_BLOCK) {
-        *status = over_points(forward, count, in, out);
-        for (int i = 0; i < count; ++i) out[i].y -= cube * out[i].y * out[i].y * out[i].y;
+        for (int i = 0; i < count && *status == TW_SUCCESS; ++i) {
+          const double lat = in[i].y;
+          *status = over_points(forward, 1, in + i, out + i);
+          out[i].y -= cube(lat) * out[i].y * out[i].y * out[i].y;
+        }
       },
       [=](TW_BLOCK) {
-        for (int i = 0; i < count; ++i) {
-          double y = in[i].y;
-          for (int pass = 0; pass < 30; ++pass) {
-            const double next = in[i].y + cube * y * y * y;
-            const bool rest = std::fabs(next - y) < 1e-9;
-            y = next;
+        for (int i = 0; i < count && *status == TW_SUCCESS; ++i) {
+          const CoordinateTriple wanted = in[i];
+          CoordinateTriple plane = wanted;
+          for (int pass = 0; pass < 30 && *status == TW_SUCCESS; ++pass) {
+            *status = over_points(inverse, 1, &plane, out + i);
+            const double next = wanted.y + cube(out[i].y) * plane.y * plane.y * plane.y;
+            const bool rest = std::fabs(next - plane.y) < 1e-9;
+            plane.y = next;
             if (rest) break;
           }
-          out[i].x = in[i].x;
-          out[i].y = y;
         }
-        *status = over_points(inverse, count, out, out);
       });
 }
 

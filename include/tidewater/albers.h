@@ -5,6 +5,10 @@
  * TWalbers_c() has NO status argument, and TWalbers_s() takes C before n, the reverse of the
  * others.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Albers equal-area conic, cone of 44 and 49 N, lat -60 to 89: forward 16 nm (11 nm), inverse
+ *   207 nm (16 nm), scale 3.1e-15 (1.3e-15).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 98-103.
  *
@@ -52,12 +56,12 @@ TW_API void TWalbers_f(double e, double lon0, double n, double C, double rho0, i
                        const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse (Snyder 1987, eq. 14-8 to 14-11, 14-19, 3-16), to 1e-13 radians away from the poles.
- * Newton's steps shrink only by half towards a pole; there they are extrapolated, and a latitude
- * that comes within 4e-5 radians may be clamped to the pole.  On the sphere (e of 1e-13 or less)
- * one within 4e-7 of a pole is the pole.  The longitude is not wrapped.  For an eccentricity above
- * 1e-13 and below about 0.01, as no ellipsoid of the earth has, the logarithm of the formula loses
- * digits (1e-16 / e of them), in all four functions: pass 0 for a sphere.
+ * Inverse (Snyder 1987, eq. 14-8 to 14-11, 14-19, 3-16).  Newton's steps shrink only by half
+ * towards a pole; there they are extrapolated, and a latitude that comes within 4e-5 radians may be
+ * clamped to the pole.  On the sphere (e of 1e-13 or less) one within 4e-7 of a pole is the pole.
+ * The longitude is not wrapped.  For an eccentricity above 1e-13 and below about 0.01, as no
+ * ellipsoid of the earth has, the logarithm of the formula loses digits in all four functions: pass
+ * 0 for a sphere.
  * @param e       first eccentricity
  * @param lon0    central meridian
  * @param n       constant of TWalbers_c()

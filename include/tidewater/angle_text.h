@@ -5,6 +5,9 @@
  * The axis is 0 for a longitude, with the letters E and W, and 1 for a latitude, with N and S; no
  * letter fits any other value.
  *
+ * Accuracy: no figure; texts, names and nodes as they stand in files, exact digit by digit in
+ * tests/unit (docs/accuracy.md).
+ *
  * What all functions of text have in common is told in text.h.
  */
 #ifndef TIDEWATER_ANGLE_TEXT_H

@@ -10,6 +10,11 @@
  * omega applied first.  By contract TWcalc_matrix() has ANOTHER order, R_phi R_omega R_kappa: its
  * matrix is not that of the same three angles in the conversions.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Attitude matrix, omega, phi, kappa 0.1 to 1.2: 1.8e-16 (1.4e-16);
+ * - Attitude angles, omega, phi, kappa 0.1 to 1.2: inverse 5.7e-16 rad (3.3e-16 rad);
+ * - Geocentric rotations, angles 0.2 to 1.1: inverse 3.6e-15 rad (8.9e-16 rad).
+ *
  * Source: Wolf and Dewitt, Elements of Photogrammetry with Applications in GIS, third edition
  * (2000), the rotation matrix by omega, phi, kappa and by azimuth, tilt, swing.
  */

@@ -5,6 +5,12 @@
  * Sphere for e exactly 0.  The input array and the count come FIRST in TWlam_az_eq_f(),
  * TWlam_az_eq_i() and TWlam_az_eq_s().
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Lambert azimuthal equal-area, lon within 90, lat -30 to 89: forward 63 nm (11 nm), inverse
+ *   15 nm (11 nm), scale 2.0e-03 (1.9e-03);
+ * - Lambert azimuthal equal-area, polar, lat 1 to 89.9: forward 895 nm (9.3 nm), inverse 1.7 nm
+ *   (1.4 nm), scale 6.3e-11 (1.4e-14).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 182-190.
  *
@@ -58,9 +64,8 @@ TW_API void TWlam_az_eq_f(const CoordinateTriple* in, int32_t count, double e, d
                           CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse (Snyder 1987, eq. 20-14, 24-28 to 24-31, 3-16), to 1e-13 radians.  A longitude of exactly
- * -pi becomes pi.  From a polar origin of the ellipsoid a point past the equator comes out MIRRORED
- * in the equator.
+ * Inverse (Snyder 1987, eq. 20-14, 24-28 to 24-31, 3-16).  A longitude of exactly -pi becomes pi.
+ * From a polar origin of the ellipsoid a point past the equator comes out MIRRORED in the equator.
  * @param in                 x, y
  * @param count              number of points
  * @param e                  first eccentricity

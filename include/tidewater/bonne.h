@@ -2,6 +2,10 @@
  * @file bonne.h
  * Bonne projection of the ellipsoid.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Bonne, lon within 60, lat -60 to 85: forward 140 nm (128 nm), inverse 158 nm (133 nm), scale
+ *   5.9e-04 (4.5e-04).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 138-140.
  *

@@ -5,6 +5,13 @@
  * Series about the central meridian, for a few degrees on either side.  TWcassini_c() has NO status
  * argument, and TWcassini_s() works IN PLACE only.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Cassini, 2 degrees, lon within 2, lat -80 to 80: forward 1.8 mm (1.7 mm), inverse 2.7 mm
+ *   (1.4 mm);
+ * - Cassini, 6 degrees, lon within 6, lat -80 to 80: forward 87 mm (31 mm), inverse 328 mm
+ *   (177 mm);
+ * - Cassini, scale, lon within 5, lat -80 to 80: scale 1.1e-05 (5.7e-06).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 92-95.
  *

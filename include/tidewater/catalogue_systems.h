@@ -2,6 +2,9 @@
  * @file catalogue_systems.h
  * Coordinate systems of the parameter store.
  *
+ * Accuracy: no figure; texts, names and nodes as they stand in files, exact digit by digit in
+ * tests/unit (docs/accuracy.md).
+ *
  * What all lookups have in common, the status words among it, is told in catalogue.h.
  */
 #ifndef TIDEWATER_CATALOGUE_SYSTEMS_H

@@ -2,6 +2,9 @@
  * @file catalogue_zones.h
  * State plane zones of the parameter store.
  *
+ * Accuracy: no figure; names, counts and rows of the store, handed on as they stand there
+ * (docs/accuracy.md).
+ *
  * What all lookups have in common, the status words among it, is told in catalogue.h.
  */
 #ifndef TIDEWATER_CATALOGUE_ZONES_H

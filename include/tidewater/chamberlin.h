@@ -6,6 +6,9 @@
  * draw round the corners of a triangle.  Geodesics are solved as by TWgeodesic_inv(), on an axis of
  * the library's own; plane coordinates are in units of the semi-major axis as elsewhere.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Chamberlin trimetric, a triangle of 40 by 30 degrees: 786 nm (209 nm).
+ *
  * Source: Christensen, The Chamberlin Trimetric Projection, Cartography and Geographic Information
  * Systems 19 (1992), pp. 88-100.
  *

@@ -5,6 +5,11 @@
  * The variable is z = (y - y0) / sy + i (x - x0) / sx: northing is the real part.  Coefficients are
  * order + 1 pairs of doubles, real part first.  Element z of a point is neither read nor written.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Complex polynomial, the unit square: forward 4.1e-16 (1.4e-16), inverse 6.1e-16 (2.2e-16);
+ * - Derivative of a complex polynomial, the unit square: 1.1e-16 (1.0e-16);
+ * - Conformal polynomial, the unit square: forward 2.1e-16 (1.6e-16), inverse 3.3e-16 (2.2e-16).
+ *
  * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), complex polynomial, methods 9652 and 9653;
  * Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), eq. 26-1.
  */

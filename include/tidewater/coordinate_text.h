@@ -6,6 +6,9 @@
  * order of zero puts longitude or easting first, any other value latitude or northing.  The first
  * 150 characters of a text are read; missing fields count as 0.
  *
+ * Accuracy: no figure; texts, names and nodes as they stand in files, exact digit by digit in
+ * tests/unit (docs/accuracy.md).
+ *
  * What all functions of text have in common is told in text.h.
  */
 #ifndef TIDEWATER_COORDINATE_TEXT_H

@@ -6,6 +6,10 @@
  * the polar stereographic of the sphere.  The status of each call is that of the last stage that
  * ran.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Double stereographic, within 60 degrees of 50 N: forward 4.0 nm (2.4 nm), inverse 3.0 nm
+ *   (2.0 nm).
+ *
  * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), oblique stereographic, method 9809; the
  * stages are those of gauss_sphere.h, rotated_graticule.h and stereographic.h.
  *

@@ -4,6 +4,9 @@
  *
  * No longitude is wrapped.  Arrays of more than 32767 points work in all functions.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Eckert IV, sphere, lat -89.9 to 89.9: forward 4.9 nm (2.3 nm), inverse 310 nm (5.1 nm).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 253-258.
  *
@@ -30,8 +33,8 @@ extern "C" {
 TW_API void TWeckertIV_c(double lat0, double* y0, TWstatus* status);
 
 /**
- * Forward (Snyder 1987, eq. 32-1 to 32-5), within 1e-15 of the exact plane point; within 5e-4
- * radians of a pole by iteration to 1e-12 radians.
+ * Forward (Snyder 1987, eq. 32-1 to 32-5); within 5e-4 radians of a pole by iteration to 1e-12
+ * radians.
  * @param lon0    central meridian
  * @param y0      constant of TWeckertIV_c()
  * @param count   number of points

@@ -5,6 +5,17 @@
  * The ellipsoid is a, the semi-major axis, whose unit is that of every length, and e, the first
  * eccentricity (not its square; TWdM_dphi() alone takes the square).
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Radius of the parallel, all latitudes, GRS 1980: 1.1 nm (< 1 nm);
+ * - Radius in the meridian, all latitudes, GRS 1980: 1.4 nm (< 1 nm);
+ * - Gaussian radius, all latitudes, GRS 1980: 1.0 nm (< 1 nm);
+ * - Radius of equal surface, GRS 1980: 164 um (164 um);
+ * - Radius of equal volume, GRS 1980: < 1 nm (< 1 nm);
+ * - Meridian arc, all latitudes, GRS 1980: forward 65 nm (62 nm), inverse 65 nm (61 nm);
+ * - Derivative of the arc, all latitudes, GRS 1980: 554 nm (539 nm);
+ * - Conformal latitude, all latitudes, GRS 1980: forward 3.2 nm (2.2 nm), inverse 39 nm (20 nm);
+ * - Normal gravity, height 0: 2.4e-15 m/s^2 (2.2e-15 m/s^2).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987); Helmert,
  * Die mathematischen und physikalischen Theorieen der hoeheren Geodaesie, part 1 (1880), for the
  * meridian arc; Heiskanen and Moritz, Physical Geodesy (1967), for normal gravity.
@@ -50,7 +61,7 @@ TW_API void TWgaussian_R(double a, double e, double lat, double* radius, TWstatu
 
 /**
  * Radius of the sphere of equal surface, by the series a (1 - e^2/6 - 17 e^4/360 - 67 e^6/3024)
- * (Snyder 1987, p. 16, authalic radius); on the earth's ellipsoids within 2 mm of the closed form.
+ * (Snyder 1987, p. 16, authalic radius).
  * @param a,e     ellipsoid
  * @param radius  radius, in the unit of a
  * @param status  #TW_BAD_ECCENTRICITY for e^2 of one or more; radius unwritten
@@ -68,7 +79,7 @@ TW_API void TWeq_vol_R(double a, double e, double* radius, TWstatus* status);
 
 /**
  * Meridian arc from the equator, by the series in the third flattening to the fourth power (Helmert
- * 1880), within 1e-6 m on the earth's ellipsoids; a lat for e below 1e-12.
+ * 1880); a lat for e below 1e-12.
  * @param a,e       ellipsoid
  * @param lat       latitude, radians
  * @param distance  signed arc, in the unit of a

@@ -1,6 +1,8 @@
 /**
  * @file ellipsoid.hpp
  * Ellipsoids, prime meridians and units: small values, which any number of threads may read.
+ *
+ * Accuracy: no figure; definitions, names and units as the registry has them (docs/accuracy.md).
  */
 #ifndef TIDEWATER_ELLIPSOID_HPP
 #define TIDEWATER_ELLIPSOID_HPP

@@ -6,6 +6,10 @@
  * sin 2p, and the latitude of a rectifying latitude u with D2 to D8 likewise.  Nothing is tested in
  * these functions.  Arrays may have any number of points that the count can tell.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Equidistant conic, cone of 44 and 49 N, lat -60 to 89: forward 19 mm (13 mm), inverse 9.3 mm
+ *   (8.2 mm), scale 2.1e-09 (5.9e-10).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 111-115.
  *

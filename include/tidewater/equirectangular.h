@@ -2,6 +2,10 @@
  * @file equirectangular.h
  * Equirectangular projection of the sphere.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Equirectangular, sphere, all latitudes: forward 2.2 nm (1.4 nm), inverse 2.8 nm (2.5 nm),
+ *   scale 2.2e-16 (1.7e-16).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 90-91.
  *

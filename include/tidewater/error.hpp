@@ -1,6 +1,8 @@
 /**
  * @file error.hpp
  * What constructors and named factories of the systems layer throw.
+ *
+ * Accuracy: no figure; definitions, names and units as the registry has them (docs/accuracy.md).
  */
 #ifndef TIDEWATER_ERROR_HPP
 #define TIDEWATER_ERROR_HPP

@@ -32,6 +32,8 @@
  *   goes on.
  *
  * "Snyder 1987" is Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987).
+ *
+ * Accuracy: no figure; limits of angles and of digits, exact by comparison (docs/accuracy.md).
  */
 #ifndef TIDEWATER_FRAME_H
 #define TIDEWATER_FRAME_H

@@ -6,6 +6,14 @@
  * results are longitude and latitude on that sphere, in radians, not plane coordinates: it is the
  * first stage of other projections.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Gauss conformal sphere, lat -89 to 89, sphere at 45 N: forward 3.0 nm (2.1 nm), inverse 3.3 nm
+ *   (2.5 nm);
+ * - Gauss conformal sphere, scale, lat -85 to 85, sphere at 45 N: scale 1.3e-15 (6.4e-16);
+ * - Mercator planes of ellipsoid and sphere, the Mercator plane: forward 3.6 nm (2.8 nm), inverse
+ *   3.2 nm (2.9 nm);
+ * - Gauss-Schreiber, lon within 6, lat 20 to 70: forward 12 um (6.2 um), scale 6.4e-11 (3.2e-11).
+ *
  * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), oblique stereographic.
  *
  * What all projections have in common (units, scale, and what skip, stop and fill mean) is told in

@@ -2,6 +2,9 @@
  * @file generic_inverse.h
  * Inverse of any forward projection.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Inverse of any map, Mercator, lat -69 to 69: inverse 52 nm (41 nm).
+ *
  * Source: this library's own iteration, a secant method on the sphere: each step turns and
  * stretches the plane's error as the step before was turned and stretched.
  */

@@ -24,6 +24,9 @@
  *   for again.  After a read error nothing may be tried again before a point far off, whose window
  *   can be read.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Geoid grids, a grid of 0.25 degrees: forward 2.0 um (1.4 um), inverse < 1 nm (< 1 nm).
+ *
  * Source: Milbert, GEOID90: A High-Resolution Geoid for the United States, Eos 72 (1991), for the
  * grids; Abramowitz and Stegun, Handbook of Mathematical Functions (1964), section 25.2, Newton's
  * forward difference formula, for the interpolation.

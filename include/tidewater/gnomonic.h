@@ -4,6 +4,10 @@
  *
  * An origin within 5e-10 of a pole or of the equator takes the formula of that aspect.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Gnomonic, sphere, within 80 degrees of 50 N: forward 3.1 nm (1.4 nm), inverse 1.4 nm (< 1 nm),
+ *   scale 5.4e-16 (3.5e-16).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 164-168.
  *

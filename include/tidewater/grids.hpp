@@ -1,6 +1,11 @@
 /**
  * @file grids.hpp
  * Grids of datum shifts and of geoid undulations as objects.
+ *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Datum operation, NTv2 grid (EPSG:15948), its area: forward 7.7 um (4.9 um), inverse 1.4 nm
+ *   (< 1 nm);
+ * - Heights by a geoid grid, EGM96, the earth: forward < 1 nm (< 1 nm), inverse < 1 nm (< 1 nm).
  */
 #ifndef TIDEWATER_GRIDS_HPP
 #define TIDEWATER_GRIDS_HPP
@@ -40,9 +45,6 @@ struct GridBounds {
  * A file is checked once and read into memory; what happens to it afterwards does not matter.  A
  * shared handle: any number of grids may be open, copies are cheap, and any number of threads may
  * use one at once.
- *
- * Measured against PROJ 9.1 on its NTv2 grids of France, Germany, Switzerland and New Zealand and
- * on GeoTIFF files of the same nodes: within 0.02 mm both ways.
  */
 class TW_SYSTEMS_API ShiftGrid {
  public:
@@ -65,7 +67,7 @@ class TW_SYSTEMS_API ShiftGrid {
   Summary forward(std::size_t count, Coordinates<const double> in, Coordinates<double> out,
                   TWstatus* status = nullptr) const noexcept;
   /**
-   * The way back, by iteration until a step is within 1e-12 radians (0.006 mm), at most 20 passes.
+   * The way back, by iteration until a step is within 1e-12 radians, at most 20 passes.
    * @param count   number of points
    * @param in      longitude, latitude in degrees; height
    * @param out     as forward()
@@ -98,8 +100,6 @@ class TW_SYSTEMS_API ShiftGrid {
  * no seam.
  *
  * Otherwise as ShiftGrid.  geoid.h has a C structure of the same name outside the namespace.
- * Measured against PROJ 9.1 on EGM96 at 15 minutes, bilinear: within
- * 0.001 mm.
  */
 class TW_SYSTEMS_API GeoidGrid {
  public:

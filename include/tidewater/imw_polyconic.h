@@ -5,6 +5,10 @@
  * A sheet spans 4 degrees of latitude, and 4 degrees of longitude; 8 from 60 degrees of latitude
  * on, 16 from 76 degrees on.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Modified polyconic (IMW), a sheet, lat 40 to 44, lon within 3: forward 20 nm (18 nm), inverse
+ *   710 nm (496 nm).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 131-137.
  *

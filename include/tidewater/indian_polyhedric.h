@@ -4,6 +4,10 @@
  *
  * A power series of the second order about a latitude of origin, for sheets of some degrees.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Indian polyhedric, within 2 degrees of the origin: forward 128 m (86 m), inverse 439 um
+ *   (302 um).
+ *
  * Source: Survey of India, Auxiliary Tables, fifth edition (1907), polyhedric projection.
  *
  * What all projections have in common (units, scale, and what skip, stop and fill mean) is told in

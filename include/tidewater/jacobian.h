@@ -5,6 +5,10 @@
  * A Jacobian record is nine doubles: the derivatives of the output's elements x, y, z by the
  * input's x, then by its y, then by its z.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Local distortion, Mercator, steps of 1e-5: scale 2.3e-10 (2.0e-10);
+ * - Meridian convergence, Mercator, steps of 1e-5: 0 rad (0 rad).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), chapter
  * 4, for the scale factors; central and one-sided differences for the derivatives.
  */

@@ -4,6 +4,10 @@
  *
  * TWlam_i() takes its OUTPUT array before its input array.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Lambert conformal conic, cone of 44 and 49 N, lat -60 to 89: forward 129 nm (70 nm), inverse
+ *   36 nm (30 nm), scale 5.3e-15 (3.3e-15).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 104-110.
  *
@@ -53,8 +57,8 @@ TW_API void TWlam_f(double e, double lon0, double C, double n, double rho0, int3
                     const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse, to 1e-14 radians (Snyder 1987, eq. 14-9 to 14-11, 15-11, 7-9).  Mind the order of the
- * arrays: OUT comes before in.  A point within 1e-13 of a pole gets lon0 as it was given.
+ * Inverse (Snyder 1987, eq. 14-9 to 14-11, 15-11, 7-9).  Mind the order of the arrays: OUT comes
+ * before in.  A point within 1e-13 of a pole gets lon0 as it was given.
  * @param e       first eccentricity
  * @param lon0    central meridian; a longitude of exactly -pi comes out as pi
  * @param C       constant of TWlam_c()

@@ -6,6 +6,14 @@
  * Angles are degrees: longitudes east, latitudes north, azimuths clockwise from north.  Lengths are
  * in the unit of the semi-major axis, metres by custom.  Objects are values; any number of threads
  * may use one.
+ *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Geodesics, to 1,000 km, all azimuths: forward 3.3 nm (1.8 nm), inverse 3.0 nm (1.4 nm);
+ * - Geodesics, to 19,000 km, all azimuths: forward 11 nm (4.2 nm), inverse 7.5 nm (3.7 nm);
+ * - Geodesics, nearly antipodal, within a degree of the antipode: inverse 7.5 nm (3.7 nm);
+ * - Polygon, its perimeter and as scale its relative area, a polygon of 6 million km^2: forward
+ *   1.9 nm (1.9 nm), scale 2.2e-16 (2.2e-16);
+ * - Rhumb lines, lat -60 to 60, to 2,000 km: forward 2.8 nm (< 1 nm), inverse 1.4 nm (< 1 nm).
  */
 #ifndef TIDEWATER_LINES_HPP
 #define TIDEWATER_LINES_HPP
@@ -78,14 +86,10 @@ struct LineCourses {
 /**
  * Geodesics: the shortest lines.
  *
- * After C. F. F. Karney, Algorithms for geodesics, Journal of Geodesy 87 (2013), 43-55.  On the
- * earth's ellipsoids, measured against lines worked out at 40 digits: lengths and ends within 8 nm
- * for lines between any two points, nearly antipodal ones, poles, meridians and the equator
- * included (to a flattening of 0.01: 15 nm); areas below a line within 0.2 square metres, or as far
- * as the azimuths carry where the ends are nearly antipodal.
+ * After C. F. F. Karney, Algorithms for geodesics, Journal of Geodesy 87 (2013), 43-55: between any
+ * two points, nearly antipodal ones, poles, meridians and the equator included.
  *
- * Latitudes beyond 90 degrees and numbers that are not finite give NaN, counted as
- * failed.
+ * Latitudes beyond 90 degrees and numbers that are not finite give NaN, counted as failed.
  */
 class TW_SYSTEMS_API Geodesic {
  public:
@@ -130,8 +134,7 @@ class TW_SYSTEMS_API Geodesic {
  * Rhumb lines: lines of constant azimuth.
  *
  * After C. F. F. Karney, The area of rhumb polygons, Studia Geophysica et Geodaetica 68 (2024),
- * 99-120.  On the earth's ellipsoids lengths and ends are within 10 nm, parallels and lines close
- * to them included; ends of lines that wind around a pole within 2e-15 of their length.
+ * 99-120; parallels and lines close to them keep their digits.
  *
  * Between two points the shorter way around is taken, eastwards where both are of one length.  A
  * point at a pole is reached along its meridian.  A line that would go on over a pole has no end:

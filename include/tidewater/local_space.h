@@ -10,6 +10,10 @@
  * the local x, y and z axis in geocentric components, z the outward normal at the origin.  No
  * function here tests a latitude or a longitude.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - East, north, up, within 1,500 km: forward 3.0 nm (2.1 nm), inverse 1.5 um (1.5 um);
+ * - Local space rectangular, within 1,500 km: forward 3.0 nm (2.1 nm), inverse 1.5 um (1.5 um).
+ *
  * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), geocentric to topocentric, methods 9836 and
  * 9837.
  */

@@ -4,6 +4,9 @@
  *
  * The polynomials of degree five stand for the rectified skew orthomorphic grid of TWrso_param().
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Malaya grid, 100 to 104 E, 1.3 to 6.5 N: forward 5.1 mm (3.8 mm), inverse 3.8 mm (2.4 mm).
+ *
  * Source: the coefficients are the grid's own, and stand for the projection of skew_orthomorphic.h:
  * Hotine, The Orthomorphic Projection of the Spheroid, Empire Survey Review 8 and 9 (1946-47).
  *

@@ -5,6 +5,9 @@
  * The unit is the number of metres in one unit of the text; for an area or a volume already squared
  * or cubed.  The narrow readers read the first 50 characters.
  *
+ * Accuracy: no figure; texts, names and nodes as they stand in files, exact digit by digit in
+ * tests/unit (docs/accuracy.md).
+ *
  * What all functions of text have in common is told in text.h.
  */
 #ifndef TIDEWATER_MEASURE_TEXT_H

@@ -2,6 +2,10 @@
  * @file mercator.h
  * Mercator projection of the ellipsoid.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Mercator, lat -89 to 89: forward 4.6 nm (2.0 nm), inverse 2.8 nm (1.4 nm), scale 2.1e-16
+ *   (1.4e-16).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 38-47.
  *
@@ -40,7 +44,7 @@ TW_API void TWmerc_f(double e, double lon0, double y0, int32_t count, const Coor
                      CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse, to 1e-14 radians (Snyder 1987, eq. 7-9 to 7-12).
+ * Inverse (Snyder 1987, eq. 7-9 to 7-12).
  * @param e       first eccentricity
  * @param lon0    central meridian, radians; a longitude of exactly -pi comes out as pi
  * @param y0      constant of TWmerc_c()

@@ -4,6 +4,10 @@
  *
  * The input array and the count come FIRST in these calls.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Miller cylindrical, sphere, lat -89.9 to 89.9: forward 6.0 nm (2.4 nm), inverse 2.8 nm
+ *   (1.4 nm), scale 6.6e-16 (2.2e-16).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 86-89.
  *

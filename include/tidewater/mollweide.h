@@ -2,7 +2,12 @@
  * @file mollweide.h
  * Mollweide projection of the sphere.
  *
- * No longitude is wrapped.  Within about 1e-3 of a pole the ordinate is good to 1e-10 only.
+ * No longitude is wrapped.  Next to a pole the ordinate keeps few of the latitude's digits.
+ *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Mollweide, sphere, lat -89.5 to 89.5: forward 8.0 nm (3.6 nm), inverse 47 nm (4.4 nm);
+ * - Mollweide, next to the poles, sphere, lat 89.5 to 89.999: forward 3.0 nm (2.4 nm), inverse
+ *   19 um (760 nm).
  *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 249-252.
@@ -28,8 +33,7 @@ extern "C" {
 TW_API void TWmollweide_c(double lat0, double* y0, TWstatus* status);
 
 /**
- * Forward (Snyder 1987, eq. 31-1 to 31-4), within 1e-15 of the exact plane point.  No latitude is
- * tested.
+ * Forward (Snyder 1987, eq. 31-1 to 31-4).  No latitude is tested.
  * @param lon0    central meridian
  * @param y0      constant of TWmollweide_c()
  * @param count   number of points

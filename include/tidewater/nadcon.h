@@ -25,6 +25,9 @@
  * written after it is to be thrown away, and a point far off, whose window can be read, must come
  * first in a later call.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - NADCON grids, a grid of 0.25 degrees: forward < 1 nm (< 1 nm), inverse 92 um (5.1 um).
+ *
  * Source: Dewhurst, NADCON: The Application of Minimum Curvature-Derived Surfaces in the
  * Transformation of Positional Data, NOAA Technical Memorandum NOS NGS-50 (1990).
  */

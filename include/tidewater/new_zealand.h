@@ -4,7 +4,12 @@
  *
  * A complex polynomial of the sixth degree over the Mercator plane of the International ellipsoid.
  * The third double of TWn_zeal_f(), TWn_zeal_i() and TWn_zeal_s() is part of the call but not read.
- * Within New Zealand forward and inverse agree to some 1e-14.
+ *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - New Zealand map grid, 166 to 179 E, 34 to 48 S: forward 1.4 nm (< 1 nm), inverse 1.4 nm
+ *   (1.4 nm), scale 3.9e-16 (2.6e-16);
+ * - New Zealand's polynomial, arguments to 0.12: forward 6.6e-17 (5.7e-17), inverse 2.0e-17
+ *   (1.6e-17).
  *
  * Source: Reilly, A Conformal Mapping Projection with Minimum Scale Error, Survey Review 22 (1973),
  * pp. 57-71.

@@ -6,6 +6,11 @@
  * and a Lambert conic maps the turned sphere.  Plane coordinates are in units of that sphere's
  * radius, TWgaussian_R() at the latitude lat0 + (d1 + d2) / 2.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Krovak, 12 to 23 E, 47 to 51 N: forward 1.5 um (1.5 um), inverse 1.5 um (1.5 um);
+ * - Oblique Lambert, lon within 12, lat 35 to 55: forward 3.1 nm (1.7 nm), inverse 2.8 nm
+ *   (2.1 nm), scale 6.3e-05 (6.0e-05).
+ *
  * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), Krovak, method 9819; the stages are those
  * of gauss_sphere.h, rotated_graticule.h and lambert_conformal.h.
  *

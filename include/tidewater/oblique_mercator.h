@@ -5,6 +5,10 @@
  * Skew coordinates u along the central line and v across it, counted from the crossing of the line
  * with the equator of the aposphere, are rotated to map axes by the azimuth of the line.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Hotine oblique Mercator, lon within 10, lat -6 to 14: forward 14 nm (14 nm), inverse 15 nm
+ *   (14 nm), scale 5.1e-16 (3.5e-16).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987), pp. 66-75
  * and 274-278.
  *

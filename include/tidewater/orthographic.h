@@ -5,6 +5,10 @@
  * The surface point as seen from straight above the origin, by way of geocentric space.  Heights
  * are taken for 0.  The semi-major axis is part of the calls but drops out.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Orthographic, scale, lat 10 to 80: scale 1.7e-16 (1.3e-16);
+ * - Orthographic, within 75 degrees of 50 N: forward 1.5 nm (< 1 nm), inverse 2.6 nm (1.4 nm).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 145-153.
  *
@@ -49,10 +53,9 @@ TW_API void TWortho_f(double a, double e, double lon0, double lat0, double x0, d
                       CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse: the local vertical met with the ellipsoid, a quadratic equation, to 1e-15 radians of the
- * surface; within three degrees of the rim, and above e = 0.1, by iteration along the vertical to
- * 1e-9 radians.  An inner call sets the status anew, so that of an earlier point does not outlast a
- * later point that is computed.
+ * Inverse: the local vertical met with the ellipsoid, a quadratic equation; within three degrees of
+ * the rim, and above e = 0.1, by iteration along the vertical to 1e-9 radians.  An inner call sets
+ * the status anew, so that of an earlier point does not outlast a later point that is computed.
  * @param a          not read
  * @param e          first eccentricity
  * @param lon0,lat0  origin

@@ -5,6 +5,12 @@
  * Sphere for e exactly 0.  Heights are READ from element z of the input and COPIED to the output;
  * h, h0 and the heights are in the unit of a, x and y in units of a.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Vertical perspective, from 5,000 km above 50 N, within 45 degrees: forward 2.4 nm (1.8 nm),
+ *   inverse 11 nm (4.8 nm);
+ * - Tilted perspective, sphere, tilt of 20 degrees: forward 1.7 nm (< 1 nm), inverse 2.8 nm
+ *   (2.1 nm).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 169-181.
  *

@@ -2,6 +2,12 @@
  * @file plane.h
  * Helpers on the plane.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Grid units, a plane: forward 1.6 nm (1.0 nm), inverse 1.1 nm (1.0 nm);
+ * - Bilinear interpolation, a cell of values to 8: 8.3e-16 (4.7e-16);
+ * - Newton's interpolation, three values, single precision: 1.2e-07 (1.0e-07);
+ * - Distance from a chord, a line of 41 points: < 1 nm (< 1 nm).
+ *
  * Source: Abramowitz and Stegun, Handbook of Mathematical Functions (1964), section 25.2, for the
  * interpolations; the others are definitions.
  */

@@ -6,6 +6,12 @@
  * second output.  In a block terms go by total degree, and within it by falling power of x: 1; x,
  * y; x^2, x y, y^2; and so on.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Polynomial of degree two, the unit square: forward 3.2e-16 (1.8e-16), inverse 3.3e-16
+ *   (1.7e-16);
+ * - Polynomial of any degree, the unit square: forward 3.2e-16 (1.8e-16), inverse 3.3e-16
+ *   (1.7e-16).
+ *
  * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), general polynomial, methods 9645 to 9648.
  */
 #ifndef TIDEWATER_PLANE_POLYNOMIAL_H

@@ -4,6 +4,10 @@
  *
  * TWpolycon_c() has NO status argument.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Polyconic, lon within 30, lat -80 to 80: forward 956 um (947 um), inverse 2.5 mm (1.3 mm),
+ *   scale 3.9e-16 (2.5e-16).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 124-131.
  *

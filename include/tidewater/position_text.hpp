@@ -4,6 +4,11 @@
  *
  * Nothing here depends on the locale, keeps a state or throws (but std::bad_alloc for the sentence
  * of a refusal).  Texts are UTF-8.  Everything may be called from any thread.
+ *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Angles as text, degrees, minutes, seconds to 5 decimals: 2.6e-14 degrees (1.5e-14 degrees);
+ * - Positions as text, decimal degrees to 12 decimals: 0 degrees (0 degrees);
+ * - Military grid references, lat -79 to 83, squares of 1 um: inverse 678 nm (607 nm).
  */
 #ifndef TIDEWATER_POSITION_TEXT_HPP
 #define TIDEWATER_POSITION_TEXT_HPP
@@ -163,7 +168,7 @@ struct GridPosition {
 TW_SYSTEMS_API int utm_zone(double longitude, double latitude);
 
 /**
- * Universal grid coordinates of a point (transverse Mercator: to 1e-8 m; polar: to 1e-8 m).
+ * Universal grid coordinates of a point.
  * @param longitude,latitude  degrees on WGS 84
  * @param zone  -1: that of utm_zone(); else the zone to use, 0 polar
  */

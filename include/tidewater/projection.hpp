@@ -1,6 +1,11 @@
 /**
  * @file projection.hpp
  * Map projections by method and named parameters.
+ *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - The 65 methods of projection with a formula or series of their own, the domains of their rows:
+ *   forward 353 nm (117 nm), inverse 147 um (160 nm);
+ * - Projected systems of the registry, 5,135, at 16 points of their areas: 144 um (27 nm).
  */
 #ifndef TIDEWATER_PROJECTION_HPP
 #define TIDEWATER_PROJECTION_HPP
@@ -33,8 +38,7 @@ struct Factors {
  * A map projection of an ellipsoid: longitude and latitude in degrees to easting and northing in
  * metres, both counted as the method's definition says (westing and southing where it has those).
  *
- * Measured against PROJ 9.1 on all projected systems of the registry: within 1 mm, nearly all
- * within a micrometre; truth() says what holds for a method, docs/systems.md how it was measured.
+ * truth() says what holds for a method, docs/accuracy.md measures each.
  *
  * A shared handle: copies are cheap, and any number of threads may use one at once.
  */
@@ -60,7 +64,7 @@ class TW_SYSTEMS_API Projection {
   /** The parameters by the registry's names; degrees, metres. */
   std::vector<std::pair<std::string, double>> parameters() const;
   Ellipsoid ellipsoid() const; /**< what is projected */
-  /** How true the formulas are, in words: "within 5 nm of the exact projection to 3,900 km ...". */
+  /** How true the formulas are, in words: "closed formulas and series to rounding". */
   std::string truth() const;
 
   /**
@@ -79,7 +83,7 @@ class TW_SYSTEMS_API Projection {
 
   /**
    * Distortion at points given as longitude, latitude in degrees, by central differences of the
-   * forward formula to the sixth order: 1e-9 of a scale away from the map's edges.
+   * forward formula to the sixth order, which are weakest hard by the map's edges.
    * @param count  number of points
    * @param in     longitude, latitude in degrees
    * @param out    count results; NaN where a point or its neighbourhood has no image

@@ -2,6 +2,9 @@
  * @file regression.h
  * Datum shift by multiple regression.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Multiple regression, 40 degrees of longitude: 1.6 nm (1.3 nm).
+ *
  * Source: Defense Mapping Agency Technical Report 8350.2, Department of Defense World Geodetic
  * System 1984 (1991), appendix D.
  */

@@ -10,6 +10,10 @@
  * Take the geodesic for the shortest way and the rhumb line for a constant course.  No argument is
  * checked for its range; the status is that of the last inner call made.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Rhumb lines, lat -60 to 60, to 2,000 km: forward 152 nm (123 nm), inverse 150 nm (121 nm);
+ * - Points along a rhumb line, a line of 3,000 km, 31 points: 162 nm (150 nm).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 46-47.
  */

@@ -5,6 +5,10 @@
  * The projection is a table of 19 parallels.  Two clamped cubic splines (spline.h) go through it,
  * so that the figures differ from those of other interpolations between the 5-degree parallels.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Robinson, sphere, lat -89 to 89: forward 3.3 nm (1.6 nm), inverse 2.8 nm (2.4 nm), scale
+ *   4.0e-15 (3.3e-15).
+ *
  * Source: Robinson, A New Map Projection: Its Development and Characteristics, International
  * Yearbook of Cartography 14 (1974), pp. 145-155.
  *
@@ -53,7 +57,7 @@ TW_API void TWrobin_f(const double* knots, const double* y_coef, const double* x
                       TWstatus* status);
 
 /**
- * Inverse, to 1e-8 radians or better.  The longitude is not wrapped.
+ * Inverse.  The longitude is not wrapped.
  * @param knots   19 knots of TWrobin_c()
  * @param y_coef  coefficients of TWrobin_c()
  * @param x_coef  coefficients of TWrobin_c()

@@ -5,6 +5,9 @@
  * Longitude and latitude on the sphere as seen from another pole.  TWrotgrat_f() and TWrotgrat_i()
  * have lat0 in their calls but do not read it.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Rotated graticule, lat -85 to 85: forward 2.9 nm (2.4 nm), inverse 3.1 nm (2.3 nm).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 29-32.
  *

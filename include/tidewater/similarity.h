@@ -6,6 +6,11 @@
  * not checked: the inverses use its transpose, so that a matrix that is not orthogonal does not
  * come back. s is the scale difference: the factor is 1 + s.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Similarity, seven parameters, the earth: forward 1.6 nm (1.2 nm), inverse 14 mm (11 mm);
+ * - Molodensky-Badekas, the earth: forward 2.7 nm (1.8 nm), inverse 17 mm (14 mm);
+ * - Three shifts, the earth: forward < 1 nm (< 1 nm), inverse < 1 nm (< 1 nm).
+ *
  * Source: IOGP Publication 373-7-2 (Guidance Note 7-2), coordinate frame rotation and
  * Molodensky-Badekas.
  */

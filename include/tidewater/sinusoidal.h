@@ -2,6 +2,10 @@
  * @file sinusoidal.h
  * Sinusoidal projection of the ellipsoid.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Sinusoidal, lat -89.9 to 89.9: forward 65 nm (60 nm), inverse 153 nm (116 nm), scale 8.7e-14
+ *   (6.5e-14).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 243-248.
  *

@@ -2,6 +2,10 @@
  * @file skew_orthomorphic.h
  * Rectified skew orthomorphic projection of the ellipsoid.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Rectified skew orthomorphic, lon within 10, lat -6 to 14: forward 12 nm (12 nm), inverse 12 nm
+ *   (12 nm), scale 5.7e-16 (3.6e-16).
+ *
  * Source: Hotine, The Orthomorphic Projection of the Spheroid, Empire Survey Review 8 and 9
  * (1946-47).
  *
@@ -50,7 +54,7 @@ TW_API void TWrso_f(double lon0, double skew, double A, double B, double C, doub
                     const CoordinateTriple* in, CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse, to 1e-14 radians.  The longitude is not wrapped.
+ * Inverse.  The longitude is not wrapped.
  * @param lon0    constant of TWrso_c()
  * @param skew    angle from the map's north to the central line
  * @param A       constant of TWrso_c()

@@ -5,6 +5,14 @@
  * The constants are one set: TWsom_c() works them out once for an orbit, TWsom_f() and TWsom_i()
  * take them as they are.  The arrays are the caller's and hold n_terms doubles each.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Space oblique Mercator, Landsat 2, 5 terms, the scanned strip from its northernmost point to
+ *   the equator: forward 17 mm (17 mm), inverse 17 mm (17 mm);
+ * - Space oblique Mercator, Landsat 5, 5 terms, the scanned strip from its northernmost point to
+ *   the equator: forward 17 mm (17 mm), inverse 17 mm (17 mm);
+ * - Space oblique Mercator, Landsat 5, 20 terms, the scanned strip from its northernmost point to
+ *   the equator: forward 1.8 um (1.6 um), inverse 65 um (39 um).
+ *
  * Source: Snyder, Space Oblique Mercator Projection: Mathematical Development, USGS Bulletin 1518
  * (1981); Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 214-229.

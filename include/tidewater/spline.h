@@ -5,6 +5,10 @@
  * A spline of n knots is an array of knots and n rows (a, b, c, d): between knots i and i + 1 its
  * value is ((d t + c) t + b) t + a with t = x - knots[i].
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Robinson, sphere, lat -89 to 89: forward 3.3 nm (1.6 nm), inverse 2.8 nm (2.4 nm), scale
+ *   4.0e-15 (3.3e-15).
+ *
  * Source: de Boor, A Practical Guide to Splines (1978), chapter IV.
  */
 #ifndef TIDEWATER_SPLINE_H

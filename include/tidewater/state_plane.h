@@ -5,6 +5,10 @@
  * Parameters of the zones of the State Plane Coordinate Systems, by zone number.  The projection of
  * a zone is TWt_merc_f(), TWlam_f() or TWo_merc_f(), by its type.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - State plane 1983, 4 zones, one at least of each type: 879 um (879 um);
+ * - State plane 1927, 3 zones, one at least of each type: 2.0 mm (2.0 mm).
+ *
  * Source: Claire, State Plane Coordinates by Automatic Data Processing, C&GS Publication 62-4
  * (1968); Stem, State Plane Coordinate System of 1983, NOAA Manual NOS NGS 5 (1989).
  */

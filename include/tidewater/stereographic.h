@@ -6,6 +6,12 @@
  * 1e-12 of the origin in longitude and in latitude is the origin.  Differences of longitude are not
  * wrapped.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Stereographic, oblique, within 90 degrees of 50 N: forward 2.8 nm (1.7 nm), inverse 1.9 nm
+ *   (1.4 nm), scale 5.5e-16 (3.2e-16);
+ * - Stereographic, polar, lat 0 to 89.9: forward 3.6 nm (2.0 nm), inverse 1.4 nm (< 1 nm), scale
+ *   4.0e-16 (2.3e-16).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 154-163.
  *
@@ -48,7 +54,7 @@ TW_API void TWstereo_f(double e, double lon0, double lat0, double C, double m0, 
                        TWstatus* status);
 
 /**
- * Inverse, to 1e-12 radians (Snyder 1987, eq. 20-14, 21-36 to 21-38; polar 7-9, 20-16).
+ * Inverse (Snyder 1987, eq. 20-14, 21-36 to 21-38; polar 7-9, 20-16).
  *
  * In the oblique aspect the longitude is a plain arctangent, so it NEVER LIES MORE THAN 90 DEGREES
  * from lon0.  In the south polar aspect lon0 is negated at each point that is not the origin, so

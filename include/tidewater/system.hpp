@@ -1,6 +1,8 @@
 /**
  * @file system.hpp
  * Coordinate systems by name, code, definition, PROJ string or WKT.
+ *
+ * Accuracy: no figure; definitions, names and units as the registry has them (docs/accuracy.md).
  */
 #ifndef TIDEWATER_SYSTEM_HPP
 #define TIDEWATER_SYSTEM_HPP

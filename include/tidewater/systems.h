@@ -10,6 +10,8 @@
  *
  * Longitude or easting first, degrees, metres above the ellipsoid; see system.hpp and
  * transformation.hpp, whose objects these are.
+ *
+ * Accuracy: no figure; the C interface of the objects, whose rows hold (docs/accuracy.md).
  */
 #ifndef TIDEWATER_SYSTEMS_H
 #define TIDEWATER_SYSTEMS_H

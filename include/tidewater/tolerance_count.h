@@ -2,6 +2,8 @@
  * @file tolerance_count.h
  * How many points a line needs.
  *
+ * Accuracy: no figure; a count of points, which the tolerance decides (docs/accuracy.md).
+ *
  * Source: this library's own: doubling, then the secant method.
  */
 #ifndef TIDEWATER_TOLERANCE_COUNT_H

@@ -1,6 +1,19 @@
 /**
  * @file transformation.hpp
  * From one coordinate system to another.
+ *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Projected systems of the registry, 5,135, at 16 points of their areas: 144 um (27 nm);
+ * - Datum operations of the registry by parameters, 3 points of their areas: 359 um (2.5 um);
+ * - Geocentric coordinates, all latitudes, to 9 km up: forward 2.2 nm (1.7 nm), inverse 1.5 um
+ *   (1.5 um);
+ * - Datum operation, three translations (EPSG:1133), its area: forward 1.3 um (1.3 um), inverse
+ *   1.9 mm (1.6 mm);
+ * - Datum operation, seven parameters (EPSG:1777), its area: forward 878 nm (852 nm), inverse
+ *   735 um (713 um);
+ * - Datum operation, NTv2 grid (EPSG:15948), its area: forward 7.7 um (4.9 um), inverse 1.4 nm
+ *   (< 1 nm);
+ * - Heights by a geoid grid, EGM96, the earth: forward < 1 nm (< 1 nm), inverse < 1 nm (< 1 nm).
  */
 #ifndef TIDEWATER_TRANSFORMATION_HPP
 #define TIDEWATER_TRANSFORMATION_HPP
@@ -59,10 +72,6 @@ struct Candidate {
  * metres; heights of compound systems in their own unit above their vertical datum.  A system
  * without a height axis hands heights through unchanged; between heights above different surfaces
  * the registry's offsets and geoid grids are used.
- *
- * Measured against PROJ 9.1: 5,103 of 5,108 projected systems within 1 mm over their areas of use,
- * operations by parameters within 0.4 mm, by grids within 0.1 mm, heights by geoid within 0.001 mm
- * (docs/systems.md names the exceptions).
  *
  * A shared handle: copies are cheap, and any number of threads may use one at once.
  */

@@ -2,6 +2,9 @@
  * @file universal_grids.h
  * Parameters of the universal grids and of the British national grid.
  *
+ * Accuracy: no figure; constants and parameters of families, which enter the rows of their
+ * families (docs/accuracy.md).
+ *
  * Source: Defense Mapping Agency Technical Manual 8358.2, The Universal Grids (1989), for the
  * universal grids; Ordnance Survey, A Guide to Coordinate Systems in Great Britain, for the British
  * grid.

@@ -5,6 +5,10 @@
  * Within 0.0003 of an axis (of the equator or the central meridian, or of the lines x = 0 and y =
  * 0) the formulas are those of the axis, by design.
  *
+ * Accuracy, worst (and what 95 of 100 points stay below), of docs/accuracy.md:
+ * - Van der Grinten, sphere, lat -89 to 89, off the axes: forward 5.8 um (300 nm), inverse 668 nm
+ *   (37 nm), scale 1.8e-08 (4.4e-12).
+ *
  * Source: Snyder, Map Projections: A Working Manual, USGS Professional Paper 1395 (1987),
  * pp. 239-242.
  *
@@ -40,9 +44,8 @@ TW_API void TWvdg_f(double lon0, double y0, int32_t count, const CoordinateTripl
                     CoordinateTriple* out, TWstatus* status);
 
 /**
- * Inverse, in closed form (Rubincam, The American Cartographer 8, 1981), within 1e-11 radians of
- * the iteration to 1e-12 radians that serves within 0.01 radians of a pole and at the outer circle.
- * The longitude is not wrapped.
+ * Inverse, in closed form (Rubincam, The American Cartographer 8, 1981); within 0.01 radians of a
+ * pole and at the outer circle by iteration to 1e-12 radians.  The longitude is not wrapped.
  * @param lon0    central meridian
  * @param y0      constant of TWvdg_c()
  * @param count   number of points

@@ -12,6 +12,7 @@
 
 #include "datum/grid_file.hpp"
 #include "formulas/wraps.hpp"
+#include "foundation/new_array.hpp"
 #include "tidewater/national_grid.h"
 
 using namespace tidewater::detail;
@@ -389,9 +390,9 @@ TWstatus read_headers() {
   // Each sub-grid has a header: a damaged count must not ask for a table larger than the file.
   constexpr auto kBytes = static_cast<int64_t>(kHeaderBytes);
   if (num_file < 0 || num_file > length_of(cnt_file) / kBytes - 1) return TW_GSB_READ_ERROR;
-  cnt_subgrids = new (std::nothrow) CntSubGrid[static_cast<std::size_t>(num_file)];
+  cnt_subgrids = new_array<CntSubGrid>(static_cast<uint64_t>(num_file)).release();
   opened_grids->subgrids = cnt_subgrids;
-  cnt_children = new (std::nothrow) Child[static_cast<std::size_t>(num_file)];
+  cnt_children = new_array<Child>(static_cast<uint64_t>(num_file)).release();
   opened_grids->children = cnt_children;
   if (!cnt_subgrids || !cnt_children) return TW_NO_MEMORY;
   int64_t record = kHeaderRecords;
@@ -513,10 +514,16 @@ void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t /*reserved*/, Co
     const CoordinateTriple point = in[i];
     double dlon = 0;
     double dlat = 0;
+    double lon = point.x;
+    double lat = point.y;
     for (int pass = 0; pass < kPasses; ++pass) {
       // A pass outside leaves the shifts as they are.
-      *status = shift_at(point.x - dlon, point.y - dlat, &dlon, &dlat, &call);
+      *status = shift_at(lon, lat, &dlon, &dlat, &call);
       if (!TW_OK(*status)) return;
+      // At the same place the passes that are left would answer the same.
+      if (point.x - dlon == lon && point.y - dlat == lat) break;
+      lon = point.x - dlon;
+      lat = point.y - dlat;
     }
     if (*status == TW_I_OUTSIDE_CNT) {  // the last pass alone decides
       out[i] = point;

@@ -40,7 +40,7 @@ TW_INLINE SphereLatitude<V> sphere_latitude(V psi) {
 // psi = atanh(sin chi) of a latitude of the sphere.
 template <Number V>
 TW_INLINE V sphere_isometric(const SinCos<V>& chi) {
-  return copysign(log((1.0 + abs(chi.sin)) / chi.cos), chi.sin);
+  return copysign(log_ratio(1.0 + abs(chi.sin), chi.cos), chi.sin);
 }
 
 // The mapping on an ellipsoid of eccentricity e, for c above 0: psi of the sphere is c (psi of the

@@ -43,7 +43,7 @@ TW_INLINE V eccentric_factor(double e, V sin_lat) {
 // ln(tan(p/2 + pi/4) ((1 - e sin p) / (1 + e sin p))^(e/2)), the Mercator ordinate of latitude p.
 template <Number V>
 TW_INLINE V isometric_latitude(double e, const SinCos<V>& lat) {
-  const V sphere = log((1.0 + abs(lat.sin)) / lat.cos);
+  const V sphere = log_ratio(1.0 + abs(lat.sin), lat.cos);
   return copysign(sphere, lat.sin) - eccentric_term(e, lat.sin);
 }
 

@@ -69,18 +69,23 @@ struct Memory<Lanes<N>> {
   // Pairs of x and y; z is not touched.
   TW_INLINE static void store_block(CoordinateTriple* out, Lanes<N> x, Lanes<N> y) {
     typedef double Two __attribute__((vector_size(16)));
+    // x and y by turns, of the points with even and with odd numbers.
+    typename Lanes<N>::Vector even, odd;
+    if constexpr (N == 2) {
+      even = __builtin_shufflevector(x.v, y.v, 0, 2);
+      odd = __builtin_shufflevector(x.v, y.v, 1, 3);
+    } else if constexpr (N == 4) {
+      even = __builtin_shufflevector(x.v, y.v, 0, 4, 2, 6);
+      odd = __builtin_shufflevector(x.v, y.v, 1, 5, 3, 7);
+    } else {
+      even = __builtin_shufflevector(x.v, y.v, 0, 8, 2, 10, 4, 12, 6, 14);
+      odd = __builtin_shufflevector(x.v, y.v, 1, 9, 3, 11, 5, 13, 7, 15);
+    }
     for (int i = 0; i < N; i += 2) {
-      if constexpr (N == 2) {
-        const Two first = __builtin_shufflevector(x.v, y.v, 0, 2);
-        const Two second = __builtin_shufflevector(x.v, y.v, 1, 3);
-        __builtin_memcpy(&out[0].x, &first, 16);
-        __builtin_memcpy(&out[1].x, &second, 16);
-      } else {
-        const Two first = {x.v[i], y.v[i]};
-        const Two second = {x.v[i + 1], y.v[i + 1]};
-        __builtin_memcpy(&out[i].x, &first, 16);
-        __builtin_memcpy(&out[i + 1].x, &second, 16);
-      }
+      const Two first = {even[i], even[i + 1]};
+      const Two second = {odd[i], odd[i + 1]};
+      __builtin_memcpy(&out[i].x, &first, 16);
+      __builtin_memcpy(&out[i + 1].x, &second, 16);
     }
   }
 

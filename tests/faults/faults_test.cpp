@@ -16,11 +16,14 @@
 #include <map>
 #include <new>
 #include <optional>
+#include <random>
+#include <set>
 #include <string>
 #include <thread>
 #include <vector>
 
 #include "builder.hpp"
+#include "called.hpp"
 #include "csv.hpp"
 #include "faults/injected.hpp"
 #include "support/data.hpp"
@@ -42,6 +45,9 @@
 #include "tidewater/transformation.hpp"
 
 using namespace tidewater::test;
+
+// The array functions target of the fuzzer: calls by any bytes.
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 
 namespace {
 
@@ -113,6 +119,7 @@ struct Files {
     folder.write("nadcon/area.par", "g\n");
     folder.write("geoid/area.par", "0 2 4 6 8 10 12g\n");
     folder.write("national/area.par", "n\n");
+    folder.write("g.tif", tiff());
     std::filesystem::create_directories(folder.path() / "sources");
     folder.write("sources/layouts.csv",
                  "layout,column,type,offset,size\nl,number,int32,0,4\nl,name,text,4,44\n");
@@ -121,6 +128,35 @@ struct Files {
   }
 
   std::string operator/(const char* name) const { return (folder.path() / name).string(); }
+
+ private:
+  template <class T>
+  static void put(std::string& bytes, T value) {
+    bytes.append(reinterpret_cast<const char*>(&value), sizeof value);
+  }
+
+  // A TIFF of one strip: 4 by 4 nodes, 10 degrees apart, of two bands.
+  static std::string tiff() {
+    struct Tag {
+      std::uint16_t tag, type;
+      std::uint32_t count, value;
+    };
+    constexpr Tag kTags[] = {
+        {256, 3, 1, 4},           {257, 3, 1, 4},      {258, 3, 2, 32 | 32 << 16},
+        {259, 3, 1, 1},           {262, 3, 1, 1},      {273, 4, 1, 400},
+        {277, 3, 1, 2},           {278, 3, 1, 4},      {279, 4, 1, 128},
+        {339, 3, 2, 3 | 3 << 16}, {33550, 12, 3, 300}, {33922, 12, 6, 324}};
+    std::string bytes = "II*";
+    bytes += std::string(1, 0);
+    put(bytes, std::uint32_t{8});
+    put(bytes, static_cast<std::uint16_t>(std::size(kTags)));
+    for (const Tag& tag : kTags) put(bytes, tag);
+    bytes.resize(300);
+    for (const double number : {10., 10., 0., 0., 0., 0., 10., 60., 0.}) put(bytes, number);
+    bytes.resize(400);
+    for (int i = 0; i < 32; ++i) put(bytes, static_cast<float>(0.25 * i));
+    return bytes;
+  }
 };
 
 const Files& files() {
@@ -169,6 +205,57 @@ Outcome national(bool inverse) {
   return Bits().add(p).when(status == TW_SUCCESS);
 }
 
+// The functions beneath, called by themselves.
+Outcome nadcon_window() {
+  static const std::string directory = directory_of("nadcon");
+  NadconControl control = {};
+  NadconWindow window = {};
+  TWstatus status = 0;
+  TWnadcon_c(directory.c_str(), &control, &status);
+  if (!TW_OK(status)) return std::nullopt;
+  double lon[16] = {}, lat[16] = {};
+  TWloc_grids(-65.4, 45.3, 0, &control, &window, lon, lat, &status);
+  return Bits().add(window.xmin).add(lon).add(lat).when(status == TW_SUCCESS);
+}
+
+Outcome geoid_window() {
+  static const std::string directory = directory_of("geoid");
+  GeoidControl control = {};
+  GeoidWindow window = {};
+  TWstatus status = 0;
+  TWgeo90_c(directory.c_str(), &control, &status);
+  if (!TW_OK(status)) return std::nullopt;
+  static float data[22 * 22];
+  int32_t index = 0;
+  TWgeo90_local(-65.4, 45.3, 0, &control, &window, data, &index, &status);
+  if (status != TW_SUCCESS) return std::nullopt;
+  double undulations[2] = {};
+  // At two ends of the grid, so that each call loads.
+  TWget_geo90(degrees(-78.4), degrees(31.3), 0, &control, &undulations[0], &status);
+  if (status != TW_SUCCESS) return std::nullopt;
+  TWget_geo90(degrees(-52.4), degrees(57.3), 0, &control, &undulations[1], &status);
+  return Bits().add(window.xmin).add(data).add(undulations).when(status == TW_SUCCESS);
+}
+
+Outcome national_parts() {
+  static const std::string directory = directory_of("national");
+  static const std::string path = files() / "n.gsb";
+  char name[260] = "", from[9] = "", to[9] = "";
+  TWstatus status = 0;
+  TWget_cnt_fnam(directory.c_str(), name, &status);
+  if (!TW_OK(status)) return std::nullopt;
+  TWrd_cnt_fhdr(path.c_str(), 0, &status);
+  if (!TW_OK(status)) return std::nullopt;
+  TWcnt_to_from(0, from, to, &status);
+  double shift[4] = {};
+  TWget_cnt_shift({degrees(-70.4), degrees(40.3), 0}, 0, &shift[0], &shift[1], &status);
+  if (status != TW_SUCCESS) return std::nullopt;
+  // By contract it says nothing of a failure: what it loads is asked for by the next call.
+  TWload_cnt_local_grid(0, 500);
+  TWget_cnt_shift({degrees(-51.4), degrees(55.3), 0}, 0, &shift[2], &shift[3], &status);
+  return Bits().text(name).add(from).add(to).add(shift).when(status == TW_SUCCESS);
+}
+
 Outcome satellite_constants() {
   double v[13] = {}, m[2][9] = {}, sums[2] = {};
   TWstatus status = 0;
@@ -184,6 +271,13 @@ Outcome spline() {
   TWstatus status = 0;
   TWrobin_csform(knots, coefficients, 4, &status);
   return Bits().add(coefficients).when(status == TW_SUCCESS);
+}
+
+Outcome robinson_constants() {
+  double knots[19] = {}, y[76] = {}, x[76] = {}, y0 = 0;
+  TWstatus status = 0;
+  TWrobin_c(knots, y, x, &y0, 0.3, &status);
+  return Bits().add(knots).add(y).add(x).add(y0).when(status == TW_SUCCESS);
 }
 
 Outcome tolerance_count() {
@@ -216,25 +310,36 @@ Outcome row_tables() {
   return bits.when(status == TW_SUCCESS);
 }
 
-Outcome magnetic_values() {
-  static Synthesis s(3);
+Outcome magnetic_values(bool with_rates) {
+  static Synthesis s(3), rates(3);
   static Coefficients c = [] {
     Coefficients made(3);
     Coefficients::fill(made, 5, 1);
     return made;
   }();
-  SynthesisCache& k = s.cache;
-  k.last_colat = k.last_radius = s.last_lon = 1e30;
+  SynthesisCache &k = s.cache, &r = rates.cache;
+  k.last_colat = k.last_radius = s.last_lon = r.last_colat = r.last_radius = 1e30;
   const CoordinateTriple p[2] = {{0.1, 0.8, 100}, {2, -0.3, 0}};
-  CoordinateTriple field[2] = {};
-  MagneticElements elements[2] = {};
+  CoordinateTriple field[2] = {}, yearly[2] = {};
+  MagneticElements elements[2] = {}, changes[2] = {};
   TWstatus status = 0;
-  TWhar_mag_val(s.N, s.radius, c.C.rows(), c.S.rows(), s.rec_a.rows(), s.rec_b.rows(), k.dC.data(),
-                k.dS.data(), k.lC.data(), k.lS.data(), k.rC.data(), k.rS.data(), k.C.data(),
-                k.S.data(), &k.last_colat, &k.last_radius, &s.last_lon, s.tolerance, &k.tcos,
-                &k.tsin, &k.scale_theta, &k.scale_lambda, &k.scale_r, s.a, s.e, 2, p, field,
-                elements, &status);
-  return Bits().add(field).add(elements).when(status == TW_SUCCESS);
+  if (with_rates) {
+    TWhar_mag_var(s.N, s.radius, c.C.rows(), c.S.rows(), s.rec_a.rows(), s.rec_b.rows(),
+                  k.dC.data(), k.dS.data(), k.lC.data(), k.lS.data(), k.rC.data(), k.rS.data(),
+                  k.C.data(), k.S.data(), &k.last_colat, &k.last_radius, &s.last_lon, s.tolerance,
+                  &k.tcos, &k.tsin, &k.scale_theta, &k.scale_lambda, &k.scale_r, 3, c.C.rows(),
+                  c.S.rows(), r.dC.data(), r.dS.data(), r.lC.data(), r.lS.data(), r.rC.data(),
+                  r.rS.data(), r.C.data(), r.S.data(), &r.last_colat, &r.last_radius, &r.tcos,
+                  &r.tsin, &r.scale_theta, &r.scale_lambda, &r.scale_r, s.a, s.e, 2, p, field,
+                  elements, yearly, changes, &status);
+  } else {
+    TWhar_mag_val(s.N, s.radius, c.C.rows(), c.S.rows(), s.rec_a.rows(), s.rec_b.rows(),
+                  k.dC.data(), k.dS.data(), k.lC.data(), k.lS.data(), k.rC.data(), k.rS.data(),
+                  k.C.data(), k.S.data(), &k.last_colat, &k.last_radius, &s.last_lon, s.tolerance,
+                  &k.tcos, &k.tsin, &k.scale_theta, &k.scale_lambda, &k.scale_r, s.a, s.e, 2, p,
+                  field, elements, &status);
+  }
+  return Bits().add(field).add(elements).add(yearly).add(changes).when(status == TW_SUCCESS);
 }
 
 AngleUnit angle_unit() {
@@ -245,20 +350,64 @@ AngleUnit angle_unit() {
   return unit;
 }
 
+AngleUnit wide_angle_unit() {
+  AngleUnit unit = angle_unit();
+  std::memset(unit.format, 0, sizeof unit.format);
+  const char16_t form[] = u"dd:mm:ss";
+  std::copy(std::begin(form), std::end(form), unit.wide_format);
+  return unit;
+}
+
 // The texts hold their place on the stack or in strings: no word tells of memory, so that what they
 // write is whole, or nothing.
 Outcome texts() {
-  char text[200] = "";
-  TWchar16 wide[200] = {};
-  TWstatus status = 0;
+  char text[16][200] = {};
+  TWstatus words[16] = {};
   const CoordinateTriple p = {0.1, 0.8, 100};
-  TWllh_to_ascii(&p, angle_unit(), 0, 1, 3, 1, text, &status);
-  if (!TW_OK(status)) return std::nullopt;
-  TWrad_to_ascii_wide(0.3, angle_unit(), 1, wide, &status);
-  if (!TW_OK(status)) return std::nullopt;
-  CoordinateTriple read = {};
-  TWascii_to_llh("10:20:30.5E,48:00:01N,12", angle_unit(), 0, 1, &read, &status);
-  return Bits().text(text).add(wide).add(read).when(TW_OK(status));
+  const AngleUnit unit = angle_unit();
+  int n = 0;
+  TWllh_to_ascii(&p, unit, 0, 1, 3, 1, text[n], &words[n]), ++n;
+  TWenh_to_ascii(&p, 0, 3, 1, 1, 2, 1, text[n], &words[n]), ++n;
+  TWxyz_to_ascii(&p, 3, 1, text[n], &words[n]), ++n;
+  TWrad_to_ascii(0.3, unit, 1, text[n], &words[n]), ++n;
+  TWmet_to_ascii(1234.5, 2, 1, text[n], &words[n]), ++n;
+  TWsq_met_to_ascii(1234.5, 2, 1, text[n], &words[n]), ++n;
+  TWcub_met_to_ascii(1234.5, 2, 1, text[n], &words[n]), ++n;
+  TWscalr_to_asc(0.99960, 8, text[n], &words[n]), ++n;
+  double value[4] = {};
+  CoordinateTriple read[3] = {};
+  TWascii_to_llh("10:20:30.5E,48:00:01N,12", unit, 0, 1, &read[0], &words[n]), ++n;
+  TWascii_to_enh("1,2,3", 0, 1, 1, &read[1], &words[n]), ++n;
+  TWascii_to_xyz("1,2,3", 1, &read[2], &words[n]), ++n;
+  TWascii_to_rad("10:20:30.5E", unit, 0, &value[0], &words[n]), ++n;
+  TWascii_to_met("12.5", 1, &value[1], &words[n]), ++n;
+  TWascii_to_sq_met("12.5", 1, &value[2], &words[n]), ++n;
+  TWascii_to_cub_met("12.5", 1, &value[3], &words[n]), ++n;
+  Bits bits;
+  for (int i = 0; i < n; ++i) {
+    if (!TW_OK(words[i])) return std::nullopt;
+    bits.text(text[i]);
+  }
+  return bits.add(value).add(read).when(true);
+}
+
+Outcome wide_texts() {
+  TWchar16 text[4][200] = {}, angle[40] = u"10:20:30.5E";
+  TWstatus words[8] = {};
+  double value[4] = {};
+  const AngleUnit unit = wide_angle_unit();
+  TWrad_to_ascii_wide(0.3, unit, 1, text[0], &words[0]);
+  TWmet_to_ascii_wide(1234.5, 2, 1, text[1], &words[1]);
+  TWsq_met_to_ascii_wide(1234.5, 2, 1, text[2], &words[2]);
+  TWcub_met_to_ascii_wide(1234.5, 2, 1, text[3], &words[3]);
+  TWascii_to_rad_wide(angle, unit, 0, &value[0], &words[4]);
+  TWascii_to_met_wide(u"12.5", 1, &value[1], &words[5]);
+  TWascii_to_sq_met_wide(u"12.5", 1, &value[2], &words[6]);
+  TWascii_to_cub_met_wide(u"12.5", 1, &value[3], &words[7]);
+  for (const TWstatus word : words) {
+    if (!TW_OK(word)) return std::nullopt;
+  }
+  return Bits().add(text).add(value).when(true);
 }
 
 Outcome catalogue() {
@@ -385,12 +534,18 @@ const Call kCalls[] = {
     {"TWgeo90_i", [] { return geoid(true); }},
     {"TWcnt_f", [] { return national(false); }},
     {"TWcnt_i", [] { return national(true); }},
+    {"TWnadcon_c and TWloc_grids", nadcon_window},
+    {"TWgeo90_local and TWget_geo90", geoid_window},
+    {"TWcnt_ parts", national_parts},
     {"TWsom_c", satellite_constants},
     {"TWrobin_csform", spline},
+    {"TWrobin_c", robinson_constants},
     {"TWtoler_to_cnt", tolerance_count},
     {"TWhar_alocCtnm and TWhar_aloc_Cnm", row_tables},
-    {"TWhar_mag_val", magnetic_values},
+    {"TWhar_mag_val", [] { return magnetic_values(false); }},
+    {"TWhar_mag_var", [] { return magnetic_values(true); }},
     {"texts", texts},
+    {"wide texts", wide_texts},
     {"catalogue", catalogue},
     {"ShiftGrid of a .gsb",
      [] {
@@ -408,6 +563,11 @@ const Call kCalls[] = {
          const tidewater::GeoidGrid grid(files() / "g.geo");
          return Bits().add(grid.undulation(-70, 40)).add(grid.undulation(-52.5, 58)).when(true);
        });
+     }},
+    {"ShiftGrid of a .tif",
+     [] {
+       return unless_thrown(
+           [] { return shifted(tidewater::ShiftGrid(files() / "g.tif"), 25, 45); });
      }},
     {"Transformation by the registry",
      [] {
@@ -448,6 +608,9 @@ class Faults : public ::testing::TestWithParam<Call> {
   // Fails call after call of a kind; how many were seen to fail.
   void fail_each(Fault fault) {
     const Call& call = GetParam();
+    if (fault == Fault::kAllocation && std::strcmp(call.name, "ShiftGrid of a .tif") == 0) {
+      GTEST_SKIP() << "libtiff 4.5 itself ends the process by what it could not allocate";
+    }
     call.run();  // what is kept for good is made here
     const Outcome whole = call.run();
     ASSERT_TRUE(whole);
@@ -504,6 +667,128 @@ INSTANTIATE_TEST_SUITE_P(All, Faults, ::testing::ValuesIn(kCalls), [](const auto
   std::erase_if(name, [](unsigned char c) { return !std::isalnum(c); });
   return name;
 });
+
+// --- The registry's first load
+// --------------------------------------------------------------------------
+
+// What a process tells that has loaded the registry with a fault in it, and then without.
+struct Load {
+  int calls = 0;       // that could have failed
+  int failures = 0;    // that did
+  bool whole = false;  // the first answer is what it is without the fault
+  bool said = false;   // it was none, with a sentence
+  bool again = false;  // the second answer is what it is without the fault
+  long blocks = 0;     // held at the end
+  std::uint64_t answer = 0;
+};
+
+Outcome registry_answer() {
+  return unless_thrown([]() -> Outcome {
+    const tidewater::System system("EPSG:27572");
+    return Bits().text(system.name().c_str()).text(system.to_wkt().c_str()).when(true);
+  });
+}
+
+// In a child of its own, since a process loads it once.
+Load first_load(Fault fault, int nth, bool for_good, const Outcome& whole) {
+  int ends[2] = {};
+  if (pipe(ends) != 0) return {};
+  std::fflush(stdout);
+  const pid_t child = fork();
+  if (child == 0) {
+    Load load;
+    {
+      const Injected injected(fault, nth, for_good);
+      const Outcome first = registry_answer();
+      load.whole = first && (!whole || first == whole);
+      load.said = !first;
+      load.calls = injected.calls();
+      load.failures = injected.failures();
+    }
+    const Outcome second = registry_answer();
+    load.again = second && (!whole || second == whole);
+    load.answer = second.value_or(0);
+    load.blocks = live_blocks();
+    _exit(write(ends[1], &load, sizeof load) == sizeof load ? 0 : 1);
+  }
+  close(ends[1]);
+  Load load;
+  const bool told = child > 0 && read(ends[0], &load, sizeof load) == sizeof load;
+  close(ends[0]);
+  int status = 0;
+  if (child > 0) waitpid(child, &status, 0);
+  if (!told || status != 0) return {};
+  return load;
+}
+
+void fail_first_load(Fault fault) {
+  // Throw once, so that what the language keeps for that is there in all children.
+  EXPECT_FALSE(unless_thrown([]() -> Outcome { throw tidewater::Error("x"); }));
+  const Load plain = first_load(fault, -1, false, std::nullopt);
+  ASSERT_TRUE(plain.whole && plain.again);
+  const Outcome whole = plain.answer;
+  ASSERT_GT(plain.calls, fault == Fault::kAllocation ? 1000 : 0) << "loaded before";
+  int failed = 0, faults = 0;
+  for (const bool for_good : {false, true}) {
+    for (const int nth : places(plain.calls)) {
+      const Load load = first_load(fault, nth, for_good, whole);
+      ASSERT_TRUE(load.whole || load.said) << nth << (for_good ? " and all after" : "");
+      ASSERT_TRUE(load.again) << nth << (for_good ? " and all after" : "");
+      ASSERT_GE(load.failures, 1) << nth;
+      // The texts of an error may be kept.
+      ASSERT_LE(load.blocks, plain.blocks + 2) << nth << (for_good ? " and all after" : "");
+      ++faults;
+      failed += load.said ? 1 : 0;
+    }
+  }
+  std::printf("the registry's first load: %d faults of %d calls, %d of them said\n", faults,
+              plain.calls, failed);
+}
+
+// Before all tests that load it in this process, as those without parameters are.
+TEST(RegistryFirstLoad, EveryAllocation) { fail_first_load(Fault::kAllocation); }
+TEST(RegistryFirstLoad, EveryRead) { fail_first_load(Fault::kRead); }
+TEST(RegistryFirstLoad, EveryReadShort) { fail_first_load(Fault::kShortRead); }
+
+// --- Who allocates
+// --------------------------------------------------------------------------------------
+
+std::set<std::string> called_ones, allocating, reading;
+std::optional<Injected> counted;
+Fault counted_fault = Fault::kAllocation;
+
+void count_call(const char* function, bool begins) {
+  if (begins) {
+    counted.emplace(counted_fault, -1, false);
+    return;
+  }
+  const int calls = counted->calls();
+  counted.reset();
+  called_ones.insert(function);
+  if (calls > 0) (counted_fault == Fault::kAllocation ? allocating : reading).insert(function);
+}
+
+// Of all functions whose arguments are numbers and points, with any of them.
+TEST(WhoAllocates, TheseAlone) {
+  on_call = count_call;
+  std::mt19937 random(1);
+  for (const Fault fault : {Fault::kAllocation, Fault::kRead}) {
+    counted_fault = fault;
+    for (int i = 0; i < 60 * 40; ++i) {
+      std::vector<std::uint8_t> bytes(600);
+      for (std::uint8_t& b : bytes) b = static_cast<std::uint8_t>(random() % 200);
+      bytes[0] = static_cast<std::uint8_t>(i % 60);
+      LLVMFuzzerTestOneInput(bytes.data(), bytes.size());
+    }
+  }
+  on_call = nullptr;
+  std::printf("%zu functions called\n", called_ones.size());
+  EXPECT_GT(called_ones.size(), 200u);
+  EXPECT_EQ(reading, std::set<std::string>());
+  // Each of them stands among the calls whose allocations fail in turn.
+  EXPECT_EQ(allocating,
+            (std::set<std::string>{"TWrobin_c", "TWrobin_csform", "TWsom_c", "TWtoler_to_cnt"}));
+}
 
 // --- Signals
 // --------------------------------------------------------------------------------------

@@ -97,6 +97,47 @@ TEST(Elementary, WithinTheStatedUnitsInTheLastPlace) {
   EXPECT_LT(worst("atanh", -0.99, 0.99, area_tangent, mpfr_atanh), 2);
 }
 
+// In units in the last place of the exact logarithm of the exact quotient.
+double log_ratio_error(double top, double low) {
+  Exact exact, divisor;
+  mpfr_set_d(exact.value, top, MPFR_RNDN);
+  mpfr_set_d(divisor.value, low, MPFR_RNDN);
+  mpfr_div(exact.value, exact.value, divisor.value, MPFR_RNDN);
+  mpfr_log(exact.value, exact.value, MPFR_RNDN);
+  return ulp_error(points::log_ratio(top, low), exact);
+}
+
+TEST(Elementary, TheLogarithmOfAQuotientIsWithinItsUnitsInTheLastPlace) {
+  std::mt19937_64 random(11);
+  const auto between = [&](double low, double high) {
+    return std::uniform_real_distribution<double>(low, high)(random);
+  };
+  double most = 0;
+  for (int i = 0; i < 30000; ++i) {
+    const double low = between(0.5, 2);
+    most = std::fmax(most, log_ratio_error(between(0.5, 2), low));                   // near 1
+    most = std::fmax(most, log_ratio_error(low * (1 + between(-1e-6, 1e-6)), low));  // very near
+    most = std::fmax(most,
+                     log_ratio_error(std::exp(between(-690, 690)), std::exp(between(-690, 690))));
+  }
+  std::printf("log_ratio  %.3f ulp\n", most);
+  EXPECT_LT(most, 2);
+  EXPECT_EQ(points::log_ratio(3.25, 3.25), 0.0);
+}
+
+TEST(Elementary, TheLogarithmOfAnOddQuotientIsThatOfTheQuotient) {
+  const double values[] = {0.0, -0.0, 1.0, -2.0, 5e-324, 1e-305, 1e305, INFINITY, -INFINITY, NAN};
+  for (const double top : values) {
+    for (const double low : values) {
+      const double expected = std::log(top / low);
+      const double got = points::log_ratio(top, low);
+      EXPECT_TRUE((std::isnan(got) && std::isnan(expected)) || got == expected ||
+                  std::fabs(got / expected - 1) < 4e-16)
+          << top << " / " << low << ": " << got << " not " << expected;
+    }
+  }
+}
+
 TEST(Portable, WithinTheStatedUnitsInTheLastPlace) {
   EXPECT_LT(worst("tan", -1.6, 1.6, portable::tan, mpfr_tan), 2.1);
   EXPECT_LT(worst("tan", -1e5, 1e5, portable::tan, mpfr_tan), 2.1);

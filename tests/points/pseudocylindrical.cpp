@@ -49,6 +49,11 @@ const Operations pseudocylindrical = {
      [](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
        TWsinusoidal_s(0.9, 0.3, 0, n, in, out, status);
      }},
+    // The zero of a parameter keeps its sign.
+    {"TWsinusoidal_s, k0 = -0", geographic(-180, -90), geographic(180, 90),
+     [](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
+       TWsinusoidal_s(-0.0, 0.3, kE * kE, n, in, out, status);
+     }},
     {"TWmollweide_f", geographic(-180, -90), geographic(180, 90),
      [](int32_t n, Points in, CoordinateTriple* out, TWstatus* status) {
        TWmollweide_f(0.3, 0.1, n, in, out, status);

@@ -1,13 +1,18 @@
 #include "support/data.hpp"
 
-#include <unistd.h>
-
 #include <cstdlib>
+#include <cstdio>
 #include <fstream>
+#include <random>
 
 namespace fs = std::filesystem;
 
 namespace tidewater::test {
+
+#ifdef _WIN32
+// By contract a national grid stays open when another is opened: the tests open more than 512.
+[[maybe_unused]] static const int most_files = _setmaxstdio(2048);
+#endif
 
 fs::path shared_data() {
   const char* named = std::getenv("TIDEWATER_DATA");
@@ -21,9 +26,10 @@ fs::path proj_data() {
 }
 
 ScratchFolder::ScratchFolder() {
-  std::string name = (fs::temp_directory_path() / "tidewater-XXXXXX").string();
-  if (!mkdtemp(name.data())) throw std::runtime_error("no scratch folder");
-  path_ = name;
+  std::random_device any;
+  do {
+    path_ = fs::temp_directory_path() / ("tidewater-" + std::to_string(any()));
+  } while (!fs::create_directory(path_));
 }
 
 ScratchFolder::~ScratchFolder() {

@@ -11,6 +11,17 @@
 
 namespace tidewater::test {
 
+// An emulated processor takes a limit of the memory and holds none, nor can the program start anew.
+inline bool emulated() {
+  rlimit before = {}, held = {};
+  getrlimit(RLIMIT_AS, &before);
+  const rlimit asked = {1u << 30, before.rlim_max};
+  setrlimit(RLIMIT_AS, &asked);
+  getrlimit(RLIMIT_AS, &held);
+  setrlimit(RLIMIT_AS, &before);
+  return held.rlim_cur != asked.rlim_cur;
+}
+
 template <class Work>
 [[noreturn]] void exit_with_little_memory(Work work) {
   constexpr rlim_t size = 600u << 20;
@@ -26,12 +37,18 @@ void expect_with_little_memory(Work work) {
 
 }  // namespace tidewater::test
 
-#define TIDEWATER_NEED_MEMORY_LIMIT() static_cast<void>(0)
+#define TIDEWATER_NEED_MEMORY_LIMIT() \
+  if (tidewater::test::emulated()) GTEST_SKIP() << "an emulator does not limit the memory"
 #else
 namespace tidewater::test {
+inline bool emulated() { return false; }
+
 template <class Work>
 void expect_with_little_memory(Work) {}
 }  // namespace tidewater::test
 
 #define TIDEWATER_NEED_MEMORY_LIMIT() GTEST_SKIP() << "memory cannot be limited in this build"
 #endif
+
+#define TIDEWATER_NEED_NEW_PROCESS() \
+  if (tidewater::test::emulated()) GTEST_SKIP() << "an emulated program cannot start anew"

@@ -14,6 +14,11 @@
 #include "support/points.hpp"
 #include "tidewater/text.h"
 
+#ifdef _WIN32
+inline int setenv(const char* name, const char* value, int) { return _putenv_s(name, value); }
+inline int unsetenv(const char* name) { return _putenv_s(name, ""); }
+#endif
+
 namespace tidewater::test {
 
 inline constexpr const char* kCommaLocale = "de_DE.UTF-8";
@@ -27,6 +32,10 @@ class ScopedLocale {
     if (const char* user = std::getenv("LC_ALL")) user_ = user;
     setenv("LC_ALL", name, 1);
     found_ = std::setlocale(LC_ALL, "") != nullptr;
+#ifdef _WIN32
+    // There the user's locale is not in the environment.
+    found_ = std::string_view(name) == "C";
+#endif
   }
   ~ScopedLocale() {
     if (user_) {

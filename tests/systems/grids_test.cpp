@@ -54,7 +54,7 @@ Coordinates<const double> view(const std::vector<Point>& points) {
   return {&points.front().x, &points.front().y, &points.front().z, 3};
 }
 
-double apart(double a, double b) { return std::fabs(std::remainder(a - b, 360)); }
+[[maybe_unused]] double apart(double a, double b) { return std::fabs(std::remainder(a - b, 360)); }
 
 #ifdef TIDEWATER_HAVE_PROJ
 // Both ways within a tenth of a millimetre of the peer, wherever it has a figure; tells the worst

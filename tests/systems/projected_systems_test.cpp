@@ -1,12 +1,15 @@
 // Every projected system of the registry, both ways, against PROJ.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
+#include <cstdio>
 #include <map>
 #include <memory>
 #include <numbers>
 #include <set>
 #include <string>
+#include <vector>
 
 #include "registry.hpp"
 #include "tidewater/transformation.hpp"
@@ -45,7 +48,17 @@ const std::set<int> kPeerDeparts = {
 struct Outcome {
   int systems = 0, compared = 0, silent = 0;
   std::map<int, std::string> beyond;
+  std::vector<double> within;  // the distances of the others
 };
+
+// "worst 0.0004 m, 95 in 100 within 1e-08 m", which scripts/accuracy reads.
+std::string spread(std::vector<double> distances) {
+  std::sort(distances.begin(), distances.end());
+  char text[80];
+  std::snprintf(text, sizeof text, "worst %.3g m, 95 in 100 within %.3g m", distances.back(),
+                distances[distances.size() * 95 / 100]);
+  return text;
+}
 
 // The larger of the two directions' worst distance in metres; not-a-number where PROJ has none.
 double worst_distance(PJ_CONTEXT* context, int code, int base_code, std::string* where) {
@@ -129,7 +142,11 @@ TEST(ProjectedSystems, AgreeWithProjToAMillimetre) {
       continue;
     }
     ++outcome.compared;
-    if (distance > kMillimetre) outcome.beyond[code] = record->name + ", " + where;
+    if (distance > kMillimetre) {
+      outcome.beyond[code] = record->name + ", " + where;
+    } else {
+      outcome.within.push_back(distance);
+    }
   }
   int unexpected = 0;
   for (const auto& [code, words] : outcome.beyond) {
@@ -140,8 +157,9 @@ TEST(ProjectedSystems, AgreeWithProjToAMillimetre) {
   }
   std::printf(
       "%d projected systems, %d compared with PROJ, %d of them beyond 1 mm; PROJ has no "
-      "formula for %d\n",
-      outcome.systems, outcome.compared, static_cast<int>(outcome.beyond.size()), outcome.silent);
+      "formula for %d; of the others the %s\n",
+      outcome.systems, outcome.compared, static_cast<int>(outcome.beyond.size()), outcome.silent,
+      spread(outcome.within).c_str());
   EXPECT_GT(outcome.compared, 5000);
   EXPECT_LE(unexpected * 1000, outcome.systems);
   EXPECT_EQ(unexpected, 0);
@@ -157,9 +175,8 @@ TEST(DatumOperations, AgreeWithProjToAMillimetre) {
                                  1053, 1054, 1055, 1056, 1057, 1058, 1065, 1066, 9636,
                                  1034, 1039, 1061, 1062, 1063, 9601, 9619, 9660};
   constexpr double kEpoch = 2021.5;
-  int compared = 0;
   int silent = 0;
-  double worst_of_all = 0;
+  std::vector<double> compared;
   for (const int code : registry.operations()) {
     const auto operation = registry.operation(code);
     if (!methods.contains(operation->method)) continue;
@@ -225,14 +242,13 @@ TEST(DatumOperations, AgreeWithProjToAMillimetre) {
       ++silent;
       continue;
     }
-    ++compared;
-    worst_of_all = std::max(worst_of_all, worst);
+    compared.push_back(worst);
     EXPECT_LE(worst, kMillimetre) << "EPSG:" << code << " " << operation->name << ", method "
                                   << operation->method;
   }
-  std::printf("%d operations by parameters, the worst %.3g m from PROJ; PROJ has none for %d\n",
-              compared, worst_of_all, silent);
-  EXPECT_GT(compared, 1200);
+  std::printf("%zu operations by parameters, the %s from PROJ; PROJ has none for %d\n",
+              compared.size(), spread(compared).c_str(), silent);
+  EXPECT_GT(compared.size(), 1200U);
 }
 
 #else

@@ -51,13 +51,6 @@ double cos_arc(const CoordinateTriple& p, double lon, double lat) {
   return std::sin(p.y) * std::sin(lat) + std::cos(p.y) * std::cos(lat) * std::cos(p.x - lon);
 }
 
-double azimuth(const CoordinateTriple& from, const CoordinateTriple& to) {
-  const double d = to.x - from.x;
-  return std::atan2(
-      std::sin(d) * std::cos(to.y),
-      std::cos(from.y) * std::sin(to.y) - std::sin(from.y) * std::cos(to.y) * std::cos(d));
-}
-
 TEST(BipolarConic, ParametersAndConstants) {
   const Bipolar b;
   EXPECT_DOUBLE_EQ(b.lon_a, degrees(-110));
@@ -201,6 +194,12 @@ TEST(BipolarConic, NotANumberAndNothingToDo) {
 TEST(BipolarConic, AgreesWithProj) {
   TIDEWATER_NEED_PROJ();
 #ifdef TIDEWATER_HAVE_PROJ
+  const auto azimuth = [](const CoordinateTriple& from, const CoordinateTriple& to) {
+    const double d = to.x - from.x;
+    return std::atan2(
+        std::sin(d) * std::cos(to.y),
+        std::cos(from.y) * std::sin(to.y) - std::sin(from.y) * std::cos(to.y) * std::cos(d));
+  };
   const ProjPeer peer("+proj=bipc +ns +R=1 +lon_0=0");
   ASSERT_TRUE(peer.ok());
   const Bipolar b;

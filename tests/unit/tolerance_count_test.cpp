@@ -3,6 +3,7 @@
 #include <functional>
 #include <limits>
 
+#include "support/little_memory.hpp"
 #include "support/points.hpp"
 #include "tidewater/datum.h"
 #include "tidewater/lines.h"
@@ -211,6 +212,7 @@ int code_of(const Answer& r) {
 }
 
 TEST(ToleranceCountDeathTest, DoublingEndsWithTheMemory) {
+  TIDEWATER_NEED_MEMORY_LIMIT();
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   EXPECT_EXIT(
       {
@@ -225,6 +227,7 @@ TEST(ToleranceCountDeathTest, DoublingEndsWithTheMemory) {
 }
 
 TEST(ToleranceCountDeathTest, TheSecantSearchNeedsItsOwnMemory) {
+  TIDEWATER_NEED_MEMORY_LIMIT();
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   EXPECT_EXIT(
       {

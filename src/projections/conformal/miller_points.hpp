@@ -11,7 +11,7 @@ namespace tidewater::detail {
 template <Number V>
 TW_INLINE V miller_ordinate(V lat) {
   const auto at = sincos(0.8 * lat);
-  return copysign(log((1.0 + abs(at.sin)) / at.cos), at.sin) * 1.25;
+  return copysign(log_ratio(1.0 + abs(at.sin), at.cos), at.sin) * 1.25;
 }
 
 struct MillerForward {

@@ -119,9 +119,9 @@ void TWortho_c(double e, double lon0, double lat0, double* x0, double* y0, doubl
 void TWortho_f(double /*a*/, double e, double lon0, double lat0, double x0, double y0, double z0,
                const double* r, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
                TWstatus* status) {
-  const auto at = sincos(lat0);
-  *status = over_points(OrthographicForward{frame_of(e, x0, y0, z0, r), lon0, lat0, at.sin, at.cos},
-                        count, in, out);
+  *status = over_points(
+      OrthographicForward{frame_of(e, x0, y0, z0, r), lon0, lat0, sincos(lon0), sincos(lat0)},
+      count, in, out);
 }
 
 void TWortho_i(double /*a*/, double e, double lon0, double lat0, double x0, double y0, double z0,

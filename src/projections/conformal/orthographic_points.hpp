@@ -5,6 +5,7 @@
 
 #include "formulas/constants.hpp"
 #include "formulas/pole_hold.hpp"
+#include "formulas/radii.hpp"
 #include "points/elementary.hpp"
 #include "points/over_points.hpp"
 
@@ -30,22 +31,24 @@ struct OrthographicFrame {
 
 struct OrthographicForward {
   OrthographicFrame frame;
-  double lon0, lat0, sin_lat0, cos_lat0;
+  double lon0, lat0;
+  SinCos<double> at_lon0, at_lat0;
 
   template <Number V>
   TW_INLINE Answer<V> operator()(V lon, V lat) const {
     const auto d = sincos(lon - lon0);
-    const auto l = sincos(lon);
+    const V sin_lon = d.sin * at_lon0.cos + d.cos * at_lon0.sin;
+    const V cos_lon = d.cos * at_lon0.cos - d.sin * at_lon0.sin;
     const auto p = sincos(lat);
     // By contract: the arc cosine of the distance decides; a hair beyond the antipode it is not a
     // number, and does not.
-    const V cosine = p.cos * d.cos * cos_lat0 + p.sin * sin_lat0;
+    const V cosine = p.cos * d.cos * at_lat0.cos + p.sin * at_lat0.sin;
     const auto centre = (abs(lon - lon0) < 1e-12) & (abs(lat - lat0) < 1e-12);
     const auto beyond = (cosine < kBeyondQuarter) & (cosine >= -1.0);
     const Mask<V> plain = centre | !beyond;
-    const V nu = 1.0 / sqrt(1.0 - frame.e2 * square(p.sin));
-    const V x = nu * p.cos * l.cos - frame.origin.x;
-    const V y = nu * p.cos * l.sin - frame.origin.y;
+    const V nu = normal_radius(frame.e2, p.sin);
+    const V x = nu * p.cos * cos_lon - frame.origin.x;
+    const V y = nu * p.cos * sin_lon - frame.origin.y;
     const V z = (1.0 - frame.e2) * nu * p.sin - frame.origin.z;
     return {select(centre, 0.0, frame.east.x * x + frame.east.y * y + frame.east.z * z),
             select(centre, 0.0, frame.north.x * x + frame.north.y * y + frame.north.z * z), plain};

@@ -41,7 +41,7 @@ struct HotineForward {
     const V U = across / T;
     const auto fails = abs(abs(U) - 1.0) < kHotineUnit;
     const Mask<V> plain = pole | !fails;
-    const V v = log((T - across) / (T + across)) * (A / 2 / B);
+    const V v = log_ratio(T - across, T + across) * (A / 2 / B);
     // By contract: the second form multiplies by B.
     const V u = select(abs(at.cos) >= 1e-10, atan2(cos_g * S + sin_g * at.sin, at.cos) * (A / B),
                        dl * (A * B));
@@ -103,7 +103,7 @@ struct HotineInverse {
     const V U = across / T;
     const auto pole = abs(abs(U) - 1.0) < kHotineUnit;
     // t^B = E / sqrt((1 + U) / (1 - U))
-    const V psi = (0.5 * log((T + across) / (T - across)) - log_E) * (1 / B);
+    const V psi = (0.5 * log_ratio(T + across, T - across) - log_E) * (1 / B);
     const V lat = inverse.of_isometric(psi);
     const V lon = lon0 - atan2(cos_g * S - sin_g * at.sin, at.cos) * (1 / B);
     return {select(pole, lon0, lon), select(pole, select(U < 0.0, -kHalfPi, V(kHalfPi)), lat)};

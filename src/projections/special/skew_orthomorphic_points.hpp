@@ -14,7 +14,7 @@ inline constexpr double kHyperbolicLimit = 700;
 
 template <Number V>
 TW_INLINE V half_log_ratio(V g) {
-  return log((g + 1.0) / (1.0 - g)) * 0.5;
+  return log_ratio(g + 1.0, 1.0 - g) * 0.5;
 }
 
 struct SkewForward {

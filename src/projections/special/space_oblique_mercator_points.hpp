@@ -138,7 +138,7 @@ struct SpaceForward {
     const V sine = (p.sin * (c_inc * G) - t.sin * p.cos * s_inc) / sqrt(1.0 - e2 * square(p.sin));
     const auto terms = series.at(L, series.orbit.rate(E));
     // ln tan(ph / 2 + pi/4) of the transformed latitude ph, by the speed
-    const V y0 = 0.5 * log((1.0 + sine) / (1.0 - sine)) / terms.speed;
+    const V y0 = 0.5 * log_ratio(1.0 + sine, 1.0 - sine) / terms.speed;
     V x;
     V y;
     if (abs(series.a0) < kSteady) {
