@@ -143,8 +143,8 @@ TEST_F(NadconPins, AGridBehindTheCountDoesNotServe) {
   const auto ten = [](int, int) { return 10.0F; };
   open({-100, 20, 30, 8, ten}, {-100, 20, 30, 8, ten});
   control.grids[1] = control.grids[0];
-  control.grids[1].xmin += 100;
-  control.grids[1].xmax += 100;
+  control.grids[1].xmin += 80;
+  control.grids[1].xmax += 80;
   const CoordinateTriple in = at(-10.5, 23.5);
   CoordinateTriple out = kUntouchedPoint;
   TWstatus status = 0;
