@@ -4,14 +4,14 @@
 
 #include <algorithm>
 #include <cstring>
-#include <limits>
-#include <new>
 #include <string_view>
 #include <utility>
 
 #ifndef _WIN32
 #include <sys/types.h>
 #endif
+
+#include "foundation/new_array.hpp"
 
 namespace tidewater::detail {
 
@@ -98,9 +98,7 @@ bool read_exactly(std::FILE* file, void* bytes, std::size_t count) {
 }
 
 std::unique_ptr<unsigned char[]> make_buffer(std::int64_t size) {
-  if (size < 0 || size > std::numeric_limits<std::ptrdiff_t>::max()) return nullptr;
-  return std::unique_ptr<unsigned char[]>(
-      new (std::nothrow) unsigned char[static_cast<std::size_t>(size)]);
+  return size < 0 ? nullptr : new_array<unsigned char>(static_cast<std::uint64_t>(size));
 }
 
 void FileImage::count_load(std::FILE* file, std::int64_t* budget) {

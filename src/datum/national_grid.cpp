@@ -12,6 +12,7 @@
 
 #include "datum/grid_file.hpp"
 #include "formulas/wraps.hpp"
+#include "foundation/new_array.hpp"
 #include "tidewater/national_grid.h"
 
 using namespace tidewater::detail;
@@ -389,9 +390,9 @@ TWstatus read_headers() {
   // Each sub-grid has a header: a damaged count must not ask for a table larger than the file.
   constexpr auto kBytes = static_cast<int64_t>(kHeaderBytes);
   if (num_file < 0 || num_file > length_of(cnt_file) / kBytes - 1) return TW_GSB_READ_ERROR;
-  cnt_subgrids = new (std::nothrow) CntSubGrid[static_cast<std::size_t>(num_file)];
+  cnt_subgrids = new_array<CntSubGrid>(static_cast<uint64_t>(num_file)).release();
   opened_grids->subgrids = cnt_subgrids;
-  cnt_children = new (std::nothrow) Child[static_cast<std::size_t>(num_file)];
+  cnt_children = new_array<Child>(static_cast<uint64_t>(num_file)).release();
   opened_grids->children = cnt_children;
   if (!cnt_subgrids || !cnt_children) return TW_NO_MEMORY;
   int64_t record = kHeaderRecords;

@@ -2,11 +2,12 @@
 
 #include <cmath>
 #include <cstddef>
+#include <cstdint>
 #include <cstdlib>
 #include <limits>
 #include <memory>
-#include <new>
 
+#include "foundation/new_array.hpp"
 #include "tidewater/geodesic.h"
 #include "tidewater/plane.h"
 #include "tidewater/rhumb.h"
@@ -20,7 +21,7 @@ constexpr int16_t kRhumbLine = 1;
 using Points = std::unique_ptr<CoordinateTriple[]>;
 
 Points allocate(int32_t count) {
-  return Points(new (std::nothrow) CoordinateTriple[static_cast<std::size_t>(count)]);
+  return tidewater::detail::new_array<CoordinateTriple>(static_cast<std::uint64_t>(count));
 }
 
 class Line {

@@ -5,10 +5,11 @@
 #include <algorithm>
 #include <cmath>
 #include <cstddef>
+#include <cstdint>
 #include <memory>
-#include <new>
 
 #include "formulas/wraps.hpp"
+#include "foundation/new_array.hpp"
 #include "points/portable.hpp"
 #include "tidewater/geocentric.h"
 #include "tidewater/harmonic_synthesis.h"
@@ -27,7 +28,7 @@ class Places {
  public:
   Places(double a, double e, int32_t count, const CoordinateTriple* points)
       : count_(static_cast<std::size_t>(std::max(count, 0))),
-        triples_(new (std::nothrow) CoordinateTriple[2 * count_]) {
+        triples_(new_array<CoordinateTriple>(2 * std::uint64_t{count_})) {
     if (!triples_) return;
     std::copy_n(points, count_, triples_.get() + count_);
     TWstatus always_success = TW_SUCCESS;

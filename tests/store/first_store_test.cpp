@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "support/data.hpp"
+#include "support/grids.hpp"
 #include "support/points.hpp"
 #include "tidewater/catalogue.h"
 
@@ -160,9 +161,8 @@ TEST_F(FirstStore, SatellitesFollowSnyder) {
 
 // A node of a NADCON-format file: 273 columns, record 0 is the header, value 0 of a record a label.
 double node(const std::string& bytes, int row, int column) {
-  float value = 0;
-  std::memcpy(&value, bytes.data() + ((row + 1) * 274 + column + 1) * 4, sizeof value);
-  return static_cast<double>(value);
+  const auto offset = static_cast<std::size_t>(((row + 1) * 274 + column + 1) * 4);
+  return static_cast<double>(f32_at(bytes, offset));
 }
 
 std::string bytes_of(const std::filesystem::path& path) {

@@ -1,12 +1,18 @@
 #include "support/data.hpp"
 
 #include <cstdlib>
+#include <cstdio>
 #include <fstream>
 #include <random>
 
 namespace fs = std::filesystem;
 
 namespace tidewater::test {
+
+#ifdef _WIN32
+// By contract a national grid stays open when another is opened: the tests open more than 512.
+[[maybe_unused]] static const int most_files = _setmaxstdio(2048);
+#endif
 
 fs::path shared_data() {
   const char* named = std::getenv("TIDEWATER_DATA");

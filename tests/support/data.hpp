@@ -35,6 +35,12 @@ class ScratchFolder {
 }  // namespace tidewater::test
 
 // Leaves a test with a clear word where the real data are not there.
+#ifdef _WIN32
+#define TIDEWATER_NOT_ON_WINDOWS(reason) GTEST_SKIP() << "Windows: " reason
+#else
+#define TIDEWATER_NOT_ON_WINDOWS(reason) static_cast<void>(0)
+#endif
+
 #define TIDEWATER_NEED_SHARED_DATA()          \
   if (tidewater::test::shared_data().empty()) \
   GTEST_SKIP() << "real data not found: set TIDEWATER_DATA to the folder of them"

@@ -18,8 +18,9 @@ struct Gnomonic {
     TWstatus status = 0;
     TWgnomon_c(lat, &cos_lat0, &sin_lat0, &status);
     EXPECT_EQ(status, TW_SUCCESS);
-    EXPECT_EQ(cos_lat0, std::cos(lat));
-    EXPECT_EQ(sin_lat0, std::sin(lat));
+    // Not all platforms' own functions give the last digit.
+    EXPECT_NEAR(cos_lat0, std::cos(lat), 1.2e-16);
+    EXPECT_NEAR(sin_lat0, std::sin(lat), 1.2e-16);
   }
   TWstatus forward(const Points& in, Points& out) const {
     TWstatus status = 0;

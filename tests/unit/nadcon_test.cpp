@@ -699,6 +699,7 @@ TEST_F(Nadcon, MissingListLeavesTheBlock) {
 }
 
 TEST_F(Nadcon, LongestDirectory) {
+  TIDEWATER_NOT_ON_WINDOWS("no path is as long");
   write_pair(folder, "g", {-100, 20, 30, 8, flat});
   folder.write("area.par", "g\n");
   std::string directory = folder.directory();

@@ -168,6 +168,10 @@ TEST(Spline, WithoutMemoryNothingIsWritten) {
   TWrobin_csform(knots, coef, 3, &status);
   EXPECT_EQ(failing.asked(), 1);
   EXPECT_EQ(status, TW_NO_MEMORY);
+  // More bytes than a pointer of 32 bits counts.
+  status = 0;
+  TWrobin_csform(knots, coef, 2147483647, &status);
+  EXPECT_EQ(status, TW_NO_MEMORY);
   const double expected[12] = {0, 0, 9, 9, 1, 9, 9, 9, 0, 0, 9, 9};
   for (int i = 0; i < 12; ++i) EXPECT_EQ(coef[i], expected[i]);
 }

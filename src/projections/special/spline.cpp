@@ -2,10 +2,10 @@
 // de Boor, A Practical Guide to Splines (1978), chapter IV.
 
 #include <cmath>
+#include <cstdint>
 #include <limits>
-#include <memory>
-#include <new>
 
+#include "foundation/new_array.hpp"
 #include "tidewater/spline.h"
 
 namespace {
@@ -42,7 +42,7 @@ void TWrobin_csform(const double* knots, double* coef, int32_t n, TWstatus* stat
   *status = TW_SUCCESS;
   if (n < 2) return;  // no interval, nothing to work out
   const std::size_t size = static_cast<std::size_t>(n);
-  const std::unique_ptr<double[]> work(new (std::nothrow) double[3 * size]);
+  const auto work = tidewater::detail::new_array<double>(3 * std::uint64_t{size});
   if (!work) {
     *status = TW_NO_MEMORY;
     return;
