@@ -624,7 +624,6 @@ std::string_view foreign(const Definition& definition) {
     case 1029:
       return sphere || definition.method == 1029 ? "" : "PROJ takes the ellipsoid's formula";
     case 1028:
-      return sphere ? "" : "PROJ takes the sphere's formula";
     case kChamberlin:
       return sphere ? "" : "PROJ takes the sphere's formula";
     case kLandsat:

@@ -1,7 +1,7 @@
 #include "support/data.hpp"
 
-#include <cstdlib>
 #include <cstdio>
+#include <cstdlib>
 #include <fstream>
 #include <random>
 
