@@ -9,6 +9,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <initializer_list>
 #include <limits>
 #include <map>
 #include <string>
@@ -34,24 +35,35 @@ void fail(const char* function, const char* what) {
 // A table of so many; arrays of nothing have a place too.
 std::size_t terms(int32_t count) { return count > 0 ? static_cast<std::size_t>(count) : 0; }
 
+bool is_among(std::string_view function, std::initializer_list<std::string_view> all) {
+  return std::find(all.begin(), all.end(), function) != all.end();
+}
+
 // Functions whose points know of each other, by contract.
 bool is_of_the_whole_array(std::string_view function) {
-  constexpr std::string_view kAll[] = {
-      "TWortho_s",    // a bad latitude repeats the scale of the point before
-      "TWpolycon_s",  // so does one that is not computed
-      "TWo_merc_uv_k", "TWo_merc_f",  "TWo_merc_i",  "TWo_merc_s",  // u and v of the point before
-      "TWstereo_f",    "TWstereo_s",  // lon0 is negated anew at each point of the south
-      "TWt_merc_xyk",  "TWlaborde_f", "TWlaborde_i",  // one failing point ends what follows on all
-  };
-  return std::find(std::begin(kAll), std::end(kAll), function) != std::end(kAll);
+  return is_among(
+      function,
+      {
+          "TWortho_s",    // a bad latitude repeats the scale of the point before
+          "TWpolycon_s",  // so does one that is not computed
+          "TWo_merc_uv_k", "TWo_merc_f", "TWo_merc_i",
+          "TWo_merc_s",                 // u and v of the point before
+          "TWstereo_i", "TWstereo3_i",  // lon0 is negated anew at each point of the south
+      });
+}
+
+// Several projections behind one another: a point that fails in one ends it for all.
+bool is_chain(std::string_view function) {
+  return is_among(function,
+                  {"TWstereo3_f", "TWpersp_f", "TWlaborde_f", "TWlaborde_i", "TWlaborde_s",
+                   "TWt_merc_xyk", "TWg_schreiber", "TWo_lam_f", "TWo_lam_i", "TWo_lam_s"});
 }
 
 // By contract another answer in place: what they read is their output, or the input is changed.
 bool is_other_in_place(std::string_view function) {
-  constexpr std::string_view kAll[] = {"TWt_merc_xyk",  "TWlabor_s",   "TWgaussII_s",
-                                       "TWg_schreiber", "TWcassini_s", "TWpoly2deg_f",
-                                       "TWlaborde_s",   "TWn_zeal_f",  "TWstereo_i"};
-  return std::find(std::begin(kAll), std::end(kAll), function) != std::end(kAll);
+  return is_among(function,
+                  {"TWt_merc_xyk", "TWlabor_s", "TWgaussII_s", "TWg_schreiber", "TWcassini_s",
+                   "TWpoly2deg_f", "TWlaborde_s", "TWn_zeal_f", "TWstereo_i"});
 }
 
 bool same(double a, double b) {
@@ -258,7 +270,8 @@ void Session::over_points(const char* function, bool input_stays, const Call& ca
   }
 
   // Each point alone.
-  for (std::size_t i = 0; !is_of_the_whole_array(function) && i < given.size(); ++i) {
+  const bool alone = !is_of_the_whole_array(function) && (TW_OK(status) || !is_chain(function));
+  for (std::size_t i = 0; alone && i < given.size(); ++i) {
     if (same(out[i], kNothing)) continue;  // left out, or behind one that ended the array
     CoordinateTriple one_in = given[i], one_out = kNothing;
     call(1, &one_in, &one_out, &status);
@@ -332,9 +345,10 @@ void of_callbacks(Session& s) {
   if (s.wanted()) {
     const std::vector<CoordinateTriple> in = s.some(s.count());
     Guarded out(std::vector(in.size(), kNothing));
+    const double lon = s.number("lon"), lat = s.number("lat"), unused = s.number("unused");
     called("TWgeneric_i", [&] {
-      TWgeneric_i(mapped, context, s.number("lon"), s.number("lat"), s.number("unused"),
-                  static_cast<int32_t>(in.size()), in.data(), out.data(), &status);
+      TWgeneric_i(mapped, context, lon, lat, unused, static_cast<int32_t>(in.size()), in.data(),
+                  out.data(), &status);
     });
     s.check_word("TWgeneric_i", status);
   }
@@ -342,16 +356,16 @@ void of_callbacks(Session& s) {
     const std::vector<CoordinateTriple> in = s.some(s.count());
     const auto n = static_cast<int32_t>(in.size());
     std::vector<double> records(9 * in.size(), 0), convergence(in.size(), 0);
+    const double step0 = s.number("step0"), step1 = s.number("step1"), step2 = s.number("step2");
+    const double a = s.number("a"), e = s.number("e");
     called("TWget_jacobian", [&] {
-      TWget_jacobian(mapped_by_pointer, &map, s.number("step"), s.number("step1"),
-                     s.number("step2"), n, in.data(), records.data(), &status);
+      TWget_jacobian(mapped_by_pointer, &map, step0, step1, step2, n, in.data(), records.data(),
+                     &status);
     });
     s.check_word("TWget_jacobian", status);
     Guarded scales(std::vector(in.size(), kNothing)), slopes(std::vector(in.size(), kNothing));
-    called("TWJ_to_scales", [&] {
-      TWJ_to_scales(s.number("a"), s.number("e"), n, in.data(), records.data(), scales.data(),
-                    &status);
-    });
+    called("TWJ_to_scales",
+           [&] { TWJ_to_scales(a, e, n, in.data(), records.data(), scales.data(), &status); });
     s.check_word("TWJ_to_scales", status);
     called("TWJ_to_slopes", [&] { TWJ_to_slopes(n, records.data(), slopes.data(), &status); });
     called("TWJ_to_merconv",
@@ -361,10 +375,12 @@ void of_callbacks(Session& s) {
     const std::vector<CoordinateTriple> control = s.some(3);
     double sides[3] = {}, azimuths[3] = {};
     CoordinateTriple plane[3] = {};
+    const auto mode = s.whole<int16_t>("mode");
+    const double e = s.number("e");
+    double *lon_c = s.place("lon_c"), *lat_c = s.place("lat_c"), *turn = s.place("rotation");
     called("TWchamtri_c", [&] {
-      TWchamtri_c(mapped, context, s.whole<int16_t>("mode"), s.number("e"), control.data(), sides,
-                  azimuths, plane, s.place("lon_c"), s.place("lat_c"), s.place("rotation"),
-                  &status);
+      TWchamtri_c(mapped, context, mode, e, control.data(), sides, azimuths, plane, lon_c, lat_c,
+                  turn, &status);
     });
     s.check_word("TWchamtri_c", status);
   }
@@ -380,10 +396,12 @@ void of_callbacks(Session& s) {
     const CoordinateTriple end = {ordinary(s.number("lon2"), 3), ordinary(s.number("lat2"), 1.5),
                                   0};
     int32_t count = 0;
+    const double e = ordinary(s.number("e"), 0.3);
+    const double tolerance = 1 + std::fabs(ordinary(s.number("t"), 1e6));
+    const auto kind = s.whole<int16_t>("kind");
     called("TWtoler_to_cnt", [&] {
-      TWtoler_to_cnt(mapped, reinterpret_cast<TWcontext>(&smooth), start, end, 6378137,
-                     ordinary(s.number("e"), 0.3), 1 + std::fabs(ordinary(s.number("t"), 1e6)),
-                     s.whole<int16_t>("kind"), &count, &status);
+      TWtoler_to_cnt(mapped, reinterpret_cast<TWcontext>(&smooth), start, end, 6378137, e,
+                     tolerance, kind, &count, &status);
     });
     s.check_word("TWtoler_to_cnt", status);
   }

@@ -402,8 +402,8 @@ ParsedAngle parse_angle(std::string_view text, Axis axis, bool decimal_comma) {
 std::size_t format_angle(double degrees, const AngleFormat& format, char* out) {
   char* p = out;
   if (!(std::fabs(degrees) <= 1e6)) {
-    std::memcpy(out, "nan", 3);
-    return 3;
+    constexpr std::string_view kNone = "nan";
+    return kNone.copy(out, kNone.size());
   }
   const bool parted = format.form == AngleForm::minutes || format.form == AngleForm::seconds;
   const AngleMarks marks =

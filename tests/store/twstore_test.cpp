@@ -340,6 +340,15 @@ TEST_F(TwstoreBuild, AFullDiskBehindTheListIsSaid) {
     EXPECT_EQ(result.code, 1);
     EXPECT_EQ(result.output, "twstore: the output cannot be written\n");
   }
+  const std::string start = std::string(TWSTORE_COMMAND) + " ";
+  for (const char* command : {"--help", "build --help", "list --help"}) {
+    const Result result = shell(start + command + " >/dev/full");
+    EXPECT_EQ(result.code, 1) << command;
+    EXPECT_EQ(result.output, "twstore: the output cannot be written\n") << command;
+  }
+  const Result packed = shell(start + "pack " + in_quotes(sources_.store()) + " /dev/full");
+  EXPECT_EQ(packed.code, 1);
+  EXPECT_EQ(packed.output, "twstore: /dev/full cannot be written\n");
 }
 
 TEST_F(Twstore, WhatIsNoStoreIsSaidToBeNone) {

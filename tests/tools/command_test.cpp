@@ -6,6 +6,7 @@
 #include <string>
 
 #include "command.hpp"
+#include "support/grids.hpp"
 
 using namespace tidewater::test;
 
@@ -55,6 +56,43 @@ TEST(Command, GridsThatCannotBeUsedEndTheRunBeforeItsFirstFigure) {
   }
 }
 
+TEST(Command, ATruncatedGridOfAnyFormEndsTheRun) {
+  const auto place = [](int r, int c) { return static_cast<float>(0.01 * (3 * r + c)); };
+  const std::string grid = GridFile{-80, 30, 30, 30, place}.bytes();
+  GsbFile national;
+  national.grids.push_back(
+      {"ROOT", "NONE", 30 * 3600.0, 60 * 3600.0, 50 * 3600.0, 80 * 3600.0, 3600, place, place});
+  const std::string line = "40.3 -65.4 10\n";
+  const struct {
+    const char* name;
+    std::string bytes, options;
+  } kCases[] = {{"g.las", grid, "--grid g.las"},
+                {"g.los", grid, "--grid g.las"},
+                {"g.las", grid, "--shift nadcon:."},
+                {"g.geo", grid, "--height --geoid g.geo"},
+                {"n.gsb", national.bytes(), "--grid n.gsb"},
+                {"n.gsb", national.bytes(), "--shift ntv2:."}};
+  for (const auto& c : kCases) {
+    const ScratchFolder folder;
+    for (const char* name : {"g.las", "g.los", "g.geo"}) folder.write(name, grid);
+    folder.write("n.gsb", national.bytes());
+    folder.write("area.par", std::string(c.options).ends_with("ntv2:.") ? "n\n" : "g\n");
+    const std::string command =
+        "cd " + folder.path().string() + "; tidewater convert --to geodetic " + c.options;
+    EXPECT_EQ(shell(command, line).status, 0) << command << shell(command, line).err;
+    // Behind the header, in the middle, and a byte before the end.
+    for (const std::size_t size : {std::size_t{400}, c.bytes.size() / 2, c.bytes.size() - 1}) {
+      // The end of a .gsb says nothing that is read.
+      if (size + 1 == c.bytes.size() && std::string(c.name) == "n.gsb") continue;
+      folder.write(c.name, c.bytes.substr(0, size));
+      const Outcome r = shell(command, line + line);
+      EXPECT_EQ(r.status, 2) << command << " " << size;
+      EXPECT_EQ(r.out, "") << command << " " << size;
+      EXPECT_NE(r.err.find(std::string(c.name).substr(0, 1)), std::string::npos) << r.err;
+    }
+  }
+}
+
 TEST(Command, LinesThatAreWrongSayWhatToTry) {
   expect_marked("tidewater convert", "98.39 -4.49 x\n", "* * x\n",
                 "if the longitude stands first, say --order lon-lat");
@@ -88,19 +126,54 @@ TEST(Command, ZeroHasNoSign) {
       "0:00:00.0N 0:00:00.0E\n");
 }
 
-TEST(Command, AFullDiskIsSaidByEveryListing) {
+TEST(Command, AFullDiskIsSaidByEverySubcommand) {
   if (!std::filesystem::exists("/dev/full")) GTEST_SKIP() << "no /dev/full here";
-  for (const char* command :
-       {"--help", "--version", "convert --help", "systems list", "systems list methods",
-        "systems search lambert", "systems show 2154", "doctor", "doctor --json",
-        "factors --system 2154", "convert --to wgs84", "line", "convert --geojson --to 2154"}) {
-    const Outcome r = shell(std::string("tidewater ") + command + " >/dev/full",
-                            std::string(command).find("geojson") == std::string::npos
-                                ? "48 3 48 4\n"
-                                : R"({"type":"Point","coordinates":[3,48]})");
+  const ScratchFolder folder;
+  folder.write("g.geo", GridFile{-80, 30, 30, 30, [](int, int) { return 1.0F; }}.bytes());
+  const std::string grid = (folder.path() / "g.geo").string();
+  const std::string positions = "48 3 48 4\n", table = "lat,lon\n48,3\n";
+  const std::string json = R"({"type":"Point","coordinates":[3,48]})";
+  const std::pair<std::string, std::string> kCommands[] = {
+      {"--help", ""},
+      {"--version", ""},
+      {"convert --help", ""},
+      {"convert", positions},
+      {"convert --to wgs84", positions},
+      {"convert --describe", ""},
+      {"convert --csv --to 2154", table},
+      {"convert --geojson --to 2154", json},
+      {"line", positions},
+      {"line --points 3", positions},
+      {"line --points 3 --as csv", positions},
+      {"line --points 3 --as geojson", positions},
+      {"line --area", "0 0\n0 1\n1 1\n"},
+      {"line --csv", "lat1,lon1,lat2,lon2\n1,2,3,4\n"},
+      {"magnetic --date 2026 1 2", ""},
+      {"magnetic --date 2026 -f -", positions},
+      {"magnetic --date 2026 --csv -f -", table},
+      {"factors --system 2154", positions},
+      {"factors --system 2154 --json", positions},
+      {"geoid " + grid + " 45 -65", ""},
+      {"geoid " + grid + " -f -", "45 -65\n"},
+      {"systems list", ""},
+      {"systems list methods", ""},
+      {"systems list zones --json", ""},
+      {"systems search lambert", ""},
+      {"systems show 2154", ""},
+      {"systems show 2154 --as wkt2", ""},
+      {"systems show 27700 --to 4326 --json", ""},
+      {"doctor", ""},
+      {"doctor --json", ""}};
+  for (const auto& [command, input] : kCommands) {
+    EXPECT_EQ(shell("tidewater " + command, input).status, 0) << command;
+    const Outcome r = shell("tidewater " + command + " >/dev/full", input);
     EXPECT_EQ(r.status, 2) << command;
     EXPECT_NE(r.err.find("standard output cannot be written"), std::string::npos) << command;
   }
+  // No file of these processes may grow at all; what they say goes through a pipe.
+  const Outcome documents = shell("(ulimit -f 0; trap '' XFSZ; tidewater documents " +
+                                  folder.path().string() + "/d 2>&1; echo $?) | cat");
+  EXPECT_NE(documents.out.find("cannot be written\n2\n"), std::string::npos) << documents.out;
 }
 
 TEST(Command, TablesThatCannotBeRead) {

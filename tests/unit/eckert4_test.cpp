@@ -91,6 +91,28 @@ TEST(EckertIV, NearThePole) {
   }
 }
 
+TEST(EckertIV, NearThePoleThePassesComeToRest) {
+  // Newton's passes from half the latitude, as stated; the root by w = pi/2 - t to its third power:
+  // t + sin t cos t + 2 sin t = (2 + pi/2) sin p is w^2 (1 + w / 3 ...) = (2 + pi/2) u^2 / 2.
+  for (const double u : {4.9e-4, 3e-4, 1e-4, 3e-5, 1e-5}) {
+    for (const double sign : {1.0, -1.0}) {
+      Points out = {{0.7, sign * (kPi / 2 - u), 0}};
+      EXPECT_EQ(forward(out, out), TW_SUCCESS) << u;
+      long double low = 1, high = 1.57079632679489662L;
+      const long double target = (2 + std::acos(-1.0L) / 2) * std::cos(static_cast<long double>(u));
+      for (int k = 0; k < 80; ++k) {
+        const long double t = (low + high) / 2;
+        (t + std::sin(t) * std::cos(t) + 2 * std::sin(t) < target ? low : high) = t;
+      }
+      const auto sine = static_cast<double>(std::sin(low));
+      const auto cosine = static_cast<double>(std::cos(low));
+      // Where the derivative goes to zero rounding moves the root: by 1e-16 over w.
+      EXPECT_NEAR(out[0].y, sign * kYUnit * sine, 1e-14);
+      EXPECT_NEAR(out[0].x, 2 / std::sqrt(kPi * (4 + kPi)) * 0.7 * (1 + cosine), 1e-15 / u);
+    }
+  }
+}
+
 TEST(EckertIV, EveryInputLeavesTheConstants) {
   for (const double lat : {kPi / 2, -kPi / 2, 3.0, 100.0, 1e17, -1e17, 1e300, -1e300,
                            static_cast<double>(kInfinity), kNaN}) {
@@ -116,6 +138,11 @@ TEST(EckertIV, InverseClampsTheOrdinate) {
   EXPECT_NEAR(out[0].y, kPi / 2, 3e-8);
   EXPECT_NEAR(out[0].x, 0.7 + std::sqrt(kPi * (4 + kPi)) * 0.3 / 2, 1e-15);
   EXPECT_NEAR(out[1].y, -kPi / 2, 3e-8);
+  for (const double sign : {1.0, -1.0}) {
+    CoordinateTriple p = {0.3, sign * 1.05 * kYUnit, 0};
+    TWeckertIV_i(0.7, 0, 1, &p, &p, &status);
+    EXPECT_NEAR(p.y, sign * kPi / 2, 3e-8);
+  }
   EXPECT_NEAR(out[2].y, kPi / 2, 3e-8);
   EXPECT_TRUE(std::isnan(out[3].y));
 }

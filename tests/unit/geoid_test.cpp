@@ -690,6 +690,18 @@ TEST_F(Geoid, FileCutAtEachRecord) {
   }
 }
 
+TEST_F(Geoid, TheSamePointAskedAgainIsServedFromTheOldNodes) {
+  // By contract: the bounds are those of the window that could not be read.
+  write_grid(folder, "g", {-100, 20, 60, 60, [](int r, int) { return r < 30 ? 1.0F : 2.0F; }});
+  const Opened opened = open(folder, {"g"});
+  EXPECT_EQ(Undulation(opened.control, -70, 25.25).n, 1);
+  fs::resize_file(folder.path() / "g.geo", 5);
+  EXPECT_EQ(Undulation(opened.control, -70, 70.25).status, TW_GEOID_READ_ERROR);
+  const Undulation again(opened.control, -70, 70.25);
+  EXPECT_EQ(again.status, TW_SUCCESS);
+  EXPECT_EQ(again.n, 1);
+}
+
 TEST_F(Geoid, HeadersOfImpossibleSizes) {
   constexpr std::int32_t kMost = 2147483647;
   const float infinity = std::numeric_limits<float>::infinity();

@@ -125,4 +125,43 @@ TEST_F(NadconPins, AGridThatCannotBeOpenedLeavesNoFileOpen) {
   }
 }
 
+TEST_F(NadconPins, ADirectoryThatTheBlockCannotHoldIsNone) {
+  const auto none = [](int, int) { return 0.0F; };
+  open({-100, 20, 30, 8, none}, {-100, 20, 30, 8, none});
+  std::string directory = folder.directory();
+  directory.insert(0, 260 - directory.size(), '/');  // one more than with its end fits
+  NadconControl block = {};
+  block.grid_count = -7;
+  TWstatus status = 0;
+  TWnadcon_c(directory.c_str(), &block, &status);
+  EXPECT_EQ(status, TW_GRID_NOT_FOUND);
+  EXPECT_EQ(block.grid_count, -7);
+  EXPECT_STREQ(block.directory, "");
+}
+
+TEST_F(NadconPins, AGridBehindTheCountDoesNotServe) {
+  const auto ten = [](int, int) { return 10.0F; };
+  open({-100, 20, 30, 8, ten}, {-100, 20, 30, 8, ten});
+  control.grids[1] = control.grids[0];
+  control.grids[1].xmin += 100;
+  control.grids[1].xmax += 100;
+  const CoordinateTriple in = at(-10.5, 23.5);
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 0;
+  TWnadcon_f(1, &in, &control, &out, &status);
+  EXPECT_EQ(status, TW_I_OUTSIDE_NADCON);
+  expect_near(out, in.x, in.y, 5, 0);
+}
+
+TEST(MolodenskyPins, NearAPoleOnePointIsWritten) {
+  // Beyond 89 degrees a point goes through geocentric coordinates, and no neighbour with it.
+  const CoordinateTriple in[2] = {{0.3, degrees(89.5), 100}, {0.4, 0.5, 6}};
+  CoordinateTriple out[2] = {kUntouchedPoint, kUntouchedPoint};
+  TWstatus status = 0;
+  TWmol_std_i(6378137, 0.0818, 100, 1e-5, 10, 20, 30, 1, in, out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_NE(out[0].x, kUntouched);
+  expect_untouched(out[1]);
+}
+
 }  // namespace

@@ -106,6 +106,25 @@ TEST(ImwPolyconic, IsNearlyThePlainPolyconic) {
               arc_between(e, degrees(36), degrees(39)) + nu * cot * (1 - std::cos(angle)), 300 / a);
 }
 
+TEST(ImwPolyconic, AWholeTurnAsideIsTheSamePlace) {
+  // Beyond half a turn a point goes a road of its own, to the same image.
+  for (const double lat1 : {degrees(36), 0.0, degrees(-4), degrees(-40)}) {
+    const Sheet sheet(kE, 0.1, lat1);
+    for (double north = 0; north < 4.1; north += 0.5) {
+      for (const double east : {-0.04, 0.0, 0.03}) {
+        Points here = {{0.1 + east, lat1 + degrees(north), 0}};
+        // up to a whole turn from the central meridian
+        const double turn = east <= 0 ? 2 * kPi : -2 * kPi;
+        Points aside = {{0.1 + east + turn, here[0].y, 0}};
+        EXPECT_EQ(sheet.forward(here, here), TW_SUCCESS);
+        EXPECT_EQ(sheet.forward(aside, aside), TW_SUCCESS);
+        // What rounding leaves of radii of up to 60.
+        expect_near(aside[0], here[0].x, here[0].y, 5e-14);
+      }
+    }
+  }
+}
+
 TEST(ImwPolyconic, EdgesAreTrueArcs) {
   // The bounding parallels are polyconic arcs, true to scale; the meridians 2 degrees out are too.
   for (const double south : {degrees(36), degrees(-40), degrees(64)}) {

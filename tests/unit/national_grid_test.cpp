@@ -618,6 +618,24 @@ TEST_F(NationalGrid, ArrayStopsAtAShortRead) {
   }
 }
 
+TEST_F(NationalGrid, TheSamePointAskedAgainIsServedFromTheOldNodes) {
+  // By contract: the block that could not be read counts as loaded.
+  const GsbFile file{
+      {child("A", "NONE", 43, 45, 104, 106, 2), child("B", "NONE", 53, 55, 104, 106, 3)}};
+  const std::string bytes = file.bytes();
+  ASSERT_EQ(open(bytes.substr(0, bytes.size() - 16 - 24 * 16)), TW_SUCCESS);
+  const CoordinateTriple first = west(104.75, 43.75), in = west(104.75, 53.75);
+  CoordinateTriple out = {};
+  TWstatus status = 0;
+  TWcnt_f(1, &first, 0, &out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  TWcnt_f(1, &in, 0, &out, &status);
+  EXPECT_EQ(status, TW_GSB_READ_ERROR);
+  TWcnt_f(1, &in, 0, &out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_NEAR((out.y - in.y) / kSecond, 2, 1e-6);  // and not the 3 of its own nodes
+}
+
 // Which nodes a load keeps is seen by writing other values into the file behind it.
 class NationalBlock : public NationalGrid {
  protected:

@@ -94,9 +94,9 @@ TEST(Chamberlin, PlacesOfTheSphere) {
     ASSERT_EQ(status, TW_SUCCESS);
     std::mt19937 random(3);
     std::uniform_real_distribution<double> lon(-3, -0.6), lat(-0.6, 1.5);
-    Points in(40), out = untouched(40);
+    Points in(1000), out = untouched(1000);
     for (CoordinateTriple& p : in) p = {lon(random), lat(random), 7};
-    TWchamtri_f(0, corners.data(), sides.data(), azimuths.data(), plane.data(), 40, in.data(),
+    TWchamtri_f(0, corners.data(), sides.data(), azimuths.data(), plane.data(), 1000, in.data(),
                 out.data(), &status);
     EXPECT_EQ(status, TW_SUCCESS);
     int inside = 0;
@@ -106,7 +106,7 @@ TEST(Chamberlin, PlacesOfTheSphere) {
       ++inside;
       expect_near(out[i], p.x, p.y, 7, 1e-13);
     }
-    EXPECT_GT(inside, 30);
+    EXPECT_GT(inside, 800);
   }
 }
 
@@ -227,6 +227,23 @@ TEST(ObliqueMercator, TheInverseOfThePoles) {
   expect_near(p, h.lon0, kHalf, 0);
   p = h.back(-u, -v);
   expect_near(p, h.lon0, -kHalf, 0);
+}
+
+TEST(ObliqueMercator, ADistanceThatRoundsBelowOneIsHeld) {
+  // On the equator D = B sqrt(1 - e^2) is 1 in exact arithmetic, and E = D + sqrt(D^2 - 1) too.
+  int below = 0;
+  for (int i = 1; i < 300; ++i) {
+    const double e = 0.001 * i, e2 = e * e;
+    double lat0 = 0, alpha = 0.7, B = 0, A = 0, E = 0, lon0 = 0, gamma0 = 0;
+    TWstatus status = 0;
+    TWo_merc_c(0, e, 0.3, 0, 0, 0, &lat0, &alpha, &B, &A, &E, &lon0, &gamma0, &status);
+    EXPECT_EQ(status, TW_SUCCESS) << e;
+    EXPECT_NEAR(E, 1, 1e-7) << e;
+    EXPECT_NEAR(gamma0, 0.7, 1e-14) << e;
+    const double D = std::sqrt(1 + e2 / (1 - e2)) * std::sqrt(1 - e2);
+    below += D * D < 1;
+  }
+  EXPECT_GT(below, 10);
 }
 
 // --- Stereographic ------------------------------------------------------------------------------
@@ -379,6 +396,70 @@ TEST(Cassini, TheInversePoleIsATrillionthWide) {
   }
 }
 
+TEST(AzimuthalEqualArea, TheOriginOfAnOblique) {
+  // rho = 0 has no azimuth.  On the large flattening the authalic latitude goes there and back.
+  for (const double e : {0.0, kE, 0.3}) {
+    double e2 = 0, q1 = 0, qp = 0, rq = 0, m1 = 0, sin_b1 = 0, cos_b1 = 0, sin_lat0 = 0;
+    double cos_lat0 = 0, D = 0;
+    TWstatus status = 0;
+    TWlam_az_eq_c(e, 0.25, 0.7, &e2, &q1, &qp, &rq, &m1, &sin_b1, &cos_b1, &sin_lat0, &cos_lat0, &D,
+                  &status);
+    for (const double y : {0.0, 1e-200}) {  // the square of which is 0
+      const CoordinateTriple in = {0, y, 0};
+      CoordinateTriple out = kUntouchedPoint;
+      TWlam_az_eq_i(&in, 1, e, 0.25, 0.7, e2, qp, rq, sin_b1, cos_b1, sin_lat0, cos_lat0, D, &out,
+                    &status);
+      EXPECT_EQ(status, TW_SUCCESS);
+      expect_near(out, 0.25, 0.7, 1e-12);
+    }
+  }
+}
+
+TEST(AzimuthalEqualArea, APolarMapIsTrueHardByItsPole) {
+  for (const double sign : {1.0, -1.0}) {
+    double e2 = 0, q1 = 0, qp = 0, rq = 0, m1 = 0, sin_b1 = 0, cos_b1 = 0, sin_lat0 = 0;
+    double cos_lat0 = 0, D = 0;
+    TWstatus status = 0;
+    TWlam_az_eq_c(kE, 0.25, sign * kHalf, &e2, &q1, &qp, &rq, &m1, &sin_b1, &cos_b1, &sin_lat0,
+                  &cos_lat0, &D, &status);
+    for (const double off : {1e-2, 1e-3, 1e-4, 1e-5, 3e-7}) {
+      CoordinateTriple p = {0.3, sign * (kHalf - off), 0};
+      TWlam_az_eq_s(&p, 1, 0.25, sign * kHalf, kE, e2, qp, 1, sin_lat0, cos_lat0, &p, &status);
+      EXPECT_EQ(status, TW_SUCCESS);
+      // What is left of qp - q has 16 digits less those of the square of the distance.
+      EXPECT_NEAR(p.x, 1, off * off + 1e-16 / (off * off) * 4);
+      EXPECT_NEAR(p.y, 1, off * off + 1e-16 / (off * off) * 4);
+    }
+  }
+}
+
+TEST(AzimuthalEquidistant, TheWholeSphereThereAndBack) {
+  // Distance and azimuth of the sphere forward; back, the side of the quarter turn is found again.
+  int beyond = 0;
+  for (const double lat0 : {0.0, 0.6, -0.6, 1.2, -1.3}) {
+    double n1 = 0, g = 0;
+    TWaz_eq_c(0, lat0, &n1, &g);
+    for (double lon = -3; lon < 3.1; lon += 0.37) {
+      for (double lat = -1.5; lat < 1.51; lat += 0.23) {
+        const CoordinateTriple in = {0.1 + lon, lat, 0};
+        const Arc arc({0.1, lat0, 0}, in);
+        if (arc.distance > 3) continue;  // the antipode is a circle
+        CoordinateTriple p = in;
+        TWstatus status = 0;
+        TWaz_eq_f(0, 0.1, lat0, n1, g, 1, &p, &p, &status);
+        EXPECT_EQ(status, TW_SUCCESS);
+        expect_near(p, static_cast<double>(arc.distance * std::sin(arc.azimuth)),
+                    static_cast<double>(arc.distance * std::cos(arc.azimuth)), 1e-12);
+        TWaz_eq_i(0, 0.1, lat0, n1, 1, &p, &p, &status);
+        EXPECT_EQ(status, TW_SUCCESS);
+        expect_near(p, in.x, in.y, 1e-11);
+        beyond += std::fabs(lon) > 1.6;
+      }
+    }
+  }
+  EXPECT_GT(beyond, 200);
+}
+
 // --- Albers -------------------------------------------------------------------------------------
 
 TEST(Albers, WhatTheSpheresFanDoesNotHold) {
@@ -426,6 +507,141 @@ TEST(Albers, TheApexIsAHundredThousandthWide) {
   EXPECT_NEAR(p.x, 0.5e-5, 1e-20);
   EXPECT_NEAR(p.y, 0.5e5, 1e-9);
   EXPECT_NEAR(p.z, 0.25, 1e-15);
+}
+
+// --- Perspective
+// ----------------------------------------------------------------------------------
+
+TEST(Perspective, TenPassesForTheConstants) {
+  // On an ellipsoid of no planet they are all used up, and each moves the result.
+  constexpr double e2 = 0.8 * 0.8, lat0 = 0.7, height = -0.3;
+  const double s = std::sin(lat0), c = std::cos(lat0), n1 = 1 / std::sqrt(1 - s * s * e2);
+  double lat = lat0, distance = 0, before = 0;
+  for (int pass = 0; pass < 10; ++pass) {
+    before = lat;
+    distance = c / std::cos(lat) * (height + n1);
+    lat = lat0 - std::asin(s * n1 * e2 * c / distance);
+  }
+  double p = kUntouched, phi_g = kUntouched;
+  TWstatus status = 0;
+  TWpersp_c(1, 0.8, lat0, height, 0, &p, &phi_g, &status);
+  EXPECT_EQ(status, TW_BAD_PARAMETER);
+  EXPECT_NEAR(p, distance, 1e-12);
+  EXPECT_NEAR(phi_g, lat, 1e-12);
+  EXPECT_GT(std::fabs(lat - before), 1e-10);
+}
+
+TEST(Perspective, TheSpheresConstants) {
+  double p = kUntouched, phi_g = kUntouched;
+  TWstatus status = 77;
+  TWpersp_c(6371000, 0, 0.7, 500000, 1000, &p, &phi_g, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_EQ(p, 501000.0 / 6371000 + 1);
+  EXPECT_EQ(phi_g, 0.7);
+}
+
+// --- Polyconic
+// ------------------------------------------------------------------------------------
+
+TEST(Polyconic, TheEquatorsScaleEndsAtItsLimit) {
+  // By contract the sphere's tangent is 0 / 0 hard by the equator, where the equator's own form,
+  // 1 + d^2 / 2, no longer serves.
+  const auto h = [](double lat) {
+    CoordinateTriple p = {0.2, lat, 0};
+    TWstatus status = 0;
+    TWpolycon_s(0, 0, 1, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    return p.y;
+  };
+  for (const double sign : {1.0, -1.0}) {
+    EXPECT_NEAR(h(sign * std::nextafter(1e-14, 0)), 1.02, 1e-15);
+    EXPECT_TRUE(std::isnan(h(sign * 1e-14)));
+  }
+}
+
+// --- Lambert conformal
+// ----------------------------------------------------------------------------
+
+TEST(LambertConformal, HardByTheApexIsTheCentralMeridian) {
+  // A cone of n = 1 on the sphere: 5e-14 from the apex the latitude is not yet the pole's, and the
+  // angle at the apex counts as none.
+  for (const double x : {0.0, 3e-14, -3e-14}) {
+    const CoordinateTriple in = {x, 0.5, 0};
+    CoordinateTriple out = kUntouchedPoint;
+    TWstatus status = 0;
+    TWlam_i(0, 0.25, 1, 1, 0.5 + 5e-14, 1, &out, &in, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    EXPECT_EQ(out.x, 0.25) << x;
+    EXPECT_NEAR(out.y, kHalf, 1e-12);
+  }
+}
+
+// --- Bonne --------------------------------------------------------------------------------------
+
+TEST(Bonne, OnlyTheStandardParallelItselfIsTrue) {
+  // The scale of the parallel's opposite is that of any other latitude.
+  constexpr double lat1 = 0.7, d = 0.4;
+  const double r0 = 1 / std::tan(lat1) + lat1;
+  const auto h = [&](double lat) {
+    CoordinateTriple p = {0.1 + d, lat, 0};
+    TWstatus status = 0;
+    TWbonne_s(1, lat1, 0.1, 0, r0, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    return p.y;
+  };
+  EXPECT_EQ(h(lat1), 1);
+  for (const double lat : {-lat1, 0.3}) {
+    const double r = r0 - lat, g = (std::cos(lat) - r * std::sin(lat)) / r * d;
+    EXPECT_NEAR(h(lat), std::sqrt(g * g + 1), 1e-15);
+    EXPECT_GT(h(lat), 1.001);
+  }
+}
+
+// --- Sinusoidal ---------------------------------------------------------------------------------
+
+TEST(Sinusoidal, AnOriginBeyondThePoleHasNoArcBeforeIt) {
+  // The latitude is the origin's own: no arc is asked for, and none fails.
+  const CoordinateTriple in = {0.3, 1.6, 0};
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 77;
+  TWsinusoidal_f(0.1, 1.6, kE, kE * kE, 0.25, 1, &in, &out, &status);
+  EXPECT_EQ(status, TW_SUCCESS);
+  EXPECT_EQ(out.y, 0);
+}
+
+TEST(Sinusoidal, AnArcAHairBeyondTheQuarterIsHeldAndTold) {
+  const CoordinateTriple in = {0.2, kHalf + 5e-13, 0};
+  CoordinateTriple out = kUntouchedPoint;
+  TWstatus status = 0;
+  TWsinusoidal_i(0.1, 0, 0, 0, 0, 1, &in, &out, &status);
+  EXPECT_EQ(status, TW_I_LATITUDE_LIMITED);
+  expect_near(out, 0.1, kHalf, 0);
+}
+
+TEST(Sinusoidal, TheCentralMeridianIsTrue) {
+  for (double lat = -1.5; lat < 1.6; lat += 0.25) {
+    CoordinateTriple p = {0.1, lat, 0};
+    TWstatus status = 0;
+    TWsinusoidal_s(1, 0.1, kE * kE, 1, &p, &p, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    // The fifth power of n, where the arc's series ends, is 1e-14.
+    EXPECT_NEAR(p.x, 1, 1e-13) << lat;
+    EXPECT_NEAR(p.y, 1, 1e-13) << lat;
+  }
+}
+
+// --- Rotated graticule --------------------------------------------------------------------------
+
+TEST(RotatedGraticule, ASineOfOneIsThePole) {
+  // A billionth from the pole and from its antipode the sine is 1 to the last bit.
+  for (const double sign : {1.0, -1.0}) {
+    const CoordinateTriple in = {sign > 0 ? 0.5 : 0.5 + kPi, sign * (0.6 - 1e-9), 0};
+    CoordinateTriple out = kUntouchedPoint;
+    TWstatus status = 0;
+    TWrotgrat_f(0.1, 0.2, 0.5, 0.6, 0.3, 1, &in, &out, &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    EXPECT_EQ(out.y, sign * kHalf);
+  }
 }
 
 // --- The general inverse, step by step

@@ -217,12 +217,17 @@ TEST(VanDerGrinten, ScaleFillsAtThePoles) {
   EXPECT_EQ(status, TW_SUCCESS);
 }
 
-TEST(VanDerGrinten, ClosedFormBesideTheStatedIteration) {
-  // The latitude by the iteration, pass for pass.
-  const auto stated = [](double X, double Y) {
+// The latitude of (X, Y), in units of pi, by the iteration, pass for pass.
+struct StatedLatitude {
+  double lat = 0;
+  bool limited = false;
+
+  StatedLatitude(double X, double Y) {
     double p = 2 * std::atan(Y), previous = p + 1;
     for (int pass = 0; pass < 200 && std::fabs(p - previous) > 1e-12; ++pass) {
       previous = p;
+      limited = std::fabs(2 * p / kPi) > 1;
+      if (limited) break;
       const double th = std::asin(2 * p / kPi), s = std::sin(th), c = std::cos(th);
       const double t = std::tan(th / 2), G = c / (c + s - 1), B = Y / s - 1 / (c + 1), f = 2 - s;
       const double F = (X * X + Y * Y - 2 * f * G * B - t * t) * c * kPi / 4;
@@ -230,8 +235,33 @@ TEST(VanDerGrinten, ClosedFormBesideTheStatedIteration) {
                        (c * Y / (1 - c) + t) * f * G / (c + 1) - (t * t - 1) * t;
       p -= F / D;
     }
-    return previous;
-  };
+    lat = previous;
+  }
+};
+
+TEST(VanDerGrinten, TheRimByTheStatedIteration) {
+  int within = 0, beyond = 0;
+  for (const double r : {0.99996, 0.99999, 1.0, 1.0001, 1.01, 1.1, 1.3}) {
+    for (double angle = 0.05; angle < 1.5; angle += 0.037) {
+      const double X = r * std::cos(angle), Y = r * std::sin(angle);
+      const StatedLatitude stated(X, Y), aside(X * (1 + 1e-12), Y);
+      // Near its singular places rounding decides what becomes of a start.
+      if (aside.limited != stated.limited || !(std::fabs(aside.lat - stated.lat) < 1e-9)) continue;
+      const CoordinateTriple in = {X * kPi, -Y * kPi, 0};
+      CoordinateTriple out = kUntouchedPoint;
+      TWstatus status = 0;
+      TWvdg_i(0, 0, 1, &in, &out, &status);
+      EXPECT_EQ(status, stated.limited ? TW_I_LATITUDE_LIMITED : TW_SUCCESS) << r << " " << angle;
+      EXPECT_NEAR(out.y, -stated.lat, 1e-8) << r << " " << angle;
+      ++(stated.limited ? beyond : within);
+    }
+  }
+  EXPECT_GT(within, 50);
+  EXPECT_GT(beyond, 10);
+}
+
+TEST(VanDerGrinten, ClosedFormBesideTheStatedIteration) {
+  const auto stated = [](double X, double Y) { return StatedLatitude(X, Y).lat; };
   for (double r = 0.01; r < 0.99; r += 0.021) {
     for (double angle = 0.01; angle < kPi / 2; angle += 0.037) {
       const double X = r * std::cos(angle), Y = r * std::sin(angle);

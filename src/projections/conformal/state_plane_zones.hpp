@@ -1,5 +1,5 @@
-// The zones of the State Plane Coordinate Systems of 1927 and 1983, in the order of their lists; their
-// names stand in data/zones_1927.csv and data/zones_1983.csv, in the same order.
+// The zones of the State Plane Coordinate Systems of 1927 and 1983, in the order of their lists;
+// their names stand in data/zones_1927.csv and data/zones_1983.csv, in the same order.
 //
 // The definitions are those of Claire, State Plane Coordinates by Automatic Data Processing, Coast
 // and Geodetic Survey Publication 62-4 (1968), for 1927, and of Stem, State Plane Coordinate System

@@ -1,11 +1,11 @@
 // Laborde projection: the ellipsoid on the Gauss conformal sphere, its transverse Mercator plane,
 // and a complex cubic.  The exported functions, and a point whose refinement does not end.
 
+#include "tidewater/laborde.h"
 #include "points/over_heights.hpp"
 #include "points/portable.hpp"
 #include "projections/special/laborde_points.hpp"
 #include "tidewater/gauss_sphere.h"
-#include "tidewater/laborde.h"
 #include "tidewater/transverse_mercator.h"
 
 using namespace tidewater::detail;

@@ -13,8 +13,8 @@ namespace tidewater::detail {
 
 inline constexpr double kMollweideX = std::numbers::sqrt2 * 2 / kPi;
 
-// The cube root of a number from 1e-280 on, within 1e-9 of it: a start from the exponent's third part
-// within a tenth, two steps that need no division.
+// The cube root of a number from 1e-280 on, within 1e-9 of it: a start from the exponent's third
+// part within a tenth, two steps that need no division.
 template <Number V>
 TW_INLINE V rough_cube_root(V a) {
   const V high = number(shift_right(bits(a), 32) + Bits<V>(int64_t{0x4338000000000000})) - 0x1.8p52;

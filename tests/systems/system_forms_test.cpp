@@ -1,0 +1,335 @@
+// The forms of a system's name that other tests do not use, units by name, and the calls of the C
+// interface one by one.
+
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cmath>
+#include <limits>
+#include <string>
+
+#include "tidewater/ellipsoid.hpp"
+#include "tidewater/error.hpp"
+#include "tidewater/lines.hpp"
+#include "tidewater/projection.hpp"
+#include "tidewater/system.hpp"
+#include "tidewater/systems.h"
+#include "tidewater/transformation.hpp"
+
+namespace tidewater::test {
+
+namespace {
+
+// The sentence with which a text is refused; empty where it is taken.
+std::string refusal(const std::string& text) {
+  try {
+    const System system(text);
+    return "";
+  } catch (const Error& error) {
+    return error.what();
+  }
+}
+
+void expect_refused(const std::string& text, const std::string& because) {
+  const std::string sentence = refusal(text);
+  EXPECT_NE(sentence.find(because), std::string::npos) << text << ": \"" << sentence << "\"";
+}
+
+Point forward(const System& system, double lon, double lat) {
+  const auto projection = system.projection();
+  EXPECT_TRUE(projection.has_value());
+  return projection->forward({lon, lat});
+}
+
+}  // namespace
+
+TEST(Units, ByNameAndCode) {
+  const Unit metre("metre");
+  EXPECT_EQ(metre.name(), "metre");
+  EXPECT_EQ(metre.code(), 9001);
+  EXPECT_EQ(metre.kind(), Unit::Kind::length);
+  EXPECT_EQ(metre.factor(), 1);
+  EXPECT_EQ(Unit("EPSG:9003").factor(), 1200.0 / 3937);
+  const Unit grad("grad");
+  EXPECT_EQ(grad.kind(), Unit::Kind::angle);
+  EXPECT_NEAR(grad.factor(), 3.14159265358979323846 / 200, 1e-17);
+  const Unit parts("parts per million");
+  EXPECT_EQ(parts.kind(), Unit::Kind::scale);
+  EXPECT_NEAR(parts.factor(), 1e-6, 1e-21);
+  EXPECT_THROW(Unit("no such unit"), Error);
+}
+
+TEST(Ellipsoids, SemiMinorAxis) {
+  EXPECT_NEAR(Ellipsoid("WGS 84").b(), 6356752.314245, 1e-6);
+  EXPECT_EQ(Ellipsoid(6371000, 0).b(), 6371000);
+}
+
+TEST(SystemNames, UtmOnAnyDatum) {
+  // A pair of datum and zone of the registry is that system.
+  EXPECT_EQ(System("utm:31N ED50").code(), 23031);
+  // Others are made: the equator at the central meridian is (500 km, 0 or 10,000 km).
+  const System tokyo("utm:31S Tokyo");
+  EXPECT_EQ(tokyo.code(), 0);
+  EXPECT_EQ(tokyo.name(), "Tokyo / UTM zone 31S");
+  EXPECT_EQ(tokyo.ellipsoid().name(), "Bessel 1841");
+  const Point p = forward(tokyo, 3, 0);
+  EXPECT_NEAR(p.x, 500000, 1e-6);
+  EXPECT_NEAR(p.y, 1e7, 1e-6);
+  // A projected system stands for its base.
+  EXPECT_NE(System("utm:31N EPSG:31370").datum().find("Belg"), std::string::npos);
+  expect_refused("utm:31N EPSG:5773", "is no geographic system");
+  EXPECT_THROW(System("utm", 10, 86), Error);
+  EXPECT_EQ(System("ups", 10, 86).code(), 5041);
+  EXPECT_EQ(System("ups", 10, -86).code(), 5042);
+  EXPECT_EQ(System("ups:south").code(), 5042);
+  expect_refused("ups:X", "must say N or S");
+  expect_refused("ups", "must say N or S");
+}
+
+TEST(SystemNames, ObliqueStatePlaneZone) {
+  // Alaska 1 of NOS NGS 5 (1989), appendix A, which the registry has as a system of its own.
+  const System alaska("spcs83:5001");
+  EXPECT_NE(alaska.method().find("Oblique Mercator"), std::string::npos);
+  const Point p = forward(alaska, -134, 55), q = forward(System("EPSG:26931"), -134, 55);
+  // The registry's azimuth is rounded to 1e-4 seconds, 0.7 mm at this distance.
+  EXPECT_NEAR(p.x, q.x, 1e-3);
+  EXPECT_NEAR(p.y, q.y, 1e-3);
+  expect_refused("spcs83:9999", "There is no state plane zone");
+}
+
+TEST(SystemNames, Definitions) {
+  const System plain("transverse mercator lon0=9 k0=0.9996 x0=500000 datum=ED50");
+  const Point p = forward(plain, 9, 0);
+  EXPECT_NEAR(p.x, 500000, 1e-6);
+  EXPECT_NEAR(p.y, 0, 1e-6);
+  EXPECT_EQ(plain.ellipsoid().name(), "International 1924");
+  EXPECT_EQ(plain.axes(), "EN");
+  EXPECT_EQ(System("transverse mercator lon0=9 ellps=GRS80 axes=NE").axes(), "NE");
+  expect_refused("transverse mercator lon0=9 ellps=GRS80 axes=XY", "two letters of E, N, W and S");
+  expect_refused("transverse mercator lon0=9 ellps=GRS80 axes=ENU", "two letters of E, N, W and S");
+  const System feet("transverse mercator lon0=9 ellps=GRS80 units=EPSG:9003");
+  EXPECT_EQ(feet.unit_factor(), 1200.0 / 3937);
+  expect_refused("transverse mercator lon0=9 ellps=GRS80 units=degree", "is no unit of length");
+  expect_refused("no such method lon0=9 ellps=GRS80", "there is no projection method");
+  EXPECT_EQ(System("geographic ellps=GRS80 pm=2.5").meridian().longitude(), 2.5);
+  // 2.5969213 grads
+  EXPECT_NEAR(System("geographic ellps=GRS80 pm=Paris").meridian().longitude(), 2.5969213 * 0.9,
+              1e-12);
+  expect_refused("EPSG:5773+4326", "must be a horizontal system and a vertical one");
+  expect_refused("EPSG:4326+4326", "must be a horizontal system and a vertical one");
+}
+
+TEST(SystemNames, ProjStrings) {
+  // Other names for one ellipsoid: figures by f, e squared, b.
+  const double rf = 298.257222101, f = 1 / rf;
+  const auto flattening = [](const std::string& words) {
+    return System("+proj=longlat +a=6378137 " + words).ellipsoid().inverse_flattening();
+  };
+  EXPECT_NEAR(flattening("+rf=298.257222101"), rf, 1e-9);
+  EXPECT_NEAR(flattening("+f=" + std::to_string(f)), rf, 1e-1);
+  EXPECT_NEAR(flattening("+es=0.006694380022903416"), rf, 1e-9);
+  EXPECT_EQ(flattening("+es=0"), 0);
+  EXPECT_EQ(flattening("+f=0"), 0);
+  expect_refused("+proj=longlat +a=6378137 +es=1", "+es must be from zero up to one");
+  expect_refused("+proj=longlat +a=6378137 +es=-0.1", "+es must be from zero up to one");
+}
+
+TEST(SystemNames, PolarProjString) {
+  const Point south = forward(System("+proj=ups +south +ellps=WGS84"), 0, -90);
+  EXPECT_NEAR(south.x, 2e6, 1e-6);
+  EXPECT_NEAR(south.y, 2e6, 1e-6);
+  // Along the meridian of Greenwich y grows in the south and falls in the north.
+  EXPECT_GT(forward(System("+proj=ups +south +ellps=WGS84"), 0, -89).y, 2e6);
+  EXPECT_LT(forward(System("+proj=ups +ellps=WGS84"), 0, 89).y, 2e6);
+}
+
+TEST(SystemNames, SevenParametersInAProjString) {
+  const System bessel("geographic ellps=bessel towgs84=598.1,73.7,418.2,0.202,0.045,-2.455,6.7");
+  EXPECT_NE(bessel.to_proj().find("+towgs84=598.1,73.7,418.2,0.202,0.045,-2.455,6.7"),
+            std::string::npos)
+      << bessel.to_proj();
+}
+
+TEST(Transformations, AnEnsembleAndItsMemberAreOne) {
+  // Within the 2 m that the registry states of the ensemble.
+  const Transformation map(System("EPSG:4326"), System("EPSG:9057"));
+  EXPECT_EQ(map.target().code(), 9057);
+  const Point p = map.forward({7, 51});
+  EXPECT_NEAR(p.x, 7, 2e-5);
+  EXPECT_NEAR(p.y, 51, 2e-5);
+  EXPECT_LE(map.accuracy(), 2);
+}
+
+TEST(Transformations, AnAreaMayBeAPoint) {
+  TransformationOptions options;
+  options.area = Area{"", 2, 47, 2, 47};
+  const Transformation map(System("EPSG:4230"), System("EPSG:4326"), options);
+  const Point p = map.forward({2, 47});
+  EXPECT_GT(std::fabs(p.x - 2), 1e-5);
+  EXPECT_LT(std::fabs(p.x - 2), 3e-3);
+}
+
+TEST(Lines, OfNoPlaceAreNone) {
+  constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+  const Geodesic geodesic(6378137, 1 / 298.257223563);
+  EXPECT_EQ(geodesic.f(), 1 / 298.257223563);
+  const Rhumb rhumb(6378137, 1 / 298.257223563);
+  EXPECT_EQ(rhumb.a(), 6378137);
+  for (const auto& [lon1, lat1, lon2, lat2] : {std::array{0.0, 95.0, 1.0, 1.0},
+                                               {0.0, 0.0, 1.0, -90.5},
+                                               {kNaN, 0.0, 1.0, 1.0},
+                                               {0.0, kNaN, 1.0, 1.0},
+                                               {0.0, 0.0, kNaN, 1.0},
+                                               {0.0, 0.0, 1.0, kNaN}}) {
+    EXPECT_TRUE(std::isnan(geodesic.inverse(lon1, lat1, lon2, lat2).length));
+    EXPECT_TRUE(std::isnan(rhumb.inverse(lon1, lat1, lon2, lat2).length));
+  }
+  // A quarter of the equator by a rhumb line.
+  const LineCourse course = rhumb.inverse(0, 0, 90, 0);
+  EXPECT_NEAR(course.length, 6378137 * 1.5707963267948966, 1e-6);
+  EXPECT_NEAR(course.azimuth1, 90, 1e-12);
+}
+
+TEST(SystemsC, EveryTextOfASystem) {
+  tw_system* system = tw_system_create_at("utm", 3, -10);
+  ASSERT_NE(system, nullptr) << tw_last_error();
+  EXPECT_EQ(tw_system_code(system), 32731);
+  EXPECT_EQ(tw_system_unit_factor(system), 1);
+  EXPECT_EQ(tw_system_unit_factor(nullptr), 0);
+  char text[2000];
+  EXPECT_GT(tw_system_datum(system, text, sizeof text), 0u);
+  EXPECT_NE(std::string(text).find("World Geodetic System 1984"), std::string::npos);
+  EXPECT_GT(tw_system_method(system, text, sizeof text), 0u);
+  EXPECT_STREQ(text, "Transverse Mercator");
+  EXPECT_EQ(tw_system_unit(system, text, sizeof text), 5u);
+  EXPECT_STREQ(text, "metre");
+  EXPECT_EQ(tw_system_axes(system, text, sizeof text), 2u);
+  EXPECT_STREQ(text, "EN");
+  EXPECT_GT(tw_system_describe(system, text, sizeof text), 0u);
+  EXPECT_NE(std::string(text).find("UTM zone 31S"), std::string::npos);
+  tw_projection* projection = tw_projection_of(system);
+  ASSERT_NE(projection, nullptr);
+  double xy[2] = {3, 0};
+  const tw_points view = {xy, xy + 1, nullptr, 2};
+  EXPECT_EQ(tw_project(projection, 0, 1, &view, &view, nullptr, 1), 0u);
+  EXPECT_NEAR(xy[0], 500000, 1e-6);
+  EXPECT_NEAR(xy[1], 1e7, 1e-6);
+  TWstatus word = 0;
+  EXPECT_EQ(tw_project(nullptr, 0, 1, &view, &view, &word, 1), 1u);
+  EXPECT_EQ(word, TW_BAD_INPUT);
+  tw_projection_destroy(projection);
+  tw_system_destroy(system);
+  EXPECT_EQ(tw_system_create_at("utm", 3, 89), nullptr);
+
+  tw_system* geographic = tw_system_create("EPSG:4326");
+  EXPECT_EQ(tw_projection_of(geographic), nullptr);
+  EXPECT_STREQ(tw_last_error(), "The system is not projected.");
+  tw_system_destroy(geographic);
+
+  ASSERT_GT(tw_projection_method_count(), 0u);
+  EXPECT_GT(tw_projection_method(0, text, sizeof text), 0u);
+  EXPECT_EQ(tw_projection_method(tw_projection_method_count(), text, sizeof text), 0u);
+}
+
+TEST(SystemsC, CandidatesAndOptions) {
+  tw_system* source = tw_system_create("EPSG:4230");
+  tw_system* target = tw_system_create("EPSG:4326");
+  const double area[4] = {-5, 42, 8, 51};
+  tw_transformation_options options = {};
+  options.area = area;
+  options.grid_folders = "/nowhere\n\n/nor here";
+  options.epoch = 2020.5;
+  tw_candidates* list = tw_candidates_create(source, target, &options);
+  ASSERT_NE(list, nullptr) << tw_last_error();
+  const std::size_t count = tw_candidates_count(list);
+  ASSERT_GT(count, 2u);
+  EXPECT_EQ(tw_candidates_count(nullptr), 0u);
+  char steps[200], text[400];
+  std::string usable;
+  for (std::size_t i = 0; i < count; ++i) {
+    EXPECT_GT(tw_candidate_name(list, i, text, sizeof text), 0u) << i;
+    tw_candidate_operation(list, i, steps, sizeof steps);
+    if (usable.empty() && tw_candidate_missing(list, i, text, sizeof text) == 0) usable = steps;
+  }
+  EXPECT_GT(tw_candidate_accuracy(list, 0), 0);
+  EXPECT_TRUE(std::isnan(tw_candidate_accuracy(list, count)));
+  EXPECT_TRUE(std::isnan(tw_candidate_accuracy(nullptr, 0)));
+  EXPECT_EQ(tw_candidate_name(list, count, text, sizeof text), 0u);
+  tw_candidates_destroy(list);
+  EXPECT_EQ(tw_candidates_create(nullptr, target, nullptr), nullptr);
+
+  // The one named is the one taken; its points in radians and in the systems' own axes.
+  ASSERT_FALSE(usable.empty());
+  options.operation = usable.c_str();
+  options.radians = 1;
+  options.own_axes = 1;
+  tw_transformation* map = tw_transformation_create(source, target, &options);
+  ASSERT_NE(map, nullptr) << tw_last_error();
+  EXPECT_EQ(tw_transformation_operation(map, text, sizeof text), usable.size());
+  EXPECT_EQ(text, usable);
+  options.radians = 0;
+  options.own_axes = 0;
+  tw_transformation* degrees = tw_transformation_create(source, target, &options);
+  ASSERT_NE(degrees, nullptr);
+  constexpr double kDegree = 3.14159265358979323846 / 180;
+  double own[2] = {47 * kDegree, 2 * kDegree}, usual[2] = {2, 47};
+  const tw_points own_view = {own, own + 1, nullptr, 2}, view = {usual, usual + 1, nullptr, 2};
+  EXPECT_EQ(tw_transform(map, 0, 1, &own_view, &own_view, nullptr, 1), 0u);
+  EXPECT_EQ(tw_transform(degrees, 0, 1, &view, &view, nullptr, 1), 0u);
+  EXPECT_NEAR(own[0] / kDegree, usual[1], 1e-12);
+  EXPECT_NEAR(own[1] / kDegree, usual[0], 1e-12);
+  EXPECT_GT(std::fabs(usual[0] - 2), 1e-5);  // the datums differ
+  float single[3] = {2, 47, 0};
+  const tw_points_f single_view = {single, single + 1, nullptr, 2};
+  EXPECT_EQ(tw_transform_f(degrees, 0, 1, &single_view, &single_view, nullptr, 1), 0u);
+  EXPECT_NEAR(single[0], usual[0], 1e-5);
+  EXPECT_NEAR(single[1], usual[1], 1e-5);
+  tw_transformation_destroy(degrees);
+  tw_transformation_destroy(map);
+  tw_system_destroy(source);
+  tw_system_destroy(target);
+}
+
+TEST(SystemsC, AnglesLinesAndNames) {
+  double degrees = -7;
+  EXPECT_EQ(tw_parse_angle("12\xC2\xB0 30' S", 2, 0, &degrees), 1);
+  EXPECT_EQ(degrees, -12.5);
+  EXPECT_EQ(tw_parse_angle("12,5", 0, 1, &degrees), 1);
+  EXPECT_EQ(degrees, 12.5);
+  degrees = -7;
+  EXPECT_EQ(tw_parse_angle("rubbish", 0, 0, &degrees), 0);
+  EXPECT_EQ(degrees, -7);
+  EXPECT_STRNE(tw_last_error(), "");
+
+  // A quarter of the equator, by either kind of line.
+  for (const int32_t rhumb : {0, 1}) {
+    tw_lines* lines = tw_lines_create(rhumb, 6378137, 1 / 298.257223563);
+    ASSERT_NE(lines, nullptr);
+    const double lon = 10, lat = 0, azimuth = 90, length = 6378137 * 1.5707963267948966;
+    double end_lon = 0, end_lat = 7, end_azimuth = 0;
+    EXPECT_EQ(
+        tw_lines_direct(lines, 1, &lon, &lat, &azimuth, &length, &end_lon, &end_lat, &end_azimuth),
+        0u);
+    EXPECT_NEAR(end_lon, 100, 1e-9);
+    EXPECT_NEAR(end_lat, 0, 1e-9);
+    tw_lines_destroy(lines);
+  }
+  EXPECT_EQ(
+      tw_lines_direct(nullptr, 3, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr),
+      3u);
+
+  tw_magnetic_model* model = tw_magnetic_model_create("WMM2025", 2025);
+  ASSERT_NE(model, nullptr);
+  char text[100];
+  EXPECT_GT(tw_magnetic_model_name(model, text, sizeof text), 0u);
+  EXPECT_NE(std::string(text).find("2025"), std::string::npos);
+  tw_magnetic_model_destroy(model);
+  tw_magnetic_value value[1];
+  TWstatus word = 0;
+  const double xyz[3] = {};
+  const tw_points view = {const_cast<double*>(xyz), const_cast<double*>(xyz + 1), nullptr, 3};
+  EXPECT_EQ(tw_magnetic_field(nullptr, 1, &view, value, &word), 1u);
+  EXPECT_EQ(word, TW_BAD_INPUT);
+}
+
+}  // namespace tidewater::test
