@@ -154,14 +154,12 @@ struct End {
     if (!odd) return;
     for (int i = 0; i < block.count; ++i) {
       const CoordinateTriple p = block.now[i];
-      if (!(std::isfinite(p.x) && std::isfinite(p.y) && std::isfinite(p.z))) {
+      if (!(std::isfinite(p.x) && std::isfinite(p.y) && std::fabs(p.z) <= 1e100)) {
         block.fail(i, TW_BAD_INPUT);
       } else if (!(std::fabs(p.x) <= limit_x)) {
         block.fail(i, angles ? TW_BAD_LONGITUDE : TW_BAD_INPUT);
       } else if (!(std::fabs(p.y) <= limit_y)) {
         block.fail(i, angles ? TW_BAD_LATITUDE : TW_BAD_INPUT);
-      } else if (!(std::fabs(p.z) <= 1e100)) {
-        block.fail(i, TW_BAD_INPUT);
       }
     }
   }

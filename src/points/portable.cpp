@@ -88,7 +88,6 @@ double asinh(double v) {
   return size < 1e150 ? points::asinh(v) : std::copysign(points::log(size) + kLn2, v);
 }
 double atanh(double v) { return points::atanh(v); }
-double exp(double v) { return points::exp(v); }
 double log(double v) { return points::log(v); }
 
 // The special values are those of C, Annex F.

@@ -18,7 +18,6 @@ double sinh(double v);
 double cosh(double v);
 double asinh(double v);
 double atanh(double v);
-double exp(double v);
 double log(double v);
 double pow(double base, double exponent);  // 0.51 ulp, by logarithms of twice the digits
 double hypot(double x, double y);          // 1.2 ulp

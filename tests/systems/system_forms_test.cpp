@@ -77,7 +77,7 @@ TEST(SystemNames, UtmOnAnyDatum) {
   EXPECT_NEAR(p.y, 1e7, 1e-6);
   // A projected system stands for its base.
   EXPECT_NE(System("utm:31N EPSG:31370").datum().find("Belg"), std::string::npos);
-  expect_refused("utm:31N EPSG:5773", "is no geographic system");
+  expect_refused("utm:31N EPSG:5773", "is not a geographic system");
   EXPECT_THROW(System("utm", 10, 86), Error);
   EXPECT_EQ(System("ups", 10, 86).code(), 5041);
   EXPECT_EQ(System("ups", 10, -86).code(), 5042);

@@ -231,7 +231,7 @@ std::string Side::name() const {
 
 const Transformation& Side::zone(int number) const {
   const std::lock_guard lock(zones_->lock);
-  auto& known = zones_->known[static_cast<std::size_t>(number + 60)];
+  auto& known = zones_->known[static_cast<std::size_t>(std::int64_t{number} + 60)];
   if (!known) {
     std::string name = std::to_string(std::abs(number)) + (number < 0 ? "S" : "N");
     const Side side =
