@@ -19,6 +19,7 @@
 #include <random>
 #include <set>
 #include <string>
+#include <string_view>
 #include <thread>
 #include <vector>
 
@@ -620,6 +621,8 @@ class Faults : public ::testing::TestWithParam<Call> {
       ASSERT_EQ(call.run(), whole);
       calls = none.calls();
     }
+    // Every call allocates; those of files read, and no others.
+    ASSERT_EQ(calls > 0, fault == Fault::kAllocation || reads_files());
     int failed = 0;
     for (const bool for_good : {false, true}) {
       for (const int nth : places(calls)) {
@@ -650,8 +653,14 @@ class Faults : public ::testing::TestWithParam<Call> {
   // By contract the window of a failed load has its new place and its old nodes, so that the same
   // point asked again is answered from them: another load puts that right.
   static bool holds_a_window() {
-    const std::string name = GetParam().name;
-    return name.find("TWnadcon") == 0 || name.find("TWgeo90") == 0 || name.find("TWcnt") == 0;
+    const std::string_view name = GetParam().name;
+    return name.starts_with("TWnadcon") || name.starts_with("TWgeo90") || name.starts_with("TWcnt");
+  }
+
+  static bool reads_files() {
+    const std::string_view name = GetParam().name;
+    return holds_a_window() || name.starts_with("ShiftGrid") || name.starts_with("GeoidGrid") ||
+           name == "build_store" || name == "TableStore";
   }
 
   // By contract TWcnt_c() leaves each file that it opened open for good, with its tables.

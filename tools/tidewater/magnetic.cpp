@@ -442,7 +442,8 @@ void add_magnetic(CLI::App& app, int& exit_status) {
       "Computes the field of a geomagnetic model and its yearly change.\n"
       "A line begins with two angles and, where a plain number follows, a height in metres, on WGS "
       "84; written are the figures named below.  The rest of it is passed through, as are blank "
-      "lines and lines that begin with #.  A line that is not a position is written with * in place "
+      "lines and lines that begin with #.  A line that is not a position is written with * in "
+      "place "
       "of the figures and told on standard error.");
   CLI::Option* position = command->add_option("position", options->position,
                                               "a single position; without one, files are read");
