@@ -759,7 +759,7 @@ TEST(ComplexPolynomial, TheDerivativeSetsTheWord) {
 }
 
 TEST(Similarity, AScaleOfNoneIsToldOfAnyPoint) {
-  const double rotation[3] = {};
+  const double rotation[9] = {};
   for (const int32_t count : {0, 1, 2}) {
     const Points in(2, {1, 2, 3});
     Points out = untouched(2);
@@ -769,8 +769,7 @@ TEST(Similarity, AScaleOfNoneIsToldOfAnyPoint) {
   }
 }
 
-// --- Points from a tolerance
-// ----------------------------------------------------------------------
+// --- Points from a tolerance ---------------------------------------------------------------------
 
 void straight(TWcontext, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
               TWstatus*) {
