@@ -516,16 +516,10 @@ void TWcnt_i(int32_t count, const CoordinateTriple* in, int32_t /*reserved*/, Co
     const CoordinateTriple point = in[i];
     double dlon = 0;
     double dlat = 0;
-    double lon = point.x;
-    double lat = point.y;
     for (int pass = 0; pass < kPasses; ++pass) {
       // A pass outside leaves the shifts as they are.
-      *status = shift_at(lon, lat, &dlon, &dlat, &call);
+      *status = shift_at(point.x - dlon, point.y - dlat, &dlon, &dlat, &call);
       if (!TW_OK(*status)) return;
-      // At the same place the passes that are left would answer the same.
-      if (point.x - dlon == lon && point.y - dlat == lat) break;
-      lon = point.x - dlon;
-      lat = point.y - dlat;
     }
     if (*status == TW_I_OUTSIDE_CNT) {  // the last pass alone decides
       out[i] = point;

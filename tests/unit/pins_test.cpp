@@ -333,8 +333,7 @@ TEST(Stereographic, AQuarterOfTheGlobeFromTheOrigin) {
   }
 }
 
-// --- Cassini: the printed series with a flattening that shows every term
-// ---------------------------
+// --- Cassini: the printed series with a flattening that shows every term ------------------------
 
 TEST(Cassini, PrintedSeries) {
   constexpr double e = 0.4, lon0 = 0.1, m0 = 0.2;
@@ -509,8 +508,7 @@ TEST(Albers, TheApexIsAHundredThousandthWide) {
   EXPECT_NEAR(p.z, 0.25, 1e-15);
 }
 
-// --- Perspective
-// ----------------------------------------------------------------------------------
+// --- Perspective --------------------------------------------------------------------------------
 
 TEST(Perspective, TenPassesForTheConstants) {
   // On an ellipsoid of no planet they are all used up, and each moves the result.
@@ -540,8 +538,7 @@ TEST(Perspective, TheSpheresConstants) {
   EXPECT_EQ(phi_g, 0.7);
 }
 
-// --- Polyconic
-// ------------------------------------------------------------------------------------
+// --- Polyconic ----------------------------------------------------------------------------------
 
 TEST(Polyconic, TheEquatorsScaleEndsAtItsLimit) {
   // By contract the sphere's tangent is 0 / 0 hard by the equator, where the equator's own form,
@@ -559,8 +556,7 @@ TEST(Polyconic, TheEquatorsScaleEndsAtItsLimit) {
   }
 }
 
-// --- Lambert conformal
-// ----------------------------------------------------------------------------
+// --- Lambert conformal --------------------------------------------------------------------------
 
 TEST(LambertConformal, HardByTheApexIsTheCentralMeridian) {
   // A cone of n = 1 on the sphere: 5e-14 from the apex the latitude is not yet the pole's, and the
@@ -644,8 +640,7 @@ TEST(RotatedGraticule, ASineOfOneIsThePole) {
   }
 }
 
-// --- The general inverse, step by step
-// ------------------------------------------------------------
+// --- The general inverse, step by step ----------------------------------------------------------
 
 using Plane = std::function<CoordinateTriple(double lon, double lat)>;
 
@@ -769,7 +764,7 @@ TEST(Similarity, AScaleOfNoneIsToldOfAnyPoint) {
   }
 }
 
-// --- Points from a tolerance ---------------------------------------------------------------------
+// --- Points from a tolerance --------------------------------------------------------------------
 
 void straight(TWcontext, int32_t count, const CoordinateTriple* in, CoordinateTriple* out,
               TWstatus*) {
