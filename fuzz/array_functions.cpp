@@ -16,6 +16,7 @@
 #include <string_view>
 #include <vector>
 
+#include "bytes.hpp"
 #include "called.hpp"
 #include "tidewater/tidewater.h"
 
@@ -74,12 +75,10 @@ bool same(const CoordinateTriple& a, const CoordinateTriple& b) {
   return same(a.x, b.x) && same(a.y, b.y) && same(a.z, b.z);
 }
 
-// Reads the bytes from the front; zeros when they are used up.
-class Session {
+class Session : public Bytes {
  public:
-  Session(const std::uint8_t* data, std::size_t size) : at_(data), end_(data + size) {}
+  using Bytes::Bytes;
 
-  std::uint8_t byte() { return at_ == end_ ? std::uint8_t{0} : *at_++; }
   bool wanted() {
     const std::uint8_t b = byte();
     if (b % 32 == 31) numbers_.clear(), tables_.clear();  // other parameters from here on
@@ -200,13 +199,7 @@ class Session {
                                       6378137,
                                       0.0818191908426215};
     const std::uint8_t kind = byte();
-    if (kind >= 250) {
-      std::uint64_t bits = 0;
-      for (int i = 0; i < 8; ++i) bits = bits << 8 | byte();
-      double value = 0;
-      std::memcpy(&value, &bits, sizeof value);
-      return value;
-    }
+    if (kind >= 250) return any_double();
     if (kind >= 200) return kSpecial[byte() % std::size(kSpecial)];
     // What such a number ordinarily is.
     const double part = (byte() * 256 + byte()) / 65535.0;
@@ -219,8 +212,6 @@ class Session {
     return (kind % 2 == 0 ? 2 * kPi : 2) * (part - 0.5);
   }
 
-  const std::uint8_t* at_;
-  const std::uint8_t* end_;
   std::map<std::string, double> numbers_;
   std::map<std::string, std::vector<double>> tables_;
   std::map<std::string, int32_t> wholes_;

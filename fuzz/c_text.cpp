@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "bytes.hpp"
 #include "tidewater/tidewater.h"
 
 namespace {
@@ -18,31 +19,12 @@ void require(bool holds) {
   if (!holds) std::abort();
 }
 
-class Bytes {
- public:
-  Bytes(const std::uint8_t* data, std::size_t size) : at_(data), end_(data + size) {}
-
-  std::uint8_t byte() { return at_ == end_ ? std::uint8_t{0} : *at_++; }
-  template <class T>
-  T of() {
-    T value = {};
-    unsigned char bytes[sizeof value];
-    for (unsigned char& b : bytes) b = byte();
-    std::memcpy(&value, bytes, sizeof value);
-    return value;
-  }
-  double number() {
-    const std::uint8_t kind = byte();
-    if (kind < 100) return (kind - 50) * 0.0625;
-    if (kind < 180) return of<std::int32_t>() * 1e-9;
-    return of<double>();
-  }
-  std::string rest() { return {at_, end_}; }
-
- private:
-  const std::uint8_t* at_;
-  const std::uint8_t* end_;
-};
+double number(Bytes& bytes) {
+  const std::uint8_t kind = bytes.byte();
+  if (kind < 100) return (kind - 50) * 0.0625;
+  if (kind < 180) return static_cast<std::int32_t>(bytes.bits(4)) * 1e-9;
+  return bytes.any_double();
+}
 
 // Room of exactly so many characters, so that the sanitizers see what is written behind it.
 template <class Char>
@@ -96,16 +78,17 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   const char* format = kFormats[bytes.byte() % std::size(kFormats)];
   std::strcpy(unit.format, format);
   std::copy(format, format + std::strlen(format), wide_unit.wide_format);
-  unit.precision = wide_unit.precision =
-      bytes.byte() < 200 ? static_cast<int16_t>(bytes.byte() % 20) : bytes.of<int16_t>();
+  unit.precision = wide_unit.precision = bytes.byte() < 200
+                                             ? static_cast<int16_t>(bytes.byte() % 20)
+                                             : static_cast<int16_t>(bytes.bits(2));
   unit.hemisphere_mode = wide_unit.hemisphere_mode = static_cast<int16_t>(bytes.byte() % 7);
-  unit.factor = wide_unit.factor = bytes.byte() % 2 == 0 ? 4.84813681109536e-06 : bytes.number();
+  unit.factor = wide_unit.factor = bytes.byte() % 2 == 0 ? 4.84813681109536e-06 : number(bytes);
   const auto axis = static_cast<int16_t>(bytes.byte() % 3);
   const auto order = static_cast<int16_t>(bytes.byte() % 2);
   const auto heights = static_cast<int16_t>(bytes.byte() % 2);
   const int16_t precision = unit.precision;
-  const CoordinateTriple point = {bytes.number(), bytes.number(), bytes.number()};
-  const double metres = bytes.number(), v = point.x;
+  const CoordinateTriple point = {number(bytes), number(bytes), number(bytes)};
+  const double metres = number(bytes), v = point.x;
 
   writes(50, false, [&](char* t, TWstatus* s) { TWrad_to_ascii(v, unit, axis, t, s); });
   writes_wide(kWhole, false,

@@ -12,6 +12,7 @@
 #include <memory>
 #include <vector>
 
+#include "bytes.hpp"
 #include "tidewater/magnetic.h"
 
 namespace {
@@ -21,40 +22,24 @@ void fail(const char* what) {
   std::abort();
 }
 
-class Bytes {
- public:
-  Bytes(const std::uint8_t* data, std::size_t size) : at_(data), end_(data + size) {}
+int between(Bytes& bytes, int low, int high) { return low + bytes.byte() % (high - low + 1); }
 
-  bool empty() const { return at_ == end_; }
-  std::uint8_t byte() { return at_ == end_ ? std::uint8_t{0} : *at_++; }
-  int between(int low, int high) { return low + byte() % (high - low + 1); }
-  double number() {
-    static const double kSpecial[] = {0,
-                                      -0.0,
-                                      1e-300,
-                                      1e300,
-                                      1.5707963267948966,
-                                      -1.5707963267948966,
-                                      3.141592653589793,
-                                      std::numeric_limits<double>::infinity(),
-                                      std::numeric_limits<double>::quiet_NaN(),
-                                      6371200};
-    const std::uint8_t kind = byte();
-    if (kind >= 240) {
-      std::uint64_t bits = 0;
-      for (int i = 0; i < 8; ++i) bits = bits << 8 | byte();
-      double value = 0;
-      std::memcpy(&value, &bits, sizeof value);
-      return value;
-    }
-    if (kind >= 200) return kSpecial[byte() % std::size(kSpecial)];
-    return (kind - 100) / 32.0;
-  }
-
- private:
-  const std::uint8_t* at_;
-  const std::uint8_t* end_;
-};
+double number(Bytes& bytes) {
+  static const double kSpecial[] = {0,
+                                    -0.0,
+                                    1e-300,
+                                    1e300,
+                                    1.5707963267948966,
+                                    -1.5707963267948966,
+                                    3.141592653589793,
+                                    std::numeric_limits<double>::infinity(),
+                                    std::numeric_limits<double>::quiet_NaN(),
+                                    6371200};
+  const std::uint8_t kind = bytes.byte();
+  if (kind >= 240) return bytes.any_double();
+  if (kind >= 200) return kSpecial[bytes.byte() % std::size(kSpecial)];
+  return (kind - 100) / 32.0;
+}
 
 // A triangular array over blocks of exactly its rows' sizes.
 class Triangle {
@@ -68,7 +53,7 @@ class Triangle {
   double** rows() { return table_.data(); }
   void fill(Bytes& bytes) {
     for (std::size_t n = 0; n < table_.size(); ++n) {
-      for (std::size_t m = 0; m <= n; ++m) table_[n][m] = bytes.number();
+      for (std::size_t m = 0; m <= n; ++m) table_[n][m] = number(bytes);
     }
   }
 
@@ -97,13 +82,13 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   TWstatus status = 0;
 
   // Sets of a model, and the coefficients of a date.
-  const int32_t k = bytes.between(1, 4);
+  const int32_t k = between(bytes, 1, 4);
   std::vector<int32_t> degrees;
   std::vector<double> epochs;
   std::vector<Triangle> c_of_set, s_of_set;
   int32_t N = 2;
   for (int32_t i = 0; i < k; ++i) {
-    degrees.push_back(bytes.between(2, 9));
+    degrees.push_back(between(bytes, 2, 9));
     epochs.push_back(2000 + 5 * i);
     N = std::max(N, degrees.back());
     c_of_set.emplace_back(degrees.back()).fill(bytes);
@@ -112,7 +97,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   std::vector<double**> c_sets, s_sets;
   for (int32_t i = 0; i < k; ++i) {
     const auto at = static_cast<std::size_t>(i);
-    TWhar_normaliz(bytes.between(0, 3), degrees[at], c_of_set[at].rows(), s_of_set[at].rows(),
+    TWhar_normaliz(between(bytes, 0, 3), degrees[at], c_of_set[at].rows(), s_of_set[at].rows(),
                    &status);
     c_sets.push_back(c_of_set[at].rows());
     s_sets.push_back(s_of_set[at].rows());
@@ -124,23 +109,23 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     for (auto* tables : {&c_tables, &s_tables}) {
       for (double** table : *tables) std::free(table);
     }
-    TWhar_aloc_Cnm(bytes.between(-3, 9), &block, &block, &block, &block, &block, &block, nullptr,
+    TWhar_aloc_Cnm(between(bytes, -3, 9), &block, &block, &block, &block, &block, &block, nullptr,
                    nullptr, nullptr, nullptr, nullptr, nullptr, &status);
   }
   Triangle C(N), S(N), Ct(N), St(N), rec_a(N), rec_b(N);
   int32_t n_main = N, n_sec = N;
   double last_date = std::numeric_limits<double>::quiet_NaN();
   TWhar_recur_c(N, rec_a.rows(), rec_b.rows(), &status);
-  const double date = bytes.byte() < 200 ? 1999 + 0.1 * bytes.byte() : bytes.number();
-  TWhar_set_date(date, &last_date, bytes.number(), k, degrees.data(), epochs.data(), bytes.number(),
+  const double date = bytes.byte() < 200 ? 1999 + 0.1 * bytes.byte() : number(bytes);
+  TWhar_set_date(date, &last_date, number(bytes), k, degrees.data(), epochs.data(), number(bytes),
                  c_sets.data(), s_sets.data(), &n_main, &n_sec, C.rows(), S.rows(), Ct.rows(),
                  St.rows(), &status);
 
   // A walk over points with one cache, and each of them again with a new one.
-  const double tolerance = bytes.byte() % 2 == 0 ? 0 : bytes.number();
-  const double a = bytes.byte() % 2 == 0 ? 6378137 : bytes.number();
-  const double e = bytes.byte() % 2 == 0 ? 0.0818191908426215 : bytes.number();
-  const double radius = bytes.byte() % 2 == 0 ? 6371200 : bytes.number();
+  const double tolerance = bytes.byte() % 2 == 0 ? 0 : number(bytes);
+  const double a = bytes.byte() % 2 == 0 ? 6378137 : number(bytes);
+  const double e = bytes.byte() % 2 == 0 ? 0.0818191908426215 : number(bytes);
+  const double radius = bytes.byte() % 2 == 0 ? 6371200 : number(bytes);
   Cache walk(N), rates(n_sec);
   const auto field_of = [&](Cache& f, int32_t count, const CoordinateTriple* in,
                             CoordinateTriple* field, MagneticElements* elements) {
@@ -151,10 +136,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
                   elements, &status);
   };
   for (int call = 0; call < 4 && !bytes.empty(); ++call) {
-    const int32_t count = bytes.between(-1, 9);
+    const int32_t count = between(bytes, -1, 9);
     std::vector<CoordinateTriple> in(count > 0 ? static_cast<std::size_t>(count) : 0);
     for (CoordinateTriple& p : in) {
-      const double x = bytes.number(), y = bytes.number(), z = bytes.number();
+      const double x = number(bytes), y = number(bytes), z = number(bytes);
       p = {x, y, z};
     }
     std::vector<CoordinateTriple> field(in.size()), sec_field(in.size());
@@ -163,7 +148,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     if (kind == 0) {
       // By contract a sum of no points clears the first: there must be one.
       if (count <= 0) continue;
-      TWhar_sum(static_cast<int16_t>(bytes.between(-1, 6)), n_main, radius, C.rows(), S.rows(),
+      TWhar_sum(static_cast<int16_t>(between(bytes, -1, 6)), n_main, radius, C.rows(), S.rows(),
                 rec_a.rows(), rec_b.rows(), walk.sums[0].data(), walk.sums[1].data(),
                 walk.sums[2].data(), walk.sums[3].data(), walk.sums[4].data(), walk.sums[5].data(),
                 walk.sums[6].data(), walk.sums[7].data(), &walk.colat, &walk.radius, &walk.lon,
