@@ -8,6 +8,7 @@
 
 #include <atomic>
 #include <cerrno>
+#include <cinttypes>
 #include <condition_variable>
 #include <cstdio>
 #include <cstring>
@@ -323,8 +324,8 @@ class Stream {
                    Progress* progress) {
     if (progress && !result.complaints_.empty()) progress->clear();
     for (const Result::Complaint& complaint : result.complaints_) {
-      std::fprintf(stderr, "%s:%lld: %s", source.c_str(),
-                   static_cast<long long>(base + complaint.line), complaint.text.c_str());
+      std::fprintf(stderr, "%s:%" PRId64 ": %s", source.c_str(), base + complaint.line,
+                   complaint.text.c_str());
     }
   }
 
