@@ -1,3 +1,4 @@
+// Arrays for which there may be no memory.
 #pragma once
 
 #include <cstddef>
