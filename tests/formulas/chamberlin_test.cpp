@@ -108,6 +108,7 @@ void expect_map(const Chamberlin& map, const std::array<Position, 3>& control, D
       ASSERT_TRUE(map.inverse(at.x, at.y, &back)) << i << " " << k;
       EXPECT_NEAR(std::remainder(back.lon - p.lon, 2 * kPi) * std::cos(p.lat), 0, 1e-13);
       EXPECT_NEAR(back.lat, p.lat, 1e-13);
+      EXPECT_LE(std::fabs(back.lon), kPi);
     }
   }
 }

@@ -104,6 +104,31 @@ TEST(GeodesicFormulas, SphereAndProlate) {
   const auto end = prolate.position(line, near.length);
   EXPECT_NEAR(atan2_degrees(end.lat_sin, end.lat_cos), -0.1, 1e-12);
   EXPECT_NEAR(end.lon * kDegreesPerRadian, 179.9, 1e-12);
+  // From pole to pole along any meridian, whatever the shape: the direction is that of the
+  // longitude, the area that of the half of the earth's share.
+  for (const double f : {-0.01, -1e-6, 0.0, 1 / 298.257223563, 0.01}) {
+    const Geodesics lines(1, f);
+    const double meridian = lines.any_line(0, 0, 90, 0).length;
+    const double half = 180 * lines.any_line<true>(90, 0, 0, 1).area;
+    for (const double lon : {0.0, 30.0, 179.0, 179.99999946762495, 179.99999999953013, 180.0}) {
+      const auto over = lines.any_line<true>(90, 0, -90, lon);
+      EXPECT_NEAR(over.length, 2 * meridian, 1e-15) << f << " " << lon;
+      EXPECT_NEAR(std::remainder(degrees(over.azimuth1) - (180 - lon), 360), 0, 1e-13) << f << lon;
+      EXPECT_TRUE(std::isfinite(over.area)) << f << lon;
+      EXPECT_NEAR(lines.any_line<true>(90, 0, 90, lon).area, half * lon / 180, 1e-12) << f << lon;
+    }
+  }
+}
+
+// So close together that the squares of their distances are nothing.
+TEST(GeodesicFormulas, PlacesThatAreOneToRounding) {
+  const Geodesics lines(kA, kF);
+  for (const double lat : {0.0, 10.0, -60.0}) {
+    const auto arc = lines.any_line<true>(lat, 0, lat, 1e-200);
+    EXPECT_LT(arc.length, 1e-190) << lat;
+    EXPECT_TRUE(std::isfinite(arc.azimuth1.sin) && std::isfinite(arc.azimuth2.cos)) << lat;
+    EXPECT_NEAR(arc.area, 0, 1e-100) << lat;
+  }
 }
 
 // On the flattest ellipsoid that the series serve: GeographicLib 1.52, GeodSolve -E, which takes
