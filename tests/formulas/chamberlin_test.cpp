@@ -130,6 +130,22 @@ TEST(ChamberlinFormulas, OfTheEllipsoidIsDrawnByCompasses) {
   }
 }
 
+// A search that crosses the date line comes back to longitudes within half a turn.
+TEST(ChamberlinFormulas, NextToTheDateLine) {
+  const Chamberlin map(0, kTriangles[2]);
+  for (double lon = 179; lon <= 181; lon += 0.05) {
+    for (double lat = -55; lat <= -15; lat += 5) {
+      Spot at;
+      Position back;
+      ASSERT_TRUE(map.forward(degrees(lon), degrees(lat), &at));
+      ASSERT_TRUE(map.inverse(at.x, at.y, &back));
+      EXPECT_LE(std::fabs(back.lon), kPi) << lon << " " << lat;
+      EXPECT_NEAR(std::remainder(back.lon - degrees(lon), 2 * kPi), 0, 1e-12) << lon << " " << lat;
+      EXPECT_NEAR(back.lat, degrees(lat), 1e-12) << lon << " " << lat;
+    }
+  }
+}
+
 // On the way from one control point to another and beyond them, where rounding puts a point further
 // off than the sum of two distances.
 TEST(ChamberlinFormulas, InLineWithTwoPointsOfControl) {
