@@ -114,6 +114,20 @@ TEST(ObliqueMercator, TwoPointsOnTheLineGiveTheSameProjection) {
   EXPECT_NEAR(two.alpha, line.alpha, 1e-13);
 }
 
+// By symmetry the line of two points on a parallel runs due east half-way between them.
+TEST(ObliqueMercator, TwoPointsOnOneParallel) {
+  const Oblique p(2, 0.08, 0.2, 0.7, 0.5, 0.7, 0.7, 0);
+  EXPECT_EQ(p.status, TW_SUCCESS);
+  const Points in = {{0.2, 0.7, 0}, {0.5, 0.7, 0}, {0.35, 0.72, 0}};
+  Points out = in;
+  EXPECT_EQ(p.uv_k(0, in, out), TW_SUCCESS);
+  EXPECT_NEAR(out[0].y, 0, 1e-14);  // on the line
+  EXPECT_NEAR(out[1].y, 0, 1e-14);
+  // North of the line, which bulges by the square of half the chord times tan(0.7) / 2.
+  EXPECT_NEAR(std::fabs(out[2].y), 0.02 - std::pow(0.15 * std::cos(0.7), 2) * std::tan(0.7) / 2,
+              2e-4);
+}
+
 TEST(ObliqueMercator, NegativeAzimuthGainsATurn) {
   const Oblique azimuth(0, 0.08, 0, 0, 0, 0, 0.6, -0.1);
   EXPECT_EQ(azimuth.status, TW_SUCCESS);
