@@ -460,7 +460,8 @@ class TransformationImpl {
         datum_words.back() += ", which changes nothing";
       }
     }
-    if (way.links.empty()) datum_words.push_back(way.name);
+    // An ensemble and its member; the same datum has no name.
+    if (way.links.empty() && !way.name.empty()) datum_words.push_back(way.name);
     accuracy += way.accuracy;
     if (!way.area.name.empty()) area = way.area;
   }
