@@ -1531,6 +1531,14 @@ TEST(GridOperations, OffsetsBetweenVerticalDatums) {
   }
   EXPECT_TRUE(std::isnan(own.accuracy()));
   EXPECT_TRUE(std::isnan(there.forward({160, -36, 5}).z));
+  // Positions on another datum would be read a hundred metres off; the way over the ellipsoid wants
+  // a grid that is not there.
+  try {
+    const Transformation wrong = map("EPSG:4272+7839", "EPSG:4272+5759");
+    ADD_FAILURE() << wrong.describe();
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find("nzgeoid2016"), std::string::npos) << error.what();
+  }
 #ifdef TIDEWATER_HAVE_PROJ
   const std::string definition = "+proj=vgridshift +multiplier=1 +grids=" +
                                  (folder.path() / "auckht1946-nzvd2016.gtx").string();
