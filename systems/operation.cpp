@@ -60,13 +60,21 @@ Area common(const Area& a, const Area& b) {
   result.south = std::max(a.south, b.south);
   result.north = std::min(a.north, b.north);
   double best = 0;
-  for (const double turn : {-360.0, 0.0, 360.0}) {
-    const double west = std::max(a.west, b.west + turn);
-    const double east = std::min(a.west + width(a), b.west + width(b) + turn);
-    if (east - west <= best) continue;
-    best = east - west;
-    result.west = west < 180 ? west : west - 360;
-    result.east = east > 180 ? east - 360 : east;
+  if (width(b) >= 360) {
+    best = width(a);
+  } else if (width(a) >= 360) {
+    result.west = b.west;
+    result.east = b.east;
+    best = width(b);
+  } else {
+    for (const double turn : {-360.0, 0.0, 360.0}) {
+      const double west = std::max(a.west, b.west + turn);
+      const double east = std::min(a.west + width(a), b.west + width(b) + turn);
+      if (east - west <= best) continue;
+      best = east - west;
+      result.west = west < 180 ? west : west - 360;
+      result.east = east > 180 ? east - 360 : east;
+    }
   }
   if (best <= 0 || result.south >= result.north) return a;
   result.name = a.name == b.name ? a.name : a.name + " and " + b.name;

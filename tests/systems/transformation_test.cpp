@@ -4,7 +4,10 @@
 
 #include <atomic>
 #include <cmath>
+#include <cstdio>
+#include <cstdlib>
 #include <filesystem>
+#include <fstream>
 #include <thread>
 #include <vector>
 
@@ -464,6 +467,72 @@ TEST(Transformation, DefinitionsByTheirDatumAlone) {
   }
 }
 
+// Whatever a definition says of itself and of its base, its datum counts.
+TEST(Transformation, DatumsThatADefinitionNamesByTheirCode) {
+  const auto base = [](const char* datum, const char* system) {
+    return "PROJCS[\"x\",GEOGCS[\"y\",DATUM[\"D_y\",SPHEROID[\"Clarke 1866\",6378206.4,"
+           "294.978698213898],AUTHORITY[\"EPSG\",\"" +
+           std::string(datum) + "\"]],PRIMEM[\"Greenwich\",0],UNIT[\"degree\",0.0174532925199433]" +
+           system +
+           "],PROJECTION[\"Mercator_1SP\"],PARAMETER[\"central_meridian\",0],UNIT[\"metre\",1]]";
+  };
+  const auto operations = [](const std::string& text) {
+    std::string list;
+    for (const Candidate& one : Transformation::candidates(System(text), System("EPSG:4326"))) {
+      list += one.steps + ";";
+    }
+    return list;
+  };
+  const std::string of_nad27 = operations("EPSG:4267");
+  EXPECT_TRUE(has(of_nad27, "EPSG:1172;"));
+  // The datum's code alone, with the base system's, and with another base system's.
+  const char* const own = ",AUTHORITY[\"EPSG\",\"4267\"]";
+  const char* const other = ",AUTHORITY[\"EPSG\",\"4230\"]";
+  for (const char* system : {"", own, other}) {
+    EXPECT_TRUE(has(operations(base("6267", system)), "EPSG:1172;")) << system;
+  }
+  // A datum of the registry's without operations of its own system, and a code that is none.
+  EXPECT_EQ(operations(base("999999", "")), "");
+  EXPECT_TRUE(has(refusal(base("999999", "").c_str(), "EPSG:4326"), "No way is known"));
+  // A compound system's horizontal part without a code.
+  const std::string compound = "COMPD_CS[\"c\"," + base("6267", "") +
+                               ",VERT_CS[\"h\",VERT_DATUM[\"d\",2005],UNIT[\"metre\",1]]]";
+  EXPECT_TRUE(has(operations(compound), "EPSG:1172;"));
+}
+
+// Bounds that go round the Earth without its poles, bounds that meet nowhere, and the caller's.
+TEST(Transformation, AreasThatSystemsShare) {
+  const auto operations = [](const char* source, const char* target,
+                             std::optional<Area> area = {}) {
+    TransformationOptions options;
+    options.area = std::move(area);
+    std::string list;
+    for (const Candidate& one :
+         Transformation::candidates(System(source), System(target), options)) {
+      list += one.steps + ";";
+    }
+    return list;
+  };
+  // World Mercator ends at 80 south and 84 north, which holds all of NAD27's use.
+  const std::string all = operations("EPSG:4267", "EPSG:4326");
+  EXPECT_FALSE(all.empty());
+  EXPECT_EQ(operations("EPSG:4267", "EPSG:3395"), all);
+  EXPECT_EQ(operations("EPSG:4326", "EPSG:4267"), operations("EPSG:3395", "EPSG:4267"));
+  // Around the south pole there is none of it: the first system's area counts.
+  EXPECT_EQ(operations("EPSG:4267", "EPSG:5042"), all);
+  // and no operation of North America holds in Europe.
+  EXPECT_EQ(operations("EPSG:4267", "EPSG:4230"), "");
+  // A point of the caller's: Key West has the operations of the contiguous states, not of Alaska.
+  const std::string key_west =
+      operations("EPSG:4267", "EPSG:4326", Area{"", -81.8, 24.55, -81.8, 24.55});
+  EXPECT_TRUE(has(key_west, "EPSG:1173;")) << key_west;
+  EXPECT_FALSE(has(key_west, "EPSG:1176;")) << key_west;
+  const std::string fairbanks =
+      operations("EPSG:4267", "EPSG:4326", Area{"", -147.7, 64.8, -147.7, 64.8});
+  EXPECT_FALSE(has(fairbanks, "EPSG:1173;")) << fairbanks;
+  EXPECT_TRUE(has(fairbanks, "EPSG:1176;")) << fairbanks;
+}
+
 // Two unknown datums are one where name, ellipsoid and parameters are.
 TEST(Transformation, UnknownDatumsThatAreTheSame) {
   const auto text = [](const char* lon0, const char* rest) {
@@ -522,7 +591,8 @@ TEST(Transformation, ParametersToWgs84OfEitherSide) {
   EXPECT_NEAR(both.forward(at).x, there.x, 3e-8);
   EXPECT_NEAR(both.forward(at).y, there.y, 3e-8);
   // WGS 84 is not known from everywhere: both sides say so.
-  for (const auto& [source, target] : {std::pair(own, "EPSG:4821"), {"EPSG:4821", own}}) {
+  for (const auto& [source, target] :
+       {std::pair(own, "EPSG:4821"), {"EPSG:4821", own}, {own, "EPSG:4122"}, {"EPSG:4122", own}}) {
     EXPECT_TRUE(has(refusal(source, target), "No way is known")) << refusal(source, target);
   }
 }
@@ -667,6 +737,81 @@ TEST(Transformation, FailingPointsDisturbNoOthersWhateverTheMethod) {
       }
     }
   }
+}
+
+// --- registries that lie
+// --------------------------------------------------------------------------
+
+namespace {
+
+// A store of the tree's own sources with lines added to tables of the registry.
+std::string store_with(const ScratchFolder& folder,
+                       const std::vector<std::pair<std::string, std::string>>& lines) {
+  namespace fs = std::filesystem;
+  const fs::path sources = folder.path() / "sources";
+  fs::copy(fs::path(TIDEWATER_SOURCE) / "data", sources, fs::copy_options::recursive);
+  for (const auto& [table, line] : lines) {
+    std::ofstream(sources / "registry" / (table + ".csv"), std::ios::app) << line << "\n";
+  }
+  const std::string store = (folder.path() / "lies.store").string();
+  const std::string command =
+      std::string(TWSTORE_COMMAND) + " build '" + store + "' '" + sources.string() + "' >/dev/null";
+  return std::system(command.c_str()) == 0 ? store : "";
+}
+
+// What a process of its own finds with such a store, which a process reads once: true where every
+// system and operation of it gives an answer or a sentence.
+bool all_is_answered() {
+  const auto no_way = [](const char* source, const char* target, const char* operation,
+                         const char* part) {
+    const std::string why = refusal(source, target, with_operation(operation));
+    if (has(why, part)) return true;
+    std::fprintf(stderr, "%s to %s: %s\n", source, target, why.c_str());
+    return false;
+  };
+  bool good = true;
+  // Operations that are their own steps, or each other's, are none.
+  good &= no_way("EPSG:4230", "EPSG:4326", "EPSG:990001", "do not join");
+  good &= no_way("EPSG:4230", "EPSG:4326", "EPSG:990002", "do not join");
+  const auto check = [&good](bool holds, const char* what) {
+    if (!holds) std::fprintf(stderr, "not so: %s\n", what);
+    good &= holds;
+  };
+  std::string all;
+  for (const Candidate& candidate :
+       Transformation::candidates(System("EPSG:4230"), System("EPSG:4326"))) {
+    all += candidate.steps + (candidate.area.name.empty() ? "!;" : ";");
+  }
+  check(!has(all, "99000"), "no candidate is its own step");
+  check(has(all, "EPSG:990010!;"), "an operation whose area is not there holds anywhere");
+  check(!has(all, "EPSG:990011"), "what was replaced by what is not there stays replaced");
+  // A system without a datum, and an operation from a system that is not there.
+  good &= no_way("EPSG:990020", "EPSG:4326", "", "990099");
+  good &= no_way("EPSG:4230", "EPSG:4326", "EPSG:990012", "The registry has no datum");
+  return good;
+}
+
+}  // namespace
+
+TEST(RegistryThatLies, GivesSentences) {
+  GTEST_FLAG_SET(death_test_style, "threadsafe");
+  const ScratchFolder folder;
+  const std::string values = ",-87,9001,-98,9001,-121,9001,0,0,0,0,0,0,0,0";
+  const std::string store = store_with(
+      folder, {{"concatenated_operations", "990001,Circle,4230,4326,1262,1,0,990001,0,0,0"},
+               {"concatenated_operations", "990002,Two,4230,4326,1262,1,0,990003,0,0,0"},
+               {"concatenated_operations", "990003,Two back,4230,4326,1262,1,0,990002,0,0,0"},
+               {"transformations", "990010,Nowhere,9603,4230,4326,999999,999,0" + values},
+               {"transformations", "990011,Replaced,9603,4230,4326,1262,10,999999" + values},
+               {"transformations", "990012,From nothing,9603,990098,4326,1262,10,0" + values},
+               {"geodetic_systems", "990020,No datum,2,990099,NE,9122,1262"}});
+  if (store.empty()) GTEST_SKIP() << "the store could not be built";
+  EXPECT_EXIT(
+      {
+        setenv("TIDEWATER_STORE", store.c_str(), 1);
+        std::exit(all_is_answered() ? 0 : 1);
+      },
+      testing::ExitedWithCode(0), "");
 }
 
 TEST(Systems, NamesThatUsersType) {
