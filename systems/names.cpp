@@ -9,6 +9,7 @@
 #include "registry_names.hpp"
 #include "system_impl.hpp"
 #include "text_forms.hpp"
+#include "text_forms_parts.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/ellipsoid.hpp"
 #include "tidewater/position_text.hpp"
@@ -68,7 +69,7 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
   bool south = false;
   const auto [end, error] = std::from_chars(rest.data(), rest.data() + rest.size(), zone);
   std::string_view behind = rest.substr(static_cast<std::size_t>(end - rest.data()));
-  if (error == std::errc()) {
+  if (error != std::errc::invalid_argument) {  // a number, and be it too large
     behind = trimmed(behind);
     const char letter = behind.empty() ? ' ' : behind[0];
     south = letter == 'S' || letter == 's';
@@ -77,7 +78,7 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
     }
     behind.remove_prefix(1);
     if (zone < 1 || zone > 60) {
-      throw Error("UTM has zones 1 to 60, not " + std::to_string(zone) + ".");
+      throw Error("UTM has zones 1 to 60; " + quoted(text) + " names another.");
     }
   } else {
     if (!where) {
@@ -246,8 +247,9 @@ class OneLine {
     }
     if (const auto axes = take("axes")) {
       result.axes = *axes;
-      const bool known = axes->size() == 2 && axes->find_first_not_of("ENWS") == std::string::npos;
-      if (!known) refuse("axes must be two letters of E, N, W and S");
+      if (axes->size() != 2 || !horizontal_axes(*axes)) {
+        refuse("axes must be two letters of E, N, W and S, one along each direction");
+      }
     }
     for (const Given& given : given_) {
       if (!given.used) refuse(unknown(given.key, result));
@@ -307,6 +309,7 @@ class OneLine {
     }
     if (const auto pm = take("pm")) {
       if (const auto degrees = number(*pm)) {
+        if (std::fabs(*degrees) > 360) refuse("pm is beyond a whole turn");
         result.datum.meridian = {"", 0, *degrees * kDegree};
       } else {
         const PrimeMeridian named(*pm);
@@ -399,8 +402,9 @@ Definition by_registry_name(std::string_view text) {
 Definition compound_of(int horizontal, int vertical) {
   Definition result = definition_from_registry(horizontal);
   const Definition height = definition_from_registry(vertical);
-  if (height.kind != SystemKind::vertical || result.kind == SystemKind::vertical ||
-      result.kind == SystemKind::compound || result.kind == SystemKind::geocentric) {
+  const bool plane =
+      result.kind == SystemKind::projected || result.kind == SystemKind::geographic2d;
+  if (height.kind != SystemKind::vertical || !plane) {
     throw Error("EPSG:" + std::to_string(horizontal) + "+" + std::to_string(vertical) +
                 " must be a horizontal system and a vertical one.");
   }

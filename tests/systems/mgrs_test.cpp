@@ -132,7 +132,9 @@ TEST(Mgrs, ImpossibleReferencesAreRefused) {
   expect_refused("31UDQ482511193", "odd number");
   expect_refused("31UDQ 4825 11932", "unequal length");
   expect_refused("31UDQ 482 51 11932", "unequal length");
-  expect_refused("31UDQ" + std::string(24, '1'), "no grid reference");
+  for (const std::size_t count : {23, 24, 1000}) {
+    expect_refused("31UDQ" + std::string(count, '1'), "more than 11 digits each");
+  }
   expect_refused(std::string(1000, '3'), "no grid reference");
   EXPECT_EQ(format_mgrs(0, 91), "");
   EXPECT_EQ(format_mgrs(GridPosition{31, true, 50000, 5411932}), "");
