@@ -64,6 +64,15 @@ Definition projected_on(const Definition& base, std::string name, int method,
   return result;
 }
 
+// The universal zone of the point that comes with a name.
+int zone_at(const Where& where, std::string_view text) {
+  const int zone = utm_zone(where.longitude, where.latitude);
+  if (zone < 0) {
+    throw Error("The point that should tell the zone of " + quoted(text) + " is not on the earth.");
+  }
+  return zone;
+}
+
 Definition utm(std::string_view rest, const std::optional<Where>& where, std::string_view text) {
   int zone = 0;
   bool south = false;
@@ -84,8 +93,8 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
     if (!where) {
       throw Error(quoted(text) + " needs a zone, as in \"utm:30N\", or a point to find it from.");
     }
-    zone = utm_zone(where->longitude, where->latitude);
-    if (zone < 1) {
+    zone = zone_at(*where, text);
+    if (zone == 0) {
       throw Error(
           "UTM reaches from 80 degrees south to 84 degrees north; \"ups\" serves the poles.");
     }
@@ -98,7 +107,7 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
   const Definition base = geographic_named(behind);
   const std::string name = base.name + " / UTM zone " + std::to_string(zone) + (south ? "S" : "N");
   if (const auto known = Registry::shared().system(name)) {
-    if (known->name == name) return definition_from_registry(known->code);
+    return definition_from_registry(known->code);
   }
   return projected_on(base, name, 9807,
                       {{kLat0, 0},
@@ -112,6 +121,7 @@ Definition ups(std::string_view rest, const std::optional<Where>& where, std::st
   const std::string side = folded(rest);
   bool south = side == "s" || side == "south";
   if (side.empty() && where) {
+    zone_at(*where, text);
     south = where->latitude < 0;
   } else if (!south && side != "n" && side != "north") {
     throw Error(quoted(text) + " must say N or S, as in \"ups:N\", or come with a point.");
@@ -134,11 +144,7 @@ Definition military_grid(std::string_view rest, const std::optional<Where>& wher
                   "write references; a zone's numbers are \"utm:31N\", \"ups:N\" or, by a "
                   "reference, \"mgrs:31UDQ\".");
     }
-    const int zone = utm_zone(where->longitude, where->latitude);
-    if (zone < 0)
-      throw Error("The point that should tell the zone of " + quoted(text) +
-                  " is not on the earth.");
-    return zone_of(zone, where->latitude >= 0);
+    return zone_of(zone_at(*where, text), where->latitude >= 0);
   }
   // A zone alone, "31U" or "Z", or a whole reference.
   int zone = 0;
@@ -340,9 +346,11 @@ class OneLine {
       refuse("there is no projection method " + quoted(method_words_));
     }
     // What is given tells the variant.
-    if (method->code == 9802 && !has("lat1") && !has("lat2")) method = method_by_code(9801);
-    if (method->code == 9805 && has("k0")) method = method_by_code(9804);
-    if (method->code == 9829 && (has("k0") || has("lat0"))) method = method_by_code(9810);
+    const bool first = has("lat1") || has("lat 1") || has("lat ts");
+    const bool second = has("lat2") || has("lat 2");
+    if (method->code == 9802 && !first && !second) method = method_by_code(9801);
+    if (method->code == 9805 && (has("k0") || has("k 0"))) method = method_by_code(9804);
+    if (method->code == 9810 && first) method = method_by_code(9829);
     result.method = method->code;
     if (const auto units = take("units")) {
       const Unit unit(*units);
@@ -357,7 +365,7 @@ class OneLine {
       result.parameters.push_back(
           {parameter.code, kind.quantity == Quantity::angle ? *value * kDegree : *value});
     }
-    if (method->code == 9802 && !has("lat2")) {
+    if (method->code == 9802 && !second) {
       result.parameters.push_back({kLat2, result.parameter(kLat1)});
     }
   }
@@ -440,6 +448,10 @@ Definition definition_from_text(std::string_view text, const std::optional<Where
   if (text.find('=') != std::string_view::npos) return OneLine(text).definition();
 
   const auto [head, rest] = headed(text);
+  if (head == "epsg" && number(rest)) {
+    if (const auto code = registry_code(rest)) return definition_from_registry(*code);
+    throw Error("There is no coordinate system " + quoted(text) + ".");
+  }
   if (head == "utm") return utm(rest, where, text);
   if (head == "ups") return ups(rest, where, text);
   if (head == "mgrs" || head == "usng") return military_grid(rest, where, text);
