@@ -123,7 +123,8 @@ double central_meridian(int zone) { return 6 * zone - 183; }
 
 std::size_t band_of(double latitude) {
   const double band = std::floor((latitude + 80) / 8);
-  return static_cast<std::size_t>(std::clamp(band, 0.0, 19.0));
+  // A hair south of the equator the sum is rounded up to it; the squares end there.
+  return static_cast<std::size_t>(std::clamp(band, 0.0, latitude < 0 ? 9.0 : 19.0));
 }
 
 // West and east of a zone's cell in a band, from its central meridian, in degrees.  Norway and
@@ -341,7 +342,7 @@ ParsedPosition position_of(const GridPosition& grid) {
                       "; zones are 1 to 60, and 0 at the poles.";
     return position;
   }
-  if (word != TW_SUCCESS || !std::isfinite(longitude) || !std::isfinite(latitude)) {
+  if (word != TW_SUCCESS || !std::isfinite(x) || !std::isfinite(y)) {
     position.reason = "The grid has no point at these coordinates.";
     return position;
   }

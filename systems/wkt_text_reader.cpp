@@ -472,7 +472,8 @@ Definition read_geographic(const WktNode& node) {
     definition.kind = height ? SystemKind::geographic3d : SystemKind::geographic2d;
     definition.unit =
         unit != nullptr ? read_unit(*unit) : UnitDefinition{"degree", 9102, kDegreeInRadians};
-    if (definition.axes.empty()) definition.axes = height ? "ENU" : "EN";
+    if (definition.axes.empty()) definition.axes = "EN";
+    if (height && definition.axes.size() == 2) definition.axes += 'U';
   }
   read_area(node, definition);
   recognise_datum(definition);

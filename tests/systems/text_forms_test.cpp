@@ -359,6 +359,10 @@ TEST(Wkt, Version2HasItsUnitsWhereItLikes) {
       R"(LENGTHUNIT["foot",0.3048],ANGLEUNIT["grad",0.01570796326794897]])");
   EXPECT_EQ(solid.kind, SystemKind::geographic3d);
   EXPECT_EQ(solid.axes, "ENU");
+  EXPECT_EQ(definition_from_wkt(R"(GEOGCRS["g",DATUM["d",ELLIPSOID["s",6378137,298.25]],)"
+                                R"(CS[ellipsoidal,3],AXIS["lat",north],AXIS["lon",east]])")
+                .axes,
+            "NEU");
   EXPECT_EQ(solid.unit.name, "grad");
   // Geocentric ones, with a unit at the axes or none at all.
   const auto geocentric = [](const std::string& rest) {
@@ -472,6 +476,89 @@ TEST(Wkt, NamesAreQuoted) {
   for (const Wkt version : {Wkt::wkt1, Wkt::wkt2}) {
     EXPECT_EQ(definition_from_wkt(wkt_from_definition(odd, version)).name, odd.name);
   }
+}
+
+// What has no name is called unknown, what has no code has no identifier.
+TEST(Wkt, WhatHasNoName) {
+  Definition bare;
+  bare.datum.ellipsoid = {"", 0, 6371000, 0};
+  bare.datum.meridian = {"", 0, 0.1 * kDegree};
+  bare.datum.to_wgs84 = {1, 2, 3, 0.5, 0, -0.25, 6};
+  bare.unit = {"", 0, kDegree};
+  bare.axes = "NE";
+  EXPECT_EQ(wkt_from_definition(bare, Wkt::wkt1),
+            R"(GEOGCS["unknown",DATUM["unknown",SPHEROID["unknown",6371000,0],)"
+            R"(TOWGS84[1,2,3,0.5,0,-0.25,6]],PRIMEM["unknown",0.1],)"
+            R"(UNIT["unknown",0.0174532925199433],AXIS["Latitude",NORTH],AXIS["Longitude",EAST]])");
+  EXPECT_EQ(wkt_from_definition(bare, Wkt::esri),
+            R"(GEOGCS["GCS_unknown",DATUM["D_unknown",SPHEROID["unknown",6371000,0]],)"
+            R"(PRIMEM["unknown",0.1],UNIT["unknown",0.0174532925199433]])");
+  Definition plane = bare;
+  plane.datum.to_wgs84.reset();
+  plane.kind = SystemKind::projected;
+  plane.method = 9807;
+  plane.unit = {"", 0, 0.3};
+  plane.axes = "WSU";
+  const std::string text = wkt_from_definition(plane, Wkt::wkt2);
+  EXPECT_EQ(text.substr(0, 51), R"(PROJCRS["unknown",BASEGEOGCRS["unknown",DATUM["unkn)");
+  EXPECT_NE(text.find(R"(,CONVERSION["unnamed",METHOD["Transverse Mercator",ID["EPSG",9807]],)"),
+            std::string::npos);
+  EXPECT_NE(text.find(R"t(,CS[Cartesian,2],AXIS["(E)",west,ORDER[1],LENGTHUNIT["unknown",0.3]],)t"
+                      R"t(AXIS["(N)",south,ORDER[2],LENGTHUNIT["unknown",0.3]]])t"),
+            std::string::npos)
+      << text;
+  Definition height;
+  height.kind = SystemKind::vertical;
+  height.vertical_name = "Height of mine";
+  height.axes = "U";
+  EXPECT_EQ(wkt_from_definition(height, Wkt::wkt2),
+            R"(VERTCRS["Height of mine",VDATUM["Height of mine"],CS[vertical,1],)"
+            R"t(AXIS["gravity-related height (H)",up,LENGTHUNIT["metre",1]]])t");
+  EXPECT_EQ(wkt_from_definition(height, Wkt::esri),
+            R"(VERTCS["Height_of_mine",VDATUM["Height_of_mine"],PARAMETER["Vertical_Shift",0.0],)"
+            R"(PARAMETER["Direction",1.0],UNIT["Meter",1]])");
+}
+
+// Names of .prj files have letters and digits of any script, and one underscore for all else.
+TEST(Wkt, NamesOfPrjFiles) {
+  const std::pair<const char*, const char*> names[] = {
+      {"  (a-z) {Z} 0/9 ", "a_z_Z_0_9"},    {"R\u00E9union 1947", "R\u00E9union_1947"},
+      {"NAD83(CSRS)v6", "NAD83_CSRS_v6"},   {"a + b", "a_+_b"},
+      {"[at@sign~tilde`", "at_sign_tilde"}, {"-", ""},
+  };
+  for (const auto& [name, written] : names) {
+    Definition definition = definition_from_wkt(projcs(R"(PROJECTION["Transverse_Mercator"])"));
+    definition.name = name;
+    const std::string text = wkt_from_definition(definition, Wkt::esri);
+    EXPECT_EQ(text.substr(0, text.find(',')), "PROJCS[\"" + std::string(written) + "\"") << name;
+  }
+}
+
+TEST(Wkt, MercatorOfPrjFiles) {
+  const auto written = [](double rf, double k0) {
+    Definition definition;
+    definition.name = "m";
+    definition.kind = SystemKind::projected;
+    definition.datum.ellipsoid = {"", 0, 6371000, rf};
+    definition.method = 9804;
+    definition.parameters = {{kK0, k0}};
+    definition.axes = "EN";
+    return definition_from_wkt(wkt_from_definition(definition, Wkt::esri));
+  };
+  // On the sphere the scale is the cosine of the parallel of true scale.
+  EXPECT_EQ(written(0, 0.5).method, 9805);
+  EXPECT_NEAR(written(0, 0.5).parameter(kLat1), 60 * kDegree, 1e-14);
+  EXPECT_EQ(written(0, 1).parameter(kLat1), 0);
+  // On the ellipsoid k0 = cos / sqrt(1 - e2 sin2).
+  const double e2 = (2 - 1 / 300.0) / 300, parallel = written(300, 0.9).parameter(kLat1);
+  EXPECT_NEAR(std::cos(parallel) / std::sqrt(1 - e2 * std::pow(std::sin(parallel), 2)), 0.9, 1e-14);
+  expect_refused([&] { written(300, 1.1); }, "no Mercator with a scale above one, which m has.");
+  // Version 1 names the latitude of origin where it is not the equator.
+  Definition odd = definition_from_proj("+proj=merc +lat_0=0 +k=0.9 +R=6371000");
+  EXPECT_EQ(wkt_from_definition(odd, Wkt::wkt1).find("latitude_of_origin"), std::string::npos);
+  odd.parameters[0].value = 10 * kDegree;
+  EXPECT_NE(wkt_from_definition(odd, Wkt::wkt1).find(R"(PARAMETER["latitude_of_origin",10])"),
+            std::string::npos);
 }
 
 TEST(ProjText, ReadsWhatUsersHave) {
