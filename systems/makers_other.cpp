@@ -280,7 +280,9 @@ Made make_cassini(const MethodArguments& given) {
   return map_formula(metric_plane(given), Cassini(given.a, given.f, given(kLat0)));
 }
 
-// The northing less its own cube, by the radii at the point: IOGP Publication 373-7-2, method 9833.
+// The northing less its own cube, by the radii at the point: IOGP Publication 373-7-2, method 9833;
+// the inverse by Newton's method, which finds nothing beyond the greatest northing that there is.
+// A point that fails ends the loops, for the block is asked again point by point.
 Made make_hyperbolic_cassini(const MethodArguments& given) {
   const MapForward<Cassini> forward{Cassini(given.a, given.f, given(kLat0))};
   const MapInverse<Cassini> inverse{forward.map};
@@ -302,13 +304,17 @@ Made make_hyperbolic_cassini(const MethodArguments& given) {
         for (int i = 0; i < count && *status == TW_SUCCESS; ++i) {
           const CoordinateTriple wanted = in[i];
           CoordinateTriple plane = wanted;
-          for (int pass = 0; pass < 30 && *status == TW_SUCCESS; ++pass) {
+          bool rest = false;
+          for (int pass = 0; pass < 30 && !rest && *status == TW_SUCCESS; ++pass) {
             *status = over_points(inverse, 1, &plane, out + i);
-            const double next = wanted.y + cube(out[i].y) * plane.y * plane.y * plane.y;
-            const bool rest = std::fabs(next - plane.y) < 1e-9;
-            plane.y = next;
-            if (rest) break;
+            const double c = cube(out[i].y);
+            const double step = (plane.y - c * plane.y * plane.y * plane.y - wanted.y) /
+                                (1 - 3 * c * plane.y * plane.y);
+            plane.y -= step;
+            // The next step would be a thousandth of this one or less, and rounding by the maximum.
+            rest = std::fabs(step) < 1e-6;
           }
+          if (!rest && *status == TW_SUCCESS) *status = TW_NOT_CONVERGED;
         }
       });
 }
@@ -379,7 +385,7 @@ Made make_azimuthal_equidistant(const MethodArguments& given) {
       [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
 }
 
-// IOGP Publication 373-7-2, method 9831.
+// IOGP Publication 373-7-2, method 9831; the inverse by Newton's method on the latitude.
 Made make_guam(const MethodArguments& given) {
   const double a = given.a;
   const double e2 = given.e2;
@@ -397,15 +403,23 @@ Made make_guam(const MethodArguments& given) {
         return PointAnswer{x, arc.arc(lat) - origin + bend(x, lat)};
       },
       [=](double x, double y) {
-        double lat = arc.latitude(origin + y);
-        for (int i = 0; i < 30; ++i) {
-          const double next = arc.latitude(origin + y - bend(x, lat));
-          const bool rest = std::fabs(next - lat) < 1e-16;
-          lat = next;
-          if (rest) break;
+        // Bent upwards by x, so that the root lies nearer to the equator; not to begin at a pole.
+        double lat = std::clamp(arc.latitude(origin + y), -1.5, 1.5);
+        bool rest = false;
+        for (int i = 0; i < 50 && !rest; ++i) {
+          const double s = std::sin(lat);
+          const double c = std::cos(lat);
+          const double w2 = 1 - e2 * s * s;
+          const double slope =
+              a * (1 - e2) / (w2 * std::sqrt(w2)) + x * x * std::sqrt(w2) / (2 * a * c * c);
+          const double next = lat - (arc.arc(lat) - origin + bend(x, lat) - y) / slope;
+          rest = std::fabs(next - lat) < 1e-14;
+          // Half of the way to a pole at most.
+          lat = std::fabs(next) < kHalfPi ? next : (lat + std::copysign(kHalfPi, next)) / 2;
         }
         const double s = std::sin(lat);
-        return PointAnswer{x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat)), lat, within(lat)};
+        const double lon = x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat));
+        return PointAnswer{lon, lat, rest && std::fabs(lon) <= kPi};
       });
 }
 

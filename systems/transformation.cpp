@@ -51,8 +51,11 @@ bool has_height(const Definition& definition) {
 
 // Are the heights of two systems above the same surface?
 bool same_heights(const Definition& one, const Definition& other) {
-  if (one.vertical_code == 0 || other.vertical_code == 0) {
-    return one.vertical_code == other.vertical_code && one.vertical_name == other.vertical_name;
+  if (has_ellipsoidal_height(one) || has_ellipsoidal_height(other)) {
+    return has_ellipsoidal_height(one) && has_ellipsoidal_height(other);
+  }
+  if (one.vertical_code == other.vertical_code && one.vertical_name == other.vertical_name) {
+    return true;
   }
   const auto a = Registry::shared().system(one.vertical_code);
   const auto b = Registry::shared().system(other.vertical_code);
@@ -106,6 +109,8 @@ struct End {
       sx = sy = options.radians ? 1 : kDegree;
     } else if (kind != SystemKind::geocentric) {
       sx = sy = definition.unit.factor;
+    }
+    if (kind != SystemKind::geocentric) {
       std::string_view natural = "EN";
       if (definition.method == 9808 || definition.method == 9828 || definition.method == 9819 ||
           definition.method == 1042) {
@@ -382,7 +387,7 @@ class TransformationImpl {
     }
     std::string sentence = "No way is known between heights above the ellipsoid and " +
                            (end.vertical_name.empty() ? "those of " + end.name : end.vertical_name);
-    if (way == nullptr && !list.empty()) sentence += " by the operation that was named";
+    if (!named.empty()) sentence += " by the operation that was named";
     if (way != nullptr) {
       sentence = "The ways between heights above the ellipsoid and " + end.vertical_name +
                  " need what is not there: ";
@@ -460,7 +465,8 @@ class TransformationImpl {
         datum_words.back() += ", which changes nothing";
       }
     }
-    if (way.links.empty()) datum_words.push_back(way.name);
+    // An ensemble and its member; the same datum has no name.
+    if (way.links.empty() && !way.name.empty()) datum_words.push_back(way.name);
     accuracy += way.accuracy;
     if (!way.area.name.empty()) area = way.area;
   }

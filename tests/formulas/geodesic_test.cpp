@@ -47,7 +47,9 @@ TEST(GeodesicFormulas, InverseGivesTheReference) {
     worst = std::max(worst, std::fabs(arc.length - row.inverse));
     EXPECT_NEAR(arc.area, row.area, 3);  // the azimuths of nearly antipodal ends turn quickly
   }
-  EXPECT_LT(worst, 5e-9);
+  // Two units of the last place of the longest.  It is one, but the tests are not optimised, and
+  // the root that they call on Windows rounds twice: one in four thousand is off by a unit.
+  EXPECT_LT(worst, 7.5e-9);
 }
 
 TEST(GeodesicFormulas, BothRoadsOfTheInverseAgree) {

@@ -6,8 +6,10 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 #include <string_view>
 
+#include "points/over_points.hpp"
 #include "projection_impl.hpp"
 #include "tidewater/transformation.hpp"
 
@@ -87,66 +89,83 @@ TEST(Methods, ModifiedKrovakStaysByTheOldOne) {
   EXPECT_GT(most, 0.02);
 }
 
+namespace {
+
+// A method with parameters that make a map, and a position on it.
+struct Sample {
+  Projection map;
+  double lon, lat;
+};
+
+Sample sample_of(const detail::Method& method) {
+  std::vector<std::pair<std::string, double>> parameters;
+  double lon = 3;
+  double lat = 47;
+  for (const auto& parameter : method.parameters) {
+    const auto* kind = detail::parameter_kind(parameter.code);
+    const std::string_view form = kind->short_form;
+    double value = kind->usual;
+    if (form == "lat0") value = 46;
+    if (form == "lat1") value = 44;
+    if (form == "lat2") value = 49;
+    if (form == "lon0" || form == "lon1") value = 2;
+    if (form == "lon2") value = 5;
+    if (form == "azimuth") value = 40;
+    if (form == "gamma") value = 38;
+    if (form == "x0") value = 600000;
+    if (form == "y0") value = -200000;
+    if (form == "h") value = 5900000;
+    if (form == "colat") value = 30;
+    if (form == "lat3") value = 30;
+    if (form == "lon3") value = 4;
+    if (form == "inclination") value = 99;
+    if (form == "days") value = 0.07;
+    if (form == "satellite") value = 4;
+    if (form == "path") value = 199;
+    if (kind->quantity == detail::Quantity::angle && kind->usual != 0)
+      value *= 180 / 3.14159265358979324;
+    parameters.emplace_back(kind->name, value);
+  }
+  // What is of some other part of the Earth.
+  if (method.code == 9810 || method.code == 9829 || method.code == 9830) {
+    parameters[0].second = method.code == 9810 ? 90 : 71;
+  }
+  if (method.code == detail::kBipolarConic) {
+    lon = -100;
+    lat = 10;
+  }
+  if (method.code == 9811) {
+    parameters[0].second = -41;
+    parameters[1].second = 173;
+    lon = 174;
+    lat = -40;
+  }
+  if (method.code == detail::kObliqueLambert) {
+    parameters[2].second = -1;
+    parameters[3].second = 1;
+    parameters[4].second = 30;
+  }
+  if (method.code == detail::kMalaya) {
+    lon = 102;
+    lat = 4.5;
+  }
+  return {Projection(method.name, parameters,
+                     method.code == detail::kMalaya ? Ellipsoid(6377304.063, 300.8017)
+                                                    : Ellipsoid("International 1924")),
+          lon, lat};
+}
+
+}  // namespace
+
 // Every method has complete entries, can be made, goes forth and back, and has conformal,
 // equal-area or other factors that agree with its name.
 TEST(Methods, EveryOneGoesForthAndBack) {
   for (const detail::Method& method : detail::methods()) {
     SCOPED_TRACE(std::string(method.name));
-    std::vector<std::pair<std::string, double>> parameters;
-    double lon = 3;
-    double lat = 47;
     for (const auto& parameter : method.parameters) {
-      const auto* kind = detail::parameter_kind(parameter.code);
-      ASSERT_NE(kind, nullptr);
-      const std::string_view form = kind->short_form;
-      double value = kind->usual;
-      if (form == "lat0") value = 46;
-      if (form == "lat1") value = 44;
-      if (form == "lat2") value = 49;
-      if (form == "lon0" || form == "lon1") value = 2;
-      if (form == "lon2") value = 5;
-      if (form == "azimuth") value = 40;
-      if (form == "gamma") value = 38;
-      if (form == "x0") value = 600000;
-      if (form == "y0") value = -200000;
-      if (form == "h") value = 5900000;
-      if (form == "colat") value = 30;
-      if (form == "lat3") value = 30;
-      if (form == "lon3") value = 4;
-      if (form == "inclination") value = 99;
-      if (form == "days") value = 0.07;
-      if (form == "satellite") value = 4;
-      if (form == "path") value = 199;
-      if (kind->quantity == detail::Quantity::angle && kind->usual != 0)
-        value *= 180 / 3.14159265358979324;
-      parameters.emplace_back(kind->name, value);
+      ASSERT_NE(detail::parameter_kind(parameter.code), nullptr);
     }
-    // What is of some other part of the Earth.
-    if (method.code == 9810 || method.code == 9829 || method.code == 9830) {
-      parameters[0].second = method.code == 9810 ? 90 : 71;
-    }
-    if (method.code == detail::kBipolarConic) {
-      lon = -100;
-      lat = 10;
-    }
-    if (method.code == 9811) {
-      parameters[0].second = -41;
-      parameters[1].second = 173;
-      lon = 174;
-      lat = -40;
-    }
-    if (method.code == detail::kObliqueLambert) {
-      parameters[2].second = -1;
-      parameters[3].second = 1;
-      parameters[4].second = 30;
-    }
-    if (method.code == detail::kMalaya) {
-      lon = 102;
-      lat = 4.5;
-    }
-    const Projection map(method.name, parameters,
-                         method.code == detail::kMalaya ? Ellipsoid(6377304.063, 300.8017)
-                                                        : Ellipsoid("International 1924"));
+    const auto [map, lon, lat] = sample_of(method);
     EXPECT_EQ(map.method_code(), method.code);
     EXPECT_GT(map.truth().size(), 10u);
     const Point there = map.forward({lon, lat});
@@ -158,6 +177,138 @@ TEST(Methods, EveryOneGoesForthAndBack) {
     EXPECT_GT(factors.areal, 0);
     // h k is the areal scale times the sine of the angle between the graticule's lines.
     EXPECT_LE(factors.areal, factors.meridional * factors.parallel * (1 + 1e-9));
+  }
+}
+
+namespace {
+
+// What an array call gave: points and their words.
+struct Answers {
+  std::vector<Point> points;
+  std::vector<TWstatus> words;
+  Summary summary;
+};
+
+Answers run_array(const Projection& map, const std::vector<Point>& in, bool back) {
+  Answers out = {
+      std::vector<Point>(in.size(), {-7, -7, -7}), std::vector<TWstatus>(in.size(), 12345), {}};
+  const Coordinates<const double> from = {&in[0].x, &in[0].y, &in[0].z, 3};
+  const Coordinates<double> to = {&out.points[0].x, &out.points[0].y, &out.points[0].z, 3};
+  out.summary = back ? map.inverse(in.size(), from, to, {out.words.data(), 1})
+                     : map.forward(in.size(), from, to, {out.words.data(), 1});
+  return out;
+}
+
+bool same_bits(const Point& one, const Point& other) {
+  return std::memcmp(&one, &other, sizeof one) == 0 ||
+         (std::isnan(one.x) && std::isnan(one.y) && std::isnan(one.z) && std::isnan(other.x) &&
+          std::isnan(other.y) && std::isnan(other.z));
+}
+
+}  // namespace
+
+// Whatever the method, the place in a block and the processor's width: a point that fails leaves
+// every other point what it is alone, and has its own word.
+TEST(Methods, AFailingPointDisturbsNoOther) {
+  std::vector<points::Level> levels;
+  const points::Level before = points::level();
+  for (int i = 0; i < points::kLevels; ++i) {
+    const auto level = static_cast<points::Level>(i);
+    if (points::ask_for_level(level)) levels.push_back(level);
+  }
+  const double nan = std::nan("");
+  for (const detail::Method& method : detail::methods()) {
+    SCOPED_TRACE(std::string(method.name));
+    const auto [map, lon, lat] = sample_of(method);
+    std::vector<Point> good;
+    for (int i = 0; i < 260; ++i) {
+      good.push_back({lon + 0.003 * (i % 97) - 0.1, lat + 0.007 * (i % 41) - 0.1, 1.0 * i});
+    }
+    for (const bool back : {false, true}) {
+      SCOPED_TRACE(back ? "inverse" : "forward");
+      // Some of these are on some maps.
+      std::vector<Point> bad = {
+          {lon, 91.5},      {nan, lat},        {lon, nan},        {lon + 179.9, 0},
+          {lon + 90, 1e-9}, {lon + 120, -lat}, {lon + 180, -lat}, {lon + 100, -lat / 2},
+          {lon, 90},        {lon, -90}};
+      if (back) {
+        const Point at = map.forward({lon, lat});
+        bad = {{nan, at.y},          {at.x, nan},        {1e12, at.y},         {at.x, -1e12},
+               {at.x + 2.1e7, at.y}, {at.x, at.y + 2e7}, {at.x, at.y - 2.6e7}, {-5e7, 5e7},
+               {at.x - 1.3e7, at.y}, {-3e5, at.y},       {at.x, at.y + 1.1e7}, {at.x, at.y - 9e6}};
+      }
+      std::vector<Point> in = back ? run_array(map, good, false).points : good;
+      ASSERT_EQ(run_array(map, in, back).summary.failed, 0u);
+      std::vector<Point> alone(in.size());
+      for (std::size_t i = 0; i < in.size(); ++i) {
+        alone[i] = run_array(map, {in[i]}, back).points[0];
+      }
+      for (const Point& odd : bad) {
+        SCOPED_TRACE(std::to_string(odd.x) + " " + std::to_string(odd.y));
+        const Answers odd_alone = run_array(map, {odd}, back);
+        for (const points::Level level : levels) {
+          points::ask_for_level(level);
+          for (const auto& [count, at] : {std::pair<std::size_t, std::size_t>{2, 0},
+                                          {2, 1},
+                                          {19, 0},
+                                          {19, 9},
+                                          {19, 18},
+                                          {37, 20},
+                                          {260, 130}}) {
+            std::vector<Point> mixed(in.begin(), in.begin() + static_cast<std::ptrdiff_t>(count));
+            mixed[at] = odd;
+            const Answers all = run_array(map, mixed, back);
+            EXPECT_EQ(all.summary.failed, odd_alone.summary.failed);
+            EXPECT_EQ(all.words[at], odd_alone.words[0]);
+            EXPECT_TRUE(same_bits(all.points[at], odd_alone.points[0]))
+                << all.points[at].x << " " << all.points[at].y << " for " << odd_alone.points[0].x
+                << " " << odd_alone.points[0].y;
+            for (std::size_t i = 0; i < count; ++i) {
+              if (i == at) continue;
+              ASSERT_EQ(all.words[i], TW_SUCCESS) << i << " of " << count;
+              ASSERT_TRUE(same_bits(all.points[i], alone[i])) << i << " of " << count;
+            }
+          }
+        }
+        points::ask_for_level(before);
+      }
+    }
+  }
+}
+
+// Inverses by iteration lead back from all of the map, not from the neighbourhood of the origin
+// alone, or say that they do not.
+TEST(Methods, IteratedInversesLeadBackFromAfar) {
+  struct Case {
+    const char* method;
+    double farthest;  // latitude
+    double lon;       // longitude
+    double x, y;      // a place of the plane where nothing lies
+  };
+  const Ellipsoid grs80("GRS80");
+  for (const Case& c :
+       {Case{"hyperbolic cassini", 80, 50, 0, 6.1e6}, Case{"guam", 89, 175, 2.5e7, 9.9e6},
+        Case{"lambert near conformal", 85, 60, 0, 3e8}}) {
+    SCOPED_TRACE(c.method);
+    const Projection map(c.method, {{"lat0", c.lon == 60 ? 40 : 0}, {"lon0", 0}}, grs80);
+    for (double lat = -c.farthest; lat <= c.farthest; lat += 1) {
+      for (double lon = -c.lon; lon <= c.lon; lon += c.lon / 7) {
+        // The hyperbolic grid folds where the sphere's northing is the square root of two.
+        const double northing =
+            std::atan2(std::tan(std::fabs(lat) / 57.29577951), std::cos(lon / 57.29577951));
+        if (c.farthest == 80 && northing > 1.38) continue;
+        const Point there = map.forward({lon, lat});
+        const Point back = map.inverse(there);
+        EXPECT_NEAR(back.x, lon, 1e-8) << lat;
+        EXPECT_NEAR(back.y, lat, 1e-8) << lon;
+      }
+    }
+    TWstatus word = TW_SUCCESS;
+    double x = c.x, y = c.y;
+    const Coordinates<double> at = {&x, &y};
+    EXPECT_EQ(map.inverse(1, at, at, {&word, 1}).failed, 1u) << x << " " << y;
+    EXPECT_NE(word, TW_SUCCESS);
+    EXPECT_TRUE(std::isnan(x) && std::isnan(y));
   }
 }
 

@@ -160,7 +160,7 @@ TEST(Bonne, StandardParallelTakesItsOwnRadius) {
   Points out = untouched(3);
   TWstatus status = 0;
   TWbonne_f(0, lat1, e, p.e2, p.c1, 50, 3, in.data(), out.data(), &status);
-  for (int i = 0; i < 2; ++i) {
+  for (std::size_t i = 0; i < 2; ++i) {
     expect_near(out[i], p.c1 * std::sin(std::sin(lat1) * d),
                 p.c1 - p.c1 * std::cos(std::sin(lat1) * d), 1e-12);
   }

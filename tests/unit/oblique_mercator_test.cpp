@@ -340,10 +340,10 @@ TEST(ObliqueMercator, FailureLeavesTheArrayUnrotatedAndUnscaled) {
   Points skew = untouched(5), out = untouched(5);
   p.uv_k(1, in, skew);
   EXPECT_EQ(p.forward(in, out), TW_RANGE_ERROR);
-  for (int i = 0; i < 5; ++i) expect_near(out[i], skew[i].x, skew[i].y, 0);
+  for (std::size_t i = 0; i < 5; ++i) expect_near(out[i], skew[i].x, skew[i].y, 0);
   out = untouched(5);
   EXPECT_EQ(p.scale(2, in, out), TW_RANGE_ERROR);
-  for (int i = 0; i < 5; ++i) {
+  for (std::size_t i = 0; i < 5; ++i) {
     EXPECT_EQ(out[i].x, skew[i].x);
     EXPECT_EQ(out[i].y, skew[i].y);
     EXPECT_NE(out[i].z, kUntouched);  // k is written at a failing point, too
