@@ -9,7 +9,6 @@
 #include "registry_names.hpp"
 #include "system_impl.hpp"
 #include "text_forms.hpp"
-#include "text_forms_parts.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/ellipsoid.hpp"
 #include "tidewater/position_text.hpp"

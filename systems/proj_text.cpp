@@ -12,6 +12,7 @@
 #include "text_forms.hpp"
 #include "text_forms_parts.hpp"
 #include "tidewater/ellipsoid.hpp"
+#include "words.hpp"
 
 namespace tidewater::detail {
 

@@ -87,14 +87,6 @@ void recognise_datum(Definition& definition) {
   }
 }
 
-bool horizontal_axes(std::string_view axes) {
-  if (axes.size() < 2 || axes.size() > 3) return false;
-  const auto along = [&](std::string_view letters) {
-    return letters.find(axes[0]) != letters.npos || letters.find(axes[1]) != letters.npos;
-  };
-  return along("EW") && along("NS") && (axes.size() == 2 || axes[2] == 'U');
-}
-
 int parameter_among(const Method& method, std::initializer_list<int> codes) {
   for (const MethodParameter& parameter : method.parameters) {
     for (const int code : codes) {
