@@ -338,7 +338,7 @@ const Method& variant(const WktNode& name, const Method& method, std::vector<Giv
     const bool scaled = find(given, {"scalefactor"}) != nullptr;
     if (word == "stereographic" && std::fabs(pole - 90) > 1e-9) return method;
     if (std::fabs(pole - 90) < 1e-9 && scaled) {
-      if (lat0 == 0 && first != nullptr) {
+      if (lat0 == 0) {  // the parallel is the pole
         given[static_cast<std::size_t>(first - &given[0])].name = "latitudeoforigin";
       }
       return code(9810);

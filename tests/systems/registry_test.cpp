@@ -588,6 +588,24 @@ TEST(RegistryOperations, InStepsAndReplaced) {
   EXPECT_GT(replaced, 100U);
 }
 
+TEST(RegistryOperations, OfEverySystemAreThoseOfItsDatum) {
+  std::map<int, std::set<int>> of_datum;
+  const auto datum_of = [](int code) {
+    const auto system = registry().system(code);
+    return system && system->kind != SystemKind::compound ? system->datum : 0;
+  };
+  for (const int code : registry().operations()) {
+    const auto operation = registry().operation(code);
+    of_datum[datum_of(operation->source)].insert(code);
+    of_datum[datum_of(operation->target)].insert(code);
+  }
+  for (const int code : registry().systems()) {
+    if (const int datum = datum_of(code)) {
+      EXPECT_EQ(codes_of(registry().operations(code)), of_datum[datum]) << code;
+    }
+  }
+}
+
 TEST(RegistryOperations, AllOfADatumOrderedByAccuracy) {
   const auto operations = registry().operations(4275);
   EXPECT_GE(operations.size(), 14U);
@@ -783,6 +801,8 @@ TEST_F(RegistryStores, ThatLieAreRefused) {
       {"UPDATE \"geodetic systems\" SET kind = 0 WHERE code = 4326", "kind"},
       {"UPDATE \"geodetic systems\" SET kind = 9 WHERE code = 4326", "kind"},
       {"UPDATE \"geodetic systems\" SET axes = 'NE' WHERE code = 4979", "axes"},
+      {"UPDATE \"geodetic systems\" SET axes = 'EE' WHERE code = 4326", "axes"},
+      {"UPDATE \"geodetic systems\" SET axes = 'NED' WHERE code = 4979", "axes"},
       {"UPDATE \"geodetic systems\" SET axes = 'NEU' WHERE code = 4978", "axes"},
       {"UPDATE \"vertical systems\" SET axes = 'E' WHERE code = 5773", "axes"},
       {"UPDATE \"geodetic systems\" SET axes = 'NEU' WHERE code = 4326", "axes"},
@@ -858,7 +878,7 @@ TEST_F(RegistryStores, OfOtherEntriesAnswerAsTheyStand) {
               "INSERT INTO aliases VALUES (9, 2154, 'another kind of name');"
               "WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n LIMIT 20) "
               "INSERT INTO \"method parameters\" SELECT 999999, i FROM n;"
-              "UPDATE transformations SET method = 999999 WHERE code = 8049"));
+              "UPDATE transformations SET method = 999999 WHERE code IN (8049, 1193)"));
   // An accuracy that is not known goes last, whatever the codes.
   const auto operations = other.operations(4275, 4326);
   ASSERT_EQ(operations.size(), 2U);
@@ -883,8 +903,10 @@ TEST_F(RegistryStores, OfOtherEntriesAnswerAsTheyStand) {
   EXPECT_FALSE(other.system("no system of that code"));
   EXPECT_TRUE(other.search("no system of that code").empty());
   EXPECT_FALSE(other.system("another kind of name"));
+  EXPECT_TRUE(other.suggest("no system of that cod").empty());
   // No more parameters than an entry has places for: 7 and 8 more.
   EXPECT_EQ(other.operation(8049)->parameters.size(), 15U);
+  EXPECT_EQ(other.operation(1193)->parameters.size(), 7U);
 }
 
 // From a datum to itself leads what moves its points in time, and nothing that leaves it.

@@ -168,6 +168,7 @@ TEST(SystemNames, OfTheRegistry) {
   expect_refused("EPSG:27582",
                  "The registry has withdrawn EPSG:27582, NTF (Paris) / France II; EPSG:27572 takes "
                  "its place.");
+  expect_refused("EPSG:2008", "The registry has withdrawn EPSG:2008, NAD27(CGQ77) / SCoPQ zone 2.");
   // Heights stand beside two axes alone, and both parts are codes.
   for (const char* none : {"EPSG:4978+5773", "EPSG:4979+5773", "EPSG:7405+5773"}) {
     expect_refused(none, "must be a horizontal system and a vertical one");
@@ -301,6 +302,10 @@ TEST(SystemNames, GeographicAxesOfTheOtherDirection) {
 }
 
 TEST(SystemNames, ProjStrings) {
+  for (const char* text : {"+proj=utm +zone=31 +ellps=GRS80", "proj=utm zone=31 ellps=GRS80",
+                           "zone=31 ellps=GRS80 proj=utm", "zone=31 ellps=GRS80 +proj=utm"}) {
+    EXPECT_EQ(System(text).method(), "Transverse Mercator") << text;
+  }
   // Other names for one ellipsoid: figures by f, e squared, b.
   const double rf = 298.257222101, f = 1 / rf;
   const auto flattening = [](const std::string& words) {
