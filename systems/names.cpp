@@ -9,6 +9,7 @@
 #include "registry_names.hpp"
 #include "system_impl.hpp"
 #include "text_forms.hpp"
+#include "text_forms_parts.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/ellipsoid.hpp"
 #include "tidewater/position_text.hpp"
@@ -307,11 +308,7 @@ class OneLine {
     } else {
       refuse("it names no datum= and no ellps=");
     }
-    if (result.datum.name.empty()) {
-      result.datum.name =
-          "unknown datum on " + (result.datum.ellipsoid.name.empty() ? std::string("an ellipsoid")
-                                                                     : result.datum.ellipsoid.name);
-    }
+    if (result.datum.name.empty()) result.datum.name = unknown_datum(result.datum.ellipsoid);
     if (const auto pm = take("pm")) {
       if (const auto degrees = number(*pm)) {
         if (std::fabs(*degrees) > 360) refuse("pm is beyond a whole turn");

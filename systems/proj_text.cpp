@@ -308,8 +308,7 @@ void read_datum(Words& words, Definition& definition) {
     for (const char* key : {"ellps", "a", "b", "R", "rf"}) words.take(key);
   } else {
     read_ellipsoid(words, definition);
-    datum.name = "unknown datum on " + (datum.ellipsoid.name.empty() ? std::string("an ellipsoid")
-                                                                     : datum.ellipsoid.name);
+    datum.name = unknown_datum(datum.ellipsoid);
   }
   const auto grids = words.take("nadgrids");
   if (grids && *grids != "@null") datum.name += " with " + std::string(grids->substr(0, 200));
@@ -364,10 +363,10 @@ UnitDefinition read_unit(Words& words) {
   return unit;
 }
 
-// "enu", "wsu" ... in capitals; empty without one.
+// "enu", "wsu" ... in capitals, without the third.
 std::string read_axes(Words& words) {
   const auto axis = words.take("axis");
-  if (!axis) return {};
+  if (!axis) return "EN";
   std::string axes;
   for (const char c : *axis) {
     axes += c >= 'a' && c <= 'z' ? static_cast<char>(c - 32) : c;
@@ -555,7 +554,7 @@ Definition definition_from_proj(std::string_view text) {
   if (geographic) {
     definition.kind = SystemKind::geographic2d;
     definition.unit = {"degree", 9102, kDegreeInRadians};
-    definition.axes = axes.empty() ? "EN" : axes;
+    definition.axes = axes;
     words.take("units");
   } else if (geocentric) {
     definition.kind = SystemKind::geocentric;
@@ -564,7 +563,7 @@ Definition definition_from_proj(std::string_view text) {
   } else {
     definition.kind = SystemKind::projected;
     definition.unit = read_unit(words);
-    definition.axes = axes.empty() ? "EN" : axes;
+    definition.axes = axes;
     method = method_by_code(code);
     definition.method = code;
     if (*name == "utm") {
@@ -677,12 +676,10 @@ std::string proj_from_definition(const Definition& definition) {
     return text + " +no_defs +type=crs";
   }
   const Method& method = method_of(definition);
-  const std::string_view why = foreign(definition);
-  if (method.proj.empty() || !why.empty()) {
-    throw Error(
-        "PROJ strings have no form for " + definition.name + ": " +
-        (why.empty() ? "PROJ lacks the method " + std::string(method.name) : std::string(why)) +
-        ".");
+  std::string why(foreign(definition));
+  if (method.proj.empty()) why = "PROJ lacks the method " + std::string(method.name);
+  if (!why.empty()) {
+    throw Error("PROJ strings have no form for " + definition.name + ": " + why + ".");
   }
   text = "+proj=" + std::string(method.proj);
   for (const MethodParameter& parameter : method.parameters) {

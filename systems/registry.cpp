@@ -644,10 +644,9 @@ struct Registry::Tables {
       }
     }
     std::stable_sort(rows.begin(), rows.end(), [](const OperationRow* a, const OperationRow* b) {
-      const bool a_unknown = std::isnan(a->accuracy);
-      const bool b_unknown = std::isnan(b->accuracy);
-      if (a_unknown || b_unknown) return !a_unknown && b_unknown;
-      return a->accuracy < b->accuracy;
+      // What is not known goes last.
+      const auto rank = [](double accuracy) { return std::isnan(accuracy) ? HUGE_VAL : accuracy; };
+      return rank(a->accuracy) < rank(b->accuracy);
     });
     std::vector<OperationRecord> out;
     out.reserve(rows.size());

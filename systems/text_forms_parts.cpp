@@ -31,6 +31,11 @@ std::string number_text(double value) {
 
 std::string degrees_text(double radians) { return number_text(radians / kDegreeInRadians); }
 
+std::string unknown_datum(const EllipsoidDefinition& ellipsoid) {
+  const std::string_view name = ellipsoid.name;
+  return "unknown datum on " + std::string(name.empty() ? "an ellipsoid" : name);
+}
+
 void complete_parameters(Definition& definition, const Method& method) {
   std::vector<ParameterValue> complete;
   for (const MethodParameter& parameter : method.parameters) {

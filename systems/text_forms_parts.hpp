@@ -21,6 +21,9 @@ std::string bare(std::string_view name);
 std::string number_text(double value);
 std::string degrees_text(double radians);
 
+// The name of a datum of which the ellipsoid alone is known.
+std::string unknown_datum(const EllipsoidDefinition& ellipsoid);
+
 // Gives the definition all parameters that its method takes, at their usual value where none is
 // given, in the method's order.
 void complete_parameters(Definition& definition, const Method& method);

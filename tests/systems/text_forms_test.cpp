@@ -351,6 +351,11 @@ TEST(Wkt, OneNameForSeveralMethods) {
   grads.replace(grads.find(degree), degree.size(), R"(UNIT["grad",0.01570796326794897])");
   EXPECT_EQ(definition_from_wkt(grads).method, 9810);
   EXPECT_NEAR(definition_from_wkt(grads).parameter(kLat0), -90 * kDegree, 1e-15);
+  const Definition own = definition_from_wkt(
+      projcs(R"(PROJECTION["Polar_Stereographic"],PARAMETER["scale_factor",0.994],)"
+             R"(PARAMETER["latitude_of_origin",-100,UNIT["grad",0.01570796326794897]])"));
+  EXPECT_EQ(own.method, 9810);
+  EXPECT_NEAR(own.parameter(kLat0), -90 * kDegree, 1e-15);
   // Web maps have a name of their own in PROJ's extension alone, or by their code.
   const std::string web = R"(PROJECTION["Mercator_1SP"],PARAMETER["scale_factor",1])";
   EXPECT_EQ(definition_from_wkt(projcs(web)).method, 9804);
@@ -477,6 +482,10 @@ TEST(Wkt, BoundSystems) {
                      "\"x\" is none of the seven");
   expect_wkt_refused(bound(to_wgs84, method + R"(,PARAMETER["x",3,ID["EPSG",8604]])"),
                      "\"x\" is none of the seven");
+  const std::string realised =
+      R"t(TARGETCRS[GEOGCRS["WGS 84 (G1762)",DATUM["World Geodetic System 1984 (G1762)",)t"
+      R"(ELLIPSOID["WGS 84",6378137,298.257223563]],CS[ellipsoidal,2]]],)";
+  EXPECT_TRUE(definition_from_wkt(bound(realised, method)).datum.to_wgs84);
   // By another name, but of that datum.
   const std::string named =
       R"(TARGETCRS[GEOGCRS["mine",DATUM["d",ELLIPSOID["e",6378137,298.257223563],)"
@@ -567,6 +576,18 @@ TEST(Wkt, NamesOfPrjFiles) {
     definition.name = name;
     const std::string text = wkt_from_definition(definition, Wkt::esri);
     EXPECT_EQ(text.substr(0, text.find(',')), "PROJCS[\"" + std::string(written) + "\"") << name;
+  }
+}
+
+// What a .prj file says is written back as it stood.
+TEST(Wkt, PrjFilesThereAndBack) {
+  const std::string files[] = {
+      R"(GEOGCS["GCS_Mine",DATUM["D_Mine",SPHEROID["Own_1",6378000,300]],PRIMEM["Greenwich",0],)"
+      R"(UNIT["Degree",0.0174532925199433]])",
+      R"(GEOGCS["GCS_WGS_1984",DATUM["D_WGS_1984",SPHEROID["WGS_84",6378137,298.257223563]],)"
+      R"(PRIMEM["Greenwich",0],UNIT["Degree",0.0174532925199433]])"};
+  for (const std::string& file : files) {
+    EXPECT_EQ(wkt_from_definition(definition_from_wkt(file), Wkt::esri), file);
   }
 }
 
