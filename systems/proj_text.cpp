@@ -240,7 +240,8 @@ class Words {
   std::vector<Given> given_;
 };
 
-void read_ellipsoid(Words& words, Definition& definition) {
+// GRS 1980 where the words tell none; whether they do.
+bool read_ellipsoid(Words& words, Definition& definition) {
   EllipsoidDefinition& ellipsoid = definition.datum.ellipsoid;
   if (const auto name = words.take("ellps")) {
     const auto found = std::find_if(std::begin(kEllipsoids), std::end(kEllipsoids),
@@ -277,6 +278,7 @@ void read_ellipsoid(Words& words, Definition& definition) {
   if (ellipsoid.inverse_flattening != 0 && !(ellipsoid.inverse_flattening >= 3)) {
     words.refuse("the inverse flattening must be 3 or more");
   }
+  return sized;
 }
 
 // Whether this is the pseudo-Mercator of web maps: a sphere for WGS 84 with a grid that is none.
@@ -305,7 +307,12 @@ void read_datum(Words& words, Definition& definition) {
     datum = datum_from_registry(found.code);
     definition.base_code = found.base;
     definition.base = definition_from_registry(found.base).name;
-    for (const char* key : {"ellps", "a", "b", "R", "rf"}) words.take(key);
+    // An ellipsoid beside it must be its own; that of web maps is none.
+    Definition told;
+    const bool own = read_ellipsoid(words, told);
+    if (own && !web && !same_figures(told.datum.ellipsoid, datum.ellipsoid)) {
+      words.refuse("its ellipsoid is not that of +datum=" + std::string(found.name));
+    }
   } else {
     read_ellipsoid(words, definition);
     datum.name = unknown_datum(datum.ellipsoid);

@@ -45,18 +45,12 @@ void complete_parameters(Definition& definition, const Method& method) {
   definition.parameters = std::move(complete);
 }
 
-namespace {
-
-bool same_figures(const DatumDefinition& a, const DatumDefinition& b) {
-  const auto near = [](double x, double y) { return std::fabs(x - y) <= 1e-9 * std::fabs(y); };
+bool same_figures(const EllipsoidDefinition& a, const EllipsoidDefinition& b) {
   // Texts round the flattening, and name a sphere by zero or by infinity.
-  return near(a.ellipsoid.a, b.ellipsoid.a) &&
-         std::fabs(a.ellipsoid.inverse_flattening - b.ellipsoid.inverse_flattening) <=
-             1e-7 * (1 + b.ellipsoid.inverse_flattening) &&
-         std::fabs(a.meridian.longitude - b.meridian.longitude) < 1e-9;
+  return std::fabs(a.a - b.a) <= 1e-9 * b.a &&
+         std::fabs(a.inverse_flattening - b.inverse_flattening) <=
+             1e-7 * (1 + b.inverse_flattening);
 }
-
-}  // namespace
 
 void recognise_datum(Definition& definition) {
   DatumDefinition& datum = definition.datum;
@@ -66,7 +60,10 @@ void recognise_datum(Definition& definition) {
       const auto record = registry.datum(code);
       if (!record || record->ellipsoid == 0) return false;  // none, or one of heights
       DatumDefinition known = datum_from_registry(code);
-      if (!same_figures(datum, known)) return false;
+      if (!same_figures(datum.ellipsoid, known.ellipsoid) ||
+          !(std::fabs(datum.meridian.longitude - known.meridian.longitude) < 1e-9)) {
+        return false;
+      }
       known.to_wgs84 = datum.to_wgs84;
       datum = std::move(known);
       return true;

@@ -21,6 +21,9 @@ std::string bare(std::string_view name);
 std::string number_text(double value);
 std::string degrees_text(double radians);
 
+// Whether two ellipsoids are one, as exactly as texts have them.
+bool same_figures(const EllipsoidDefinition& a, const EllipsoidDefinition& b);
+
 // The name of a datum of which the ellipsoid alone is known.
 std::string unknown_datum(const EllipsoidDefinition& ellipsoid);
 

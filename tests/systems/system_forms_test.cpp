@@ -89,6 +89,10 @@ TEST(SystemNames, UtmOnAnyDatum) {
   expect_refused("utm:31N EPSG:5773", "is not a geographic system");
   // One that the registry knows by another name: its SHMG2015 is UTM.
   EXPECT_EQ(System("utm:30S SHGD2015").code(), 7887);
+  // Zones count from Greenwich: 3 degrees less the 2.33722917 of Paris.
+  const auto parameters = System("utm:31N EPSG:4807").parameters();
+  EXPECT_EQ(parameters.at(1).first, "Longitude of natural origin");
+  EXPECT_NEAR(parameters.at(1).second, 3 - 2.33722917, 1e-12);
   // Whatever the form of the base.
   EXPECT_EQ(System("utm:31n EPSG:4978").code(), 32631);
   EXPECT_EQ(System("utm:31N EPSG:4979").code(), 32631);
@@ -236,6 +240,7 @@ TEST(SystemNames, Definitions) {
   expect_refused("transverse mercator lon0=inf ellps=GRS80", "\"inf\" is no number");
   expect_refused("transverse mercator lon0=9x ellps=GRS80", "\"9x\" is no number");
   EXPECT_NEAR(forward(System("transverse mercator lon0=+9 ellps=GRS80"), 9, 0).x, 0, 1e-9);
+  expect_refused("transverse mercator lon0=9 Lon0=9 ellps=GRS80", "\"lon0\" is given twice");
   expect_refused("transverse lon0=9 mercator ellps=GRS80", "\"mercator\" is no name=value");
   for (const char* seven : {"1,2", "1,2,3,4,5,6,7,8", "1,x,3", "1,2,"}) {
     expect_refused("geographic ellps=GRS80 towgs84=" + std::string(seven),

@@ -678,6 +678,7 @@ TEST(ProjText, OneNameForSeveralMethods) {
       {"+proj=webmerc", 1024, kLon0, 0},
       // Of web maps only a sphere of WGS 84's axis without a grid.
       {"+proj=merc +a=6378137 +b=6378137 +nadgrids=@null", 1024, kLon0, 0},
+      {"+proj=merc +datum=WGS84 +a=6378137 +b=6378137 +nadgrids=@null", 1024, kLon0, 0},
       {"+proj=merc +a=6378137 +b=6378137", 9804, kLon0, 0},
       {"+proj=merc +a=6378137 +b=6378137 +nadgrids=x.gsb", 9804, kLon0, 0},
       {"+proj=merc +a=6378137 +nadgrids=@null", 9804, kLon0, 0},
@@ -770,6 +771,18 @@ TEST(ProjText, EllipsoidsUnitsAndMeridians) {
   EXPECT_EQ(bessel.datum.code, 6314);
   EXPECT_EQ(bessel.base_code, 4314);
   EXPECT_NE(bessel.datum.name.find(" with beta.gsb"), std::string::npos);
+  for (const char* datum :
+       {"NAD27 +ellps=clrk66", "NAD83 +ellps=GRS80", "OSGB36 +ellps=airy", "ire65 +ellps=mod_airy",
+        "nzgd49 +ellps=intl",
+        "WGS84 +a=6378137 +rf="
+        "298.257223563",
+        "carthage +ellps=clrk80ign", "GGRS87 +ellps=GRS80", "hermannskogel +ellps=bessel",
+        "WGS84 +a=6378137 +b=6356752.314245179"}) {
+    EXPECT_NE(definition_from_proj("+proj=longlat +datum=" + std::string(datum)).datum.code, 0);
+  }
+  expect_proj_refused("+proj=longlat +datum=WGS84 +ellps=bessel", "not that of +datum=WGS84");
+  expect_proj_refused("+proj=longlat +datum=NAD83 +R=6371000", "not that of +datum=NAD83");
+  expect_proj_refused("+proj=merc +datum=WGS84 +a=6378137 +b=6378137", "not that of +datum=WGS84");
   EXPECT_EQ(definition_from_proj("+proj=longlat +a=5 +nadgrids=@null").datum.name,
             "unknown datum on an ellipsoid");
 }
