@@ -79,7 +79,8 @@ Definition definition_from_registry(int code) {
     result.datum = datum_from_registry(system->datum);
     const auto unit = need(registry.unit(system->unit), "unit", system->unit, of);
     result.unit = {unit.name, unit.code, unit.factor};
-    if (unit.code == kSexagesimalUnit || unit.factor == 0) {
+    if (system->kind != SystemKind::projected &&
+        (unit.code == kSexagesimalUnit || unit.factor == 0)) {
       result.unit = {"degree", 9102, kPi / 180};
     }
     result.axes = system->axes;

@@ -116,6 +116,17 @@ TEST(Heights, OffsetAndSlopeOfTheGuidanceNote) {
   EXPECT_EQ(map.inverse(there).z, 473);
 }
 
+// The Caspian Sea stands 28 m below the Baltic: what lies 30 m below the one lies 2 m below the
+// other, also where the heights of either count upwards.
+TEST(Heights, OffsetsBetweenDepths) {
+  const Transformation depths = between("EPSG:4284+5612", "EPSG:4284+5706");
+  EXPECT_EQ(depths.operation(), "EPSG:5440");
+  EXPECT_NEAR(depths.forward({50, 40, 30}).z, 2, 1e-12);
+  EXPECT_NEAR(depths.inverse({50, 40, 2}).z, 30, 1e-12);
+  EXPECT_NEAR(between("EPSG:4284+5705", "EPSG:4284+5706").forward({50, 40, -30}).z, 2, 1e-12);
+  EXPECT_NEAR(between("EPSG:4284+5611", "EPSG:4284+5705").forward({50, 40, -2}).z, -30, 1e-12);
+}
+
 TEST(Heights, ByGridOfTheCallers) {
   if (!std::filesystem::exists(kGeoid)) GTEST_SKIP() << "PROJ's " << kGeoid << " is not installed";
   const Point at = {8, 46, 100};

@@ -13,6 +13,7 @@
 
 #include "support/data.hpp"
 #include "support/grids.hpp"
+#include "systems/made_store.hpp"
 
 namespace tidewater::test {
 
@@ -597,6 +598,21 @@ TEST(Transformation, ParametersToWgs84OfEitherSide) {
   }
 }
 
+// Parameters to WGS 84 that change nothing but the ellipsoid or the scale, on a sphere too.
+TEST(Transformation, ParametersThatAreAlmostNothing) {
+  const Transformation sphere{System("+proj=longlat +R=6371000 +towgs84=0,0,0"),
+                              System("EPSG:4326")};
+  // The sphere's centre is the ellipsoid's; where its 45th parallel lies, iterated by hand.
+  EXPECT_NEAR(sphere.forward({10, 45}).y, 45.19231502383479, 1e-10);
+  const Transformation scaled{System("longlat ellps=WGS84 towgs84=0,0,0,0,0,0,10"),
+                              System("geocentric:wgs84")};
+  EXPECT_NEAR(scaled.forward({0, 0, 0}).x, 6378137 * 1.00001, 1e-6);
+  // The registry's operation between two ellipsoids, of zeros alone, changes heights.
+  const Transformation heights{System("EPSG:7682"), System("EPSG:4979"),
+                               with_operation("EPSG:9773")};
+  EXPECT_NEAR(heights.forward({37, 55, 100}).z, 99.46227155439556, 1e-6);  // likewise
+}
+
 TEST(Transformation, NoShiftBetweenSystemsOfOneDatumSaysNothing) {
   const Transformation map{System("EPSG:32631"), System("EPSG:32632"), with_operation("no shift")};
   EXPECT_EQ(map.accuracy(), 0);
@@ -744,21 +760,6 @@ TEST(Transformation, FailingPointsDisturbNoOthersWhateverTheMethod) {
 
 namespace {
 
-// A store of the tree's own sources with lines added to tables of the registry.
-std::string store_with(const ScratchFolder& folder,
-                       const std::vector<std::pair<std::string, std::string>>& lines) {
-  namespace fs = std::filesystem;
-  const fs::path sources = folder.path() / "sources";
-  fs::copy(fs::path(TIDEWATER_SOURCE) / "data", sources, fs::copy_options::recursive);
-  for (const auto& [table, line] : lines) {
-    std::ofstream(sources / "registry" / (table + ".csv"), std::ios::app) << line << "\n";
-  }
-  const std::string store = (folder.path() / "lies.store").string();
-  const std::string command =
-      std::string(TWSTORE_COMMAND) + " build '" + store + "' '" + sources.string() + "' >/dev/null";
-  return std::system(command.c_str()) == 0 ? store : "";
-}
-
 // What a process of its own finds with such a store, which a process reads once: true where every
 // system and operation of it gives an answer or a sentence.
 bool all_is_answered() {
@@ -788,6 +789,9 @@ bool all_is_answered() {
   // A system without a datum, and an operation from a system that is not there.
   good &= no_way("EPSG:990020", "EPSG:4326", "", "990099");
   good &= no_way("EPSG:4230", "EPSG:4326", "EPSG:990012", "The registry has no datum");
+  // A unit that has no size.
+  good &= no_way("EPSG:990030", "EPSG:4326", "", "The unit of No unit has no size.");
+  good &= no_way("EPSG:4326+990031", "EPSG:4979", "", "has no size.");
   return good;
 }
 
@@ -795,17 +799,24 @@ bool all_is_answered() {
 
 TEST(RegistryThatLies, GivesSentences) {
   GTEST_FLAG_SET(death_test_style, "threadsafe");
-  const ScratchFolder folder;
+  const StoreSources sources;
   const std::string values = ",-87,9001,-98,9001,-121,9001,0,0,0,0,0,0,0,0";
-  const std::string store = store_with(
-      folder, {{"concatenated_operations", "990001,Circle,4230,4326,1262,1,0,990001,0,0,0"},
-               {"concatenated_operations", "990002,Two,4230,4326,1262,1,0,990003,0,0,0"},
-               {"concatenated_operations", "990003,Two back,4230,4326,1262,1,0,990002,0,0,0"},
-               {"transformations", "990010,Nowhere,9603,4230,4326,999999,999,0" + values},
-               {"transformations", "990011,Replaced,9603,4230,4326,1262,10,999999" + values},
-               {"transformations", "990012,From nothing,9603,990098,4326,1262,10,0" + values},
-               {"geodetic_systems", "990020,No datum,2,990099,NE,9122,1262"}});
-  if (store.empty()) GTEST_SKIP() << "the store could not be built";
+  for (const auto& [table, line] :
+       {std::pair<const char*, std::string>{"concatenated_operations",
+                                            "990001,Circle,4230,4326,1262,1,0,990001,0,0,0"},
+        {"concatenated_operations", "990002,Two,4230,4326,1262,1,0,990003,0,0,0"},
+        {"concatenated_operations", "990003,Two back,4230,4326,1262,1,0,990002,0,0,0"},
+        {"transformations", "990010,Nowhere,9603,4230,4326,999999,999,0" + values},
+        {"transformations", "990011,Replaced,9603,4230,4326,1262,10,999999" + values},
+        {"transformations", "990012,From nothing,9603,990098,4326,1262,10,0" + values},
+        {"geodetic_systems", "990020,No datum,2,990099,NE,9122,1262"},
+        {"units", "990040,nothing,length,0"},
+        {"vertical_systems", "990031,No height,5100,U,990040,1262"},
+        {"projected_systems", "990030,No unit,4326,16031,EN,990040,1262"}}) {
+    sources.append("registry/" + std::string(table) + ".csv", line);
+  }
+  const std::string store = sources.build();
+  ASSERT_NE(store, "");
   EXPECT_EXIT(
       {
         setenv("TIDEWATER_STORE", store.c_str(), 1);
