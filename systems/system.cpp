@@ -189,9 +189,8 @@ std::vector<FoundSystem> System::all() {
   const detail::Registry& registry = detail::Registry::shared();
   std::vector<FoundSystem> list;
   for (const int code : registry.systems()) {
-    if (auto record = registry.system(code)) {
-      list.push_back({code, std::move(record->name), record->kind});
-    }
+    auto record = *registry.system(code);
+    list.push_back({code, std::move(record.name), record.kind});
   }
   return list;
 }

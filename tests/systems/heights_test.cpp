@@ -184,6 +184,8 @@ TEST(Heights, OfADefinitionsOwnSurface) {
             5);
   EXPECT_TRUE(has(refusal(coded("a", "99991").c_str(), coded("a", "99992").c_str()), "No way"));
   EXPECT_TRUE(has(refusal(coded("a", "99991").c_str(), "EPSG:4326+5773"), "No way"));
+  EXPECT_TRUE(has(refusal(coded("a", "99991").c_str(), "EPSG:4326+5773"), "No way"));
+  EXPECT_TRUE(has(refusal("EPSG:4326+5773", coded("a", "99991").c_str()), "No way"));
   // By a name of its own a code is still that of the registry.
   EXPECT_EQ(between(coded("a", "5773").c_str(), "EPSG:4326+5773").forward({8, 46, 5}).z, 5);
 }

@@ -303,6 +303,10 @@ TEST(Lines, PolygonsOfTheSphere) {
   const double westwards[] = {90, -30, -150};
   EXPECT_NEAR(rhumb.polygon(3, westwards, south).area, pi, 4e-15);
   EXPECT_NEAR(rhumb.polygon(3, around, north).perimeter, 2 * pi * std::cos(pi / 6), 4e-15);
+  // Half a turn is taken eastwards, from either side of the Earth.
+  const double half[] = {0, 180};
+  EXPECT_NEAR(rhumb.polygon(2, half, north).area, pi, 4e-15);
+  EXPECT_NEAR(rhumb.polygon(2, half, north).perimeter, 2 * pi * std::cos(pi / 6), 4e-15);
   EXPECT_EQ(geodesic.polygon(0, nullptr, nullptr).area, 0);
   const double one[] = {3};
   EXPECT_EQ(geodesic.polygon(1, one, one).perimeter, 0);

@@ -95,7 +95,8 @@ TEST(MagneticModelObject, NamesAndTheirSeries) {
   for (const char* asked : {"IGRF", "igrf", "IGRF-14", "igrf14", "i.g.r.f. 14"}) {
     EXPECT_EQ(name_of(asked), "IGRF-14") << asked;
   }
-  for (const char* asked : {"WMM2025", "wmm", "WMM", ""}) EXPECT_EQ(name_of(asked), "WMM2025");
+  for (const char* asked : {"WMM2025", "wmm", "WMM", "{wmm_2025}", ""})
+    EXPECT_EQ(name_of(asked), "WMM2025");
   EXPECT_EQ(MagneticModel("igrf 13", 2022).name(), "IGRF-13");
   const MagneticModel model("IGRF-14", 1950);
   EXPECT_EQ(model.first_year(), 1900);
@@ -230,6 +231,17 @@ TEST(MagneticModelObject, StoresThatLackOrLie) {
       EXPECT_NE(why.find(c.part), std::string::npos) << why;
     });
   }
+  // Of two models of one epoch that for the present alone is taken, whichever stands first; a name
+  // of no letter and no digit is none.
+  const StoreSources turned;
+  turned.write("magnetic_models.csv", head +
+                                          "IGRF-14,1,igrf14 epochs,6371200,2,IAGA,1900,2030,5\n" +
+                                          "WMM2025,2,wmm2025 epochs,6371200,2,NOAA,2025,2030,5\n");
+  with_store(turned.build(), [&] {
+    EXPECT_EQ(MagneticModel("", 2026).name(), "WMM2025");
+    EXPECT_NE(sentence([] { MagneticModel("--", 2026); }).find("no magnetic model \"--\""),
+              std::string::npos);
+  });
   // Coefficients whose sums no number holds leave every point its word.
   const StoreSources sources;
   sources.replace("magnetic/wmm2025_2025.csv", "-29351.8", "1e308");

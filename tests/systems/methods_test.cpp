@@ -276,6 +276,31 @@ TEST(Methods, AFailingPointDisturbsNoOther) {
   }
 }
 
+// Zones of any width, counted from any meridian; where a zone is so wide that its ends are no part
+// of its map, they fail alone.
+TEST(Methods, ZonesOfOtherWidths) {
+  const Ellipsoid grs80("GRS80");
+  const Projection map("transverse mercator zoned", {{"lonfirst", 0}, {"width", 3}, {"x0", 500000}},
+                       grs80);
+  for (const auto& [lon, zone] : {std::pair(1.0, 1), {4.6, 2}, {-1.0, 120}, {-178.9, 61}}) {
+    const double centre = 3 * zone - 1.5;
+    const Projection one("transverse mercator", {{"lon0", centre > 180 ? centre - 360 : centre}},
+                         grs80);
+    const Point at = map.forward({lon, 50});
+    const Point there = one.forward({lon, 50});
+    EXPECT_NEAR(at.x, zone * 1e6 + 500000 + there.x, 1e-6);
+    EXPECT_NEAR(at.y, there.y, 1e-6);
+    EXPECT_NEAR(map.inverse(at).x, lon, 1e-10);
+  }
+  EXPECT_TRUE(std::isnan(map.inverse({121.5e6, 5e6}).x));
+  const Projection wide("transverse mercator zoned", {{"lonfirst", -180}, {"width", 120}}, grs80);
+  const std::vector<Point> in = {{-120, 10, 0}, {-179, 1, 0}, {-110, 20, 0}, {59, 2, 0}, {0, 3, 0}};
+  const Answers out = run_array(wide, in, false);
+  EXPECT_EQ(out.words, (std::vector<TWstatus>{TW_SUCCESS, TW_RANGE_ERROR, TW_SUCCESS,
+                                              TW_RANGE_ERROR, TW_SUCCESS}));
+  for (const std::size_t i : {0, 2, 4}) EXPECT_EQ(out.points[i].x, wide.forward(in[i]).x);
+}
+
 // Inverses by iteration lead back from all of the map, not from the neighbourhood of the origin
 // alone, or say that they do not.
 TEST(Methods, IteratedInversesLeadBackFromAfar) {
