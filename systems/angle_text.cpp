@@ -452,8 +452,9 @@ std::size_t format_angle(double degrees, const AngleFormat& format, char* out) {
     const std::uint64_t whole = seconds ? rest / 60 : rest;
     const bool packed = format.form == AngleForm::packed;
     if (packed) {
+      // What no angle has is written so that none is read from it.
       const int digits = format.axis == Axis::latitude ? 2 : 3;
-      put_digits(whole, std::max(digits, whole < 1000 ? digits : 7));
+      put_digits(whole, whole < (digits == 2 ? 100u : 1000u) ? digits : 7);
     } else {
       p = std::to_chars(p, out + kAngleTextSize, whole).ptr;
     }

@@ -123,7 +123,8 @@ double central_meridian(int zone) { return 6 * zone - 183; }
 
 std::size_t band_of(double latitude) {
   const double band = std::floor((latitude + 80) / 8);
-  return static_cast<std::size_t>(std::clamp(band, 0.0, 19.0));
+  // A hair south of the equator the sum is rounded up to it; the squares end there.
+  return static_cast<std::size_t>(std::clamp(band, 0.0, latitude < 0 ? 9.0 : 19.0));
 }
 
 // West and east of a zone's cell in a band, from its central meridian, in degrees.  Norway and
@@ -285,14 +286,15 @@ int utm_zone(double longitude, double latitude) {
   if (latitude >= 84 || latitude < -80) return 0;
   longitude = wrapped(longitude);
   const std::size_t band = band_of(latitude);
-  const int zone = static_cast<int>(std::floor((longitude + 180) / 6)) + 1;
-  for (const int other : {zone, zone - 1, zone + 1}) {
-    if (other < 1 || other > 60) continue;
-    const Cell cell = cell_of(other, band);
-    const double from = longitude - central_meridian(other);
-    if (cell.west <= from && from < cell.east) return other;
+  // Just short of 180 degrees the sum is rounded up.
+  const int zone = std::min(static_cast<int>(std::floor((longitude + 180) / 6)) + 1, 60);
+  // The wider zones of Norway and Svalbard take from their neighbours.
+  for (const int own : {zone, zone - 1}) {
+    const Cell cell = cell_of(own, band);
+    const double from = longitude - central_meridian(own);
+    if (cell.west <= from && from < cell.east) return own;
   }
-  return zone;
+  return zone + 1;
 }
 
 GridPosition grid_position(double longitude, double latitude, int zone) {
@@ -315,7 +317,7 @@ GridPosition grid_position(double longitude, double latitude, int zone) {
     word = TransverseMercatorGrid::shared().forward(from, latitude, &x, &y);
     if (!grid.north) y += kFalseNorthing;
   }
-  if (word != TW_SUCCESS || !std::isfinite(x) || !std::isfinite(y)) {
+  if (word != TW_SUCCESS) {
     return refused("The point is too far from zone " + std::to_string(grid.zone) + ".");
   }
   grid.easting = x;
@@ -340,7 +342,7 @@ ParsedPosition position_of(const GridPosition& grid) {
                       "; zones are 1 to 60, and 0 at the poles.";
     return position;
   }
-  if (word != TW_SUCCESS || !std::isfinite(longitude) || !std::isfinite(latitude)) {
+  if (word != TW_SUCCESS || !std::isfinite(x) || !std::isfinite(y)) {
     position.reason = "The grid has no point at these coordinates.";
     return position;
   }
@@ -364,7 +366,7 @@ GridPosition parse_mgrs(std::string_view text) {
     } else if (upper >= 'A' && upper <= 'Z' && digits.empty() && letters.size() < 3) {
       letters += upper;
       blank = true;  // the digits may follow at once
-    } else if (is_digit(c) && letters.size() == 3 && digits.size() < 2 * kMostDigits + 1) {
+    } else if (is_digit(c) && letters.size() == 3) {
       if (blank) ++groups;
       if (groups == 1) ++first_group;
       digits += c;
@@ -382,13 +384,13 @@ GridPosition parse_mgrs(std::string_view text) {
     return refused(quoted(text) +
                    " has groups of digits of unequal length; easting and northing need the same.");
   }
+  if (digits.size() > 2 * kMostDigits) {
+    return refused(quoted(text) + " has more than 11 digits each of easting and northing.");
+  }
   if (digits.size() % 2 != 0) {
     return refused(quoted(text) +
                    " has an odd number of digits; easting and northing need the "
                    "same.");
-  }
-  if (digits.size() > 2 * kMostDigits) {
-    return refused(quoted(text) + " has more than 11 digits of easting and northing.");
   }
   int zone = 0;
   for (const char c : figures) zone = zone * 10 + (c - '0');

@@ -9,6 +9,7 @@
 #include "registry_names.hpp"
 #include "system_impl.hpp"
 #include "text_forms.hpp"
+#include "text_forms_parts.hpp"
 #include "tidewater/conformal.h"
 #include "tidewater/ellipsoid.hpp"
 #include "tidewater/position_text.hpp"
@@ -63,12 +64,21 @@ Definition projected_on(const Definition& base, std::string name, int method,
   return result;
 }
 
+// The universal zone of the point that comes with a name.
+int zone_at(const Where& where, std::string_view text) {
+  const int zone = utm_zone(where.longitude, where.latitude);
+  if (zone < 0) {
+    throw Error("The point that should tell the zone of " + quoted(text) + " is not on the earth.");
+  }
+  return zone;
+}
+
 Definition utm(std::string_view rest, const std::optional<Where>& where, std::string_view text) {
   int zone = 0;
   bool south = false;
   const auto [end, error] = std::from_chars(rest.data(), rest.data() + rest.size(), zone);
   std::string_view behind = rest.substr(static_cast<std::size_t>(end - rest.data()));
-  if (error == std::errc()) {
+  if (error != std::errc::invalid_argument) {  // a number, and be it too large
     behind = trimmed(behind);
     const char letter = behind.empty() ? ' ' : behind[0];
     south = letter == 'S' || letter == 's';
@@ -77,14 +87,14 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
     }
     behind.remove_prefix(1);
     if (zone < 1 || zone > 60) {
-      throw Error("UTM has zones 1 to 60, not " + std::to_string(zone) + ".");
+      throw Error("UTM has zones 1 to 60; " + quoted(text) + " names another.");
     }
   } else {
     if (!where) {
       throw Error(quoted(text) + " needs a zone, as in \"utm:30N\", or a point to find it from.");
     }
-    zone = utm_zone(where->longitude, where->latitude);
-    if (zone < 1) {
+    zone = zone_at(*where, text);
+    if (zone == 0) {
       throw Error(
           "UTM reaches from 80 degrees south to 84 degrees north; \"ups\" serves the poles.");
     }
@@ -97,7 +107,7 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
   const Definition base = geographic_named(behind);
   const std::string name = base.name + " / UTM zone " + std::to_string(zone) + (south ? "S" : "N");
   if (const auto known = Registry::shared().system(name)) {
-    if (known->name == name) return definition_from_registry(known->code);
+    return definition_from_registry(known->code);
   }
   return projected_on(base, name, 9807,
                       {{kLat0, 0},
@@ -111,6 +121,7 @@ Definition ups(std::string_view rest, const std::optional<Where>& where, std::st
   const std::string side = folded(rest);
   bool south = side == "s" || side == "south";
   if (side.empty() && where) {
+    zone_at(*where, text);
     south = where->latitude < 0;
   } else if (!south && side != "n" && side != "north") {
     throw Error(quoted(text) + " must say N or S, as in \"ups:N\", or come with a point.");
@@ -133,11 +144,7 @@ Definition military_grid(std::string_view rest, const std::optional<Where>& wher
                   "write references; a zone's numbers are \"utm:31N\", \"ups:N\" or, by a "
                   "reference, \"mgrs:31UDQ\".");
     }
-    const int zone = utm_zone(where->longitude, where->latitude);
-    if (zone < 0)
-      throw Error("The point that should tell the zone of " + quoted(text) +
-                  " is not on the earth.");
-    return zone_of(zone, where->latitude >= 0);
+    return zone_of(zone_at(*where, text), where->latitude >= 0);
   }
   // A zone alone, "31U" or "Z", or a whole reference.
   int zone = 0;
@@ -246,8 +253,9 @@ class OneLine {
     }
     if (const auto axes = take("axes")) {
       result.axes = *axes;
-      const bool known = axes->size() == 2 && axes->find_first_not_of("ENWS") == std::string::npos;
-      if (!known) refuse("axes must be two letters of E, N, W and S");
+      if (axes->size() != 2 || !horizontal_axes(*axes)) {
+        refuse("axes must be two letters of E, N, W and S, one along each direction");
+      }
     }
     for (const Given& given : given_) {
       if (!given.used) refuse(unknown(given.key, result));
@@ -307,6 +315,7 @@ class OneLine {
     }
     if (const auto pm = take("pm")) {
       if (const auto degrees = number(*pm)) {
+        if (std::fabs(*degrees) > 360) refuse("pm is beyond a whole turn");
         result.datum.meridian = {"", 0, *degrees * kDegree};
       } else {
         const PrimeMeridian named(*pm);
@@ -337,9 +346,11 @@ class OneLine {
       refuse("there is no projection method " + quoted(method_words_));
     }
     // What is given tells the variant.
-    if (method->code == 9802 && !has("lat1") && !has("lat2")) method = method_by_code(9801);
-    if (method->code == 9805 && has("k0")) method = method_by_code(9804);
-    if (method->code == 9829 && (has("k0") || has("lat0"))) method = method_by_code(9810);
+    const bool first = has("lat1") || has("lat 1") || has("lat ts");
+    const bool second = has("lat2") || has("lat 2");
+    if (method->code == 9802 && !first && !second) method = method_by_code(9801);
+    if (method->code == 9805 && (has("k0") || has("k 0"))) method = method_by_code(9804);
+    if (method->code == 9810 && first) method = method_by_code(9829);
     result.method = method->code;
     if (const auto units = take("units")) {
       const Unit unit(*units);
@@ -354,7 +365,7 @@ class OneLine {
       result.parameters.push_back(
           {parameter.code, kind.quantity == Quantity::angle ? *value * kDegree : *value});
     }
-    if (method->code == 9802 && !has("lat2")) {
+    if (method->code == 9802 && !second) {
       result.parameters.push_back({kLat2, result.parameter(kLat1)});
     }
   }
@@ -399,8 +410,9 @@ Definition by_registry_name(std::string_view text) {
 Definition compound_of(int horizontal, int vertical) {
   Definition result = definition_from_registry(horizontal);
   const Definition height = definition_from_registry(vertical);
-  if (height.kind != SystemKind::vertical || result.kind == SystemKind::vertical ||
-      result.kind == SystemKind::compound || result.kind == SystemKind::geocentric) {
+  const bool plane =
+      result.kind == SystemKind::projected || result.kind == SystemKind::geographic2d;
+  if (height.kind != SystemKind::vertical || !plane) {
     throw Error("EPSG:" + std::to_string(horizontal) + "+" + std::to_string(vertical) +
                 " must be a horizontal system and a vertical one.");
   }
@@ -436,6 +448,10 @@ Definition definition_from_text(std::string_view text, const std::optional<Where
   if (text.find('=') != std::string_view::npos) return OneLine(text).definition();
 
   const auto [head, rest] = headed(text);
+  if (head == "epsg" && number(rest)) {
+    if (const auto code = registry_code(rest)) return definition_from_registry(*code);
+    throw Error("There is no coordinate system " + quoted(text) + ".");
+  }
   if (head == "utm") return utm(rest, where, text);
   if (head == "ups") return ups(rest, where, text);
   if (head == "mgrs" || head == "usng") return military_grid(rest, where, text);

@@ -81,7 +81,7 @@ constexpr NamedMeridian kMeridians[] = {
     {"oslo", 10 + 43 / 60.0 + 22.5 / 3600},
 };
 
-// Ellipsoids by PROJ's names; a and 1/f, or b where the third figure is above it.
+// Ellipsoids by PROJ's names.
 struct NamedEllipsoid {
   std::string_view name;
   double a;
@@ -212,12 +212,8 @@ class Words {
   }
 
   // Whatever would change figures and was not understood.
-  void refuse_unused(const Method* method) {
-    for (const std::string_view harmless :
-         {"proj", "no_defs", "type", "wktext", "vunits", "vto_meter", "geoidgrids", "title",
-          "approx", "algo", "over", "ellps", "a", "b", "rf", "f", "es", "datum"}) {
-      take(harmless);
-    }
+  void refuse_unused(const Method* method, std::initializer_list<std::string_view> harmless) {
+    for (const std::string_view key : harmless) take(key);
     for (const Given& given : given_) {
       if (given.used) continue;
       // A zero, or a scale of one, changes nothing.
@@ -256,24 +252,27 @@ void read_ellipsoid(Words& words, Definition& definition) {
     }
   }
   if (const auto radius = words.take_number("R")) ellipsoid = {"sphere", 0, *radius, 0};
-  const auto a = words.take_number("a");
-  if (a) ellipsoid = {"", 0, *a, ellipsoid.inverse_flattening};
+  if (const auto a = words.take_number("a")) ellipsoid = {"", 0, *a, ellipsoid.inverse_flattening};
+  const bool sized = words.has("ellps") || words.has("R") || words.has("a");
+  for (const std::string_view shape : {"b", "rf", "f", "es"}) {
+    if (!sized && words.has(shape)) {
+      words.refuse("+" + std::string(shape) + " needs the semi-major axis +a beside it");
+    }
+  }
+  if (!sized) ellipsoid = {"GRS 1980", 7019, 6378137, 298.257222101};
   if (const auto b = words.take_number("b")) {
     if (!(*b > 0) || *b > ellipsoid.a) words.refuse("+b must be above zero and not above +a");
     ellipsoid.inverse_flattening = *b == ellipsoid.a ? 0 : ellipsoid.a / (ellipsoid.a - *b);
   }
   if (const auto rf = words.take_number("rf")) ellipsoid.inverse_flattening = *rf;
-  if (const auto f = words.take_number("f")) {
-    ellipsoid.inverse_flattening = *f == 0 ? 0 : 1 / *f;
-  }
+  // A flattening that no double tells from zero is a sphere's.
+  const auto inverse_of = [](double f) { return std::isfinite(1 / f) ? 1 / f : 0; };
+  if (const auto f = words.take_number("f")) ellipsoid.inverse_flattening = inverse_of(*f);
   if (const auto es = words.take_number("es")) {
     if (!(*es >= 0 && *es < 1)) words.refuse("+es must be from zero up to one");
-    ellipsoid.inverse_flattening = *es == 0 ? 0 : 1 / (1 - std::sqrt(1 - *es));
+    ellipsoid.inverse_flattening = inverse_of(1 - std::sqrt(1 - *es));
   }
-  if (ellipsoid.a == 0) ellipsoid = {"GRS 1980", 7019, 6378137, 298.257222101};
-  if (!(ellipsoid.a > 0) || !std::isfinite(ellipsoid.a)) {
-    words.refuse("the semi-major axis must be above zero");
-  }
+  if (!(ellipsoid.a > 0)) words.refuse("the semi-major axis must be above zero");
   if (ellipsoid.inverse_flattening != 0 && !(ellipsoid.inverse_flattening >= 3)) {
     words.refuse("the inverse flattening must be 3 or more");
   }
@@ -320,6 +319,7 @@ void read_datum(Words& words, Definition& definition) {
       datum.meridian = {std::string(*pm), 0, meridian->degrees * kDegreeInRadians};
     } else {
       datum.meridian = {"", 0, words.angle("pm", *pm)};
+      if (std::fabs(datum.meridian.longitude) > 2 * kPi) words.refuse("+pm is beyond a whole turn");
     }
   }
   if (const auto shift = words.take("towgs84")) {
@@ -371,9 +371,12 @@ std::string read_axes(Words& words) {
   for (const char c : *axis) {
     axes += c >= 'a' && c <= 'z' ? static_cast<char>(c - 32) : c;
   }
-  const bool known = axes.size() == 3 && axes.find_first_not_of("ENWSUD") == axes.npos;
-  if (!known) words.refuse("+axis takes three letters of e, n, w, s, u and d");
-  return axes.substr(0, 2);
+  const bool upright = axes.size() == 3 && (axes[2] == 'U' || axes[2] == 'D');
+  axes.resize(2);
+  if (!upright || !horizontal_axes(axes)) {
+    words.refuse("+axis takes e or w and n or s, in either order, and then u or d");
+  }
+  return axes;
 }
 
 // Of the methods that have this name, by what else is given.
@@ -528,6 +531,9 @@ Definition definition_from_proj(std::string_view text) {
         bare(init->substr(0, colon)) != "epsg") {
       words.refuse("+init names no registry code, as in +init=epsg:2154");
     }
+    // Some programs write what the code stands for behind it.
+    if (!words.has("proj"))
+      words.refuse_unused(nullptr, {"no_defs", "type", "wktext", "over", "title"});
     return definition_from_registry(code);
   }
   const auto name = words.take("proj");
@@ -574,7 +580,9 @@ Definition definition_from_proj(std::string_view text) {
     }
     complete_parameters(definition, *method);
   }
-  words.refuse_unused(method);
+  words.refuse_unused(
+      method, {"proj", "no_defs", "type", "wktext", "vunits", "vto_meter", "geoidgrids", "title",
+               "approx", "algo", "over", "ellps", "a", "b", "rf", "f", "es", "datum"});
   return definition;
 }
 

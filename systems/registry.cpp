@@ -325,8 +325,9 @@ struct Registry::Tables {
       // The parts are read already, so that none of them can be a compound system.
       const SystemRow* horizontal = find(systems, row.horizontal);
       const SystemRow* vertical = find(systems, row.vertical);
-      reader.require(horizontal != nullptr && horizontal->kind != SystemKind::vertical,
-                     "its horizontal part is no system");
+      reader.require(horizontal != nullptr && (horizontal->kind == SystemKind::projected ||
+                                               horizontal->kind == SystemKind::geographic2d),
+                     "its horizontal part is no system of two axes");
       reader.require(vertical != nullptr && vertical->kind == SystemKind::vertical,
                      "its vertical part is no system");
       row.datum = horizontal->datum;
@@ -567,8 +568,7 @@ struct Registry::Tables {
     auto key = std::lower_bound(keys.begin(), keys.end(), Key{wanted, false, 0});
     int first = 0;
     for (; key != keys.end() && key->key == wanted; ++key) {
-      const AnyRow* row = find(rows, key->code);
-      if (row && name_key(view(row->name)) == wanted) return row->code;
+      if (name_key(view(find(rows, key->code)->name)) == wanted) return key->code;
       if (first == 0) first = key->code;
     }
     return first;

@@ -9,8 +9,6 @@ namespace tidewater::detail {
 
 namespace {
 
-constexpr int kSexagesimalUnit = 9110;
-
 [[noreturn]] void missing(const char* what, int code, const std::string& of) {
   throw Error("The registry has no " + std::string(what) + " " + std::to_string(code) + ", which " +
               of + " refers to.");
@@ -64,7 +62,8 @@ Definition definition_from_registry(int code) {
     result.horizontal_code = system->horizontal;
     result.vertical_name = vertical.name;
     result.vertical_code = vertical.code;
-    if (const auto datum = registry.datum(vertical.datum)) result.vertical_datum = datum->name;
+    result.vertical_datum =
+        need(registry.datum(vertical.datum), "datum", vertical.datum, vertical.name).name;
     const auto unit = need(registry.unit(vertical.unit), "unit", vertical.unit, of);
     result.vertical_unit = {unit.name, unit.code, unit.factor};
     result.axes += vertical.axes;
@@ -72,15 +71,15 @@ Definition definition_from_registry(int code) {
     const auto unit = need(registry.unit(system->unit), "unit", system->unit, of);
     result.vertical_name = system->name;
     result.vertical_code = code;
-    if (const auto datum = registry.datum(system->datum)) result.vertical_datum = datum->name;
+    result.vertical_datum = need(registry.datum(system->datum), "datum", system->datum, of).name;
     result.vertical_unit = {unit.name, unit.code, unit.factor};
     result.axes = system->axes;
   } else {
     result.datum = datum_from_registry(system->datum);
     const auto unit = need(registry.unit(system->unit), "unit", system->unit, of);
     result.unit = {unit.name, unit.code, unit.factor};
-    if (system->kind != SystemKind::projected &&
-        (unit.code == kSexagesimalUnit || unit.factor == 0)) {
+    // Sexagesimal digits have no factor; a plane in them has no size.
+    if (unit.factor == 0 && system->kind != SystemKind::projected) {
       result.unit = {"degree", 9102, kPi / 180};
     }
     result.axes = system->axes;
@@ -93,7 +92,7 @@ Definition definition_from_registry(int code) {
         result.parameters.push_back({parameter.code, registry.base_value(parameter)});
       }
       result.base_code = system->base;
-      if (const auto base = registry.system(system->base)) result.base = base->name;
+      result.base = need(registry.system(system->base), "system", system->base, of).name;
     }
   }
   result.name = system->name;

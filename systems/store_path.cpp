@@ -32,7 +32,7 @@ fs::path module_path() {
   return size < 32768 ? fs::path(name, name + size) : fs::path();
 #else
   Dl_info info = {};
-  if (dladdr(reinterpret_cast<const void*>(&module_path), &info) == 0 || !info.dli_fname) return {};
+  if (dladdr(reinterpret_cast<const void*>(&module_path), &info) == 0) return {};
   fs::path path = info.dli_fname;
   std::error_code error;
   // A program found by its bare name does not know its folder.

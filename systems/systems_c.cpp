@@ -90,6 +90,13 @@ const T& given(const T* handle) {
   return *handle;
 }
 
+// One of the three values that axes and orders have.
+template <class Choice>
+Choice given(std::int32_t choice) {
+  if (choice < 0 || choice > 2) throw tidewater::Error("An axis or order is none of 0, 1 and 2.");
+  return static_cast<Choice>(choice);
+}
+
 TransformationOptions options_from(const tw_transformation_options* from) {
   TransformationOptions options;
   if (from == nullptr) return options;
@@ -416,8 +423,8 @@ size_t tw_projection_method(size_t i, char* text, size_t size) {
 int32_t tw_parse_angle(const char* text, int32_t axis, int32_t decimal_comma, double* degrees) {
   return guarded(
       [&]() -> int32_t {
-        const auto parsed = tidewater::parse_angle(given(text), static_cast<tidewater::Axis>(axis),
-                                                   decimal_comma != 0);
+        const auto parsed =
+            tidewater::parse_angle(given(text), given<tidewater::Axis>(axis), decimal_comma != 0);
         if (!parsed) throw tidewater::Error(parsed.reason);
         *degrees = parsed.degrees;
         return 1;
@@ -429,8 +436,8 @@ int32_t tw_parse_position(const char* text, int32_t order, int32_t decimal_comma
                           double position[3]) {
   return guarded(
       [&]() -> int32_t {
-        const auto parsed = tidewater::parse_position(
-            given(text), static_cast<tidewater::Order>(order), decimal_comma != 0);
+        const auto parsed = tidewater::parse_position(given(text), given<tidewater::Order>(order),
+                                                      decimal_comma != 0);
         if (!parsed) throw tidewater::Error(parsed.reason);
         position[0] = parsed.longitude;
         position[1] = parsed.latitude;
@@ -445,8 +452,7 @@ int32_t tw_parse_mgrs(const char* text, double position[2]) {
       [&]() -> int32_t {
         const auto grid = tidewater::parse_mgrs(given(text));
         if (!grid) throw tidewater::Error(grid.reason);
-        const auto place = tidewater::position_of(grid);
-        if (!place) throw tidewater::Error(place.reason);
+        const auto place = tidewater::position_of(grid);  // every square has a centre
         position[0] = place.longitude;
         position[1] = place.latitude;
         return 1;

@@ -55,39 +55,44 @@ bool same_figures(const DatumDefinition& a, const DatumDefinition& b) {
 
 void recognise_datum(Definition& definition) {
   DatumDefinition& datum = definition.datum;
-  const auto take = [&](int code) {
-    DatumDefinition known = datum_from_registry(code);
-    if (!same_figures(datum, known)) return false;
-    known.to_wgs84 = datum.to_wgs84;
-    datum = std::move(known);
-    return true;
-  };
   try {
     const Registry& registry = Registry::shared();
-    if (datum.code != 0 && registry.datum(datum.code) && take(datum.code)) return;
+    const auto take = [&](int code) {
+      const auto record = registry.datum(code);
+      if (!record || record->ellipsoid == 0) return false;  // none, or one of heights
+      DatumDefinition known = datum_from_registry(code);
+      if (!same_figures(datum, known)) return false;
+      known.to_wgs84 = datum.to_wgs84;
+      datum = std::move(known);
+      return true;
+    };
+    if (take(datum.code)) return;
     datum.code = 0;
     for (const int code : {definition.base_code, definition.code, definition.horizontal_code}) {
-      const auto system = code != 0 ? registry.system(code) : std::nullopt;
-      if (system && system->datum != 0 && registry.datum(system->datum) && take(system->datum)) {
-        return;
-      }
+      if (const auto system = registry.system(code); system && take(system->datum)) return;
     }
-    std::string_view name = datum.name;
-    for (int i = 0; i < 2; ++i) {
-      if (const auto known = registry.datum(name); known && take(known->code)) return;
-      // The dialect of .prj files.
-      if (!name.starts_with("D_")) break;
-      name.remove_prefix(2);
-    }
+    const auto take_named = [&](std::string_view name) {
+      const auto known = registry.datum(name);
+      return known && take(known->code);
+    };
+    const std::string_view name = datum.name;
+    if (take_named(name)) return;
+    // The dialect of .prj files.
+    if ((name.starts_with("D_") || name.starts_with("d_")) && take_named(name.substr(2))) return;
     std::string_view base = definition.base;
     if (base.starts_with("GCS_")) base.remove_prefix(4);
-    if (const auto known = base.empty() ? std::nullopt : registry.system(base)) {
-      if (known->datum != 0 && take(known->datum)) return;
-    }
-    if (bare(datum.name) == "wgs1984" || bare(datum.name) == "dwgs1984") take(6326);
+    if (const auto known = registry.system(base)) take(known->datum);
   } catch (const Error&) {
     // Without a registry the text alone speaks.
   }
+}
+
+bool horizontal_axes(std::string_view axes) {
+  if (axes.size() < 2 || axes.size() > 3) return false;
+  const auto along = [&](std::string_view letters) {
+    return letters.find(axes[0]) != letters.npos || letters.find(axes[1]) != letters.npos;
+  };
+  return along("EW") && along("NS") && (axes.size() == 2 || axes[2] == 'U');
 }
 
 int parameter_among(const Method& method, std::initializer_list<int> codes) {

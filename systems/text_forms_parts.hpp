@@ -30,6 +30,10 @@ void complete_parameters(Definition& definition, const Method& method);
 // ellipsoid and meridian, or where there is no registry.
 void recognise_datum(Definition& definition);
 
+// Whether these letters are one axis to the east or west and one to the north or south, in either
+// order, and perhaps a third upwards.
+bool horizontal_axes(std::string_view axes);
+
 // The method's parameter among these codes; 0 where it takes none of them.
 int parameter_among(const Method& method, std::initializer_list<int> codes);
 

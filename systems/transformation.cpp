@@ -109,6 +109,8 @@ struct End {
       sx = sy = options.radians ? 1 : kDegree;
     } else if (kind != SystemKind::geocentric) {
       sx = sy = definition.unit.factor;
+    }
+    if (kind != SystemKind::geocentric) {
       std::string_view natural = "EN";
       if (definition.method == 9808 || definition.method == 9828 || definition.method == 9819 ||
           definition.method == 1042) {

@@ -34,14 +34,14 @@ class Parser {
   }
 
   bool ended() const { return at_ == text_.size(); }
-  char next() const { return ended() ? '\0' : text_[at_]; }
+  char next() const { return ended() ? '\0' : text_[at_]; }  // no part of any text's syntax
   bool take(char c) {
-    if (next() != c || ended()) return false;
+    if (next() != c) return false;
     ++at_;
     return true;
   }
   void skip_blanks() {
-    while (!ended() && (next() == ' ' || next() == '\t' || next() == '\r' || next() == '\n')) ++at_;
+    while (next() == ' ' || next() == '\t' || next() == '\r' || next() == '\n') ++at_;
   }
   static bool is_letter(char c) {
     return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
@@ -49,7 +49,7 @@ class Parser {
 
   std::string word() {
     std::string result;
-    while (!ended() && (is_letter(next()) || is_digit(next()))) result += text_[at_++];
+    while (is_letter(next()) || is_digit(next())) result += text_[at_++];
     return result;
   }
 
@@ -73,7 +73,7 @@ class Parser {
 
   void read_children(WktNode& node, int depth) {
     if (depth > kDeepest) refuse("has brackets deeper than any system needs");
-    for (char& c : node.value) c = c >= 'a' && c <= 'z' ? static_cast<char>(c - 32) : c;
+    for (char& c : node.value) c = c >= 'a' ? static_cast<char>(c - 32) : c;  // nothing behind z
     const char closing = text_[at_++] == '[' ? ']' : ')';
     skip_blanks();
     if (take(closing)) return;
@@ -113,10 +113,10 @@ class Parser {
     }
     at_ += static_cast<std::size_t>(result.ptr - first);
     // A date such as 2010-05-02 is a word.
-    if (!ended() && (next() == '-' || next() == ':')) {
+    if (next() == '-' || next() == ':') {
       node.kind = WktNode::Kind::word;
-      while (!ended() && (is_digit(next()) || is_letter(next()) || next() == '-' || next() == ':' ||
-                          next() == '.' || next() == '+')) {
+      while (is_digit(next()) || is_letter(next()) || next() == '-' || next() == ':' ||
+             next() == '.' || next() == '+') {
         ++at_;
       }
     }

@@ -1,14 +1,15 @@
 // Definitions from WKT: version 1 as it is commonly written, the dialect of .prj files, and
 // version 2 of 2015 and 2019 (ISO 19162, OGC 18-010).
 
+#include <algorithm>
 #include <cmath>
-#include <cstdlib>
-#include <optional>
+#include <iterator>
 
 #include "makers.hpp"
 #include "text_forms.hpp"
 #include "text_forms_parts.hpp"
 #include "wkt_text.hpp"
+#include "words.hpp"
 
 namespace tidewater::detail {
 
@@ -33,12 +34,11 @@ double need_figure(const WktNode& node, std::size_t at) {
   return value;
 }
 
-int registry_code(const WktNode& node) {
+// As a number in version 2, as a text in version 1; 0 where it is none of the registry's.
+int code_of(const WktNode& node) {
   const WktNode* id = node.find("ID", "AUTHORITY");
-  if (id == nullptr || bare(id->text(0)) != "epsg") return 0;
-  const double number = id->figure(1, 0);
-  if (number > 0 && number < 1e8) return static_cast<int>(number);
-  return std::atoi(id->text(1).substr(0, 8).c_str());
+  if (id == nullptr || id->children.size() < 2 || bare(id->text(0)) != "epsg") return 0;
+  return registry_code(id->children[1].value).value_or(0);
 }
 
 // A unit's factor as the text rounds it, to what it stands for.
@@ -52,9 +52,19 @@ double exact_factor(double factor) {
 UnitDefinition read_unit(const WktNode& node) {
   UnitDefinition unit;
   unit.name = node.text(0);
-  unit.code = registry_code(node);
+  unit.code = code_of(node);
   unit.factor = exact_factor(need_figure(node, 1));
-  if (!(unit.factor > 0) || !std::isfinite(unit.factor)) refuse(node, "is not above zero");
+  if (!(unit.factor > 0)) refuse(node, "is not above zero");
+  return unit;
+}
+
+UnitDefinition read_length_unit(const WktNode& node) {
+  UnitDefinition unit = read_unit(node);
+  // Version 1 has one keyword for both.
+  if (unit.factor == kDegreeInRadians || unit.factor == kGradInRadians ||
+      bare(unit.name) == "radian") {
+    refuse(node, "is a unit of angle where a length is needed");
+  }
   return unit;
 }
 
@@ -65,12 +75,12 @@ const WktNode* any_unit(const WktNode& node) {
 EllipsoidDefinition read_ellipsoid(const WktNode& node) {
   EllipsoidDefinition ellipsoid;
   ellipsoid.name = node.text(0);
-  ellipsoid.code = registry_code(node);
+  ellipsoid.code = code_of(node);
   const WktNode* unit = any_unit(node);
   ellipsoid.a = need_figure(node, 1) * (unit != nullptr ? read_unit(*unit).factor : 1);
   ellipsoid.inverse_flattening = need_figure(node, 2);
   if (!(ellipsoid.a > 0) || !std::isfinite(ellipsoid.a)) {
-    refuse(node, "has a semi-major axis that is not above zero");
+    refuse(node, "has a semi-major axis that is no length above zero");
   }
   if (ellipsoid.inverse_flattening != 0 && !(ellipsoid.inverse_flattening >= 3)) {
     refuse(node, "has an inverse flattening below 3");
@@ -78,22 +88,19 @@ EllipsoidDefinition read_ellipsoid(const WktNode& node) {
   return ellipsoid;
 }
 
-MeridianDefinition read_meridian(const WktNode& node, bool first_version,
-                                 const UnitDefinition& angle) {
+// The factor is that of the system's angles.
+MeridianDefinition read_meridian(const WktNode& node, bool first_version, double factor) {
   MeridianDefinition meridian;
   meridian.name = node.text(0);
-  meridian.code = registry_code(node);
-  double factor = kDegreeInRadians;
-  if (const WktNode* unit = any_unit(node)) {
-    factor = read_unit(*unit).factor;
-  } else if (!first_version && angle.factor > 0) {
-    factor = angle.factor;
-  }
+  meridian.code = code_of(node);
   const double value = need_figure(node, 1);
   // Version 1 has the unit of its system, its writers have degrees; Paris tells which.
-  if (first_version && std::fabs(value - 2.5969213) < 1e-6) factor = kGradInRadians;
+  if (first_version) {
+    factor = std::fabs(value - 2.5969213) < 1e-6 ? kGradInRadians : kDegreeInRadians;
+  }
+  if (const WktNode* unit = any_unit(node)) factor = read_unit(*unit).factor;
   meridian.longitude = value * factor;
-  if (std::fabs(meridian.longitude) > 2 * kPi) refuse(node, "is beyond a whole turn");
+  if (!(std::fabs(meridian.longitude) <= 2 * kPi)) refuse(node, "is beyond a whole turn");
   return meridian;
 }
 
@@ -113,14 +120,16 @@ void read_datum(const WktNode& system, bool first_version, Definition& definitio
   const WktNode& datum =
       need(system, "DATUM", "ENSEMBLE", "GEODETICDATUM", first_version ? "" : "TRF");
   definition.datum.name = datum.text(0);
-  definition.datum.code = registry_code(datum);
+  definition.datum.code = code_of(datum);
   definition.datum.ellipsoid = read_ellipsoid(need(datum, "ELLIPSOID", "SPHEROID"));
   if (const WktNode* shift = datum.find("TOWGS84")) read_shift(*shift, definition.datum);
-  const WktNode* angle = system.find("ANGLEUNIT", "UNIT");
-  UnitDefinition unit{"degree", 9102, kDegreeInRadians};
-  if (angle != nullptr && first_version) unit = read_unit(*angle);
   if (const WktNode* meridian = system.find("PRIMEM", "PRIMEMERIDIAN")) {
-    definition.datum.meridian = read_meridian(*meridian, first_version, unit);
+    const WktNode* angle = system.find("ANGLEUNIT");
+    if (const WktNode* axis = system.find("AXIS"); angle == nullptr && axis != nullptr) {
+      angle = axis->find("ANGLEUNIT");
+    }
+    const double factor = angle != nullptr ? read_unit(*angle).factor : kDegreeInRadians;
+    definition.datum.meridian = read_meridian(*meridian, first_version, factor);
   }
 }
 
@@ -134,30 +143,48 @@ char letter_of(const std::string& direction) {
   if (word == "south") return 'S';
   if (word == "up") return 'U';
   if (word == "down") return 'D';
-  if (word == "geocentricx") return 'X';
-  if (word == "geocentricy") return 'Y';
-  if (word == "geocentricz") return 'Z';
   return '\0';
 }
 
-// In the order that the text has, or that it numbers; empty where it has none.
+// In the order that the text numbers, else in its own; empty where it has none.
 std::string read_axes(const WktNode& system) {
-  std::string axes;
-  std::string names;  // the letter of each axis by its name
+  struct Axis {
+    double order;
+    char letter;
+    char by_name;
+  };
+  std::vector<Axis> given;
   for (const WktNode& child : system.children) {
-    if (!child.is("AXIS") || child.children.size() < 2) continue;
-    const char letter = letter_of(child.children[1].value);
-    if (letter == '\0' || axes.size() == 3) refuse(child, "has no direction that is known here");
+    if (!child.is("AXIS")) continue;
+    const char letter = child.children.size() < 2 ? '\0' : letter_of(child.children[1].value);
+    if (letter == '\0') refuse(child, "has no direction that is known here");
     const std::string name = bare(child.text(0));
     const bool northing = name.starts_with("north") || name == "n" || name == "y";
-    axes += letter;
-    names += northing ? 'N' : 'E';
+    const WktNode* order = child.find("ORDER");
+    given.push_back({order != nullptr ? need_figure(*order, 0) : 0, letter, northing ? 'N' : 'E'});
+  }
+  std::stable_sort(given.begin(), given.end(),
+                   [](const Axis& a, const Axis& b) { return a.order < b.order; });
+  std::string axes, by_names;
+  for (const Axis& axis : given) {
+    axes += axis.letter;
+    by_names += axis.by_name;
   }
   // At a pole both point the same way: their names tell.
-  if (axes.size() >= 2 && axes[0] == axes[1]) {
-    if (names[0] == names[1]) names = "EN";
-    axes[0] = names[0];
-    axes[1] = names[1];
+  const auto polar = [](char letter) { return letter == 'N' || letter == 'S'; };
+  if (axes.size() >= 2 && axes[0] == axes[1] && polar(axes[0])) {
+    const bool told = by_names[0] != by_names[1];
+    axes.replace(0, 2, told ? by_names : "EN", 0, 2);
+  }
+  return axes;
+}
+
+std::string read_horizontal_axes(const WktNode& system) {
+  std::string axes = read_axes(system);
+  if (!axes.empty() && !horizontal_axes(axes)) {
+    refuse(system,
+           "has axes that are not one along the parallel, one along the meridian and perhaps one "
+           "upwards");
   }
   return axes;
 }
@@ -202,7 +229,7 @@ constexpr MethodAlias kMethodAliases[] = {
 };
 
 const Method& find_method(const WktNode& node) {
-  if (const Method* method = method_by_code(registry_code(node))) return *method;
+  if (const Method* method = method_by_code(code_of(node))) return *method;
   const std::string name = bare(node.text(0));
   if (name.empty()) refuse(node, "has no name");
   for (const MethodAlias& alias : kMethodAliases) {
@@ -276,15 +303,9 @@ const Given* find(const std::vector<Given>& given, std::initializer_list<std::st
   return nullptr;
 }
 
-double value_of(const std::vector<Given>& given, std::initializer_list<std::string_view> names,
-                double otherwise) {
-  const Given* found = find(given, names);
-  return found != nullptr ? found->value : otherwise;
-}
-
 // Names that stand for several methods: what is given beside them tells.
 const Method& variant(const WktNode& name, const Method& method, std::vector<Given>& given,
-                      const std::string& axes, bool by_code) {
+                      const std::string& axes, const UnitDefinition& angle, bool by_code) {
   if (by_code) return method;
   const std::string word = bare(name.text(0));
   const auto code = [](int wanted) -> const Method& { return *method_by_code(wanted); };
@@ -292,12 +313,19 @@ const Method& variant(const WktNode& name, const Method& method, std::vector<Giv
     while (const Given* found = find(given, names))
       given.erase(given.begin() + (found - &given[0]));
   };
-  const double lat0 = value_of(given, {"latitudeoforigin", "latitudeofcenter"}, 0);
-  const double scale = value_of(given, {"scalefactor"}, 1);
+  const auto degrees_of = [&](const Given* one) {
+    if (one == nullptr) return 0.0;
+    const double factor = one->unit != nullptr ? read_unit(*one->unit).factor : angle.factor;
+    return one->value * (factor / kDegreeInRadians);
+  };
+  const double lat0 = degrees_of(find(given, {"latitudeoforigin", "latitudeofcenter"}));
   const Given* first = find(given, {"standardparallel1"});
   if (word == "lambertconformalconic") {
-    if (find(given, {"standardparallel2"}) != nullptr) return code(scale == 1 ? 9802 : 1051);
-    if (first != nullptr && std::fabs(first->value - lat0) > 1e-10) return code(1102);
+    const Given* scale = find(given, {"scalefactor"});
+    if (find(given, {"standardparallel2"}) != nullptr) {
+      return code(scale == nullptr || scale->value == 1 ? 9802 : 1051);
+    }
+    if (first != nullptr && std::fabs(degrees_of(first) - lat0) > 1e-10) return code(1102);
     drop({"standardparallel1"});
     return code(9801);
   }
@@ -306,7 +334,7 @@ const Method& variant(const WktNode& name, const Method& method, std::vector<Giv
   }
   if (word == "polarstereographic" || word == "stereographicnorthpole" ||
       word == "stereographicsouthpole" || word == "stereographic") {
-    const double pole = std::fabs(lat0 != 0 || first == nullptr ? lat0 : first->value);
+    const double pole = std::fabs(lat0 != 0 ? lat0 : degrees_of(first));
     const bool scaled = find(given, {"scalefactor"}) != nullptr;
     if (word == "stereographic" && std::fabs(pole - 90) > 1e-9) return method;
     if (std::fabs(pole - 90) < 1e-9 && scaled) {
@@ -322,7 +350,8 @@ const Method& variant(const WktNode& name, const Method& method, std::vector<Giv
     return code(9829);
   }
   if (word == "krovak") {
-    const bool turned = value_of(given, {"xyplanerotation"}, 0) == 90 || axes == "EN";
+    const double rotation = degrees_of(find(given, {"xyplanerotation"}));
+    const bool turned = std::fabs(rotation - 90) < 1e-9 || axes == "EN";
     drop({"xscale", "yscale", "xyplanerotation"});
     return code(turned ? 1041 : 9819);
   }
@@ -331,9 +360,9 @@ const Method& variant(const WktNode& name, const Method& method, std::vector<Giv
     // Without an angle of its own the grid is rectified by the azimuth.
     const Given* azimuth = find(given, {"azimuth"});
     if (azimuth != nullptr && find(given, {"rectifiedgridangle", "xyplanerotation"}) == nullptr) {
-      Given angle = *azimuth;
-      angle.name = "rectifiedgridangle";
-      given.push_back(angle);
+      Given rotation = *azimuth;
+      rotation.name = "rectifiedgridangle";
+      given.push_back(rotation);
     }
   }
   return method;
@@ -345,13 +374,13 @@ void read_parameters(const WktNode& owner, const WktNode& name, const UnitDefini
   std::vector<Given> given;
   for (const WktNode& child : owner.children) {
     if (!child.is("PARAMETER")) continue;
-    given.push_back({&child, bare(child.text(0)), registry_code(child), need_figure(child, 1),
-                     any_unit(child)});
+    given.push_back(
+        {&child, bare(child.text(0)), code_of(child), need_figure(child, 1), any_unit(child)});
   }
   const Method& named = find_method(name);
-  const bool by_code = registry_code(name) == named.code || bare(named.name) == bare(name.text(0));
+  const bool by_code = code_of(name) == named.code || bare(named.name) == bare(name.text(0));
   const bool second_version = name.value == "METHOD";
-  const Method& method = variant(name, named, given, axes, by_code && second_version);
+  const Method& method = variant(name, named, given, axes, angle, by_code && second_version);
   definition.method = method.code;
   for (const Given& one : given) {
     const int code = code_by_name(method, one);
@@ -374,8 +403,12 @@ void read_parameters(const WktNode& owner, const WktNode& name, const UnitDefini
         break;
     }
     if (one.unit != nullptr) factor = read_unit(*one.unit).factor;
-    if (!std::isfinite(one.value * factor)) refuse(*one.node, "is out of range");
-    definition.parameters.push_back({code, one.value * factor});
+    const double value = one.value * factor;
+    if (!std::isfinite(value)) refuse(*one.node, "is out of range");
+    if (definition.parameter(code, value) != value) {
+      refuse(*one.node, "\"" + one.node->text(0).substr(0, 80) + "\" has two different values");
+    }
+    definition.parameters.push_back({code, value});
   }
   complete_parameters(definition, method);
 }
@@ -406,32 +439,41 @@ bool is_vertical(const WktNode& node) {
   return node.is("VERT_CS") || node.is("VERTCS") || node.is("VERTCRS") || node.is("VERTICALCRS");
 }
 
+// Of the system, or of its first axis, where version 2 may have it; null without one.
+const WktNode* unit_of(const WktNode& node, std::string_view keyword) {
+  if (const WktNode* unit = node.find(keyword, "UNIT")) return unit;
+  const WktNode* axis = node.find("AXIS");
+  return axis != nullptr ? axis->find(keyword, "UNIT") : nullptr;
+}
+
+UnitDefinition length_unit_of(const WktNode& node) {
+  const WktNode* unit = unit_of(node, "LENGTHUNIT");
+  return unit != nullptr ? read_length_unit(*unit) : UnitDefinition{"metre", 9001, 1};
+}
+
 Definition read_geographic(const WktNode& node) {
   Definition definition;
   const bool first_version = node.is("GEOGCS") || node.is("GEOCCS");
   definition.name = node.text(0);
-  definition.code = registry_code(node);
+  definition.code = code_of(node);
   read_datum(node, first_version, definition);
-  const WktNode* unit = any_unit(node);
-  if (unit == nullptr) {
-    // Version 2 may have it at the axes.
-    if (const WktNode* axis = node.find("AXIS")) unit = any_unit(*axis);
-  }
   const WktNode* kind = node.find("CS");
   const bool cartesian =
       kind != nullptr && !kind->children.empty() && bare(kind->children[0].value) == "cartesian";
   if (node.is("GEOCCS") || cartesian) {
     definition.kind = SystemKind::geocentric;
-    definition.unit = unit != nullptr ? read_unit(*unit) : UnitDefinition{"metre", 9001, 1};
+    definition.unit = length_unit_of(node);
     definition.axes = "XYZ";
   } else {
-    definition.axes = read_axes(node);
+    const WktNode* unit = unit_of(node, "ANGLEUNIT");
+    definition.axes = read_horizontal_axes(node);
     const bool height = (kind != nullptr && kind->figure(1, 2) == 3) ||
                         definition.axes.size() == 3 || node.find("LINUNIT") != nullptr;
     definition.kind = height ? SystemKind::geographic3d : SystemKind::geographic2d;
     definition.unit =
         unit != nullptr ? read_unit(*unit) : UnitDefinition{"degree", 9102, kDegreeInRadians};
-    if (definition.axes.empty()) definition.axes = height ? "ENU" : "EN";
+    if (definition.axes.empty()) definition.axes = "EN";
+    if (height && definition.axes.size() == 2) definition.axes += 'U';
   }
   read_area(node, definition);
   recognise_datum(definition);
@@ -443,20 +485,16 @@ Definition read_projected(const WktNode& node) {
   const bool first_version = node.is("PROJCS");
   definition.kind = SystemKind::projected;
   definition.name = node.text(0);
-  definition.code = registry_code(node);
+  definition.code = code_of(node);
   const WktNode& base = first_version
                             ? need(node, "GEOGCS")
                             : need(node, "BASEGEOGCRS", "BASEGEODCRS", "BASEGEOGRAPHICCRS");
   read_datum(base, first_version, definition);
   definition.base = base.text(0);
-  definition.base_code = registry_code(base);
+  definition.base_code = code_of(base);
 
-  definition.axes = read_axes(node);
-  const WktNode* unit = node.find("LENGTHUNIT", "UNIT");
-  if (unit == nullptr) {
-    if (const WktNode* axis = node.find("AXIS")) unit = any_unit(*axis);
-  }
-  definition.unit = unit != nullptr ? read_unit(*unit) : UnitDefinition{"metre", 9001, 1};
+  definition.axes = read_horizontal_axes(node);
+  definition.unit = length_unit_of(node);
 
   UnitDefinition angle{"degree", 9102, kDegreeInRadians};
   if (const WktNode* given = base.find("ANGLEUNIT", "UNIT")) angle = read_unit(*given);
@@ -490,16 +528,33 @@ Definition read_projected(const WktNode& node) {
 
 void read_vertical(const WktNode& node, Definition& definition) {
   definition.vertical_name = node.text(0);
-  definition.vertical_code = registry_code(node);
+  definition.vertical_code = code_of(node);
   if (const WktNode* datum = node.find("VDATUM", "VERT_DATUM", "VERTICALDATUM", "ENSEMBLE")) {
     definition.vertical_datum = datum->text(0);
   }
-  const WktNode* unit = node.find("LENGTHUNIT", "UNIT");
-  const WktNode* axis = node.find("AXIS");
-  if (unit == nullptr && axis != nullptr) unit = any_unit(*axis);
-  definition.vertical_unit = unit != nullptr ? read_unit(*unit) : UnitDefinition{"metre", 9001, 1};
-  const std::string axes = read_axes(node);
-  definition.axes += axes.empty() ? "U" : axes;
+  definition.vertical_unit = length_unit_of(node);
+  std::string axes = read_axes(node);
+  if (axes.empty()) axes = "U";
+  if (axes != "U" && axes != "D") refuse(node, "has an axis that points neither up nor down");
+  // The dialect of .prj files has parameters in place of an axis.
+  for (const WktNode& child : node.children) {
+    if (!child.is("PARAMETER")) continue;
+    const std::string name = bare(child.text(0));
+    const double value = need_figure(child, 1);
+    if (name == "direction" && std::fabs(value) == 1) {
+      axes = value < 0 ? "D" : "U";
+    } else if (name != "verticalshift" || value != 0) {
+      refuse(child, "\"" + child.text(0).substr(0, 80) + "\" has a value that is not known here");
+    }
+  }
+  definition.axes += axes;
+}
+
+// Heights above another surface can stand beside two axes alone.
+void refuse_as_horizontal_part(const Definition& definition, const WktNode& node) {
+  if (definition.kind != SystemKind::projected && definition.kind != SystemKind::geographic2d) {
+    refuse(node, "has neither a map's nor a geographic system's two axes beside its heights");
+  }
 }
 
 Definition read_system(const WktNode& node);
@@ -508,21 +563,26 @@ Definition read_compound(const WktNode& node) {
   const WktNode* horizontal = nullptr;
   const WktNode* vertical = nullptr;
   for (const WktNode& child : node.children) {
-    if (child.kind != WktNode::Kind::object) continue;
+    const WktNode** part = nullptr;
     if (is_vertical(child)) {
-      vertical = &child;
+      part = &vertical;
     } else if (is_projected(child) || is_geographic(child) || child.is("BOUNDCRS")) {
-      horizontal = &child;
+      part = &horizontal;
+    } else {
+      continue;
     }
+    if (*part != nullptr) refuse(node, "has two horizontal or two vertical systems");
+    *part = &child;
   }
   if (horizontal == nullptr || vertical == nullptr) {
     refuse(node, "has no horizontal or no vertical system");
   }
   Definition definition = read_system(*horizontal);
+  refuse_as_horizontal_part(definition, node);
   definition.horizontal_code = definition.code;
   definition.kind = SystemKind::compound;
   definition.name = node.text(0);
-  definition.code = registry_code(node);
+  definition.code = code_of(node);
   read_vertical(*vertical, definition);
   read_area(node, definition);
   return definition;
@@ -533,6 +593,12 @@ Definition read_bound(const WktNode& node) {
   const WktNode& source = need(node, "SOURCECRS");
   if (source.children.empty()) refuse(source, "is empty");
   Definition definition = read_system(source.children[0]);
+  const WktNode& target = need(node, "TARGETCRS");
+  if (target.children.empty()) refuse(target, "is empty");
+  const Definition goal = read_system(target.children[0]);
+  if (goal.datum.code != 6326 && !bare(goal.name).starts_with("wgs84")) {
+    refuse(target, "is " + goal.name.substr(0, 80) + " and not WGS 84");
+  }
   const WktNode& way = need(node, "ABRIDGEDTRANSFORMATION");
   const WktNode& method = need(way, "METHOD");
   const std::string name = bare(method.text(0));
@@ -542,23 +608,32 @@ Definition read_bound(const WktNode& node) {
   if (!position_vector && !frame && !translation) {
     refuse(method, "is none that is known here; three or seven parameters to WGS 84 are");
   }
+  static constexpr std::string_view kNames[] = {
+      "xaxistranslation", "yaxistranslation", "zaxistranslation", "xaxisrotation",
+      "yaxisrotation",    "zaxisrotation",    "scaledifference"};
+  constexpr int kFirst = 8605;
   std::array<double, 7> seven{};
   for (const WktNode& child : way.children) {
     if (!child.is("PARAMETER")) continue;
-    const int code = registry_code(child);
-    if (code < 8605 || code > 8611) continue;
-    const auto i = static_cast<std::size_t>(code - 8605);
-    double value = need_figure(child, 1);
-    // Arc-seconds and parts per million; an abridged transformation gives the scale as a factor.
-    if (const WktNode* unit = any_unit(child)) {
-      const double factor = read_unit(*unit).factor;
-      if (i < 3) value *= factor;
-      if (i >= 3 && i < 6) value *= factor / (kDegreeInRadians / 3600);
-      if (i == 6) value *= factor / 1e-6;
-    } else if (i == 6) {
-      value = (value - 1) * 1e6;
+    const int code = code_of(child);
+    const auto by_name = std::find(std::begin(kNames), std::end(kNames), bare(child.text(0)));
+    const auto i =
+        static_cast<std::size_t>(code >= kFirst ? code - kFirst : by_name - std::begin(kNames));
+    if (i >= seven.size()) {
+      refuse(child, "\"" + child.text(0).substr(0, 80) + "\" is none of the seven to WGS 84");
     }
-    seven[i] = frame && i >= 3 && i < 6 ? -value : value;
+    const WktNode* unit = any_unit(child);
+    const double factor = unit != nullptr ? read_unit(*unit).factor : 1;
+    double value = need_figure(child, 1) * factor;
+    if (i >= 3 && i < 6) {
+      if (unit != nullptr) value /= kDegreeInRadians / 3600;
+      if (frame) value = -value;
+    } else if (i == 6) {
+      // An abridged transformation gives the scale as a factor; with a unit, also the difference.
+      value = (value > 0.5 ? value - 1 : value) * 1e6;
+      if (!(std::fabs(value) < 1e4)) refuse(child, "is no scale near one");
+    }
+    seven[i] = value;
   }
   definition.datum.to_wgs84 = seven;
   return definition;
@@ -596,10 +671,13 @@ Definition definition_from_wkt(std::string_view text) {
   Definition definition = read_system(objects.front());
   if (objects.size() == 1) return definition;
   // A .prj file may have the vertical system behind the horizontal one.
-  if (objects.size() > 2 || !is_vertical(objects[1])) {
-    throw Error("The WKT has a " + objects[1].value.substr(0, 60) + " after its system" +
-                place(objects[1]) + ".");
+  const bool height = is_vertical(objects[1]);
+  if (!height || objects.size() > 2) {
+    const WktNode& odd = objects[height ? 2 : 1];
+    throw Error("The WKT has a " + odd.value.substr(0, 60) + " after its system" + place(odd) +
+                ".");
   }
+  refuse_as_horizontal_part(definition, objects.front());
   definition.horizontal_code = definition.code;
   definition.code = 0;
   definition.kind = SystemKind::compound;

@@ -126,15 +126,14 @@ class Writer {
 
   void axes(const Definition& definition, const char* keyword, const char* const names[3]) {
     const std::size_t count = definition.kind == SystemKind::geographic3d ? 3 : 2;
-    for (std::size_t i = 0; i < count && i < definition.axes.size(); ++i) {
+    for (std::size_t i = 0; i < count; ++i) {
       const char letter = definition.axes[i];
       const bool east = letter == 'E' || letter == 'W';
-      const bool up = letter == 'U' || letter == 'D';
+      const bool up = letter == 'U';
       const char* direction = letter == 'E'   ? "east"
                               : letter == 'W' ? "west"
                               : letter == 'N' ? "north"
                               : letter == 'S' ? "south"
-                              : letter == 'D' ? "down"
                                               : "up";
       out_ += ",AXIS[" +
               in_quotes(names[up     ? 2

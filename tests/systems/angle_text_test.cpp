@@ -129,7 +129,12 @@ TEST(AngleFromText, WhatIsAmbiguousOrWrongIsRefused) {
   expect_refused("48.5.1", "two decimal marks");
   expect_refused("48.5;", "more in it");
   expect_refused("48.5 O", "west in French");
+  expect_refused("48.5 o", "write W or E");
+  expect_refused("48.5 OE", "\"OE\"");
   expect_refused("48.5x", "\"x\"");
+  // A long text is cut between two characters.
+  expect_refused(std::string(59, ' ') + std::string(59, '1') + "\u00E9\u00E9 x",
+                 "\"" + std::string(59, '1') + "...\" has \"\u00E9\"");
   expect_refused("nan", "\"nan\"");
   expect_refused("inf", "\"inf\"");
   expect_refused("48.5#", "\"#\"");
@@ -215,6 +220,16 @@ TEST(AngleToText, Forms) {
   EXPECT_EQ(written(kFull, minutes, blanks, 2, Axis::latitude), "48 51.40N");
   EXPECT_EQ(written(kFull, packed, none, 0, Axis::latitude), "485124N");
   EXPECT_EQ(written(-2.5, packed, none, 1, Axis::longitude), "0023000.0W");
+  EXPECT_EQ(written(12.5, packed, none, 0), "0123000");
+  // What no latitude or longitude has is not to be read as one: 123.5 N would be 23 degrees 30.
+  for (const auto& [degrees, axis] : {std::pair{123.5, Axis::latitude},
+                                      {-99.9999999, Axis::latitude},
+                                      {1234.5, Axis::longitude},
+                                      {999.99999999, Axis::longitude}}) {
+    EXPECT_FALSE(parse_angle(written(degrees, packed, none, 0, axis), axis)) << degrees;
+  }
+  EXPECT_EQ(written(99.5, packed, none, 0, Axis::latitude), "993000N");
+  EXPECT_EQ(written(719.5, packed, none, 0, Axis::longitude), "7193000E");
   EXPECT_EQ(written(-0.5, seconds, colons, 0), "-0:30:00");
 }
 

@@ -34,7 +34,7 @@ namespace {
 using tidewater::GeoidGrid;  // not the C structure of that name
 
 constexpr double kDegree = kPi / 180;
-constexpr double kTenthOfMillimetre = 1e-4 / 6378137 / kDegree;  // degrees
+[[maybe_unused]] constexpr double kTenthOfMillimetre = 1e-4 / 6378137 / kDegree;  // degrees
 
 struct Box {
   double west, south, east, north;
@@ -98,7 +98,7 @@ double expect_as_peer(const ShiftGrid& grid, const std::string& peer_grid, const
 }
 #endif
 
-const struct {
+[[maybe_unused]] const struct {
   const char* name;
   Box box;
 } kRealGrids[] = {{"ntf_r93.gsb", {-5.49, 41.01, 9.99, 51.99}},
@@ -437,7 +437,7 @@ TEST_F(BadGrids, NationalHeadersThatCannotBe) {
                  "overlap");
   // Doubles of the first sub-grid's header.
   const double nan = std::numeric_limits<double>::quiet_NaN();
-  for (const std::size_t offset : {72, 88, 104, 120, 136, 152}) {
+  for (const std::size_t offset : {72u, 88u, 104u, 120u, 136u, 152u}) {
     for (const double v : {nan, HUGE_VAL, -HUGE_VAL, 0.0, -1e300, 1e300, 1e-300, -3600.0}) {
       if (v == 0 && offset == 104) continue;
       std::string bytes = file([](GsbFile&) {});

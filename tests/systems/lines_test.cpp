@@ -21,7 +21,6 @@ namespace {
 
 constexpr double kA = 6378137;
 constexpr double kF = 1 / 298.257223563;
-constexpr double kDegree = 0.017453292519943295;
 
 struct Pairs {
   std::vector<double> lon1, lat1, lon2, lat2;
@@ -113,10 +112,10 @@ TEST(Lines, EveryLevelGivesTheSameBits) {
   for (const points::Level level : levels()) {
     ASSERT_TRUE(points::ask_for_level(level));
     std::vector<std::vector<double>> out(20, std::vector<double>(n + 1, -7));
-    const auto ends = [&](int k) {
+    const auto ends = [&](std::size_t k) {
       return LineEnds{out[k].data(), out[k + 1].data(), out[k + 2].data(), out[k + 3].data()};
     };
-    const auto courses = [&](int k) {
+    const auto courses = [&](std::size_t k) {
       return LineCourses{out[k].data(), out[k + 1].data(), out[k + 2].data(), out[k + 3].data()};
     };
     const LineStarts starts = {pairs.lon1.data(), pairs.lat1.data(), pairs.lon2.data(),
@@ -313,6 +312,8 @@ TEST(Lines, PolygonsOfTheSphere) {
 }
 
 #ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
+
+constexpr double kDegree = 0.017453292519943295;
 
 int lines_to_compare() {
   const char* asked = std::getenv("TIDEWATER_LINES");

@@ -73,6 +73,7 @@ TEST(Mgrs, PolarBands) {
   expect_square("BAN", 0, false, 2000000, 2000000, 100000);
   EXPECT_EQ(format_mgrs(0, 90, 0), "ZAH");
   EXPECT_EQ(format_mgrs(0, -90, 0), "BAN");
+  EXPECT_EQ(format_mgrs(0, 90, 5, true), "Z AH 00000 00000");
   EXPECT_EQ(format_mgrs(-90, 85, 0).substr(0, 1), "Y");
   EXPECT_EQ(format_mgrs(90, 85, 0).substr(0, 1), "Z");
   EXPECT_EQ(format_mgrs(-90, -85, 0).substr(0, 1), "A");
@@ -97,6 +98,8 @@ TEST(Mgrs, ZonesOfNorwayAndSvalbard) {
   EXPECT_EQ(utm_zone(180, 0), 1);
   EXPECT_EQ(utm_zone(540, 0), 1);
   EXPECT_EQ(utm_zone(179.999, 0), 60);
+  EXPECT_EQ(utm_zone(std::nextafter(180, 0), 0), 60);
+  EXPECT_EQ(utm_zone(std::nextafter(6, 0), 0), 31);
   EXPECT_EQ(utm_zone(0, 84), 0);
   EXPECT_EQ(utm_zone(0, 83.999), 31);
   EXPECT_EQ(utm_zone(0, -80), 31);
@@ -132,20 +135,64 @@ TEST(Mgrs, ImpossibleReferencesAreRefused) {
   expect_refused("31UDQ482511193", "odd number");
   expect_refused("31UDQ 4825 11932", "unequal length");
   expect_refused("31UDQ 482 51 11932", "unequal length");
-  expect_refused("31UDQ" + std::string(24, '1'), "no grid reference");
+  for (const std::size_t count : {23, 24, 1000}) {
+    expect_refused("31UDQ" + std::string(count, '1'), "more than 11 digits each");
+  }
   expect_refused(std::string(1000, '3'), "no grid reference");
+  // The corner of the square that is nearest to the pole is 600 km away on both axes.
+  expect_refused("YRA", "does not lie in the polar zone");
+  expect_refused("AJA", "does not lie in the polar zone");
+  EXPECT_TRUE(parse_mgrs("YUB1798816324"));
+  for (const char* odd : {"31UDQ{", "31U@Q", "31UDQ[1", "{", "31U1DQ", "31UDQA"}) {
+    expect_refused(odd, "no grid reference");
+  }
   EXPECT_EQ(format_mgrs(0, 91), "");
   EXPECT_EQ(format_mgrs(GridPosition{31, true, 50000, 5411932}), "");
   EXPECT_EQ(format_mgrs(GridPosition{61, true, 500000, 5411932}), "");
   EXPECT_EQ(format_mgrs(GridPosition{0, true, 50000, 50000}), "");
+  // Beyond the letters of the polar squares, on each side.
+  for (const auto& [x, y] : {std::pair{1.25e6, 2e6}, {2.75e6, 2e6}, {2e6, 1.25e6}, {2e6, 2.75e6}}) {
+    EXPECT_EQ(format_mgrs(GridPosition{0, true, x, y}), "") << x << ' ' << y;
+  }
+  // Columns 1 to 8, latitudes of the zones and half a degree.
+  EXPECT_EQ(format_mgrs(GridPosition{31, true, 950000, 1e6}), "");
+  EXPECT_EQ(format_mgrs(GridPosition{31, true, 500000, 9.4e6}), "");
+  EXPECT_EQ(format_mgrs(GridPosition{31, false, 500000, 1e6}), "");
   EXPECT_FALSE(grid_position(0, 45, 61));
+  EXPECT_FALSE(grid_position(0, 45, -2));
   EXPECT_FALSE(grid_position(0, 91));
+  EXPECT_FALSE(grid_position(std::nan(""), 0));
   EXPECT_FALSE(position_of(GridPosition{}));
+}
+
+TEST(Mgrs, AnotherZoneThanThePointsOwn) {
+  // Half a degree to either side of Greenwich, the border of zones 30 and 31.
+  const GridPosition own = grid_position(0.5, 45), other = grid_position(-0.5, 45, 31);
+  EXPECT_EQ(own.zone, 31);
+  EXPECT_EQ(other.zone, 31);
+  EXPECT_NEAR(position_of(other).longitude, -0.5, 1e-12);
+  EXPECT_NEAR(position_of(other).latitude, 45, 1e-12);
+  // By the pole's grid anywhere in its hemisphere.
+  const GridPosition polar = grid_position(0, 60, 0);
+  EXPECT_EQ(polar.easting, 2e6);
+  EXPECT_NEAR(position_of(polar).latitude, 60, 1e-12);
+  EXPECT_EQ(grid_position(100, 0, 31).reason, "The point is too far from zone 31.");
+  const double kNaN = std::nan("");
+  for (const GridPosition& none :
+       {GridPosition{31, true, 1e8, 0}, GridPosition{31, true, 500000, kNaN},
+        GridPosition{0, true, kNaN, 2e6}, GridPosition{0, false, HUGE_VAL, 2e6},
+        GridPosition{0, true, 2e6, -HUGE_VAL}}) {
+    EXPECT_EQ(position_of(none).reason, "The grid has no point at these coordinates.");
+    EXPECT_TRUE(std::isnan(position_of(none).latitude));
+    EXPECT_EQ(format_mgrs(none), "");
+  }
 }
 
 TEST(Mgrs, TheEquatorBelongsToTheNorth) {
   EXPECT_EQ(format_mgrs(3, 0, 5), "31NEA0000000000");
   EXPECT_EQ(format_mgrs(3, -1e-13, 5), "31MEV0000099999");
+  // So near that its northing is the false northing itself, and 80 degrees more are 80.
+  EXPECT_EQ(format_mgrs(3, -1e-15, 5), "31MEV0000099999");
   EXPECT_EQ(format_mgrs(GridPosition{31, true, 500000, -1}, 5), "31MEV0000099999");
 }
 

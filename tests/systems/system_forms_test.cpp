@@ -30,6 +30,15 @@ std::string refusal(const std::string& text) {
   }
 }
 
+std::string refusal(const std::string& text, double lon, double lat) {
+  try {
+    const System system(text, lon, lat);
+    return "";
+  } catch (const Error& error) {
+    return error.what();
+  }
+}
+
 void expect_refused(const std::string& text, const std::string& because) {
   const std::string sentence = refusal(text);
   EXPECT_NE(sentence.find(because), std::string::npos) << text << ": \"" << sentence << "\"";
@@ -78,12 +87,93 @@ TEST(SystemNames, UtmOnAnyDatum) {
   // A projected system stands for its base.
   EXPECT_NE(System("utm:31N EPSG:31370").datum().find("Belg"), std::string::npos);
   expect_refused("utm:31N EPSG:5773", "is not a geographic system");
+  // One that the registry knows by another name: its SHMG2015 is UTM.
+  EXPECT_EQ(System("utm:30S SHGD2015").code(), 7887);
+  // Whatever the form of the base.
+  EXPECT_EQ(System("utm:31n EPSG:4978").code(), 32631);
+  EXPECT_EQ(System("utm:31N EPSG:4979").code(), 32631);
+  EXPECT_EQ(System("utm:31S wgs 84").code(), 32731);
+  EXPECT_EQ(System("UTM:31s WGS84").code(), 32731);
   EXPECT_THROW(System("utm", 10, 86), Error);
   EXPECT_EQ(System("ups", 10, 86).code(), 5041);
   EXPECT_EQ(System("ups", 10, -86).code(), 5042);
   EXPECT_EQ(System("ups:south").code(), 5042);
+  EXPECT_EQ(System("ups:s").code(), 5042);
+  EXPECT_EQ(System("ups:N").code(), 5041);
+  EXPECT_EQ(System("ups north").code(), 5041);
   expect_refused("ups:X", "must say N or S");
   expect_refused("ups", "must say N or S");
+  for (const char* none : {"utm:0N", "utm:61S", "utm:-5N", "utm:99999999999N"}) {
+    expect_refused(none, "UTM has zones 1 to 60; \"" + std::string(none) + "\" names another.");
+  }
+  expect_refused("utm:31", "must say N or S after the zone");
+  expect_refused("utm:31X", "must say N or S after the zone");
+  expect_refused("utm", "needs a zone, as in \"utm:30N\", or a point");
+  // A point that is none tells no zone.
+  for (const char* name : {"utm", "ups", "mgrs"}) {
+    for (const auto& [lon, lat] : {std::pair{10.0, 95.0},
+                                   {10.0, std::numeric_limits<double>::quiet_NaN()},
+                                   {std::numeric_limits<double>::infinity(), 10.0}}) {
+      const std::string sentence = refusal(name, lon, lat);
+      EXPECT_EQ(sentence, "The point that should tell the zone of \"" + std::string(name) +
+                              "\" is not on the earth.");
+    }
+  }
+}
+
+TEST(SystemNames, ZonesOfTheMilitaryGrid) {
+  EXPECT_EQ(System("mgrs:31U").code(), 32631);
+  EXPECT_EQ(System("mgrs:31m").code(), 32731);
+  EXPECT_EQ(System("usng:18SUJ2306").code(), 32618);
+  EXPECT_EQ(System("mgrs:z").code(), 5041);
+  EXPECT_EQ(System("mgrs:A").code(), 5042);
+  EXPECT_EQ(System("mgrs", 3, -10).code(), 32731);
+  EXPECT_EQ(System("mgrs", 3, 85).code(), 5041);
+  EXPECT_EQ(System("mgrs", 3, -85).code(), 5042);
+  for (const char* none : {"mgrs:0U", "mgrs:61U", "mgrs:31A", "mgrs:U"}) {
+    expect_refused(none, "is no grid reference");
+  }
+  expect_refused("mgrs", "is a text form of positions");
+}
+
+TEST(SystemNames, GeocentricSystems) {
+  EXPECT_EQ(System("geocentric:EPSG:4978").code(), 4978);
+  EXPECT_EQ(System("geocentric").name(), "WGS 84 geocentric");
+  const System rgf93("geocentric:EPSG:2154");
+  EXPECT_EQ(rgf93.kind(), SystemKind::geocentric);
+  EXPECT_EQ(rgf93.axes(), "XYZ");
+  EXPECT_EQ(rgf93.datum(), System("EPSG:4171").datum());
+  expect_refused("geocentric:EPSG:5773", "is not a geographic system");
+}
+
+TEST(SystemNames, OfTheRegistry) {
+  EXPECT_EQ(System("crs84").code(), 4326);
+  EXPECT_EQ(System("Web Mercator").code(), 3857);
+  EXPECT_EQ(System("urn:ogc:def:crs:EPSG::2154").code(), 2154);
+  EXPECT_EQ(System("epsg::2154").code(), 2154);
+  EXPECT_EQ(System(" 2154\t\r\n").code(), 2154);
+  EXPECT_EQ(System("EPSG:2154+5720").kind(), SystemKind::compound);
+  // All words of one system alone.
+  EXPECT_EQ(System("jordan tm").code(), 3066);
+  expect_refused("Lambert zone", "could be several coordinate systems: EPSG:27571 NTF (Paris)");
+  expect_refused("lambrt 93", "; the nearest names are \"RGF93 v1 / Lambert-93\", \"RGF93 v2");
+  expect_refused("qqqqqqqqqqqq", "There is no coordinate system \"qqqqqqqqqqqq\".");
+  expect_refused("", "is empty");
+  expect_refused("EPSG:2147483648", "There is no coordinate system \"EPSG:2147483648\"");
+  expect_refused("EPSG:0", "There is no coordinate system \"EPSG:0\".");
+  expect_refused("EPSG:-2154", "There is no coordinate system \"EPSG:-2154\".");
+  EXPECT_EQ(System("EPSG 2154").code(), 2154);
+  expect_refused("EPS{:2154", "There is no coordinate system");
+  expect_refused("EPSG:1", "There is no coordinate system EPSG:1 in the registry.");
+  expect_refused("EPSG:27582",
+                 "The registry has withdrawn EPSG:27582, NTF (Paris) / France II; EPSG:27572 takes "
+                 "its place.");
+  // Heights stand beside two axes alone, and both parts are codes.
+  for (const char* none : {"EPSG:4978+5773", "EPSG:4979+5773", "EPSG:7405+5773"}) {
+    expect_refused(none, "must be a horizontal system and a vertical one");
+  }
+  expect_refused("EPSG:2154+height", "There is no coordinate system");
+  expect_refused("height+5720", "There is no coordinate system");
 }
 
 TEST(SystemNames, ObliqueStatePlaneZone) {
@@ -94,7 +184,11 @@ TEST(SystemNames, ObliqueStatePlaneZone) {
   // The registry's azimuth is rounded to 1e-4 seconds, 0.7 mm at this distance.
   EXPECT_NEAR(p.x, q.x, 1e-3);
   EXPECT_NEAR(p.y, q.y, 1e-3);
-  expect_refused("spcs83:9999", "There is no state plane zone");
+  expect_refused("spcs83:9999", "There is no state plane zone \"9999\" in the system of 1983.");
+  expect_refused("spcs27:9999", "There is no state plane zone \"9999\" in the system of 1927.");
+  for (const char* none : {"spcs27", "spcs27:", "spcs83:29x0", "spcs83:29 0", "spcs83:(2900"}) {
+    expect_refused(none, "There is no state plane zone \"");
+  }
 }
 
 TEST(SystemNames, Definitions) {
@@ -115,8 +209,95 @@ TEST(SystemNames, Definitions) {
   // 2.5969213 grads
   EXPECT_NEAR(System("geographic ellps=GRS80 pm=Paris").meridian().longitude(), 2.5969213 * 0.9,
               1e-12);
+  // The whole turn is the last longitude of a meridian.
+  EXPECT_EQ(System("geographic ellps=GRS80 pm=-360").meridian().longitude(), -360);
+  expect_refused("geographic ellps=GRS80 pm=360.5", "pm is beyond a whole turn");
+  expect_refused("transverse mercator lon0=9 ellps=GRS80 axes=EE", "one along each direction");
+  expect_refused("transverse mercator lon0=9 ellps=GRS80 axes=NS", "one along each direction");
+  const System own("longlat name=\"my own\" a=6378137 rf=298");
+  EXPECT_EQ(own.name(), "my own");
+  EXPECT_EQ(own.ellipsoid().inverse_flattening(), 298);
+  EXPECT_EQ(own.datum(), "unknown datum on an ellipsoid");
+  EXPECT_EQ(System("latlong a=6378137 b=6378137").ellipsoid().inverse_flattening(), 0);
+  EXPECT_EQ(System("geographic a=6378137").ellipsoid().inverse_flattening(), 0);
+  // 6378137 / 21385
+  EXPECT_NEAR(System("geographic\r\na=6378137\tb=6356752").ellipsoid().inverse_flattening(),
+              298.252840776, 1e-9);
+  expect_refused("geographic a=6378137 b=6378138", "inverse flattening must be 3 or more");
+  expect_refused("geographic pm=Paris", "it names no datum= and no ellps=");
+  expect_refused("geographic datum=EPSG:5773", "\"EPSG:5773\" is not a geographic system");
+  expect_refused("geographic datum=\"transverse mercator lon0=3 ellps=GRS80\"",
+                 "is not a geographic system");
+  expect_refused("geographic ellps=GRS80 colour=red", "\"colour\" is not known here.");
+  expect_refused("transverse mercator ellps=GRS80 lat1=3",
+                 "\"lat1\" is not known here; Transverse Mercator takes lat0 lon0 k0 x0 y0.");
+  expect_refused("transverse mercator lon0=high ellps=GRS80", "\"high\" is no number");
+  expect_refused("transverse mercator lon0=inf ellps=GRS80", "\"inf\" is no number");
+  expect_refused("transverse mercator lon0=9x ellps=GRS80", "\"9x\" is no number");
+  EXPECT_NEAR(forward(System("transverse mercator lon0=+9 ellps=GRS80"), 9, 0).x, 0, 1e-9);
+  expect_refused("transverse lon0=9 mercator ellps=GRS80", "\"mercator\" is no name=value");
+  for (const char* seven : {"1,2", "1,2,3,4,5,6,7,8", "1,x,3", "1,2,"}) {
+    expect_refused("geographic ellps=GRS80 towgs84=" + std::string(seven),
+                   "towgs84 takes three or seven numbers");
+  }
+  EXPECT_NE(System("geographic ellps=intl towgs84=-87,-98,-121").to_proj().find("-121,0,0,0,0"),
+            std::string::npos);
   expect_refused("EPSG:5773+4326", "must be a horizontal system and a vertical one");
   expect_refused("EPSG:4326+4326", "must be a horizontal system and a vertical one");
+}
+
+// One name for several methods: what is given tells, by either of the parameters' short names.
+TEST(SystemNames, VariantsByWhatIsGiven) {
+  const std::pair<const char*, const char*> methods[] = {
+      {"lcc lat0=46 k0=0.99", "Lambert Conic Conformal (1SP)"},
+      {"lcc lat1=44 lat2=48 lat0=46", "Lambert Conic Conformal (2SP)"},
+      {"lcc lat_1=44 lat_2=48 lat_0=46", "Lambert Conic Conformal (2SP)"},
+      {"lcc lat1=46 lat0=45", "Lambert Conic Conformal (2SP)"},
+      {"lcc lat2=46 lat0=45", "Lambert Conic Conformal (2SP)"},
+      {"mercator k0=0.99", "Mercator (variant A)"},
+      {"mercator k_0=0.99", "Mercator (variant A)"},
+      {"mercator lat1=-41", "Mercator (variant B)"},
+      {"polar stereographic lat0=90 k0=0.994", "Polar Stereographic (variant A)"},
+      {"polar stereographic lat1=-71", "Polar Stereographic (variant B)"},
+      {"polar stereographic lat_ts=-71", "Polar Stereographic (variant B)"},
+  };
+  for (const auto& [words, method] : methods) {
+    EXPECT_EQ(System(std::string(words) + " lon0=3 ellps=WGS84").method(), method) << words;
+  }
+  // The registry's Antarctic Polar Stereographic, and one parallel for two.
+  const System antarctic("polar stereographic lat1=-71 lon0=0 datum=EPSG:4326");
+  const Point p = forward(antarctic, 30, -75), q = forward(System("EPSG:3031"), 30, -75);
+  EXPECT_NEAR(p.x, q.x, 1e-9);
+  EXPECT_NEAR(p.y, q.y, 1e-9);
+  const Point one = forward(System("lcc lat1=46 lat0=45 lon0=3 ellps=GRS80"), 5, 47);
+  const Point two = forward(System("lcc lat1=46 lat2=46 lat0=45 lon0=3 ellps=GRS80"), 5, 47);
+  EXPECT_EQ(one.x, two.x);
+  EXPECT_EQ(one.y, two.y);
+}
+
+// Longitudes that count westwards and latitudes that count southwards, as the axes say.
+TEST(SystemNames, GeographicAxesOfTheOtherDirection) {
+  const System utm("+proj=utm +zone=31 +ellps=GRS80");
+  const Point east = forward(utm, 2, 45), west = forward(utm, -2, 45);
+  for (const auto& [text, lon, expected] :
+       {std::tuple{"+proj=longlat +axis=enu +ellps=GRS80", 2, east},
+        std::tuple{"+proj=longlat +axis=wnu +ellps=GRS80", 2, west},
+        std::tuple{"geographic ellps=GRS80 axes=WN", -2, east}}) {
+    TransformationOptions options;
+    options.operation = "no shift";
+    const Transformation map(System(text), utm, options);
+    const Point p = map.forward({static_cast<double>(lon), 45});
+    EXPECT_NEAR(p.x, expected.x, 1e-6) << text;
+    EXPECT_NEAR(p.y, expected.y, 1e-6) << text;
+    EXPECT_NEAR(map.inverse(p).x, lon, 1e-12) << text;
+  }
+  TransformationOptions own;
+  own.operation = "no shift";
+  own.own_axes = true;
+  const Transformation south(System("+proj=longlat +axis=seu +ellps=GRS80"), utm, own);
+  const Point p = south.forward({-45, 2});
+  EXPECT_NEAR(p.x, east.x, 1e-6);
+  EXPECT_NEAR(p.y, east.y, 1e-6);
 }
 
 TEST(SystemNames, ProjStrings) {

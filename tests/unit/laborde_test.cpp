@@ -119,7 +119,7 @@ TEST(Laborde, CubicIsZPlusCZCubed) {
   TWstatus status = 0;
   TWlabor_f(k.A, k.B, 3, in.data(), out.data(), &status);
   EXPECT_EQ(status, TW_SUCCESS);
-  for (int i = 0; i < 3; ++i) {
+  for (std::size_t i = 0; i < 3; ++i) {
     const Complex z(in[i].y, in[i].x);
     const Complex w = z + Complex(k.A, k.B) * z * z * z;
     expect_near(out[i], w.imag(), w.real(), kUntouched, 1e-16);
@@ -220,7 +220,7 @@ TEST(Laborde, ScaleOfTheCubicByHand) {
   TWstatus status = 0;
   TWlabor_s(1.1, A, B, 2, in.data(), out.data(), &status);
   EXPECT_EQ(status, TW_SUCCESS);
-  for (int i = 0; i < 2; ++i) {
+  for (std::size_t i = 0; i < 2; ++i) {
     const Complex z(in[i].y, in[i].x);
     const double k = std::abs(1.0 + 3.0 * Complex(B, A) * z * z) * (i == 0 ? 0.9 : 1) * 1.1;
     expect_near(out[i], k, k, k * k, 1e-15);
@@ -271,7 +271,7 @@ TEST(Laborde, ScaleOfAFailingArray) {
   TWg_schreiber(p.e, p.lon0, p.c, p.t, p.R, p.A0, p.A2, p.A4, p.A6, p.A8, p.M0, 0.9995, 2,
                 stages.data(), stages.data(), &status);
   EXPECT_EQ(status, TW_BAD_LATITUDE);
-  for (int i = 0; i < 2; ++i) {  // multiplied by R whatever the word, and not taken further
+  for (std::size_t i = 0; i < 2; ++i) {  // multiplied by R whatever the word, and not taken further
     EXPECT_EQ(chain[i].x, stages[i].x * p.R);
     EXPECT_EQ(chain[i].y, stages[i].y * p.R);
     EXPECT_EQ(chain[i].z, stages[i].z);
