@@ -444,6 +444,9 @@ const Method* method_by_words(std::string_view words) {
       if (bar == std::string_view::npos) break;
       rest.remove_prefix(bar + 1);
     }
+  }
+  // The field's words come first: "polar stereographic" is no other method's name in WKT.
+  for (const Method& method : kMethods) {
     for (const auto name : {method.name, method.wkt1, method.esri}) {
       if (!name.empty() && folded(name) == wanted) return &method;
     }
@@ -510,16 +513,18 @@ std::string_view truth_of(int method) {
 
 void require(bool good, const MethodArguments& given, const char* why) {
   if (good) return;
-  const Method* method = method_by_code(given.definition.method);
-  throw Error("The projection " + std::string(method == nullptr ? "" : method->name) +
+  throw Error("The projection " + std::string(method_by_code(given.definition.method)->name) +
               " cannot be set up: " + why + ".");
 }
 
 void require(TWstatus word, const MethodArguments& given) {
   require(TW_OK(word), given,
           word == TW_BAD_LATITUDE ? "a latitude lies beyond a pole or at one that cannot serve"
-          : word == TW_BAD_ECCENTRICITY ? "the ellipsoid has no eccentricity below one"
-                                        : "its parameters do not fit together");
+                                  : "its parameters do not fit together");
+}
+
+void require_parallel(const MethodArguments& given, double lat) {
+  require(std::fabs(lat) < kHalfPi - 1e-10, given, "the standard parallel lies at a pole");
 }
 
 }  // namespace tidewater::detail

@@ -123,14 +123,12 @@ struct End {
         if ((letter == 'N' || letter == 'S') && letter != natural[1]) sy = -sy;
       }
     }
-    const char first = definition.axes.empty() ? 'E' : definition.axes[0];
-    swapped = options.own_axes && kind != SystemKind::geocentric && (first == 'N' || first == 'S');
-    if (kind == SystemKind::compound && definition.vertical_unit.factor > 0) {
-      sz = definition.vertical_unit.factor;
-    }
-    // Inside, heights count upwards.
-    if (kind == SystemKind::compound && definition.axes.size() > 2 && definition.axes[2] == 'D') {
-      sz = -sz;
+    const bool north_first = definition.axes.starts_with('N') || definition.axes.starts_with('S');
+    swapped = options.own_axes && kind != SystemKind::geocentric && north_first;
+    if (kind == SystemKind::compound) {
+      // Inside, heights count upwards.
+      sz = definition.axes.ends_with('D') ? -definition.vertical_unit.factor
+                                          : definition.vertical_unit.factor;
     }
   }
 

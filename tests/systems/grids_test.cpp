@@ -572,6 +572,14 @@ TEST(ShiftGrids, NadconNodesWithoutData) {
     write("g.los", odd);
     EXPECT_TRUE(std::isnan(shifts().forward(Point{-16.5, 42.5, 0}).y));
   }
+  // From beyond an edge that has no data there is no way back.
+  folder.write(
+      "g.las",
+      GridFile{-20, 40, 25, 8, [](int, int c) { return c < 2 ? 999.0F : 900.0F / 3600; }}.bytes());
+  write("g.los", 2);
+  EXPECT_TRUE(std::isnan(shifts().inverse(Point{-20.3, 43.5, 0}).x));
+  EXPECT_TRUE(std::isnan(shifts().inverse(Point{-19.5, 43.5, 0}).x));
+  EXPECT_FALSE(std::isnan(shifts().inverse(Point{-17.5, 43.5, 0}).x));
   write("g.las", 180);
   write("g.los", 180);
   const Point p = shifts().forward(Point{-16, 43, 0});  // the node itself
@@ -1377,7 +1385,16 @@ TEST(GridOperations, GeocentricTranslationsOfAnyHeight) {
   const Transformation lost = by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
   EXPECT_EQ(word_of(lost, 2.3, 47.3, false), TW_NOT_CONVERGED);
   EXPECT_EQ(word_of(lost, 2.3, 47.3, true), TW_SUCCESS);
-  // Each of the three bands must be there.
+  // A national grid by that name holds no translations; each of the three bands must be there.
+  folder.write("fr_ign_gr3df97a.tif", GsbFile{{plane("A", "NONE", 40, 50, -20, 10, 1, 1)}}.bytes());
+  try {
+    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+    ADD_FAILURE();
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find("of NTv2's form holds no translations"),
+              std::string::npos)
+        << error.what();
+  }
   for (std::size_t k = 0; k < 3; ++k) {
     TiffImage lacking = translations();
     lacking.bands[k].description = "w_translation";
