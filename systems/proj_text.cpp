@@ -391,10 +391,13 @@ bool points_to(std::string_view axes, std::string_view directions) {
   return axes.find(directions[0]) != axes.npos && axes.find(directions[1]) != axes.npos;
 }
 
-// PROJ adds its false origin before it turns the axes, the registry's methods along their own.
+// PROJ adds its false origin to eastings and northings, before it turns the axes; the methods that
+// count to the west or south, and Krovak's turned to the north, have it along the former.
 double false_origin(int method, int parameter, double value) {
-  if (method != 9808 && method != 9819 && method != 9826 && method != 9828) return value;
-  return parameter == kX0 || (parameter == kY0 && method != 9826) ? 0 - value : value;
+  const bool krovak = method == 9819 || method == 1041;
+  const bool west = krovak || method == 9808 || method == 9826 || method == 9828;
+  const bool south = west && method != 9826;
+  return (west && parameter == kX0) || (south && parameter == kY0) ? 0 - value : value;
 }
 
 // Of the methods that have this name, by what else is given.
