@@ -1457,6 +1457,10 @@ TEST(GridOperations, GridsOfTheCallers) {
   const Transformation paris = map("EPSG:4807", "EPSG:4258", "grid:own.gsb");
   const Transformation joined = map("EPSG:4277", "EPSG:4326", "grid:own.gsb EPSG:1149");
   EXPECT_TRUE(std::isnan(there.accuracy()));
+  // What they tell of themselves makes them again.
+  EXPECT_EQ(there.operation(), "grid:own.gsb");
+  EXPECT_EQ(back.operation(), "-grid:own.gsb");
+  EXPECT_EQ(joined.operation(), "grid:own.gsb EPSG:1149");
   EXPECT_NE(there.describe().find("NTv2 grid of 16 rows and 31 columns, OLD to NEW " +
                                   (folder.path() / "own.gsb").string()),
             std::string::npos)
@@ -1547,6 +1551,7 @@ TEST(GridOperations, OffsetsBetweenVerticalDatums) {
     EXPECT_EQ(own.forward(p).z, to.z);
   }
   EXPECT_TRUE(std::isnan(own.accuracy()));
+  EXPECT_EQ(own.operation(), "offset:auckht1946-nzvd2016.gtx");
   EXPECT_TRUE(std::isnan(there.forward({160, -36, 5}).z));
   // Positions on another datum would be read a hundred metres off; the way over the ellipsoid wants
   // a grid that is not there.

@@ -569,8 +569,8 @@ TEST(Methods, AspectsMeet) {
     expect_same(Projection("stereographic", {{"lat0", pole}, {"lon0", 20}}, intl), variant_a, 30,
                 lat);
     // The scale of a parallel at the pole itself is the pole's.
-    expect_same(Projection("polar stereographic", {{"lat1", pole}, {"lon0", 20}}, intl), variant_a,
-                30, lat);
+    expect_same(Projection("polar stereographic variant b", {{"lat1", pole}, {"lon0", 20}}, intl),
+                variant_a, 30, lat);
     // Equal area about a pole: that of the ellipsoid, and on the sphere the oblique formula.
     const Projection area("azimuthal equal area", {{"lat0", pole}, {"lon0", 20}}, intl);
     EXPECT_NEAR(area.factors({50, lat}).areal, 1, 1e-9);
