@@ -298,7 +298,8 @@ TEST(Methods, ZonesOfOtherWidths) {
   const Answers out = run_array(wide, in, false);
   EXPECT_EQ(out.words, (std::vector<TWstatus>{TW_SUCCESS, TW_RANGE_ERROR, TW_SUCCESS,
                                               TW_RANGE_ERROR, TW_SUCCESS}));
-  for (const std::size_t i : {0, 2, 4}) EXPECT_EQ(out.points[i].x, wide.forward(in[i]).x);
+  for (const std::size_t i : std::vector<std::size_t>{0, 2, 4})
+    EXPECT_EQ(out.points[i].x, wide.forward(in[i]).x);
 }
 
 // Inverses by iteration lead back from all of the map, not from the neighbourhood of the origin
