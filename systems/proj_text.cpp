@@ -12,6 +12,7 @@
 #include "text_forms.hpp"
 #include "text_forms_parts.hpp"
 #include "tidewater/ellipsoid.hpp"
+#include "words.hpp"
 
 namespace tidewater::detail {
 
@@ -239,7 +240,8 @@ class Words {
   std::vector<Given> given_;
 };
 
-void read_ellipsoid(Words& words, Definition& definition) {
+// GRS 1980 where the words tell none; whether they do.
+bool read_ellipsoid(Words& words, Definition& definition) {
   EllipsoidDefinition& ellipsoid = definition.datum.ellipsoid;
   if (const auto name = words.take("ellps")) {
     const auto found = std::find_if(std::begin(kEllipsoids), std::end(kEllipsoids),
@@ -276,6 +278,7 @@ void read_ellipsoid(Words& words, Definition& definition) {
   if (ellipsoid.inverse_flattening != 0 && !(ellipsoid.inverse_flattening >= 3)) {
     words.refuse("the inverse flattening must be 3 or more");
   }
+  return sized;
 }
 
 // Whether this is the pseudo-Mercator of web maps: a sphere for WGS 84 with a grid that is none.
@@ -304,11 +307,15 @@ void read_datum(Words& words, Definition& definition) {
     datum = datum_from_registry(found.code);
     definition.base_code = found.base;
     definition.base = definition_from_registry(found.base).name;
-    for (const char* key : {"ellps", "a", "b", "R", "rf"}) words.take(key);
+    // An ellipsoid beside it must be its own; that of web maps is none.
+    Definition told;
+    const bool own = read_ellipsoid(words, told);
+    if (own && !web && !same_figures(told.datum.ellipsoid, datum.ellipsoid)) {
+      words.refuse("its ellipsoid is not that of +datum=" + std::string(found.name));
+    }
   } else {
     read_ellipsoid(words, definition);
-    datum.name = "unknown datum on " + (datum.ellipsoid.name.empty() ? std::string("an ellipsoid")
-                                                                     : datum.ellipsoid.name);
+    datum.name = unknown_datum(datum.ellipsoid);
   }
   const auto grids = words.take("nadgrids");
   if (grids && *grids != "@null") datum.name += " with " + std::string(grids->substr(0, 200));
@@ -363,10 +370,10 @@ UnitDefinition read_unit(Words& words) {
   return unit;
 }
 
-// "enu", "wsu" ... in capitals; empty without one.
+// "enu", "wsu" ... in capitals, without the third.
 std::string read_axes(Words& words) {
   const auto axis = words.take("axis");
-  if (!axis) return {};
+  if (!axis) return "EN";
   std::string axes;
   for (const char c : *axis) {
     axes += c >= 'a' && c <= 'z' ? static_cast<char>(c - 32) : c;
@@ -554,7 +561,7 @@ Definition definition_from_proj(std::string_view text) {
   if (geographic) {
     definition.kind = SystemKind::geographic2d;
     definition.unit = {"degree", 9102, kDegreeInRadians};
-    definition.axes = axes.empty() ? "EN" : axes;
+    definition.axes = axes;
     words.take("units");
   } else if (geocentric) {
     definition.kind = SystemKind::geocentric;
@@ -563,7 +570,7 @@ Definition definition_from_proj(std::string_view text) {
   } else {
     definition.kind = SystemKind::projected;
     definition.unit = read_unit(words);
-    definition.axes = axes.empty() ? "EN" : axes;
+    definition.axes = axes;
     method = method_by_code(code);
     definition.method = code;
     if (*name == "utm") {
@@ -676,12 +683,10 @@ std::string proj_from_definition(const Definition& definition) {
     return text + " +no_defs +type=crs";
   }
   const Method& method = method_of(definition);
-  const std::string_view why = foreign(definition);
-  if (method.proj.empty() || !why.empty()) {
-    throw Error(
-        "PROJ strings have no form for " + definition.name + ": " +
-        (why.empty() ? "PROJ lacks the method " + std::string(method.name) : std::string(why)) +
-        ".");
+  std::string why(foreign(definition));
+  if (method.proj.empty()) why = "PROJ lacks the method " + std::string(method.name);
+  if (!why.empty()) {
+    throw Error("PROJ strings have no form for " + definition.name + ": " + why + ".");
   }
   text = "+proj=" + std::string(method.proj);
   for (const MethodParameter& parameter : method.parameters) {

@@ -130,6 +130,39 @@ TEST(ChamberlinFormulas, OfTheEllipsoidIsDrawnByCompasses) {
   }
 }
 
+// A search that crosses the date line comes back to longitudes within half a turn.
+TEST(ChamberlinFormulas, NextToTheDateLine) {
+  const Chamberlin map(0, kTriangles[2]);
+  for (double lon = 179; lon <= 181; lon += 0.05) {
+    for (double lat = -55; lat <= -15; lat += 5) {
+      Spot at;
+      Position back;
+      ASSERT_TRUE(map.forward(degrees(lon), degrees(lat), &at));
+      ASSERT_TRUE(map.inverse(at.x, at.y, &back));
+      EXPECT_LE(std::fabs(back.lon), kPi) << lon << " " << lat;
+      EXPECT_NEAR(std::remainder(back.lon - degrees(lon), 2 * kPi), 0, 1e-12) << lon << " " << lat;
+      EXPECT_NEAR(back.lat, degrees(lat), 1e-12) << lon << " " << lat;
+    }
+  }
+}
+
+// On the way from one control point to another and beyond them, where rounding puts a point further
+// off than the sum of two distances.
+TEST(ChamberlinFormulas, InLineWithTwoPointsOfControl) {
+  const std::array<Position, 3> control = {Position{0, 0}, {0.5, 0}, {0.2, 0.4}};
+  const Chamberlin map(0, control);
+  for (int i = -150; i <= 200; ++i) {
+    const Position p = {i * 0.01 + 0.003, 0};
+    Spot at;
+    ASSERT_TRUE(map.forward(p.lon, p.lat, &at));
+    ASSERT_TRUE(std::isfinite(at.x) && std::isfinite(at.y)) << p.lon;
+    // The side itself has the point where it is; the other two sides by their compasses.
+    const Spot expected = by_compasses(map, control, p, on_sphere);
+    EXPECT_NEAR(at.x, expected.x, 1e-8) << p.lon;
+    EXPECT_NEAR(at.y, expected.y, 2e-8) << p.lon;
+  }
+}
+
 TEST(ChamberlinFormulas, PointsThatMakeNoTriangle) {
   const auto good = [](const Position& a, const Position& b, const Position& c) {
     return Chamberlin(0, {a, b, c}).good();

@@ -64,18 +64,30 @@ TEST(SpaceObliqueMercatorFormulas, WithoutTheEarthsTurnIsTheObliqueMercatorMapOf
   }
 }
 
-// The distance of two places close by on the ellipsoid.
-double apart(const Place& p, const Place& q) {
-  const auto position = [](const Place& at, double* v) {
+struct Vector {
+  double x, y, z;
+};
+
+// From one place to another close by on the ellipsoid.
+Vector way(const Place& from, const Place& to) {
+  const auto position = [](const Place& at) {
     const double s = std::sin(at.lat), nu = 1 / std::sqrt(1 - kE2 * s * s);
-    v[0] = nu * std::cos(at.lat) * std::cos(at.lon);
-    v[1] = nu * std::cos(at.lat) * std::sin(at.lon);
-    v[2] = nu * (1 - kE2) * s;
+    return Vector{nu * std::cos(at.lat) * std::cos(at.lon),
+                  nu * std::cos(at.lat) * std::sin(at.lon), nu * (1 - kE2) * s};
   };
-  double a[3], b[3];
-  position(p, a);
-  position(q, b);
-  return std::hypot(a[0] - b[0], a[1] - b[1], a[2] - b[2]);
+  const Vector a = position(from), b = position(to);
+  return {b.x - a.x, b.y - a.y, b.z - a.z};
+}
+
+double apart(const Place& p, const Place& q) {
+  const Vector v = way(p, q);
+  return std::hypot(v.x, v.y, v.z);
+}
+
+// Between the ways from a place to two others, the second on the left of the first.
+double angle_at(const Place& p, const Place& q, const Place& r) {
+  const Vector a = way(p, q), b = way(p, r);
+  return std::acos((a.x * b.x + a.y * b.y + a.z * b.z) / (apart(p, q) * apart(p, r)));
 }
 
 TEST(SpaceObliqueMercatorFormulas, TrackIsTrueToScaleAndTheMapConformalNextToIt) {
@@ -91,7 +103,14 @@ TEST(SpaceObliqueMercatorFormulas, TrackIsTrueToScaleAndTheMapConformalNextToIt)
     // The chord is shorter than its arc by less than 1e-9 of it.
     EXPECT_NEAR(std::hypot(x1 - x, y1 - y) / apart(here, next), 1, 2e-6) << L;
     EXPECT_GT(x1, x);
-    // North and east at right angles and of one scale.
+    // The scan line meets the track at the angle of the ground.
+    const Place aside = ground(degrees(L), kE2, kInclination, kRatio, h);
+    double xa, ya;
+    ASSERT_TRUE(map.forward(aside.lon, aside.lat, &xa, &ya));
+    EXPECT_NEAR(std::atan2(ya - y, xa - x) - std::atan2(y1 - y, x1 - x),
+                angle_at(here, next, aside), 3e-6)
+        << L;
+    // North and east of one scale.
     const Place north = {here.lon, here.lat + h}, east = {here.lon + h, here.lat};
     double xn, yn, xe, ye;
     ASSERT_TRUE(map.forward(north.lon, north.lat, &xn, &yn));

@@ -526,6 +526,28 @@ TEST(HarmonicSum, WhatIsLeftOfTheLastPointStandsInAnArrayToo) {
   }
 }
 
+// The first constant of the recursion multiplies every sum; it is 1 unless a caller sets it.
+TEST(HarmonicSum, TheFirstConstantIsAFactor) {
+  Coefficients c(5);
+  Coefficients::fill(c, 13);
+  std::vector<CoordinateTriple> points;
+  for (int i = 0; i < 20; ++i) points.push_back(geocentric(0.3 + 0.1 * i, 0.2 * i, kRadius));
+  for (int16_t mode = 0; mode <= 4; ++mode) {
+    Synthesis plain(5), doubled(5);
+    doubled.rec_a(0, 0) = 2;
+    for (const int32_t count : {1, 20}) {
+      std::vector<CoordinateTriple> a(points.size(), {0, 0, 0}), b = a;
+      plain.sum(mode, c, count, points.data(), a.data());
+      doubled.sum(mode, c, count, points.data(), b.data());
+      for (std::size_t i = 0; i < points.size(); ++i) {
+        EXPECT_EQ(b[i].x, 2 * a[i].x) << mode << " " << i;
+        EXPECT_EQ(b[i].y, 2 * a[i].y) << mode << " " << i;
+        EXPECT_EQ(b[i].z, 2 * a[i].z) << mode << " " << i;
+      }
+    }
+  }
+}
+
 // Degrees above those that are computed several points at once.
 TEST(HarmonicSum, AnArrayOfAHighDegreeIsThatOfItsPoints) {
   const int32_t degree = 66;
