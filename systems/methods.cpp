@@ -338,8 +338,8 @@ constexpr Method kMethods[] = {
      "Stereographic", kNaturalScaled, make_stereographic},
     {9810, "Polar Stereographic (variant A)", "polar stereographic variant a", "stere",
      "Polar_Stereographic", "Stereographic_North_Pole", kNaturalScaled, make_polar_stereographic_a},
-    {9829, "Polar Stereographic (variant B)", "polar stereographic", "stere", "Polar_Stereographic",
-     "Stereographic_North_Pole", kPolarB, make_polar_stereographic_b},
+    {9829, "Polar Stereographic (variant B)", "polar stereographic variant b", "stere",
+     "Polar_Stereographic", "Stereographic_North_Pole", kPolarB, make_polar_stereographic_b},
     {9830, "Polar Stereographic (variant C)", "polar stereographic variant c", "stere",
      "Polar_Stereographic_Variant_C", "", kPolarC, make_polar_stereographic_c},
     {9811, "New Zealand Map Grid", "new zealand map grid|nzmg", "nzmg", "New_Zealand_Map_Grid",
@@ -444,9 +444,6 @@ const Method* method_by_words(std::string_view words) {
       if (bar == std::string_view::npos) break;
       rest.remove_prefix(bar + 1);
     }
-  }
-  // The field's words come first: "polar stereographic" is no other method's name in WKT.
-  for (const Method& method : kMethods) {
     for (const auto name : {method.name, method.wkt1, method.esri}) {
       if (!name.empty() && folded(name) == wanted) return &method;
     }

@@ -294,6 +294,7 @@ class TransformationImpl {
             : height_ways(one.vertical_code, other.vertical_code, one, wanted, options);
     const bool own_offsets = named_heights.size() == 1 && named_heights[0].starts_with("offset:");
     if (own_offsets) {
+      tell(named_heights[0]);
       add(offset_grid_step(named_heights[0].substr(7), options.grid_folders));
       accuracy = kNotANumber;
       go(one, other, true);
@@ -366,6 +367,7 @@ class TransformationImpl {
     for (const std::string& word : named) {
       if (!word.starts_with("geoid:")) continue;
       Way way;
+      way.name = word;
       way.accuracy = kNotANumber;
       return {end, way, geoid_step(word.substr(6), to_geoid, options.grid_folders)};
     }
@@ -396,12 +398,19 @@ class TransformationImpl {
                 "positions as they are.");
   }
 
-  // Tells of an operation on heights.
+  // What would give this transformation again, a word after the other.
+  void tell(const std::string& word) {
+    if (!operation.empty()) operation += " ";
+    operation += word;
+  }
+  void tell(const Link& link) {
+    tell((link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code));
+  }
+
+  // Tells of an operation on heights, or of the caller's grid, whose name is the way's.
   void note(const Way& way) {
-    for (const Link& link : way.links) {
-      if (!operation.empty()) operation += " ";
-      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
-    }
+    if (way.links.empty()) tell(way.name);
+    for (const Link& link : way.links) tell(link);
     accuracy += way.accuracy;
     if (area.name.empty() && !way.area.name.empty()) area = way.area;
   }
@@ -449,8 +458,7 @@ class TransformationImpl {
 
   void take(const Way& way, const TransformationOptions& options) {
     for (const Link& link : way.links) {
-      if (!operation.empty()) operation += " ";
-      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
+      tell(link);
       datum_words.push_back(in_words(link) + " (" +
                             Registry::shared().method_name(link.operation.method) + ")");
       if (auto step = datum_step(link, options, flat)) {
@@ -544,6 +552,7 @@ class TransformationImpl {
       bool reversed = word.starts_with('-');
       if (reversed) word.erase(0, 1);
       if (word.starts_with("grid:")) {
+        tell((reversed ? "-" : "") + word);
         add(shift_grid_step(word.substr(5), reversed, frame_of(one.datum), frame_of(other.datum),
                             options.grid_folders));
         accuracy = kNotANumber;

@@ -1216,6 +1216,35 @@ TEST_F(BadGrids, TiffsThatCannotBe) {
   EXPECT_NE(refusal<GeoidGrid>(path).find("no band of undulations"), std::string::npos);
 }
 
+// Tiles larger than any memory, or of no size, as a damaged header has them.
+TEST_F(BadGrids, TiffsWhoseTilesCannotBe) {
+  const std::string path = (folder.path() / "x.tif").string();
+  TiffImage image{
+      10, 50, 1, 1, 40, 40, {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  image.tiled = true;
+  write_tiff(path, {image});
+  const std::string good = file_bytes(path);
+  EXPECT_EQ(refusal<ShiftGrid>(path), "");
+  // The entries of the tiles' width and height in the directory: tag, type, count, value.
+  const auto with = [&](int width, int height) {
+    std::string bytes = good;
+    for (const auto& [tag, value] : {std::pair(322, width), {323, height}}) {
+      const std::string entry = {
+          static_cast<char>(tag & 0xff), static_cast<char>(tag >> 8), 3, 0, 1, 0, 0, 0};
+      const std::size_t at = bytes.find(entry);
+      EXPECT_NE(at, std::string::npos);
+      bytes[at + 8] = static_cast<char>(value & 0xff);
+      bytes[at + 9] = static_cast<char>(value >> 8);
+    }
+    return bytes;
+  };
+  expect_refused("y.tif", with(0x7ff0, 0x7ff0), "tiles or rows of a size that cannot be");
+  for (const auto& [width, height] : {std::pair(0, 32), {32, 0}, {0, 0}}) {
+    folder.write("y.tif", with(width, height));
+    EXPECT_NE(refusal<ShiftGrid>((folder.path() / "y.tif").string()), "") << width << " " << height;
+  }
+}
+
 TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
   const std::string path = (folder.path() / "x.tif").string();
   TiffImage image{
@@ -1457,6 +1486,10 @@ TEST(GridOperations, GridsOfTheCallers) {
   const Transformation paris = map("EPSG:4807", "EPSG:4258", "grid:own.gsb");
   const Transformation joined = map("EPSG:4277", "EPSG:4326", "grid:own.gsb EPSG:1149");
   EXPECT_TRUE(std::isnan(there.accuracy()));
+  // What they tell of themselves makes them again.
+  EXPECT_EQ(there.operation(), "grid:own.gsb");
+  EXPECT_EQ(back.operation(), "-grid:own.gsb");
+  EXPECT_EQ(joined.operation(), "grid:own.gsb EPSG:1149");
   EXPECT_NE(there.describe().find("NTv2 grid of 16 rows and 31 columns, OLD to NEW " +
                                   (folder.path() / "own.gsb").string()),
             std::string::npos)
@@ -1547,6 +1580,7 @@ TEST(GridOperations, OffsetsBetweenVerticalDatums) {
     EXPECT_EQ(own.forward(p).z, to.z);
   }
   EXPECT_TRUE(std::isnan(own.accuracy()));
+  EXPECT_EQ(own.operation(), "offset:auckht1946-nzvd2016.gtx");
   EXPECT_TRUE(std::isnan(there.forward({160, -36, 5}).z));
   // Positions on another datum would be read a hundred metres off; the way over the ellipsoid wants
   // a grid that is not there.

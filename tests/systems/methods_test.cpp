@@ -298,7 +298,8 @@ TEST(Methods, ZonesOfOtherWidths) {
   const Answers out = run_array(wide, in, false);
   EXPECT_EQ(out.words, (std::vector<TWstatus>{TW_SUCCESS, TW_RANGE_ERROR, TW_SUCCESS,
                                               TW_RANGE_ERROR, TW_SUCCESS}));
-  for (const std::size_t i : {0, 2, 4}) EXPECT_EQ(out.points[i].x, wide.forward(in[i]).x);
+  for (const std::size_t i : std::vector<std::size_t>{0, 2, 4})
+    EXPECT_EQ(out.points[i].x, wide.forward(in[i]).x);
 }
 
 // Inverses by iteration lead back from all of the map, not from the neighbourhood of the origin
@@ -569,8 +570,8 @@ TEST(Methods, AspectsMeet) {
     expect_same(Projection("stereographic", {{"lat0", pole}, {"lon0", 20}}, intl), variant_a, 30,
                 lat);
     // The scale of a parallel at the pole itself is the pole's.
-    expect_same(Projection("polar stereographic", {{"lat1", pole}, {"lon0", 20}}, intl), variant_a,
-                30, lat);
+    expect_same(Projection("polar stereographic variant b", {{"lat1", pole}, {"lon0", 20}}, intl),
+                variant_a, 30, lat);
     // Equal area about a pole: that of the ellipsoid, and on the sphere the oblique formula.
     const Projection area("azimuthal equal area", {{"lat0", pole}, {"lon0", 20}}, intl);
     EXPECT_NEAR(area.factors({50, lat}).areal, 1, 1e-9);
