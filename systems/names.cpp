@@ -349,8 +349,7 @@ class OneLine {
     const bool second = has("lat2") || has("lat 2");
     if (method->code == 9802 && !first && !second) method = method_by_code(9801);
     if (method->code == 9805 && (has("k0") || has("k 0"))) method = method_by_code(9804);
-    const bool scaled = has("k0") || has("k 0") || has("lat0") || has("lat 0");
-    if (method->code == 9829 && !first && scaled) method = method_by_code(9810);
+    if (method->code == 9810 && first) method = method_by_code(9829);
     result.method = method->code;
     if (const auto units = take("units")) {
       const Unit unit(*units);
