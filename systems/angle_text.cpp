@@ -158,10 +158,10 @@ void tokenize(std::string_view text, bool decimal_comma, Tokens& out) {
     }
     Token token{};
     if (const Digits digits = read_digits(p, end, decimal_comma ? ',' : '.'); digits.end != p) {
-      const bool glued = !blank && out.count > 0 &&
-                         (out.tokens[out.count - 1].kind == TokenKind::number ||
-                          (decimal_comma && p[-1] == ',' && out.count > 1 &&
-                           out.tokens[out.count - 2].kind == TokenKind::number));
+      // Without a blank there is a piece before.
+      const bool glued = !blank && (out.tokens[out.count - 1].kind == TokenKind::number ||
+                                    (decimal_comma && p[-1] == ',' && out.count > 1 &&
+                                     out.tokens[out.count - 2].kind == TokenKind::number));
       if (glued) {
         out.reason = quoted(text) + " has a number with two decimal marks.";
         return;
@@ -208,8 +208,8 @@ void tokenize(std::string_view text, bool decimal_comma, Tokens& out) {
       const Mark* found = nullptr;
       for (const Mark& mark : kMarks) {
         if (std::string_view(p, static_cast<std::size_t>(end - p)).starts_with(mark.text)) {
-          // Two primes are seconds.
-          if (found == nullptr || mark.text.size() > found->text.size()) found = &mark;
+          found = &mark;
+          break;
         }
       }
       if (found == nullptr) {

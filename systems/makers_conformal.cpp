@@ -210,10 +210,12 @@ Made make_mercator_a(const MethodArguments& given) {
 }
 
 Made make_mercator_b(const MethodArguments& given) {
+  require_parallel(given, given(kLat1));
   return mercator(given, natural_plane(given, parallel_radius(given.e2, given(kLat1))), given.e, 0);
 }
 
 Made make_mercator_c(const MethodArguments& given) {
+  require_parallel(given, given(kLat1));
   Plane plane = natural_plane(given, parallel_radius(given.e2, given(kLat1)));
   plane.x0 = given(kXF);
   plane.y0 = given(kYF);

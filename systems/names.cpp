@@ -109,9 +109,10 @@ Definition utm(std::string_view rest, const std::optional<Where>& where, std::st
   if (const auto known = Registry::shared().system(name)) {
     return definition_from_registry(known->code);
   }
+  // Zones count from Greenwich, whatever the meridian of the base.
   return projected_on(base, name, 9807,
                       {{kLat0, 0},
-                       {kLon0, (zone * 6 - 183) * kDegree},
+                       {kLon0, (zone * 6 - 183) * kDegree - base.datum.meridian.longitude},
                        {kK0, 0.9996},
                        {kX0, 500000},
                        {kY0, south ? 10000000.0 : 0.0}});
@@ -230,7 +231,9 @@ class OneLine {
         if (!given_.empty()) refuse(quoted(word) + " is no name=value");
         words += (words.empty() ? "" : " ") + word;
       } else {
-        given_.push_back({folded(word.substr(0, equals)), word.substr(equals + 1)});
+        const std::string key = folded(word.substr(0, equals));
+        if (has(key)) refuse(quoted(key) + " is given twice");
+        given_.push_back({key, word.substr(equals + 1)});
       }
     }
     method_words_ = words;
@@ -308,11 +311,7 @@ class OneLine {
     } else {
       refuse("it names no datum= and no ellps=");
     }
-    if (result.datum.name.empty()) {
-      result.datum.name =
-          "unknown datum on " + (result.datum.ellipsoid.name.empty() ? std::string("an ellipsoid")
-                                                                     : result.datum.ellipsoid.name);
-    }
+    if (result.datum.name.empty()) result.datum.name = unknown_datum(result.datum.ellipsoid);
     if (const auto pm = take("pm")) {
       if (const auto degrees = number(*pm)) {
         if (std::fabs(*degrees) > 360) refuse("pm is beyond a whole turn");

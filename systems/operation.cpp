@@ -168,14 +168,21 @@ std::string hindrance(const OperationRecord& operation, const TransformationOpti
   return "the method " + Registry::shared().method_name(operation.method);
 }
 
-// Does a later operation between the same systems take its place?  Where that one's grid is not
-// there, the one before it serves if it can.
+// Does a later operation between the same systems take its place?  Where the grids of all later
+// ones are not there, an older one serves if it can.
 bool replaced(const OperationRecord& operation, const TransformationOptions& options) {
   if (operation.replaced_by == 0) return false;
-  const auto later = Registry::shared().operation(operation.replaced_by);
-  const bool lacks_grid = later && is_shift_grid(later->method) &&
-                          shift_grid_file(*later, options.grid_folders).empty();
-  return !lacks_grid || later->replaced_by != 0 || !hindrance(operation, options).empty();
+  if (!hindrance(operation, options).empty()) return true;
+  constexpr int kMost = 8;  // a store may say that two replace each other
+  int code = operation.replaced_by;
+  for (int i = 0; i < kMost && code != 0; ++i) {
+    const auto later = Registry::shared().operation(code);
+    const bool lacks_grid = later && is_shift_grid(later->method) &&
+                            shift_grid_file(*later, options.grid_folders).empty();
+    if (!lacks_grid) return true;
+    code = later->replaced_by;
+  }
+  return false;
 }
 
 std::optional<Way> way_of(const OperationRecord& operation, bool reversed,

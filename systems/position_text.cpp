@@ -122,7 +122,7 @@ Fields by_form(std::span<const Token> tokens, std::string_view text) {
   }
   if (colons && (loose_count == 2 || loose_count == 3)) {
     for (int i = 1; i < loose_count; ++i) {
-      if (loose[i] > 0 && is(tokens[loose[i] - 1], TokenKind::sign)) --loose[i];
+      if (is(tokens[loose[i] - 1], TokenKind::sign)) --loose[i];
     }
     return cut_at(tokens, loose + 1, loose_count - 1);
   }
@@ -132,8 +132,8 @@ Fields by_form(std::span<const Token> tokens, std::string_view text) {
     if (cut != 0) return cut_at(tokens, &cut, 1);
   }
   // Plain numbers: halves, or a fraction that ends each of the first two.
-  const bool plain = number_count + sign_count == static_cast<int>(tokens.size()) &&
-                     letter_count == 0 && sign_count <= 1;
+  const bool plain =
+      number_count + sign_count == static_cast<int>(tokens.size()) && sign_count <= 1;
   if (plain && (number_count == 2 || number_count == 4 || number_count == 6)) {
     return cut_at(tokens, &numbers[number_count / 2], 1);
   }
@@ -217,12 +217,11 @@ bool read_plain_position(std::string_view text, Order order, ParsedPosition& pos
   int count = 0;
   bool blanks = false;
   while (count < 3) {
-    const char* const begin = p;
     p = read_plain(p, end, &values[count]);
     if (p == nullptr) return false;
     ++count;
     if (p == end) break;
-    const bool apart = p[-1] == ' ' && p != begin;
+    const bool apart = p[-1] == ' ';
     if (*p == ',' || *p == ';' || *p == '\t') {
       ++p;
     } else if (apart) {

@@ -15,6 +15,7 @@
 #include "registry_names.hpp"
 #include "registry_reader.hpp"
 #include "store_path.hpp"
+#include "words.hpp"
 
 namespace tidewater::detail {
 
@@ -256,11 +257,14 @@ struct Registry::Tables {
     }
   }
 
-  Name read_axes(StoreReader& reader, std::size_t count) {
+  Name read_axes(StoreReader& reader, SystemKind kind) {
     const std::string_view axes = reader.text(kAxesSize);
-    reader.require(axes.size() == count, "its axes are too many or too few");
-    reader.require(axes.find_first_not_of("ENWSUDXYZ") == std::string_view::npos,
-                   "its axes have unknown letters");
+    bool known = horizontal_axes(axes);
+    if (kind == SystemKind::geocentric) known = axes == "XYZ";
+    if (kind == SystemKind::geographic2d) known = known && axes.size() == 2;
+    if (kind == SystemKind::geographic3d) known = known && axes.size() == 3;
+    if (kind == SystemKind::vertical) known = axes == "U" || axes == "D";
+    reader.require(known, "its axes are none of its kind");
     return keep(axes);
   }
 
@@ -274,7 +278,7 @@ struct Registry::Tables {
                  : dimension == 2 ? SystemKind::geographic2d
                                   : SystemKind::geographic3d;
       row.datum = reader.integer();
-      row.axes = read_axes(reader, dimension == 2 ? 2 : 3);
+      row.axes = read_axes(reader, row.kind);
       row.unit = reader.integer();
       row.area = reader.integer();
       return row;
@@ -293,11 +297,7 @@ struct Registry::Tables {
       row.base = reader.integer();
       row.datum = datum_of(row.base);
       row.conversion = reader.integer();
-      const std::string_view axes = reader.text(kAxesSize);
-      reader.require(axes.size() == 2 || axes.size() == 3, "its axes are too many or too few");
-      reader.require(axes.find_first_not_of("ENWSU") == std::string_view::npos,
-                     "its axes have unknown letters");
-      row.axes = keep(axes);
+      row.axes = read_axes(reader, row.kind);
       row.unit = reader.integer();
       row.area = reader.integer();
       return row;
@@ -307,7 +307,7 @@ struct Registry::Tables {
       static_cast<Row&>(row) = read_head(reader);
       row.kind = SystemKind::vertical;
       row.datum = reader.integer();
-      row.axes = read_axes(reader, 1);
+      row.axes = read_axes(reader, row.kind);
       row.unit = reader.integer();
       row.area = reader.integer();
       return row;
@@ -644,10 +644,9 @@ struct Registry::Tables {
       }
     }
     std::stable_sort(rows.begin(), rows.end(), [](const OperationRow* a, const OperationRow* b) {
-      const bool a_unknown = std::isnan(a->accuracy);
-      const bool b_unknown = std::isnan(b->accuracy);
-      if (a_unknown || b_unknown) return !a_unknown && b_unknown;
-      return a->accuracy < b->accuracy;
+      // What is not known goes last.
+      const auto rank = [](double accuracy) { return std::isnan(accuracy) ? HUGE_VAL : accuracy; };
+      return rank(a->accuracy) < rank(b->accuracy);
     });
     std::vector<OperationRecord> out;
     out.reserve(rows.size());

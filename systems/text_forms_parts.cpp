@@ -31,6 +31,11 @@ std::string number_text(double value) {
 
 std::string degrees_text(double radians) { return number_text(radians / kDegreeInRadians); }
 
+std::string unknown_datum(const EllipsoidDefinition& ellipsoid) {
+  const std::string_view name = ellipsoid.name;
+  return "unknown datum on " + std::string(name.empty() ? "an ellipsoid" : name);
+}
+
 void complete_parameters(Definition& definition, const Method& method) {
   std::vector<ParameterValue> complete;
   for (const MethodParameter& parameter : method.parameters) {
@@ -40,18 +45,27 @@ void complete_parameters(Definition& definition, const Method& method) {
   definition.parameters = std::move(complete);
 }
 
-namespace {
-
-bool same_figures(const DatumDefinition& a, const DatumDefinition& b) {
-  const auto near = [](double x, double y) { return std::fabs(x - y) <= 1e-9 * std::fabs(y); };
-  // Texts round the flattening, and name a sphere by zero or by infinity.
-  return near(a.ellipsoid.a, b.ellipsoid.a) &&
-         std::fabs(a.ellipsoid.inverse_flattening - b.ellipsoid.inverse_flattening) <=
-             1e-7 * (1 + b.ellipsoid.inverse_flattening) &&
-         std::fabs(a.meridian.longitude - b.meridian.longitude) < 1e-9;
+std::string_view natural_axes(int method) {
+  switch (method) {
+    case 9808:
+    case 9828:
+      return "WS";
+    case 9819:
+    case 1042:
+      return "SW";
+    case 9826:
+      return "WN";
+    default:
+      return "EN";
+  }
 }
 
-}  // namespace
+bool same_figures(const EllipsoidDefinition& a, const EllipsoidDefinition& b) {
+  // Texts round the flattening, and name a sphere by zero or by infinity.
+  return std::fabs(a.a - b.a) <= 1e-9 * b.a &&
+         std::fabs(a.inverse_flattening - b.inverse_flattening) <=
+             1e-7 * (1 + b.inverse_flattening);
+}
 
 void recognise_datum(Definition& definition) {
   DatumDefinition& datum = definition.datum;
@@ -61,7 +75,10 @@ void recognise_datum(Definition& definition) {
       const auto record = registry.datum(code);
       if (!record || record->ellipsoid == 0) return false;  // none, or one of heights
       DatumDefinition known = datum_from_registry(code);
-      if (!same_figures(datum, known)) return false;
+      if (!same_figures(datum.ellipsoid, known.ellipsoid) ||
+          !(std::fabs(datum.meridian.longitude - known.meridian.longitude) < 1e-9)) {
+        return false;
+      }
       known.to_wgs84 = datum.to_wgs84;
       datum = std::move(known);
       return true;
@@ -85,14 +102,6 @@ void recognise_datum(Definition& definition) {
   } catch (const Error&) {
     // Without a registry the text alone speaks.
   }
-}
-
-bool horizontal_axes(std::string_view axes) {
-  if (axes.size() < 2 || axes.size() > 3) return false;
-  const auto along = [&](std::string_view letters) {
-    return letters.find(axes[0]) != letters.npos || letters.find(axes[1]) != letters.npos;
-  };
-  return along("EW") && along("NS") && (axes.size() == 2 || axes[2] == 'U');
 }
 
 int parameter_among(const Method& method, std::initializer_list<int> codes) {

@@ -21,18 +21,23 @@ std::string bare(std::string_view name);
 std::string number_text(double value);
 std::string degrees_text(double radians);
 
+// Whether two ellipsoids are one, as exactly as texts have them.
+bool same_figures(const EllipsoidDefinition& a, const EllipsoidDefinition& b);
+
+// The name of a datum of which the ellipsoid alone is known.
+std::string unknown_datum(const EllipsoidDefinition& ellipsoid);
+
 // Gives the definition all parameters that its method takes, at their usual value where none is
 // given, in the method's order.
 void complete_parameters(Definition& definition, const Method& method);
+
+// The axes along which a method's formulas count, in their usual order.
+std::string_view natural_axes(int method);
 
 // Finds the datum, or the base system, in the registry by what the text calls it, so that the
 // datum's code is known; leaves it as it is where the registry has none of that name with this
 // ellipsoid and meridian, or where there is no registry.
 void recognise_datum(Definition& definition);
-
-// Whether these letters are one axis to the east or west and one to the north or south, in either
-// order, and perhaps a third upwards.
-bool horizontal_axes(std::string_view axes);
 
 // The method's parameter among these codes; 0 where it takes none of them.
 int parameter_among(const Method& method, std::initializer_list<int> codes);

@@ -6,6 +6,7 @@
 #include "makers.hpp"
 #include "operation.hpp"
 #include "system_impl.hpp"
+#include "text_forms_parts.hpp"
 #include "words.hpp"
 
 namespace tidewater {
@@ -110,27 +111,20 @@ struct End {
     } else if (kind != SystemKind::geocentric) {
       sx = sy = definition.unit.factor;
     }
-    if (kind != SystemKind::geocentric) {
-      std::string_view natural = "EN";
-      if (definition.method == 9808 || definition.method == 9828 || definition.method == 9819 ||
-          definition.method == 1042) {
-        natural = "WS";
-      } else if (definition.method == 9826) {
-        natural = "WN";
-      }
+    if (kind != SystemKind::geocentric && kind != SystemKind::vertical) {
+      const std::string_view natural = natural_axes(definition.method);
       for (const char letter : definition.axes.substr(0, 2)) {
-        if ((letter == 'E' || letter == 'W') && letter != natural[0]) sx = -sx;
-        if ((letter == 'N' || letter == 'S') && letter != natural[1]) sy = -sy;
+        if (natural.find(letter) != natural.npos) continue;
+        double& turned = letter == 'E' || letter == 'W' ? sx : sy;
+        turned = -turned;
       }
     }
-    const char first = definition.axes.empty() ? 'E' : definition.axes[0];
-    swapped = options.own_axes && kind != SystemKind::geocentric && (first == 'N' || first == 'S');
-    if (kind == SystemKind::compound && definition.vertical_unit.factor > 0) {
-      sz = definition.vertical_unit.factor;
-    }
-    // Inside, heights count upwards.
-    if (kind == SystemKind::compound && definition.axes.size() > 2 && definition.axes[2] == 'D') {
-      sz = -sz;
+    const bool north_first = definition.axes.starts_with('N') || definition.axes.starts_with('S');
+    swapped = options.own_axes && kind != SystemKind::geocentric && north_first;
+    if (kind == SystemKind::compound) {
+      // Inside, heights count upwards.
+      sz = definition.axes.ends_with('D') ? -definition.vertical_unit.factor
+                                          : definition.vertical_unit.factor;
     }
   }
 
@@ -300,6 +294,7 @@ class TransformationImpl {
             : height_ways(one.vertical_code, other.vertical_code, one, wanted, options);
     const bool own_offsets = named_heights.size() == 1 && named_heights[0].starts_with("offset:");
     if (own_offsets) {
+      tell(named_heights[0]);
       add(offset_grid_step(named_heights[0].substr(7), options.grid_folders));
       accuracy = kNotANumber;
       go(one, other, true);
@@ -372,6 +367,7 @@ class TransformationImpl {
     for (const std::string& word : named) {
       if (!word.starts_with("geoid:")) continue;
       Way way;
+      way.name = word;
       way.accuracy = kNotANumber;
       return {end, way, geoid_step(word.substr(6), to_geoid, options.grid_folders)};
     }
@@ -402,12 +398,19 @@ class TransformationImpl {
                 "positions as they are.");
   }
 
-  // Tells of an operation on heights.
+  // What would give this transformation again, a word after the other.
+  void tell(const std::string& word) {
+    if (!operation.empty()) operation += " ";
+    operation += word;
+  }
+  void tell(const Link& link) {
+    tell((link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code));
+  }
+
+  // Tells of an operation on heights, or of the caller's grid, whose name is the way's.
   void note(const Way& way) {
-    for (const Link& link : way.links) {
-      if (!operation.empty()) operation += " ";
-      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
-    }
+    if (way.links.empty()) tell(way.name);
+    for (const Link& link : way.links) tell(link);
     accuracy += way.accuracy;
     if (area.name.empty() && !way.area.name.empty()) area = way.area;
   }
@@ -455,8 +458,7 @@ class TransformationImpl {
 
   void take(const Way& way, const TransformationOptions& options) {
     for (const Link& link : way.links) {
-      if (!operation.empty()) operation += " ";
-      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
+      tell(link);
       datum_words.push_back(in_words(link) + " (" +
                             Registry::shared().method_name(link.operation.method) + ")");
       if (auto step = datum_step(link, options, flat)) {
@@ -550,6 +552,7 @@ class TransformationImpl {
       bool reversed = word.starts_with('-');
       if (reversed) word.erase(0, 1);
       if (word.starts_with("grid:")) {
+        tell((reversed ? "-" : "") + word);
         add(shift_grid_step(word.substr(5), reversed, frame_of(one.datum), frame_of(other.datum),
                             options.grid_folders));
         accuracy = kNotANumber;

@@ -68,6 +68,10 @@ UnitDefinition read_length_unit(const WktNode& node) {
   return unit;
 }
 
+double factor_of(const WktNode* unit, double otherwise) {
+  return unit != nullptr ? read_unit(*unit).factor : otherwise;
+}
+
 const WktNode* any_unit(const WktNode& node) {
   return node.find("ANGLEUNIT", "LENGTHUNIT", "SCALEUNIT", "UNIT");
 }
@@ -76,8 +80,7 @@ EllipsoidDefinition read_ellipsoid(const WktNode& node) {
   EllipsoidDefinition ellipsoid;
   ellipsoid.name = node.text(0);
   ellipsoid.code = code_of(node);
-  const WktNode* unit = any_unit(node);
-  ellipsoid.a = need_figure(node, 1) * (unit != nullptr ? read_unit(*unit).factor : 1);
+  ellipsoid.a = need_figure(node, 1) * factor_of(any_unit(node), 1);
   ellipsoid.inverse_flattening = need_figure(node, 2);
   if (!(ellipsoid.a > 0) || !std::isfinite(ellipsoid.a)) {
     refuse(node, "has a semi-major axis that is no length above zero");
@@ -98,8 +101,7 @@ MeridianDefinition read_meridian(const WktNode& node, bool first_version, double
   if (first_version) {
     factor = std::fabs(value - 2.5969213) < 1e-6 ? kGradInRadians : kDegreeInRadians;
   }
-  if (const WktNode* unit = any_unit(node)) factor = read_unit(*unit).factor;
-  meridian.longitude = value * factor;
+  meridian.longitude = value * factor_of(any_unit(node), factor);
   if (!(std::fabs(meridian.longitude) <= 2 * kPi)) refuse(node, "is beyond a whole turn");
   return meridian;
 }
@@ -128,8 +130,8 @@ void read_datum(const WktNode& system, bool first_version, Definition& definitio
     if (const WktNode* axis = system.find("AXIS"); angle == nullptr && axis != nullptr) {
       angle = axis->find("ANGLEUNIT");
     }
-    const double factor = angle != nullptr ? read_unit(*angle).factor : kDegreeInRadians;
-    definition.datum.meridian = read_meridian(*meridian, first_version, factor);
+    definition.datum.meridian =
+        read_meridian(*meridian, first_version, factor_of(angle, kDegreeInRadians));
   }
 }
 
@@ -173,8 +175,8 @@ std::string read_axes(const WktNode& system) {
   // At a pole both point the same way: their names tell.
   const auto polar = [](char letter) { return letter == 'N' || letter == 'S'; };
   if (axes.size() >= 2 && axes[0] == axes[1] && polar(axes[0])) {
-    const bool told = by_names[0] != by_names[1];
-    axes.replace(0, 2, told ? by_names : "EN", 0, 2);
+    if (by_names[0] == by_names[1]) by_names = "EN";
+    axes.replace(0, 2, by_names, 0, 2);
   }
   return axes;
 }
@@ -228,6 +230,8 @@ constexpr MethodAlias kMethodAliases[] = {
     {"vandergrinteni", kVanDerGrinten},
 };
 
+bool is_called(std::string_view name, const std::string& wanted) { return bare(name) == wanted; }
+
 const Method& find_method(const WktNode& node) {
   if (const Method* method = method_by_code(code_of(node))) return *method;
   const std::string name = bare(node.text(0));
@@ -236,10 +240,10 @@ const Method& find_method(const WktNode& node) {
     if (alias.name == name) return *method_by_code(alias.code);
   }
   for (const Method& method : methods()) {
-    if (bare(method.name) == name || bare(method.wkt1) == name) return method;
+    if (is_called(method.name, name) || is_called(method.wkt1, name)) return method;
   }
   for (const Method& method : methods()) {
-    if (!method.esri.empty() && bare(method.esri) == name) return method;
+    if (is_called(method.esri, name)) return method;
   }
   if (const Method* method = method_by_words(node.text(0))) return *method;
   refuse(node, "names the projection method \"" + node.text(0).substr(0, 80) +
@@ -259,7 +263,9 @@ int code_by_name(const Method& method, const Given& given) {
   if (given.code != 0 && parameter_among(method, {given.code}) != 0) return given.code;
   for (const MethodParameter& parameter : method.parameters) {
     const ParameterKind& kind = *parameter_kind(parameter.code);
-    if (bare(kind.name) == given.name || bare(parameter.wkt1) == given.name) return parameter.code;
+    if (is_called(kind.name, given.name) || is_called(parameter.wkt1, given.name)) {
+      return parameter.code;
+    }
   }
   struct Group {
     std::initializer_list<std::string_view> names;
@@ -315,8 +321,7 @@ const Method& variant(const WktNode& name, const Method& method, std::vector<Giv
   };
   const auto degrees_of = [&](const Given* one) {
     if (one == nullptr) return 0.0;
-    const double factor = one->unit != nullptr ? read_unit(*one->unit).factor : angle.factor;
-    return one->value * (factor / kDegreeInRadians);
+    return one->value * (factor_of(one->unit, angle.factor) / kDegreeInRadians);
   };
   const double lat0 = degrees_of(find(given, {"latitudeoforigin", "latitudeofcenter"}));
   const Given* first = find(given, {"standardparallel1"});
@@ -338,7 +343,7 @@ const Method& variant(const WktNode& name, const Method& method, std::vector<Giv
     const bool scaled = find(given, {"scalefactor"}) != nullptr;
     if (word == "stereographic" && std::fabs(pole - 90) > 1e-9) return method;
     if (std::fabs(pole - 90) < 1e-9 && scaled) {
-      if (lat0 == 0 && first != nullptr) {
+      if (lat0 == 0) {  // the parallel is the pole
         given[static_cast<std::size_t>(first - &given[0])].name = "latitudeoforigin";
       }
       return code(9810);
@@ -378,7 +383,7 @@ void read_parameters(const WktNode& owner, const WktNode& name, const UnitDefini
         {&child, bare(child.text(0)), code_of(child), need_figure(child, 1), any_unit(child)});
   }
   const Method& named = find_method(name);
-  const bool by_code = code_of(name) == named.code || bare(named.name) == bare(name.text(0));
+  const bool by_code = code_of(name) == named.code || is_called(named.name, bare(name.text(0)));
   const bool second_version = name.value == "METHOD";
   const Method& method = variant(name, named, given, axes, angle, by_code && second_version);
   definition.method = method.code;
@@ -402,8 +407,7 @@ void read_parameters(const WktNode& owner, const WktNode& name, const UnitDefini
       case Quantity::scale:
         break;
     }
-    if (one.unit != nullptr) factor = read_unit(*one.unit).factor;
-    const double value = one.value * factor;
+    const double value = one.value * factor_of(one.unit, factor);
     if (!std::isfinite(value)) refuse(*one.node, "is out of range");
     if (definition.parameter(code, value) != value) {
       refuse(*one.node, "\"" + one.node->text(0).substr(0, 80) + "\" has two different values");
@@ -459,7 +463,7 @@ Definition read_geographic(const WktNode& node) {
   read_datum(node, first_version, definition);
   const WktNode* kind = node.find("CS");
   const bool cartesian =
-      kind != nullptr && !kind->children.empty() && bare(kind->children[0].value) == "cartesian";
+      kind != nullptr && !kind->children.empty() && is_called(kind->children[0].value, "cartesian");
   if (node.is("GEOCCS") || cartesian) {
     definition.kind = SystemKind::geocentric;
     definition.unit = length_unit_of(node);
@@ -515,12 +519,7 @@ Definition read_projected(const WktNode& node) {
     read_parameters(conversion, need(conversion, "METHOD", "PROJECTION"), angle, definition.unit,
                     definition.axes, definition);
   }
-  if (definition.axes.empty()) {
-    definition.axes = "EN";
-    if (definition.method == 9808 || definition.method == 9828) definition.axes = "WS";
-    if (definition.method == 9819 || definition.method == 1042) definition.axes = "SW";
-    if (definition.method == 9826) definition.axes = "WN";
-  }
+  if (definition.axes.empty()) definition.axes = natural_axes(definition.method);
   read_area(node, definition);
   recognise_datum(definition);
   return definition;
@@ -623,8 +622,7 @@ Definition read_bound(const WktNode& node) {
       refuse(child, "\"" + child.text(0).substr(0, 80) + "\" is none of the seven to WGS 84");
     }
     const WktNode* unit = any_unit(child);
-    const double factor = unit != nullptr ? read_unit(*unit).factor : 1;
-    double value = need_figure(child, 1) * factor;
+    double value = need_figure(child, 1) * factor_of(unit, 1);
     if (i >= 3 && i < 6) {
       if (unit != nullptr) value /= kDegreeInRadians / 3600;
       if (frame) value = -value;

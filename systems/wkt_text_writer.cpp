@@ -35,6 +35,10 @@ std::string underscored(std::string_view name) {
   return result;
 }
 
+std::string_view either(std::string_view name, std::string_view otherwise = "unknown") {
+  return name.empty() ? otherwise : name;
+}
+
 // One text grows from left to right.
 class Writer {
  public:
@@ -60,6 +64,9 @@ class Writer {
  private:
   bool second() const { return version_ == Wkt::wkt2; }
   bool esri() const { return version_ == Wkt::esri; }
+  std::string in_dialect(std::string_view name) const {
+    return esri() ? underscored(name) : std::string(name);
+  }
 
   void id(int code) {
     if (code <= 0 || esri()) return;
@@ -68,7 +75,7 @@ class Writer {
   }
 
   void unit(const char* keyword, const UnitDefinition& unit, const char* otherwise) {
-    std::string name = unit.name.empty() ? otherwise : unit.name;
+    std::string name(either(unit.name, otherwise));
     if (esri() && name == "metre") name = "Meter";
     if (esri() && name == "degree") name = "Degree";
     if (esri() && name == "US survey foot") name = "Foot_US";
@@ -80,9 +87,8 @@ class Writer {
   void degree() { unit("ANGLEUNIT", {"degree", 9102, kDegreeInRadians}, "degree"); }
 
   void ellipsoid(const EllipsoidDefinition& ellipsoid) {
-    const std::string name = ellipsoid.name.empty() ? "unknown" : ellipsoid.name;
-    out_ += std::string(second() ? "ELLIPSOID[" : "SPHEROID[") +
-            in_quotes(esri() ? underscored(name) : name) + "," + number_text(ellipsoid.a) + "," +
+    out_ += second() ? "ELLIPSOID[" : "SPHEROID[";
+    out_ += in_quotes(in_dialect(either(ellipsoid.name))) + "," + number_text(ellipsoid.a) + "," +
             number_text(ellipsoid.inverse_flattening);
     if (second()) out_ += ",LENGTHUNIT[\"metre\",1]";
     id(ellipsoid.code);
@@ -90,15 +96,11 @@ class Writer {
   }
 
   void datum(const DatumDefinition& datum) {
-    const std::string name = datum.name.empty() ? "unknown" : datum.name;
-    out_ += ",DATUM[";
-    if (second()) {
-      out_ += in_quotes(name);
-    } else if (esri()) {
-      out_ += in_quotes(datum.code == 6326 ? "D_WGS_1984" : "D_" + underscored(name));
-    } else {
-      out_ += in_quotes(datum.code == 6326 ? "WGS_1984" : underscored(name));
-    }
+    std::string name(either(datum.name));
+    if (!second()) name = underscored(name);
+    if (!second() && datum.code == 6326) name = "WGS_1984";
+    if (esri() && !name.starts_with("D_")) name.insert(0, "D_");
+    out_ += ",DATUM[" + in_quotes(name);
     out_ += ",";
     ellipsoid(datum.ellipsoid);
     if (!second() && !esri() && datum.to_wgs84) {
@@ -109,17 +111,17 @@ class Writer {
       out_ += "]";
     }
     id(datum.code);
-    const std::string meridian = datum.meridian.name.empty() ? "unknown" : datum.meridian.name;
-    out_ += "],PRIMEM[" + in_quotes(meridian) + "," + degrees_text(datum.meridian.longitude);
+    out_ += "],PRIMEM[" + in_quotes(either(datum.meridian.name)) + "," +
+            degrees_text(datum.meridian.longitude);
     if (second()) degree();
     id(datum.meridian.code);
     out_ += "]";
   }
 
   // Of a projected system's base, or of a system in version 1.
-  void geographic_head(const char* keyword, std::string name, const Definition& definition) {
-    if (name.empty()) name = "unknown";
-    if (esri()) name = "GCS_" + underscored(name);
+  void geographic_head(const char* keyword, std::string_view given, const Definition& definition) {
+    std::string name = in_dialect(either(given));
+    if (esri() && !name.starts_with("GCS_")) name.insert(0, "GCS_");
     out_ += std::string(keyword) + "[" + in_quotes(name);
     datum(definition.datum);
   }
@@ -130,16 +132,15 @@ class Writer {
       const char letter = definition.axes[i];
       const bool east = letter == 'E' || letter == 'W';
       const bool up = letter == 'U';
-      const char* direction = letter == 'E'   ? "east"
+      std::string direction = letter == 'E'   ? "east"
                               : letter == 'W' ? "west"
                               : letter == 'N' ? "north"
                               : letter == 'S' ? "south"
                                               : "up";
-      out_ += ",AXIS[" +
-              in_quotes(names[up     ? 2
-                              : east ? 0
-                                     : 1]) +
-              "," + (second() ? direction : upper(direction));
+      if (!second()) {
+        for (char& c : direction) c = static_cast<char>(c - 32);  // capitals
+      }
+      out_ += ",AXIS[" + in_quotes(names[up ? 2 : east ? 0 : 1]) + "," + direction;
       if (second()) {
         out_ += ",ORDER[" + std::to_string(i + 1) + "]";
         if (up) {
@@ -151,11 +152,6 @@ class Writer {
       out_ += "]";
     }
   }
-  static std::string upper(std::string word) {
-    for (char& c : word) c = static_cast<char>(c - 32);
-    return word;
-  }
-
   void usage(const Definition& definition) {
     if (!second() || definition.area.empty()) return;
     out_ += ",USAGE[SCOPE[\"unknown\"],AREA[" + in_quotes(definition.area) + "],BBOX[" +
@@ -330,15 +326,14 @@ class Writer {
     static const char* const kNames[] = {"(E)", "(N)", "(H)"};
     static const char* const kNamesOfVersion1[] = {"Easting", "Northing", "Height"};
     const Method& method = method_of(definition);
-    const std::string name = definition.name.empty() ? "unknown" : definition.name;
-    const std::string base = definition.base.empty() ? definition.datum.name : definition.base;
+    const std::string_view name = either(definition.name);
+    const std::string_view base = either(definition.base, definition.datum.name);
     if (second()) {
       out_ += "PROJCRS[" + in_quotes(name) + ",";
       geographic_head("BASEGEOGCRS", base, definition);
       id(definition.base_code);
-      out_ += "],CONVERSION[" +
-              in_quotes(definition.conversion.empty() ? "unnamed" : definition.conversion) +
-              ",METHOD[" + in_quotes(method.name);
+      out_ += "],CONVERSION[" + in_quotes(either(definition.conversion, "unnamed")) + ",METHOD[" +
+              in_quotes(method.name);
       id(method.code);
       out_ += "]";
       for (const MethodParameter& given : method.parameters) {
@@ -350,7 +345,7 @@ class Writer {
       axes(definition, "LENGTHUNIT", kNames);
       usage(definition);
     } else {
-      out_ += "PROJCS[" + in_quotes(esri() ? underscored(name) : name) + ",";
+      out_ += "PROJCS[" + in_quotes(in_dialect(name)) + ",";
       geographic_head("GEOGCS", base, definition);
       degree();
       id(definition.base_code);
@@ -382,9 +377,8 @@ class Writer {
 
   void vertical(const Definition& definition, int code) {
     const bool down = definition.axes.ends_with('D');
-    const std::string datum =
-        definition.vertical_datum.empty() ? definition.vertical_name : definition.vertical_datum;
     const std::string& name = definition.vertical_name;
+    const std::string_view datum = either(definition.vertical_datum, name);
     if (second()) {
       out_ += "VERTCRS[" + in_quotes(name) + ",VDATUM[" + in_quotes(datum) + "],CS[vertical,1]" +
               (down ? ",AXIS[\"depth (D)\",down" : ",AXIS[\"gravity-related height (H)\",up");

@@ -42,6 +42,14 @@ std::optional<double> number(std::string_view text) {
   return value;
 }
 
+bool horizontal_axes(std::string_view axes) {
+  if (axes.size() < 2 || axes.size() > 3) return false;
+  const auto along = [&](std::string_view letters) {
+    return letters.find(axes[0]) != letters.npos || letters.find(axes[1]) != letters.npos;
+  };
+  return along("EW") && along("NS") && (axes.size() == 2 || axes[2] == 'U');
+}
+
 std::vector<std::string> words_of(std::string_view text) {
   std::vector<std::string> words;
   std::string word;

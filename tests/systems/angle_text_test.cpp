@@ -132,6 +132,8 @@ TEST(AngleFromText, WhatIsAmbiguousOrWrongIsRefused) {
   expect_refused("48.5 o", "write W or E");
   expect_refused("48.5 OE", "\"OE\"");
   expect_refused("48.5x", "\"x\"");
+  EXPECT_EQ(parse_angle(std::string(100, '\x80')).reason,
+            "\"...\" has \"...\" in it, which is no part of an angle.");
   // A long text is cut between two characters.
   expect_refused(std::string(59, ' ') + std::string(59, '1') + "\u00E9\u00E9 x",
                  "\"" + std::string(59, '1') + "...\" has \"\u00E9\"");
@@ -179,6 +181,21 @@ TEST(AngleFromText, PlainNumbersAreTheNearestDoublesInEveryLocale) {
     std::from_chars(text, end, expected);
     EXPECT_EQ(parse_angle({text, end}).degrees, expected);
   }
+}
+
+// More digits than a double has: too large is infinite, too small is nothing.
+TEST(AngleFromText, DigitsBeyondADouble) {
+  const auto value = [](const std::string& text) {
+    const detail::Digits digits = detail::read_digits(text.data(), text.data() + text.size());
+    EXPECT_EQ(digits.end, text.data() + text.size());
+    return digits.value;
+  };
+  const std::string ones(450, '1');
+  EXPECT_EQ(value(ones), HUGE_VAL);
+  EXPECT_EQ(value(ones + ".5"), HUGE_VAL);
+  EXPECT_EQ(value("0." + std::string(350, '0') + "1"), 0);
+  EXPECT_EQ(value("0." + std::string(300, '0') + "1"), 1e-301);
+  EXPECT_EQ(value("0." + ones), 1 / 9.0);
 }
 
 // Each byte in the middle, at the beginning and at the end, and every text cut at each place.

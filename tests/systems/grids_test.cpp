@@ -572,6 +572,14 @@ TEST(ShiftGrids, NadconNodesWithoutData) {
     write("g.los", odd);
     EXPECT_TRUE(std::isnan(shifts().forward(Point{-16.5, 42.5, 0}).y));
   }
+  // From beyond an edge that has no data there is no way back.
+  folder.write(
+      "g.las",
+      GridFile{-20, 40, 25, 8, [](int, int c) { return c < 2 ? 999.0F : 900.0F / 3600; }}.bytes());
+  write("g.los", 2);
+  EXPECT_TRUE(std::isnan(shifts().inverse(Point{-20.3, 43.5, 0}).x));
+  EXPECT_TRUE(std::isnan(shifts().inverse(Point{-19.5, 43.5, 0}).x));
+  EXPECT_FALSE(std::isnan(shifts().inverse(Point{-17.5, 43.5, 0}).x));
   write("g.las", 180);
   write("g.los", 180);
   const Point p = shifts().forward(Point{-16, 43, 0});  // the node itself
@@ -1208,6 +1216,35 @@ TEST_F(BadGrids, TiffsThatCannotBe) {
   EXPECT_NE(refusal<GeoidGrid>(path).find("no band of undulations"), std::string::npos);
 }
 
+// Tiles larger than any memory, or of no size, as a damaged header has them.
+TEST_F(BadGrids, TiffsWhoseTilesCannotBe) {
+  const std::string path = (folder.path() / "x.tif").string();
+  TiffImage image{
+      10, 50, 1, 1, 40, 40, {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  image.tiled = true;
+  write_tiff(path, {image});
+  const std::string good = file_bytes(path);
+  EXPECT_EQ(refusal<ShiftGrid>(path), "");
+  // The entries of the tiles' width and height in the directory: tag, type, count, value.
+  const auto with = [&](int width, int height) {
+    std::string bytes = good;
+    for (const auto& [tag, value] : {std::pair(322, width), {323, height}}) {
+      const std::string entry = {
+          static_cast<char>(tag & 0xff), static_cast<char>(tag >> 8), 3, 0, 1, 0, 0, 0};
+      const std::size_t at = bytes.find(entry);
+      EXPECT_NE(at, std::string::npos);
+      bytes[at + 8] = static_cast<char>(value & 0xff);
+      bytes[at + 9] = static_cast<char>(value >> 8);
+    }
+    return bytes;
+  };
+  expect_refused("y.tif", with(0x7ff0, 0x7ff0), "tiles or rows of a size that cannot be");
+  for (const auto& [width, height] : {std::pair(0, 32), {32, 0}, {0, 0}}) {
+    folder.write("y.tif", with(width, height));
+    EXPECT_NE(refusal<ShiftGrid>((folder.path() / "y.tif").string()), "") << width << " " << height;
+  }
+}
+
 TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
   const std::string path = (folder.path() / "x.tif").string();
   TiffImage image{
@@ -1377,7 +1414,16 @@ TEST(GridOperations, GeocentricTranslationsOfAnyHeight) {
   const Transformation lost = by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
   EXPECT_EQ(word_of(lost, 2.3, 47.3, false), TW_NOT_CONVERGED);
   EXPECT_EQ(word_of(lost, 2.3, 47.3, true), TW_SUCCESS);
-  // Each of the three bands must be there.
+  // A national grid by that name holds no translations; each of the three bands must be there.
+  folder.write("fr_ign_gr3df97a.tif", GsbFile{{plane("A", "NONE", 40, 50, -20, 10, 1, 1)}}.bytes());
+  try {
+    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+    ADD_FAILURE();
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find("of NTv2's form holds no translations"),
+              std::string::npos)
+        << error.what();
+  }
   for (std::size_t k = 0; k < 3; ++k) {
     TiffImage lacking = translations();
     lacking.bands[k].description = "w_translation";
@@ -1440,6 +1486,10 @@ TEST(GridOperations, GridsOfTheCallers) {
   const Transformation paris = map("EPSG:4807", "EPSG:4258", "grid:own.gsb");
   const Transformation joined = map("EPSG:4277", "EPSG:4326", "grid:own.gsb EPSG:1149");
   EXPECT_TRUE(std::isnan(there.accuracy()));
+  // What they tell of themselves makes them again.
+  EXPECT_EQ(there.operation(), "grid:own.gsb");
+  EXPECT_EQ(back.operation(), "-grid:own.gsb");
+  EXPECT_EQ(joined.operation(), "grid:own.gsb EPSG:1149");
   EXPECT_NE(there.describe().find("NTv2 grid of 16 rows and 31 columns, OLD to NEW " +
                                   (folder.path() / "own.gsb").string()),
             std::string::npos)
@@ -1530,6 +1580,7 @@ TEST(GridOperations, OffsetsBetweenVerticalDatums) {
     EXPECT_EQ(own.forward(p).z, to.z);
   }
   EXPECT_TRUE(std::isnan(own.accuracy()));
+  EXPECT_EQ(own.operation(), "offset:auckht1946-nzvd2016.gtx");
   EXPECT_TRUE(std::isnan(there.forward({160, -36, 5}).z));
   // Positions on another datum would be read a hundred metres off; the way over the ellipsoid wants
   // a grid that is not there.

@@ -49,7 +49,7 @@ TEST(Mgrs, PublishedReferences) {
 
 TEST(Mgrs, FormsOfTheText) {
   for (const char* text : {"31UDQ4825111932", "31U DQ 48251 11932", " 31 u dq 4825111932 ",
-                           "31U\tDQ48251 11932\n", "31UD Q48251 11932"}) {
+                           "31U\tDQ48251 11932\n", "31UDQ\r48251 11932\r\n", "31UD Q48251 11932"}) {
     expect_square(text, 31, true, 448251, 5411932, 1);
   }
   expect_square("31UDQ48251251193225", 31, true, 448251.25, 5411932.25, 0.01);
@@ -189,6 +189,7 @@ TEST(Mgrs, AnotherZoneThanThePointsOwn) {
 }
 
 TEST(Mgrs, TheEquatorBelongsToTheNorth) {
+  EXPECT_EQ(format_mgrs(GridPosition{31, false, 500000, 1e7}, 0), "31NEA");
   EXPECT_EQ(format_mgrs(3, 0, 5), "31NEA0000000000");
   EXPECT_EQ(format_mgrs(3, -1e-13, 5), "31MEV0000099999");
   // So near that its northing is the false northing itself, and 80 degrees more are 80.

@@ -80,6 +80,9 @@ TEST(PositionFromText, TheOrderIsNeverGuessed) {
   // An angle beyond 90 degrees is a longitude.
   expect_position("148.25 2.5", 148.25, 2.5);
   expect_position("2.5 148.25", 148.25, 2.5);
+  // With a blank between, signs are no form of ISO 6709, which has latitude first.
+  expect_position("+148.25 -002.5", 148.25, -2.5);
+  expect_refused("+48.25 -002.5/", "sign amid");
   expect_refused("2.5 148.25", "beyond 90", Order::longitude_first);
 }
 
@@ -112,6 +115,8 @@ TEST(PositionFromText, WhatIsAmbiguousOrWrongIsRefused) {
   expect_refused("48.25", "where the second angle", first);
   expect_refused("48 51 24", "where the second angle", first);
   expect_refused("2 30 48 15 7", "where the second angle", first);
+  expect_refused("-2 -48 -7", "where the second angle", first);
+  expect_refused("2.5 48 35", "where the second angle", first);
   expect_refused("2.5,,48", "no angle", first);
   expect_refused(",2.5,48", "no angle", first);
   expect_refused("2.5,48,", "no height", first);

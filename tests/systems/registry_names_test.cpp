@@ -37,6 +37,11 @@ TEST(FoldedNames, TakeAnyBytes) {
   }
 }
 
+TEST(FoldedNames, AreSplitAtTheirBlanks) {
+  EXPECT_EQ(split_words("  utm  31n "), (std::vector<std::string_view>{"utm", "31n"}));
+  EXPECT_TRUE(split_words("  ").empty());
+}
+
 TEST(FoldedNames, KeysHaveNoBlanks) {
   EXPECT_EQ(name_key("WGS 84"), "wgs84");
   EXPECT_EQ(name_key("WGS_84"), name_key("wgs84"));

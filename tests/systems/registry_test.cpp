@@ -11,6 +11,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <iostream>
 #include <limits>
 #include <map>
 #include <numbers>
@@ -21,6 +22,9 @@
 #include "csv.hpp"
 #include "store_path.hpp"
 #include "support/data.hpp"
+#include "support/little_memory.hpp"
+#include "system_impl.hpp"
+#include "text_forms.hpp"
 
 namespace fs = std::filesystem;
 
@@ -585,6 +589,24 @@ TEST(RegistryOperations, InStepsAndReplaced) {
   EXPECT_GT(replaced, 100U);
 }
 
+TEST(RegistryOperations, OfEverySystemAreThoseOfItsDatum) {
+  std::map<int, std::set<int>> of_datum;
+  const auto datum_of = [](int code) {
+    const auto system = registry().system(code);
+    return system && system->kind != SystemKind::compound ? system->datum : 0;
+  };
+  for (const int code : registry().operations()) {
+    const auto operation = registry().operation(code);
+    of_datum[datum_of(operation->source)].insert(code);
+    of_datum[datum_of(operation->target)].insert(code);
+  }
+  for (const int code : registry().systems()) {
+    if (const int datum = datum_of(code)) {
+      EXPECT_EQ(codes_of(registry().operations(code)), of_datum[datum]) << code;
+    }
+  }
+}
+
 TEST(RegistryOperations, AllOfADatumOrderedByAccuracy) {
   const auto operations = registry().operations(4275);
   EXPECT_GE(operations.size(), 14U);
@@ -775,11 +797,28 @@ TEST_F(RegistryStores, ThatLieAreRefused) {
       {"UPDATE \"projected systems\" SET base = 1 WHERE code = 2154", "base"},
       {"UPDATE \"projected systems\" SET axes = 'Q!' WHERE code = 2154", "axes"},
       {"UPDATE \"projected systems\" SET axes = 'E' WHERE code = 2154", "axes"},
+      {"UPDATE \"projected systems\" SET base = 2147483647 WHERE code = 2154", "base"},
+      {"UPDATE \"projected systems\" SET axes = 'EE' WHERE code = 2154", "axes"},
+      {"UPDATE \"geodetic systems\" SET kind = 0 WHERE code = 4326", "kind"},
       {"UPDATE \"geodetic systems\" SET kind = 9 WHERE code = 4326", "kind"},
+      {"UPDATE \"geodetic systems\" SET axes = 'NE' WHERE code = 4979", "axes"},
+      {"UPDATE \"geodetic systems\" SET axes = 'EE' WHERE code = 4326", "axes"},
+      {"UPDATE \"geodetic systems\" SET axes = 'NED' WHERE code = 4979", "axes"},
+      {"UPDATE \"geodetic systems\" SET axes = 'NEU' WHERE code = 4978", "axes"},
+      {"UPDATE \"vertical systems\" SET axes = 'E' WHERE code = 5773", "axes"},
       {"UPDATE \"geodetic systems\" SET axes = 'NEU' WHERE code = 4326", "axes"},
       {"UPDATE \"compound systems\" SET horizontal = code WHERE code = 7405", "horizontal"},
       {"UPDATE \"compound systems\" SET vertical = 4326 WHERE code = 7405", "vertical"},
+      {"UPDATE \"compound systems\" SET horizontal = 5701 WHERE code = 7405", "two axes"},
+      {"UPDATE \"compound systems\" SET horizontal = 4978 WHERE code = 7405", "two axes"},
+      {"UPDATE \"compound systems\" SET vertical = 999999 WHERE code = 7405", "vertical"},
       {"UPDATE ellipsoids SET semi_major_axis = -1 WHERE code = 7030", "ellipsoid"},
+      {"UPDATE ellipsoids SET semi_minor_axis = -1 WHERE code = 7030", "ellipsoid"},
+      {"UPDATE ellipsoids SET semi_minor_axis = 6378138 WHERE code = 7030", "ellipsoid"},
+      {"UPDATE ellipsoids SET inverse_flattening = 0.5 WHERE code = 7030", "ellipsoid"},
+      {"WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n LIMIT 1000001) "
+       "INSERT INTO \"datum members\" SELECT 900000, i FROM n",
+       "\"datum members\" has 10"},
       {"UPDATE units SET kind = 'weight' WHERE code = 9001", "kind"},
       {"UPDATE units SET factor = -1 WHERE code = 9001", "factor"},
       {"UPDATE areas SET west = 1000 WHERE code = 1262", "Earth"},
@@ -826,6 +865,158 @@ TEST_F(RegistryStores, DamagedAnywhereAreRefusedOrAnswer) {
     }
   }
 }
+
+// Values that no entry of the registry has at hand.
+TEST_F(RegistryStores, OfOtherEntriesAnswerAsTheyStand) {
+  const Registry other(
+      altered("UPDATE transformations SET accuracy = -1 WHERE code = 1193;"
+              "UPDATE \"grid transformations\" SET accuracy = -1 WHERE code = 9327;"
+              "UPDATE transformations SET source = 1 WHERE code = 1133;"
+              "UPDATE transformations SET target = 1 WHERE code = 1134;"
+              "UPDATE ellipsoids SET semi_minor_axis = semi_major_axis WHERE code = 7030;"
+              "UPDATE units SET factor = 0 WHERE code = 9003;"
+              "INSERT INTO aliases VALUES (0, 999999, 'no system of that code');"
+              "INSERT INTO aliases VALUES (9, 2154, 'another kind of name');"
+              "WITH RECURSIVE n(i) AS (SELECT 1 UNION ALL SELECT i + 1 FROM n LIMIT 20) "
+              "INSERT INTO \"method parameters\" SELECT 999999, i FROM n;"
+              "UPDATE transformations SET method = 999999 WHERE code IN (8049, 1193)"));
+  // An accuracy that is not known goes last, whatever the codes.
+  const auto operations = other.operations(4275, 4326);
+  ASSERT_EQ(operations.size(), 2U);
+  EXPECT_EQ(operations[0].code, 15960);
+  EXPECT_EQ(operations[1].code, 1193);
+  EXPECT_TRUE(std::isnan(operations[1].accuracy));
+  const auto all = other.operations(4275);
+  ASSERT_GT(all.size(), 3U);
+  EXPECT_TRUE(std::isnan(all[all.size() - 1].accuracy) && std::isnan(all[all.size() - 2].accuracy));
+  EXPECT_FALSE(std::isnan(all[all.size() - 3].accuracy));
+  // From or to a system that is none leads nowhere.
+  EXPECT_TRUE(with_code(registry().operations(4230), 1133));
+  EXPECT_FALSE(with_code(other.operations(4230, 4326), 1133));
+  EXPECT_FALSE(with_code(other.operations(4230, 4326), 1134));
+  EXPECT_TRUE(other.operations(1).empty());
+  // A semi-minor axis as long as the other one tells no flattening.
+  EXPECT_EQ(other.ellipsoid(7030)->inverse_flattening, 298.257223563);
+  EXPECT_NE(sentence([&] {
+              other.base_value({0, 1, 9003});
+            }).find("unit 9003, which has no factor"),
+            std::string::npos);
+  EXPECT_FALSE(other.system("no system of that code"));
+  EXPECT_TRUE(other.search("no system of that code").empty());
+  EXPECT_FALSE(other.system("another kind of name"));
+  EXPECT_TRUE(other.suggest("no system of that cod").empty());
+  // No more parameters than an entry has places for: 7 and 8 more.
+  EXPECT_EQ(other.operation(8049)->parameters.size(), 15U);
+  EXPECT_EQ(other.operation(1193)->parameters.size(), 7U);
+}
+
+// From a datum to itself leads what moves its points in time, and nothing that leaves it.
+TEST(RegistryOperations, WithinOneDatum) {
+  EXPECT_EQ(codes_of(registry().operations(8251, 8251)), (std::set<int>{8676}));
+  EXPECT_GT(registry().operations(8251).size(), 1U);
+}
+
+TEST(RegistryFiles, EllipsoidsAreListed) {
+  const Source source("ellipsoids");
+  const std::vector<int> codes = registry().ellipsoids();
+  ASSERT_EQ(codes.size(), source.size());
+  for (std::size_t i = 0; i < source.size(); ++i) EXPECT_EQ(codes[i], source.integer(i, "code"));
+}
+
+// The process's own registry, read from a store in which something is missing that others refer to:
+// each in a process of its own.
+TEST_F(RegistryStores, WithHolesRefuseWhatStandsOnThem) {
+  GTEST_FLAG_SET(death_test_style, "threadsafe");
+  struct Hole {
+    const char* sql;
+    int system;
+    const char* words;
+  };
+  const Hole holes[] = {
+      {"UPDATE \"projected systems\" SET unit = 1 WHERE code = 2154", 2154,
+       "no unit 1, which RGF93 v1 / Lambert-93 refers to"},
+      {"DELETE FROM datums WHERE code = 6171", 2154,
+       "no datum 6171, which the definition refers to"},
+      {"DELETE FROM ellipsoids WHERE code = 7019", 2154,
+       "no ellipsoid 7019, which the definition refers to"},
+      {"DELETE FROM meridians WHERE code = 8901", 2154, "no prime meridian 8901, which R"},
+      {"DELETE FROM conversions WHERE code = 18085", 2154,
+       "no conversion 18085, which RGF93 v1 / Lambert-93 refers to"},
+      {"DELETE FROM datums WHERE code = 5101", 7405, "no datum 5101, which ODN height refers to"},
+      {"DELETE FROM datums WHERE code = 5101", 5701, "no datum 5101, which ODN height refers to"},
+      {"UPDATE \"vertical systems\" SET unit = 1 WHERE code = 5701", 7405,
+       "no unit 1, which OSGB36 / British National Grid . ODN height refers to"},
+      {"UPDATE \"vertical systems\" SET unit = 1 WHERE code = 5701", 5701,
+       "no unit 1, which ODN height refers to"},
+      // Without an area of use it is the whole Earth; sexagesimal degrees are degrees.
+      {"DELETE FROM areas WHERE code = 1326; UPDATE \"projected systems\" SET area = 99999 "
+       "WHERE code = 2154",
+       2154, "RGF93 v1 / Lambert-93, -180 to 180"},
+      {"UPDATE \"geodetic systems\" SET unit = 9110 WHERE code = 4171", 4171,
+       "RGF93 v1, .* of degree"},
+  };
+  for (const Hole& hole : holes) {
+    EXPECT_EXIT(
+        {
+          setenv("TIDEWATER_STORE", altered(hole.sql).c_str(), 1);
+          try {
+            const detail::Definition known = detail::definition_from_registry(hole.system);
+            std::cerr << known.name << ", " << known.west << " to " << known.east << " of "
+                      << known.unit.name;
+          } catch (const Error& error) {
+            std::cerr << error.what();
+          }
+          fs::remove_all(folder_.path());
+          std::exit(0);
+        },
+        ::testing::ExitedWithCode(0), hole.words)
+        << hole.sql;
+  }
+  // Without a registry a text speaks for itself.
+  EXPECT_EXIT(
+      {
+        setenv("TIDEWATER_STORE", path("absent").c_str(), 1);
+        const detail::Definition read = detail::definition_from_wkt(
+            "GEOGCS[\"g\",DATUM[\"WGS_1984\",SPHEROID[\"s\",6378137,298.257223563]]]");
+        std::cerr << read.datum.name << " " << read.datum.code;
+        fs::remove_all(folder_.path());
+        std::exit(0);
+      },
+      ::testing::ExitedWithCode(0), "WGS_1984 0");
+}
+
+#ifdef __linux__
+
+// A program that stands where there is no store says where it looked, also one found by its name.
+TEST_F(RegistryStores, ThatAreNowhereAreLookedForBesideTheProgram) {
+  TIDEWATER_NEED_NEW_PROCESS();
+  constexpr const char* kCopied = "TIDEWATER_COPIED_TEST";
+  if (std::getenv(kCopied) != nullptr) {
+    std::cout << sentence([] { detail::store_path(); }) << std::endl;
+    return;
+  }
+  const fs::path program = folder_.path() / "copied_test";
+  fs::copy_file("/proc/self/exe", program);
+  const std::string arguments =
+      " --gtest_filter=RegistryStores.ThatAreNowhereAreLookedForBesideTheProgram > " +
+      path("printed");
+  const std::string before =
+      std::string("unset TIDEWATER_STORE GTEST_TOTAL_SHARDS GTEST_SHARD_INDEX; ") + kCopied + "=1 ";
+  for (const std::string& call :
+       {before + program.string(), before + "PATH=" + folder_.path().string() + " copied_test"}) {
+    EXPECT_EQ(std::system((call + arguments).c_str()), 0) << call;
+    std::ifstream in(path("printed"));
+    const std::string printed{std::istreambuf_iterator<char>(in), {}};
+    EXPECT_NE(printed.find("No parameter store was found at \""), std::string::npos) << printed;
+    EXPECT_NE(printed.find("\"" + (fs::canonical(folder_.path()) / "tidewater.store").string()),
+              std::string::npos)
+        << printed;
+    EXPECT_NE(printed.find("the environment variable TIDEWATER_STORE may name one."),
+              std::string::npos);
+  }
+}
+
+#endif
 
 TEST_F(RegistryStores, WithHolesAnswerWithNothing) {
   const Registry holes(

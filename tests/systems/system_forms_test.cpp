@@ -89,6 +89,10 @@ TEST(SystemNames, UtmOnAnyDatum) {
   expect_refused("utm:31N EPSG:5773", "is not a geographic system");
   // One that the registry knows by another name: its SHMG2015 is UTM.
   EXPECT_EQ(System("utm:30S SHGD2015").code(), 7887);
+  // Zones count from Greenwich: 3 degrees less the 2.33722917 of Paris.
+  const auto parameters = System("utm:31N EPSG:4807").parameters();
+  EXPECT_EQ(parameters.at(1).first, "Longitude of natural origin");
+  EXPECT_NEAR(parameters.at(1).second, 3 - 2.33722917, 1e-12);
   // Whatever the form of the base.
   EXPECT_EQ(System("utm:31n EPSG:4978").code(), 32631);
   EXPECT_EQ(System("utm:31N EPSG:4979").code(), 32631);
@@ -168,6 +172,7 @@ TEST(SystemNames, OfTheRegistry) {
   expect_refused("EPSG:27582",
                  "The registry has withdrawn EPSG:27582, NTF (Paris) / France II; EPSG:27572 takes "
                  "its place.");
+  expect_refused("EPSG:2008", "The registry has withdrawn EPSG:2008, NAD27(CGQ77) / SCoPQ zone 2.");
   // Heights stand beside two axes alone, and both parts are codes.
   for (const char* none : {"EPSG:4978+5773", "EPSG:4979+5773", "EPSG:7405+5773"}) {
     expect_refused(none, "must be a horizontal system and a vertical one");
@@ -235,6 +240,7 @@ TEST(SystemNames, Definitions) {
   expect_refused("transverse mercator lon0=inf ellps=GRS80", "\"inf\" is no number");
   expect_refused("transverse mercator lon0=9x ellps=GRS80", "\"9x\" is no number");
   EXPECT_NEAR(forward(System("transverse mercator lon0=+9 ellps=GRS80"), 9, 0).x, 0, 1e-9);
+  expect_refused("transverse mercator lon0=9 Lon0=9 ellps=GRS80", "\"lon0\" is given twice");
   expect_refused("transverse lon0=9 mercator ellps=GRS80", "\"mercator\" is no name=value");
   for (const char* seven : {"1,2", "1,2,3,4,5,6,7,8", "1,x,3", "1,2,"}) {
     expect_refused("geographic ellps=GRS80 towgs84=" + std::string(seven),
@@ -301,6 +307,10 @@ TEST(SystemNames, GeographicAxesOfTheOtherDirection) {
 }
 
 TEST(SystemNames, ProjStrings) {
+  for (const char* text : {"+proj=utm +zone=31 +ellps=GRS80", "proj=utm zone=31 ellps=GRS80",
+                           "zone=31 ellps=GRS80 proj=utm", "zone=31 ellps=GRS80 +proj=utm"}) {
+    EXPECT_EQ(System(text).method(), "Transverse Mercator") << text;
+  }
   // Other names for one ellipsoid: figures by f, e squared, b.
   const double rf = 298.257222101, f = 1 / rf;
   const auto flattening = [](const std::string& words) {

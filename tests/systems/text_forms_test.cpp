@@ -57,6 +57,7 @@ TEST(WktSyntax, BracketsQuotesAndNumbers) {
   EXPECT_EQ(a.find("C"), nullptr);
   EXPECT_EQ(objects[1].figure(0, 0), 7);
   EXPECT_EQ(a.text(1), "");
+  EXPECT_EQ(a.text(99), "");
   EXPECT_EQ(a.figure(0, 5), 5);
   EXPECT_EQ(a.figure(99, 5), 5);
   for (const char* date : {"2010-05-02", "2010-05-02T10:00:30.5Z", "2010-05-02T10:00+01:00"}) {
@@ -187,6 +188,28 @@ TEST(Wkt, AxesHaveTheirNumbersAndAtAPoleTheirNames) {
   }
 }
 
+// A datum is the registry's where its name or its code is and its figures are the same.
+TEST(Wkt, DatumsOfTheRegistry) {
+  const auto datum_of = [](const std::string& datum, const std::string& rest = "") {
+    return definition_from_wkt("GEOGCS[\"g\"," + datum + rest + "]").datum.code;
+  };
+  const std::string figures = R"(SPHEROID["s",6378137,298.257223563])";
+  for (const char* name : {"WGS_1984", "D_WGS_1984", "d_wgs_1984", "World Geodetic System 1984"}) {
+    EXPECT_EQ(datum_of("DATUM[\"" + std::string(name) + "\"," + figures + "]"), 6326) << name;
+  }
+  EXPECT_EQ(datum_of(R"(DATUM["mine",)" + figures + R"(,AUTHORITY["EPSG","6326"]])"), 6326);
+  EXPECT_EQ(datum_of(R"(DATUM["mine",)" + figures + "]", R"(,AUTHORITY["EPSG","4326"])"), 6326);
+  // Another flattening or meridian, another ellipsoid under the code of a system; a code of
+  // heights.
+  EXPECT_EQ(datum_of(R"(DATUM["WGS_1984",SPHEROID["s",6378137,300]])"), 0);
+  EXPECT_EQ(datum_of(R"(DATUM["WGS_1984",SPHEROID["s",6378138,298.257223563]])"), 0);
+  EXPECT_EQ(datum_of(R"(DATUM["WGS_1984",)" + figures + "]", R"(,PRIMEM["p",5])"), 0);
+  EXPECT_EQ(datum_of(R"(DATUM["mine",)" + figures + "]", R"(,AUTHORITY["EPSG","4230"])"), 0);
+  EXPECT_EQ(datum_of(R"(DATUM["WGS_1984",)" + figures + R"(,AUTHORITY["EPSG","5101"]])"), 6326);
+  EXPECT_EQ(datum_of(R"(DATUM["D_mine",)" + figures + "]"), 0);
+  EXPECT_EQ(datum_of(R"(DATUM["mine",)" + figures + "]"), 0);
+}
+
 // Codes are whole numbers above zero; what is none is no code.
 TEST(Wkt, Codes) {
   const auto code_of = [](const std::string& id) {
@@ -230,6 +253,10 @@ TEST(Wkt, TransformationsToWgs84) {
       R"(TOWGS84[598.1,73.7,418.2,0.202,0.045,-2.455,6.7]],UNIT["degree",0.0174532925199433]])");
   ASSERT_TRUE(old.datum.to_wgs84);
   EXPECT_EQ((*old.datum.to_wgs84)[5], -2.455);
+  EXPECT_EQ(definition_from_wkt(R"(GEOGCS["g",DATUM["d",SPHEROID["s",6378388,297],)"
+                                R"(TOWGS84[-87,-98,-121]]])")
+                .datum.to_wgs84.value(),
+            (std::array<double, 7>{-87, -98, -121}));
   // Version 2 has them in a bound system, and both ways of counting rotations.
   const Definition bound = definition_from_wkt(wkt_from_definition(old, Wkt::wkt2));
   ASSERT_TRUE(bound.datum.to_wgs84);
@@ -256,6 +283,7 @@ TEST(Wkt, OneNameForSeveralMethods) {
   constexpr Case kCases[] = {
       {R"(PROJECTION["Mercator"],PARAMETER["scale_factor",0.997])", 9804, kK0, 0.997},
       {R"(PROJECTION["Mercator"],PARAMETER["standard_parallel_1",-41])", 9805, kLat1, -41},
+      {R"(PROJECTION["Mercator"],PARAMETER["central_meridian",3])", 9805, kLat1, 0},
       {R"(PROJECTION["Lambert_Conformal_Conic"],PARAMETER["standard_parallel_1",46],)"
        R"(PARAMETER["latitude_of_origin",45],PARAMETER["scale_factor",0.99])",
        1102, kLat0, 46},
@@ -267,6 +295,9 @@ TEST(Wkt, OneNameForSeveralMethods) {
       {R"(PROJECTION["Lambert_Conformal_Conic"],PARAMETER["standard_parallel_1",46],)"
        R"(PARAMETER["standard_parallel_2",48])",
        9802, kLat2, 48},
+      {R"(PROJECTION["Lambert_Conformal_Conic"],PARAMETER["standard_parallel_1",46],)"
+       R"(PARAMETER["standard_parallel_2",48],PARAMETER["scale_factor",1])",
+       9802, kLat1, 46},
       {R"(PROJECTION["Lambert_Conformal_Conic"],PARAMETER["standard_parallel_1",46],)"
        R"(PARAMETER["standard_parallel_2",48],PARAMETER["scale_factor",1.0000382])",
        1051, kEllipsoidScaling, 1.0000382},
@@ -320,6 +351,11 @@ TEST(Wkt, OneNameForSeveralMethods) {
   grads.replace(grads.find(degree), degree.size(), R"(UNIT["grad",0.01570796326794897])");
   EXPECT_EQ(definition_from_wkt(grads).method, 9810);
   EXPECT_NEAR(definition_from_wkt(grads).parameter(kLat0), -90 * kDegree, 1e-15);
+  const Definition own = definition_from_wkt(
+      projcs(R"(PROJECTION["Polar_Stereographic"],PARAMETER["scale_factor",0.994],)"
+             R"(PARAMETER["latitude_of_origin",-100,UNIT["grad",0.01570796326794897]])"));
+  EXPECT_EQ(own.method, 9810);
+  EXPECT_NEAR(own.parameter(kLat0), -90 * kDegree, 1e-15);
   // Web maps have a name of their own in PROJ's extension alone, or by their code.
   const std::string web = R"(PROJECTION["Mercator_1SP"],PARAMETER["scale_factor",1])";
   EXPECT_EQ(definition_from_wkt(projcs(web)).method, 9804);
@@ -446,6 +482,15 @@ TEST(Wkt, BoundSystems) {
                      "\"x\" is none of the seven");
   expect_wkt_refused(bound(to_wgs84, method + R"(,PARAMETER["x",3,ID["EPSG",8604]])"),
                      "\"x\" is none of the seven");
+  const std::string realised =
+      R"t(TARGETCRS[GEOGCRS["WGS 84 (G1762)",DATUM["World Geodetic System 1984 (G1762)",)t"
+      R"(ELLIPSOID["WGS 84",6378137,298.257223563]],CS[ellipsoidal,2]]],)";
+  EXPECT_TRUE(definition_from_wkt(bound(realised, method)).datum.to_wgs84);
+  // By another name, but of that datum.
+  const std::string named =
+      R"(TARGETCRS[GEOGCRS["mine",DATUM["d",ELLIPSOID["e",6378137,298.257223563],)"
+      R"(ID["EPSG",6326]],CS[ellipsoidal,2]]],)";
+  EXPECT_TRUE(definition_from_wkt(bound(named, method)).datum.to_wgs84);
   // To another system the figures would be another's.
   expect_wkt_refused(bound("TARGETCRS[" + source + "],", method), "TARGETCRS is g and not WGS 84");
   expect_wkt_refused(bound("TARGETCRS[],", method), "TARGETCRS is empty");
@@ -534,6 +579,18 @@ TEST(Wkt, NamesOfPrjFiles) {
   }
 }
 
+// What a .prj file says is written back as it stood.
+TEST(Wkt, PrjFilesThereAndBack) {
+  const std::string files[] = {
+      R"(GEOGCS["GCS_Mine",DATUM["D_Mine",SPHEROID["Own_1",6378000,300]],PRIMEM["Greenwich",0],)"
+      R"(UNIT["Degree",0.0174532925199433]])",
+      R"(GEOGCS["GCS_WGS_1984",DATUM["D_WGS_1984",SPHEROID["WGS_84",6378137,298.257223563]],)"
+      R"(PRIMEM["Greenwich",0],UNIT["Degree",0.0174532925199433]])"};
+  for (const std::string& file : files) {
+    EXPECT_EQ(wkt_from_definition(definition_from_wkt(file), Wkt::esri), file);
+  }
+}
+
 TEST(Wkt, MercatorOfPrjFiles) {
   const auto written = [](double rf, double k0) {
     Definition definition;
@@ -615,12 +672,15 @@ TEST(ProjText, OneNameForSeveralMethods) {
       {"+proj=lcc +lat_1=44 +lat_2=46 +k_0=1.5", 1051, kEllipsoidScaling, 1.5},
       {"+proj=lcc +lat_1=44 +lat_2=46 +k=1", 9802, kLat2, 46},
       {"+proj=lcc +lat_1=46 +axis=wnu", 9826, kLat0, 46},
+      {"+proj=lcc +lat_1=46 +axis=nwu", 9826, kLat0, 46},
+      {"+proj=lcc +lat_1=46 +lat_2=48 +axis=wnu", 9802, kLat2, 48},
       {"+proj=merc +k=0.99", 9804, kK0, 0.99},
       {"+proj=merc +lat_ts=0", 9804, kK0, 1},
       {"+proj=merc +lat_ts=-41", 9805, kLat1, -41},
       {"+proj=webmerc", 1024, kLon0, 0},
       // Of web maps only a sphere of WGS 84's axis without a grid.
       {"+proj=merc +a=6378137 +b=6378137 +nadgrids=@null", 1024, kLon0, 0},
+      {"+proj=merc +datum=WGS84 +a=6378137 +b=6378137 +nadgrids=@null", 1024, kLon0, 0},
       {"+proj=merc +a=6378137 +b=6378137", 9804, kLon0, 0},
       {"+proj=merc +a=6378137 +b=6378137 +nadgrids=x.gsb", 9804, kLon0, 0},
       {"+proj=merc +a=6378137 +nadgrids=@null", 9804, kLon0, 0},
@@ -663,6 +723,7 @@ TEST(ProjText, OneNameForSeveralMethods) {
     const bool angle = parameter_kind(c.parameter)->quantity == Quantity::angle;
     EXPECT_NEAR(read.parameter(c.parameter, NAN), c.value * (angle ? kDegree : 1), 1e-15) << c.text;
   }
+  EXPECT_EQ(definition_from_proj("+proj=tmerc +axis=end").axes, "EN");
   for (const char* name : {"longlat", "latlong", "lonlat", "latlon"}) {
     EXPECT_EQ(definition_from_proj("+title=mine +proj=" + std::string(name)).name, "mine");
     EXPECT_EQ(definition_from_proj("+axis=neu +proj=" + std::string(name)).axes, "NE");
@@ -712,6 +773,18 @@ TEST(ProjText, EllipsoidsUnitsAndMeridians) {
   EXPECT_EQ(bessel.datum.code, 6314);
   EXPECT_EQ(bessel.base_code, 4314);
   EXPECT_NE(bessel.datum.name.find(" with beta.gsb"), std::string::npos);
+  for (const char* datum :
+       {"NAD27 +ellps=clrk66", "NAD83 +ellps=GRS80", "OSGB36 +ellps=airy", "ire65 +ellps=mod_airy",
+        "nzgd49 +ellps=intl",
+        "WGS84 +a=6378137 +rf="
+        "298.257223563",
+        "carthage +ellps=clrk80ign", "GGRS87 +ellps=GRS80", "hermannskogel +ellps=bessel",
+        "WGS84 +a=6378137 +b=6356752.314245179"}) {
+    EXPECT_NE(definition_from_proj("+proj=longlat +datum=" + std::string(datum)).datum.code, 0);
+  }
+  expect_proj_refused("+proj=longlat +datum=WGS84 +ellps=bessel", "not that of +datum=WGS84");
+  expect_proj_refused("+proj=longlat +datum=NAD83 +R=6371000", "not that of +datum=NAD83");
+  expect_proj_refused("+proj=merc +datum=WGS84 +a=6378137 +b=6378137", "not that of +datum=WGS84");
   EXPECT_EQ(definition_from_proj("+proj=longlat +a=5 +nadgrids=@null").datum.name,
             "unknown datum on an ellipsoid");
 }
@@ -743,12 +816,14 @@ TEST(ProjText, WritesOnlyWhatIsTheSame) {
     definition.method = method;
     definition.parameters = std::move(parameters);
     definition.unit = {"", 0, 0.3};
+    definition.axes = "NE";
     return proj_from_definition(definition);
   };
   const std::string tail = " +R=6371000 +to_meter=0.3 +no_defs +type=crs";
   EXPECT_EQ(written(0, 1027, {}), "+proj=laea +lat_0=0 +lon_0=0 +x_0=0 +y_0=0" + tail);
   EXPECT_EQ(written(0, 9834, {}), "+proj=cea +lat_ts=0 +lon_0=0 +x_0=0 +y_0=0" + tail);
   EXPECT_EQ(written(0, 1028, {}), "+proj=eqc +lat_ts=0 +lat_0=0 +lon_0=0 +x_0=0 +y_0=0" + tail);
+  EXPECT_EQ(written(300, 1029, {}).substr(0, 20), "+proj=eqc +lat_ts=0 ");
   EXPECT_EQ(written(300, 9807, {{kK0, 0.9996}}),
             "+proj=tmerc +lat_0=0 +lon_0=0 +k_0=0.9996 +x_0=0 +y_0=0 +a=6371000 +rf=300 "
             "+to_meter=0.3 +no_defs +type=crs");
@@ -789,6 +864,7 @@ TEST(ProjText, WritesOnlyWhatIsTheSame) {
 
 TEST(ProjText, RefusesWhatItDoesNotUnderstand) {
   expect_proj_refused("+step", "pipeline");
+  expect_proj_refused("+proj=pipeline", "pipeline");
   expect_proj_refused("+proj=longlat +lat_0=5", "+lat_0 is not known here.");
   expect_proj_refused("+proj=tmerc +k=x", "+k=x is no number");
   expect_proj_refused("+proj=laea +k_0=2", "+k_0 is not known here; Lambert Azimuthal");

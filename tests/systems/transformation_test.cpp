@@ -11,8 +11,10 @@
 #include <thread>
 #include <vector>
 
+#include "operation.hpp"
 #include "support/data.hpp"
 #include "support/grids.hpp"
+#include "systems/made_store.hpp"
 
 namespace tidewater::test {
 
@@ -400,6 +402,14 @@ TEST(Transformation, AnOperationServesWhereItsSuccessorLacksTheGrid) {
        Transformation::candidates(System("EPSG:4149"), System("EPSG:4326"))) {
     EXPECT_FALSE(has(candidate.steps, "EPSG:1753")) << candidate.steps;
   }
+  // Of several that lack their grids none but the last is told.
+  for (const auto& [source, target, retired] : {std::tuple("EPSG:4277", "EPSG:4258", "EPSG:5338"),
+                                                {"EPSG:4202", "EPSG:4283", "EPSG:1464"},
+                                                {"EPSG:4202", "EPSG:4283", "EPSG:1596"}}) {
+    for (const Candidate& candidate : Transformation::candidates(System(source), System(target))) {
+      EXPECT_NE(candidate.steps, retired);
+    }
+  }
   // With the grid the newer one is taken.
   const ScratchFolder folder;
   SubGrid grid = {"CH",
@@ -416,6 +426,7 @@ TEST(Transformation, AnOperationServesWhereItsSuccessorLacksTheGrid) {
   options.grid_folders = {folder.directory()};
   const Transformation by_grid{System("EPSG:4149"), System("EPSG:4326"), options};
   EXPECT_EQ(by_grid.operation(), "EPSG:7788");
+  EXPECT_FALSE(has(by_grid.describe(), "(2)")) << by_grid.describe();
   EXPECT_NEAR(by_grid.forward({7.5, 47}).y, 47 - 4.0 / 3600, 1e-12);
   EXPECT_NEAR(by_grid.forward({7.5, 47}).x, 7.5 - 3.0 / 3600, 1e-12);  // positive west in the file
 }
@@ -491,7 +502,8 @@ TEST(Transformation, DatumsThatADefinitionNamesByTheirCode) {
   for (const char* system : {"", own, other}) {
     EXPECT_TRUE(has(operations(base("6267", system)), "EPSG:1172;")) << system;
   }
-  // A datum of the registry's without operations of its own system, and a code that is none.
+  // A datum of the registry's that no system has, and a code that is none.
+  EXPECT_EQ(operations(base("6008", "")), "");
   EXPECT_EQ(operations(base("999999", "")), "");
   EXPECT_TRUE(has(refusal(base("999999", "").c_str(), "EPSG:4326"), "No way is known"));
   // A compound system's horizontal part without a code.
@@ -597,6 +609,21 @@ TEST(Transformation, ParametersToWgs84OfEitherSide) {
   }
 }
 
+// Parameters to WGS 84 that change nothing but the ellipsoid or the scale, on a sphere too.
+TEST(Transformation, ParametersThatAreAlmostNothing) {
+  const Transformation sphere{System("+proj=longlat +R=6371000 +towgs84=0,0,0"),
+                              System("EPSG:4326")};
+  // The sphere's centre is the ellipsoid's; where its 45th parallel lies, iterated by hand.
+  EXPECT_NEAR(sphere.forward({10, 45}).y, 45.19231502383479, 1e-10);
+  const Transformation scaled{System("longlat ellps=WGS84 towgs84=0,0,0,0,0,0,10"),
+                              System("geocentric:wgs84")};
+  EXPECT_NEAR(scaled.forward({0, 0, 0}).x, 6378137 * 1.00001, 1e-6);
+  // The registry's operation between two ellipsoids, of zeros alone, changes heights.
+  const Transformation heights{System("EPSG:7682"), System("EPSG:4979"),
+                               with_operation("EPSG:9773")};
+  EXPECT_NEAR(heights.forward({37, 55, 100}).z, 99.46227155439556, 1e-6);  // likewise
+}
+
 TEST(Transformation, NoShiftBetweenSystemsOfOneDatumSaysNothing) {
   const Transformation map{System("EPSG:32631"), System("EPSG:32632"), with_operation("no shift")};
   EXPECT_EQ(map.accuracy(), 0);
@@ -679,11 +706,82 @@ TEST(Transformation, DoublesToFloats) {
   float both_x[2], both_y[2];
   ASSERT_TRUE(map.inverse(2, Coordinates<const float>{x, y}, Coordinates<float>{both_x, both_y}));
   EXPECT_EQ(both_y[1], static_cast<float>(back_y[1]));
+  const float height_of_both[2] = {10, 20};
+  float both_z[2];
+  double back_z[2];
+  ASSERT_TRUE(map.inverse(2, Coordinates<const float>{x, y, height_of_both},
+                          Coordinates<float>{both_x, both_y, both_z}));
+  EXPECT_EQ(both_z[1], 20.0F);
+  ASSERT_TRUE(map.inverse(2, Coordinates<const float>{x, y, height_of_both},
+                          Coordinates<double>{back_x, back_y, back_z}));
+  EXPECT_EQ(back_z[0], 10);
   float narrow_x[2], narrow_y[2];
   const double wide_x[2] = {x[0], x[1]}, wide_y[2] = {y[0], y[1]};
   ASSERT_TRUE(map.inverse(2, Coordinates<const double>{wide_x, wide_y},
                           Coordinates<float>{narrow_x, narrow_y}));
   EXPECT_EQ(narrow_x[1], static_cast<float>(back_x[1]));
+}
+
+// Single precision has the same words and not-a-numbers, whatever comes in and goes out.
+template <class In, class Out>
+void expect_words_of_singles(const Transformation& map) {
+  const In lon[] = {3, 3, 500, 100, 4}, lat[] = {45, 91, 45, 1, 46};
+  Out x[5], y[5], z[5];
+  TWstatus words[5];
+  const Summary summary =
+      map.forward(5, Coordinates<const In>{lon, lat}, Coordinates<Out>{x, y, z}, {words, 1});
+  EXPECT_EQ(summary.failed, 2u);
+  EXPECT_EQ(summary.word, TW_BAD_LATITUDE);
+  EXPECT_EQ(words[3], TW_RANGE_ERROR);
+  for (const int i : {1, 3}) EXPECT_TRUE(std::isnan(x[i]) && std::isnan(y[i]) && std::isnan(z[i]));
+  for (const int i : {0, 4}) {
+    const Point alone = map.forward({static_cast<double>(lon[i]), static_cast<double>(lat[i])});
+    EXPECT_EQ(words[i], TW_SUCCESS);
+    EXPECT_EQ(x[i], static_cast<Out>(alone.x));
+    EXPECT_EQ(z[i], 0);
+  }
+  EXPECT_EQ(map.forward(5, Coordinates<const In>{lon, lat}, Coordinates<Out>{x, y}).failed, 2u);
+}
+
+TEST(Transformation, SinglesThatFail) {
+  const Transformation map{System("EPSG:4326"), System("EPSG:32631")};
+  expect_words_of_singles<float, float>(map);
+  expect_words_of_singles<float, double>(map);
+  expect_words_of_singles<double, float>(map);
+  expect_words_of_singles<double, double>(map);
+}
+
+// A step of the registry's in itself: where nothing changes there is none; other meridians, axes,
+// flattenings or a scale are enough for one.  The meridian is where the figures count from.
+TEST(Transformation, StepsThatChangeNothingAreNone) {
+  const detail::Frame greenwich = {6378137, 0.08, 0};
+  const detail::Frame paris = {6378137, 0.08, 0.04};
+  const auto step = [](double scale, const detail::Frame& source, const detail::Frame& target) {
+    detail::OperationRecord record = {};
+    record.method = 9606;
+    record.parameters = {{8611, scale, 9202}};
+    return detail::similarity_or_offset({record, false}, source, target, 2020, false);
+  };
+  EXPECT_EQ(step(0, greenwich, greenwich), nullptr);
+  EXPECT_NE(step(1, greenwich, greenwich), nullptr);
+  EXPECT_NE(step(0, greenwich, {6378137.1, 0.08, 0}), nullptr);
+  EXPECT_NE(step(0, greenwich, {6378137, 0.0801, 0}), nullptr);
+  for (const auto& [source, target, by] :
+       {std::tuple(greenwich, paris, 0.04), {paris, greenwich, -0.04}, {paris, paris, 0.0}}) {
+    const auto turned = step(10, source, target);
+    ASSERT_NE(turned, nullptr);
+    CoordinateTriple one[2] = {{0.5, 0.3, 100}, {-3, 1.2, 0}}, other[2];
+    TWstatus words[2] = {TW_SUCCESS, TW_SUCCESS};
+    detail::Block block = {2, one, other, words};
+    turned->run(block, false);
+    // A scale leaves directions from the centre as they are.
+    EXPECT_NEAR(block.now[0].x, 0.5 + by, 1e-15);
+    EXPECT_NEAR(block.now[1].x, -3 + by, 1e-15);
+    EXPECT_NEAR(block.now[0].z, 100 + 63.8, 0.3);
+    turned->run(block, true);
+    EXPECT_NEAR(block.now[0].x, 0.5, 1e-15);
+    EXPECT_NEAR(block.now[0].y, 0.3, 1e-12);
+  }
 }
 
 // Methods of all kinds of loops, with points that fail in the first step or in the last one, below
@@ -744,21 +842,6 @@ TEST(Transformation, FailingPointsDisturbNoOthersWhateverTheMethod) {
 
 namespace {
 
-// A store of the tree's own sources with lines added to tables of the registry.
-std::string store_with(const ScratchFolder& folder,
-                       const std::vector<std::pair<std::string, std::string>>& lines) {
-  namespace fs = std::filesystem;
-  const fs::path sources = folder.path() / "sources";
-  fs::copy(fs::path(TIDEWATER_SOURCE) / "data", sources, fs::copy_options::recursive);
-  for (const auto& [table, line] : lines) {
-    std::ofstream(sources / "registry" / (table + ".csv"), std::ios::app) << line << "\n";
-  }
-  const std::string store = (folder.path() / "lies.store").string();
-  const std::string command =
-      std::string(TWSTORE_COMMAND) + " build '" + store + "' '" + sources.string() + "' >/dev/null";
-  return std::system(command.c_str()) == 0 ? store : "";
-}
-
 // What a process of its own finds with such a store, which a process reads once: true where every
 // system and operation of it gives an answer or a sentence.
 bool all_is_answered() {
@@ -788,6 +871,9 @@ bool all_is_answered() {
   // A system without a datum, and an operation from a system that is not there.
   good &= no_way("EPSG:990020", "EPSG:4326", "", "990099");
   good &= no_way("EPSG:4230", "EPSG:4326", "EPSG:990012", "The registry has no datum");
+  // A unit that has no size.
+  good &= no_way("EPSG:990030", "EPSG:4326", "", "The unit of No unit has no size.");
+  good &= no_way("EPSG:4326+990031", "EPSG:4979", "", "has no size.");
   return good;
 }
 
@@ -795,17 +881,24 @@ bool all_is_answered() {
 
 TEST(RegistryThatLies, GivesSentences) {
   GTEST_FLAG_SET(death_test_style, "threadsafe");
-  const ScratchFolder folder;
+  const StoreSources sources;
   const std::string values = ",-87,9001,-98,9001,-121,9001,0,0,0,0,0,0,0,0";
-  const std::string store = store_with(
-      folder, {{"concatenated_operations", "990001,Circle,4230,4326,1262,1,0,990001,0,0,0"},
-               {"concatenated_operations", "990002,Two,4230,4326,1262,1,0,990003,0,0,0"},
-               {"concatenated_operations", "990003,Two back,4230,4326,1262,1,0,990002,0,0,0"},
-               {"transformations", "990010,Nowhere,9603,4230,4326,999999,999,0" + values},
-               {"transformations", "990011,Replaced,9603,4230,4326,1262,10,999999" + values},
-               {"transformations", "990012,From nothing,9603,990098,4326,1262,10,0" + values},
-               {"geodetic_systems", "990020,No datum,2,990099,NE,9122,1262"}});
-  if (store.empty()) GTEST_SKIP() << "the store could not be built";
+  for (const auto& [table, line] :
+       {std::pair<const char*, std::string>{"concatenated_operations",
+                                            "990001,Circle,4230,4326,1262,1,0,990001,0,0,0"},
+        {"concatenated_operations", "990002,Two,4230,4326,1262,1,0,990003,0,0,0"},
+        {"concatenated_operations", "990003,Two back,4230,4326,1262,1,0,990002,0,0,0"},
+        {"transformations", "990010,Nowhere,9603,4230,4326,999999,999,0" + values},
+        {"transformations", "990011,Replaced,9603,4230,4326,1262,10,999999" + values},
+        {"transformations", "990012,From nothing,9603,990098,4326,1262,10,0" + values},
+        {"geodetic_systems", "990020,No datum,2,990099,NE,9122,1262"},
+        {"units", "990040,nothing,length,0"},
+        {"vertical_systems", "990031,No height,5100,U,990040,1262"},
+        {"projected_systems", "990030,No unit,4326,16031,EN,990040,1262"}}) {
+    sources.append("registry/" + std::string(table) + ".csv", line);
+  }
+  const std::string store = sources.build();
+  ASSERT_NE(store, "");
   EXPECT_EXIT(
       {
         setenv("TIDEWATER_STORE", store.c_str(), 1);
