@@ -386,6 +386,20 @@ std::string read_axes(Words& words) {
   return axes;
 }
 
+// Whether the axes point to these two directions, in either order.
+bool points_to(std::string_view axes, std::string_view directions) {
+  return axes.find(directions[0]) != axes.npos && axes.find(directions[1]) != axes.npos;
+}
+
+// PROJ adds its false origin to eastings and northings, before it turns the axes; the methods that
+// count to the west or south, and Krovak's turned to the north, have it along the former.
+double false_origin(int method, int parameter, double value) {
+  const bool krovak = method == 9819 || method == 1041;
+  const bool west = krovak || method == 9808 || method == 9826 || method == 9828;
+  const bool south = west && method != 9826;
+  return (west && parameter == kX0) || (south && parameter == kY0) ? 0 - value : value;
+}
+
 // Of the methods that have this name, by what else is given.
 int method_code(Words& words, std::string_view name, const std::string& axes) {
   const auto zero = [&](std::string_view key) {
@@ -398,10 +412,9 @@ int method_code(Words& words, std::string_view name, const std::string& axes) {
   };
   const bool scaled = words.has("k") || words.has("k_0");
   const bool polar = std::fabs(std::fabs(angle("lat_0")) - kHalfPi) < 1e-9;
-  if (name == "tmerc" || name == "etmerc") return axes == "WS" ? 9808 : 9807;
+  if (name == "tmerc" || name == "etmerc") return points_to(axes, "WS") ? 9808 : 9807;
   if (name == "utm") return 9807;
   if (name == "lcc") {
-    if (axes == "WN") return 9826;
     const Given* first = words.peek("lat_1");
     const Given* second = words.peek("lat_2");
     if (second != nullptr && (first == nullptr || second->value != first->value)) {
@@ -409,7 +422,7 @@ int method_code(Words& words, std::string_view name, const std::string& axes) {
       return k != nullptr && words.number("k_0", k->value) != 1 ? 1051 : 9802;
     }
     const bool same = !words.has("lat_0") || std::fabs(angle("lat_0") - angle("lat_1")) < 1e-12;
-    if (same) return 9801;
+    if (same) return points_to(axes, "WN") ? 9826 : 9801;
     return scaled ? 1102 : 9802;
   }
   if (name == "merc") {
@@ -421,14 +434,14 @@ int method_code(Words& words, std::string_view name, const std::string& axes) {
     if (words.has("lat_1") || words.has("lon_1")) return kTwoPointOblique;
     return words.flag("no_uoff") || words.flag("no_off") ? 9812 : 9815;
   }
-  if (name == "krovak") return axes == "SW" ? 9819 : 1041;
-  if (name == "mod_krovak") return axes == "SW" ? 1042 : 1043;
+  if (name == "krovak") return points_to(axes, "SW") ? 9819 : 1041;
+  if (name == "mod_krovak") return points_to(axes, "SW") ? 1042 : 1043;
   if (name == "stere" || name == "ups") {
     if (!polar) return name == "ups" ? 9810 : kStereographic;
     return words.has("lat_ts") && std::fabs(std::fabs(angle("lat_ts")) - kHalfPi) > 1e-12 ? 9829
                                                                                           : 9810;
   }
-  if (name == "bonne") return axes == "WS" ? 9828 : 9827;
+  if (name == "bonne") return points_to(axes, "WS") ? 9828 : 9827;
   if (name == "cass") return words.flag("hyperbolic") ? 9833 : 9806;
   if (name == "aeqd") return words.flag("guam") ? 9831 : int{kAzimuthalEquidistant};
   if (name == "laea") return 9820;
@@ -456,7 +469,10 @@ void read_parameters(Words& words, const Method& method, Definition& definition)
       value = kind.quantity == Quantity::angle ? words.take_angle(parameter.proj)
                                                : words.take_number(parameter.proj);
     }
-    if (value) definition.parameters.push_back({parameter.code, *value});
+    if (value) {
+      definition.parameters.push_back(
+          {parameter.code, false_origin(method.code, parameter.code, *value)});
+    }
   }
   const auto set = [&](int code, double value) {
     for (ParameterValue& given : definition.parameters) {
@@ -677,8 +693,15 @@ std::string proj_from_definition(const Definition& definition) {
     tail();
     return text + unit_words(definition.unit) + " +no_defs +type=crs";
   }
+  // In what order the axes stand is no matter of a PROJ string, but where they point.
+  std::string axis;
+  if (!points_to(definition.axes, "EN")) {
+    axis = " +axis=";
+    for (const char letter : definition.axes.substr(0, 2)) axis += static_cast<char>(letter + 32);
+    axis += 'u';
+  }
   if (definition.method == 0) {
-    text = "+proj=longlat";
+    text = "+proj=longlat" + axis;
     tail();
     return text + " +no_defs +type=crs";
   }
@@ -688,11 +711,12 @@ std::string proj_from_definition(const Definition& definition) {
   if (!why.empty()) {
     throw Error("PROJ strings have no form for " + definition.name + ": " + why + ".");
   }
-  text = "+proj=" + std::string(method.proj);
+  text = "+proj=" + std::string(method.proj.substr(0, method.proj.find(" +axis="))) + axis;
   for (const MethodParameter& parameter : method.parameters) {
     if (parameter.proj.empty()) continue;
     const ParameterKind& kind = *parameter_kind(parameter.code);
-    const double value = definition.parameter(parameter.code, kind.usual);
+    const double value =
+        false_origin(method.code, parameter.code, definition.parameter(parameter.code, kind.usual));
     text += " +" + std::string(parameter.proj) + "=" +
             (kind.quantity == Quantity::angle ? degrees_text(value) : number_text(value));
   }

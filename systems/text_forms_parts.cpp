@@ -45,6 +45,21 @@ void complete_parameters(Definition& definition, const Method& method) {
   definition.parameters = std::move(complete);
 }
 
+std::string_view natural_axes(int method) {
+  switch (method) {
+    case 9808:
+    case 9828:
+      return "WS";
+    case 9819:
+    case 1042:
+      return "SW";
+    case 9826:
+      return "WN";
+    default:
+      return "EN";
+  }
+}
+
 bool same_figures(const EllipsoidDefinition& a, const EllipsoidDefinition& b) {
   // Texts round the flattening, and name a sphere by zero or by infinity.
   return std::fabs(a.a - b.a) <= 1e-9 * b.a &&

@@ -31,6 +31,9 @@ std::string unknown_datum(const EllipsoidDefinition& ellipsoid);
 // given, in the method's order.
 void complete_parameters(Definition& definition, const Method& method);
 
+// The axes along which a method's formulas count, in their usual order.
+std::string_view natural_axes(int method);
+
 // Finds the datum, or the base system, in the registry by what the text calls it, so that the
 // datum's code is known; leaves it as it is where the registry has none of that name with this
 // ellipsoid and meridian, or where there is no registry.

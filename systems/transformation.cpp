@@ -6,6 +6,7 @@
 #include "makers.hpp"
 #include "operation.hpp"
 #include "system_impl.hpp"
+#include "text_forms_parts.hpp"
 #include "words.hpp"
 
 namespace tidewater {
@@ -110,17 +111,12 @@ struct End {
     } else if (kind != SystemKind::geocentric) {
       sx = sy = definition.unit.factor;
     }
-    if (kind != SystemKind::geocentric) {
-      std::string_view natural = "EN";
-      if (definition.method == 9808 || definition.method == 9828 || definition.method == 9819 ||
-          definition.method == 1042) {
-        natural = "WS";
-      } else if (definition.method == 9826) {
-        natural = "WN";
-      }
+    if (kind != SystemKind::geocentric && kind != SystemKind::vertical) {
+      const std::string_view natural = natural_axes(definition.method);
       for (const char letter : definition.axes.substr(0, 2)) {
-        if ((letter == 'E' || letter == 'W') && letter != natural[0]) sx = -sx;
-        if ((letter == 'N' || letter == 'S') && letter != natural[1]) sy = -sy;
+        if (natural.find(letter) != natural.npos) continue;
+        double& turned = letter == 'E' || letter == 'W' ? sx : sy;
+        turned = -turned;
       }
     }
     const bool north_first = definition.axes.starts_with('N') || definition.axes.starts_with('S');

@@ -519,12 +519,7 @@ Definition read_projected(const WktNode& node) {
     read_parameters(conversion, need(conversion, "METHOD", "PROJECTION"), angle, definition.unit,
                     definition.axes, definition);
   }
-  if (definition.axes.empty()) {
-    definition.axes = "EN";
-    if (definition.method == 9808 || definition.method == 9828) definition.axes = "WS";
-    if (definition.method == 9819 || definition.method == 1042) definition.axes = "SW";
-    if (definition.method == 9826) definition.axes = "WN";
-  }
+  if (definition.axes.empty()) definition.axes = natural_axes(definition.method);
   read_area(node, definition);
   recognise_datum(definition);
   return definition;

@@ -4,13 +4,18 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
+#include <cstdlib>
 #include <cstring>
 #include <iterator>
 #include <vector>
 
+#include "support/little_memory.hpp"
+
 using tidewater::points::ask_for_level;
 using tidewater::points::Level;
+using tidewater::points::level;
 using tidewater::points::over_points;
 
 namespace {
@@ -75,5 +80,38 @@ TEST(Number, TheLesserAndTheGreaterAreTheSecondWhereNeitherIs) {
                         {nan, nan, nan, nan}};
   expect_at_every_width(tidewater::test::LesserAndGreater{}, cases);
 }
+
+TEST(Level, IsWhatWasAskedForWhereThereIsSuchAOne) {
+  EXPECT_TRUE(ask_for_level(Level::one_by_one));
+  EXPECT_EQ(level(), Level::one_by_one);
+  for (const Level wanted : kAll) {
+    const Level before = level();
+    EXPECT_EQ(level(), ask_for_level(wanted) ? wanted : before);
+  }
+}
+
+#if defined(__unix__)
+// In a process of its own, which looks at its environment when it starts.
+TEST(Level, IsNarrowedByTheEnvironment) {
+  TIDEWATER_NEED_NEW_PROCESS();
+  const Level started = level();
+  testing::FLAGS_gtest_death_test_style = "threadsafe";
+  constexpr const char* kNames[] = {"one_by_one", "baseline", "avx2", "avx512", "of nothing"};
+  constexpr int kOffset = 10;
+  Level widest = Level::one_by_one;
+  for (const Level wanted : kAll) {
+    if (ask_for_level(wanted)) widest = wanted;
+  }
+  for (int i = 0; i < 5; ++i) {
+    setenv("TIDEWATER_LEVEL", kNames[i], 1);
+    // A level that is not there gives the widest below it; a name that is none, the widest of all.
+    const int expected = std::min(i, static_cast<int>(widest));
+    EXPECT_EXIT(std::_Exit(kOffset + static_cast<int>(started)),
+                testing::ExitedWithCode(kOffset + expected), "")
+        << kNames[i];
+  }
+  unsetenv("TIDEWATER_LEVEL");
+}
+#endif
 
 }  // namespace

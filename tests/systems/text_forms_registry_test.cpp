@@ -15,6 +15,7 @@
 #include "registry.hpp"
 #include "system_impl.hpp"
 #include "text_forms.hpp"
+#include "tidewater/transformation.hpp"
 
 #ifdef TIDEWATER_HAVE_PROJ
 #include <proj.h>
@@ -342,6 +343,53 @@ TEST(TextFormsRegistry, WhatIsWrittenIsTheSamePlaneToProj) {
   }
   EXPECT_EQ(differences, "");
   for (const auto& [form, count] : compared) EXPECT_GT(count, 350) << form;
+  proj_context_destroy(context);
+}
+
+// Axes to the west and south, with a false origin: the same figures as PROJ's, from the string as
+// it stands and as it is written again.
+TEST(TextFormsRegistry, TurnedAxesAreThoseOfProj) {
+  PJ_CONTEXT* context = proj_context_create();
+  const std::string kTurned[] = {
+      "+proj=tmerc +lon_0=29 +axis=wsu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=tmerc +lon_0=29 +axis=swu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=tmerc +lon_0=29 +axis=wnu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=tmerc +lon_0=29 +axis=esu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=bonne +lat_1=40 +axis=wsu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=lcc +lat_1=40 +axis=wnu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=lcc +lat_1=40 +axis=nwu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=lcc +lat_1=40 +lat_2=50 +axis=wnu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=krovak +axis=swu +x_0=100 +y_0=50 +ellps=bessel",
+      "+proj=krovak +axis=wsu +x_0=100 +y_0=50 +ellps=bessel",
+      "+proj=krovak +axis=enu +x_0=100 +y_0=50 +ellps=bessel",
+      "+proj=cass +lat_0=48 +lon_0=14 +axis=swu +x_0=100 +y_0=50 +ellps=WGS84",
+      "+proj=laea +lat_0=40 +axis=neu +x_0=100 +y_0=50 +ellps=WGS84",
+  };
+  TransformationOptions options;
+  options.own_axes = true;
+  options.operation = "no shift";
+  for (const std::string& text : kTurned) {
+    PJ* peer = proj_create(context, text.c_str());
+    ASSERT_NE(peer, nullptr) << text;
+    const PJ_COORD theirs = proj_trans(peer, PJ_FWD, proj_coord(20 * kDegree, 45 * kDegree, 0, 0));
+    proj_destroy(peer);
+    const System once(text);
+    // A PROJ string keeps where the axes point, and their order where one is turned.
+    const std::string again = once.to_proj();
+    const bool turned = again.find("+axis=") != std::string::npos;
+    EXPECT_EQ(turned, text.find("+axis=enu") == text.npos && text.find("+axis=neu") == text.npos);
+    for (const System& system : {once, System(again)}) {
+      // PROJ's Krovak has one ellipsoid.
+      const std::string ellipsoid = text.substr(text.find("+ellps="));
+      const Transformation way(System("+proj=longlat " + ellipsoid), system, options);
+      Point ours = way.forward({20, 45});
+      if (!turned && system.axes() != once.axes()) std::swap(ours.x, ours.y);
+      EXPECT_NEAR(ours.x, theirs.xy.x, 1e-4) << text << "; " << again;
+      EXPECT_NEAR(ours.y, theirs.xy.y, 1e-4) << text << "; " << again;
+    }
+  }
+  // So are those of a system of the registry: Gusterberg counts southwards, then westwards.
+  EXPECT_NE(System("EPSG:8044").to_proj().find("+proj=cass +axis=swu "), std::string::npos);
   proj_context_destroy(context);
 }
 

@@ -672,6 +672,8 @@ TEST(ProjText, OneNameForSeveralMethods) {
       {"+proj=lcc +lat_1=44 +lat_2=46 +k_0=1.5", 1051, kEllipsoidScaling, 1.5},
       {"+proj=lcc +lat_1=44 +lat_2=46 +k=1", 9802, kLat2, 46},
       {"+proj=lcc +lat_1=46 +axis=wnu", 9826, kLat0, 46},
+      {"+proj=lcc +lat_1=46 +axis=nwu", 9826, kLat0, 46},
+      {"+proj=lcc +lat_1=46 +lat_2=48 +axis=wnu", 9802, kLat2, 48},
       {"+proj=merc +k=0.99", 9804, kK0, 0.99},
       {"+proj=merc +lat_ts=0", 9804, kK0, 1},
       {"+proj=merc +lat_ts=-41", 9805, kLat1, -41},
@@ -814,6 +816,7 @@ TEST(ProjText, WritesOnlyWhatIsTheSame) {
     definition.method = method;
     definition.parameters = std::move(parameters);
     definition.unit = {"", 0, 0.3};
+    definition.axes = "NE";
     return proj_from_definition(definition);
   };
   const std::string tail = " +R=6371000 +to_meter=0.3 +no_defs +type=crs";

@@ -238,6 +238,29 @@ TEST(Laborde, ScaleOfTheCubicByHand) {
   EXPECT_NEAR(one[0].x, std::hypot(1, 12), 4e-15);
 }
 
+// The third element is an input, and goes along in arrays of any length.
+TEST(Laborde, ScaleOfManyPointsIsThatOfEach) {
+  const Cubic cubic(0.3);
+  for (const int32_t count : {1, 255, 256, 257, 600}) {
+    const auto size = static_cast<std::size_t>(count);
+    Points in(size), out(size + 1, kUntouchedPoint);
+    for (std::size_t i = 0; i < size; ++i) {
+      in[i] = {0.0001 * static_cast<double>(i), 0.02, 7};
+      out[i] = {8, 9, 1 + 0.001 * static_cast<double>(i)};
+    }
+    Points each = out;
+    TWstatus status = 0;
+    TWlabor_s(0.9995, cubic.A, cubic.B, count, in.data(), out.data(), &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    for (std::size_t i = 0; i < size; ++i) {
+      TWlabor_s(0.9995, cubic.A, cubic.B, 1, &in[i], &each[i], &status);
+      ASSERT_EQ(out[i].x, each[i].x) << count << " " << i;
+      ASSERT_EQ(out[i].z, each[i].z) << count << " " << i;
+    }
+    expect_untouched(out[size]);
+  }
+}
+
 TEST(Laborde, ScaleOfTheChain) {
   // With azimuth 45 degrees A is B, and the exchanged constants do no harm: the scale is that of
   // the whole projection.
