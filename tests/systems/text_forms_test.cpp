@@ -676,6 +676,7 @@ TEST(ProjText, OneNameForSeveralMethods) {
       {"+proj=lcc +lat_1=46 +lat_2=48 +axis=wnu", 9802, kLat2, 48},
       {"+proj=merc +k=0.99", 9804, kK0, 0.99},
       {"+proj=merc +lat_ts=0", 9804, kK0, 1},
+      {"+proj=merc +lat_ts=0 +k=1", 9804, kK0, 1},
       {"+proj=merc +lat_ts=-41", 9805, kLat1, -41},
       {"+proj=webmerc", 1024, kLon0, 0},
       // Of web maps only a sphere of WGS 84's axis without a grid.
@@ -759,6 +760,8 @@ TEST(ProjText, EllipsoidsUnitsAndMeridians) {
   EXPECT_EQ(unit("+to_meter=1200/3937").factor, 1200.0 / 3937);
   EXPECT_EQ(unit("+units=m +to_meter=1").code, 9001);
   EXPECT_EQ(unit("+units=us-ft").code, 9003);
+  EXPECT_EQ(unit("+units=us-ft +to_meter=0.304800609601").code, 0);
+  expect_proj_refused("+proj=tmerc +units=km +to_meter=1", "two different units");
   expect_proj_refused("+proj=tmerc +to_meter=1/0", "above zero");
   expect_proj_refused("+proj=tmerc +to_meter=-1", "above zero");
   const auto meridian = [](const std::string& pm) {
@@ -869,6 +872,8 @@ TEST(ProjText, RefusesWhatItDoesNotUnderstand) {
   expect_proj_refused("+proj=tmerc +k=x", "+k=x is no number");
   expect_proj_refused("+proj=laea +k_0=2", "+k_0 is not known here; Lambert Azimuthal");
   expect_proj_refused("+proj=laea +k=0", "+k is not known here");
+  expect_proj_refused("+proj=merc +lat_ts=0 +k_0=2",
+                      "+k_0 is not known here; Mercator (variant B)");
   expect_proj_refused("+proj=tmerc +x_0=inf", "no number");
   expect_proj_refused("+proj=tmerc +lon_0=400d", "beyond 360");
   expect_proj_refused("+proj=utm +zone=0", "+zone from 1 to 60");
