@@ -124,6 +124,12 @@ TEST(Wkt, ContradictionsAreRefused) {
       tmerc(R"(PARAMETER["latitude_of_origin",10],PARAMETER["latitude_of_origin",20])"),
       "\"latitude_of_origin\" has two different values");
   expect_wkt_refused(tmerc(R"(PARAMETER["false_easting",1e308],UNIT["u",1000])"), "out of range");
+  expect_wkt_refused(tmerc(R"(PARAMETER[latitude_of_origin,0])"), "PARAMETER has no name");
+  for (const char* box : {"-91,0,0,0", "0,-181,0,0", "0,0,90.5,0", "0,0,0,1e300"}) {
+    expect_wkt_refused(
+        R"(GEOGCRS["g",DATUM["d",ELLIPSOID["s",6378137,298.25]],BBOX[)" + std::string(box) + "]]",
+        "BBOX has a side that is not on the earth");
+  }
   for (const char* unit : {R"(UNIT["degree",0.0174532925199433])", R"(UNIT["radian",1])",
                            R"(UNIT["grad",0.01570796326794897])"}) {
     expect_wkt_refused(tmerc(unit), "unit of angle where a length is needed");
