@@ -26,7 +26,7 @@ constexpr Alias kEllipsoids[] = {
     {"hayford", 7022},  {"international", 7022}, {"bessel", 7004},    {"bess nam", 7046},
     {"airy", 7001},     {"mod airy", 7002},      {"krass", 7024},     {"krassovsky", 7024},
     {"aust sa", 7003},  {"helmert", 7020},       {"evrst30", 7015},   {"plessis", 7027},
-    {"cgcs2000", 1024}, {"pz90", 7054},          {"sphere", 7035},
+    {"cgcs2000", 1024}, {"pz90", 7054},
 };
 constexpr Alias kUnits[] = {
     {"m", 9001},       {"meter", 9001},
@@ -39,7 +39,7 @@ constexpr Alias kUnits[] = {
     {"link", 9098},    {"deg", 9102},
     {"degrees", 9102}, {"rad", 9101},
     {"radians", 9101}, {"grads", 9105},
-    {"gon", 9106},     {"ind yd", 9084},
+    {"gon", 9105},     {"ind yd", 9084},
     {"fath", 9014},    {"kmi", 9030},
     {"us ch", 9033},   {"us mi", 9035},
     {"mi", 9093},

@@ -116,16 +116,15 @@ class ShiftGridStep final : public DatumStep {
 
 // Translations of geocentric coordinates that a grid has for the positions of the target: IOGP
 // Publication 373-7-2, method 1087.
-class GeocentricGridStep final : public DatumStep {
+class GeocentricGridStep final : public Step {
  public:
   GeocentricGridStep(GridContent grid, bool reversed, bool flat, const Frame& source,
-                     const Frame& target, std::string words)
+                     const Frame& target)
       : grid_(std::move(grid)),
         reversed_(reversed),
         flat_(flat),
         source_(source),
-        target_(target),
-        words_(std::move(words)) {}
+        target_(target) {}
 
   void run(Block& block, bool inverse) const override {
     const bool back = inverse != reversed_;
@@ -143,7 +142,6 @@ class GeocentricGridStep final : public DatumStep {
       }
     }
   }
-  std::string describe() const override { return words_; }
 
  private:
   static constexpr int kMostPasses = 20;
@@ -186,7 +184,6 @@ class GeocentricGridStep final : public DatumStep {
   GridContent grid_;
   bool reversed_, flat_;
   Frame source_, target_;
-  std::string words_;
 };
 
 }  // namespace
@@ -221,16 +218,14 @@ std::vector<std::string> folders_for(const std::string& file,
   return file.find('/') != std::string::npos ? std::vector<std::string>{} : all_folders(folders);
 }
 
-std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& source,
-                                                 const Frame& target,
-                                                 const std::vector<std::string>& folders,
-                                                 bool flat) {
+std::unique_ptr<const Step> shift_grid_step(const Link& link, const Frame& source,
+                                            const Frame& target,
+                                            const std::vector<std::string>& folders, bool flat) {
   const GridFile file = grid_of(link.operation, folders);
   if (file.path.empty()) throw Error(in_words(link) + " needs a grid that was not found.");
   if (is_geocentric_grid(link.operation.method)) {
     return std::make_unique<GeocentricGridStep>(read_grid(file.path, {}, GridKind::geocentric),
-                                                link.reversed, flat, source, target,
-                                                in_words(link));
+                                                link.reversed, flat, source, target);
   }
   return std::make_unique<ShiftGridStep>(ShiftGrid(file.path), link.reversed != file.reversed,
                                          file.reversed ? target : source,

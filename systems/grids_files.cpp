@@ -249,7 +249,7 @@ void close_round(int bands, Lattice* g) {
   closed.reserve(g->values.size() + static_cast<std::size_t>(g->rows * bands));
   const auto row_values = static_cast<std::ptrdiff_t>(g->columns * bands);
   for (std::int64_t row = 0; row < g->rows; ++row) {
-    const auto first = g->values.begin() + row * row_values;
+    const auto first = g->values.begin() + static_cast<std::ptrdiff_t>(row) * row_values;
     closed.insert(closed.end(), first, first + row_values);
     closed.insert(closed.end(), first, first + bands);
   }

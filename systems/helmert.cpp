@@ -107,13 +107,7 @@ Similarity similarity_of(const OperationRecord& operation, double epoch) {
   const Family family = family_of(operation.method);
   Similarity result;
   double years = 0;
-  if (time_dependent(operation.method)) {
-    if (!std::isfinite(epoch)) {
-      throw Error("EPSG:" + std::to_string(operation.code) + ", " + operation.name +
-                  ", depends on time: give the epoch of the coordinates.");
-    }
-    years = epoch - value_of(operation, kReferenceEpoch);
-  }
+  if (time_dependent(operation.method)) years = epoch - value_of(operation, kReferenceEpoch);
   const bool rotates = family != Family::translation;
   const bool frame = family == Family::coordinate_frame || family == Family::pivoted_frame;
   for (int i = 0; i < 3; ++i) {
@@ -176,16 +170,15 @@ class SimilarityStep final : public DatumStep {
   std::string words_;
 };
 
-class OffsetStep final : public DatumStep {
+class OffsetStep final : public Step {
  public:
   OffsetStep(double lon, double lat, double height, const Frame& source, const Frame& target,
-             bool reversed, std::string words)
+             bool reversed)
       // Longitudes are from Greenwich here, the offset is between the two meridians' longitudes.
       : lon_(lon - source.meridian + target.meridian),
         lat_(lat),
         height_(height),
-        sign_(reversed ? -1 : 1),
-        words_(std::move(words)) {}
+        sign_(reversed ? -1 : 1) {}
 
   void run(Block& block, bool inverse) const override {
     const double sign = inverse ? -sign_ : sign_;
@@ -195,11 +188,9 @@ class OffsetStep final : public DatumStep {
       block.now[i].z += sign * height_;
     }
   }
-  std::string describe() const override { return words_; }
 
  private:
   double lon_, lat_, height_, sign_;
-  std::string words_;
 };
 
 }  // namespace
@@ -225,14 +216,13 @@ std::string in_words(const Link& link) {
 bool is_similarity_or_offset(int method) { return family_of(method) != Family::none; }
 bool depends_on_time(int method) { return time_dependent(method); }
 
-std::unique_ptr<const DatumStep> similarity_or_offset(const Link& link, const Frame& source,
-                                                      const Frame& target, double epoch,
-                                                      bool flat) {
+std::unique_ptr<const Step> similarity_or_offset(const Link& link, const Frame& source,
+                                                 const Frame& target, double epoch, bool flat) {
   const OperationRecord& operation = link.operation;
   if (family_of(operation.method) == Family::offset) {
     return std::make_unique<OffsetStep>(
         value_of(operation, kLongitudeOffset), value_of(operation, kLatitudeOffset),
-        value_of(operation, kHeightOffset), source, target, link.reversed, in_words(link));
+        value_of(operation, kHeightOffset), source, target, link.reversed);
   }
   const Similarity map = similarity_of(operation, epoch);
   // Two ellipsoids as near as those of GRS 1980 and WGS 84 are within 0.1 mm of each other.

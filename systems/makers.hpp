@@ -58,6 +58,8 @@ inline Plane false_origin_plane(const MethodArguments& given, double scale) {
 // Constants that came out wrong are an error with a sentence.
 void require(bool good, const MethodArguments& given, const char* why);
 void require(TWstatus word, const MethodArguments& given);
+// The parallel along which a cylinder is true is no pole.
+void require_parallel(const MethodArguments& given, double lat);
 
 Made make_transverse_mercator(const MethodArguments& given);
 Made make_transverse_mercator_south(const MethodArguments& given);

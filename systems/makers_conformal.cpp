@@ -130,7 +130,8 @@ Made make_transverse_mercator_south(const MethodArguments& given) {
                        TransverseMercatorMap(given, given(kK0, 1)));
 }
 
-// Each zone's million is put before its easting.
+// Each zone's million is put before its easting.  A point that fails ends the loops: the word is
+// the last call's, and the block is asked again point by point.
 Made make_zoned_transverse_mercator(const MethodArguments& given) {
   const TransverseMercatorMap map(given, given(kK0, 1));
   const double first = given(kInitialLon);
@@ -142,7 +143,7 @@ Made make_zoned_transverse_mercator(const MethodArguments& given) {
   return formula(
       Plane{},
       [=](TW_BLOCK) {
-        for (int i = 0; i < count; ++i) {
+        for (int i = 0; i < count && *status == TW_SUCCESS; ++i) {
           double from = in[i].x - first;
           if (from < 0) from += 2 * kPi;
           const double zone = 1 + std::floor(from / width);
@@ -154,11 +155,11 @@ Made make_zoned_transverse_mercator(const MethodArguments& given) {
       },
       [=](TW_BLOCK) {
         const double zones = std::floor(2 * kPi / width + 0.5);
-        for (int i = 0; i < count; ++i) {
+        for (int i = 0; i < count && *status == TW_SUCCESS; ++i) {
           const double zone = std::floor(in[i].x / 1e6);
           if (!(zone >= 1 && zone <= zones)) {
             *status = TW_BAD_ZONE;
-            continue;
+            return;
           }
           CoordinateTriple point = {in[i].x - zone * 1e6 - x0, in[i].y - y0, 0};
           map.inverse(1, &point, &point, status);
@@ -209,10 +210,12 @@ Made make_mercator_a(const MethodArguments& given) {
 }
 
 Made make_mercator_b(const MethodArguments& given) {
+  require_parallel(given, given(kLat1));
   return mercator(given, natural_plane(given, parallel_radius(given.e2, given(kLat1))), given.e, 0);
 }
 
 Made make_mercator_c(const MethodArguments& given) {
+  require_parallel(given, given(kLat1));
   Plane plane = natural_plane(given, parallel_radius(given.e2, given(kLat1)));
   plane.x0 = given(kXF);
   plane.y0 = given(kYF);

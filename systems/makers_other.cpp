@@ -138,7 +138,7 @@ Made make_albers(const MethodArguments& given) {
   const double e = given.e;
   double n, C, rho0;
   TWalbers_c(e, 0, given(kLatF), given(kLat1), given(kLat2), &n, &C, &rho0);
-  require(std::isfinite(rho0) && n != 0, given, "its standard parallels make no cone");
+  require(std::isfinite(rho0), given, "its standard parallels make no cone");
   return formula(
       false_origin_plane(given, 1),
       [=](TW_BLOCK) { TWalbers_f(e, 0, n, C, rho0, count, in, out, status); },
@@ -159,8 +159,8 @@ Made make_azimuthal_equal_area_spherical(const MethodArguments& given) {
 Made make_cylindrical_equal_area(const MethodArguments& given) {
   const Authalic sphere(given);
   const double lat1 = given(kLat1);
+  require_parallel(given, lat1);
   const double parallel = transverse_radius(given, lat1) * std::cos(lat1);
-  require(parallel > 0, given, "the standard parallel lies at a pole");
   const Plane plane = {given(kLon0), parallel, sphere.radius * sphere.radius / parallel, given(kX0),
                        given(kY0)};
   return pointwise(
@@ -175,8 +175,8 @@ Made make_cylindrical_equal_area(const MethodArguments& given) {
 }
 
 Made make_cylindrical_equal_area_spherical(const MethodArguments& given) {
+  require_parallel(given, given(kLat1));
   const double c = std::cos(given(kLat1));
-  require(c > 0, given, "the standard parallel lies at a pole");
   const Plane plane = {given(kLon0), given.a * c, given.a / c, given(kX0), given(kY0)};
   return pointwise(
       plane,
@@ -280,7 +280,9 @@ Made make_cassini(const MethodArguments& given) {
   return map_formula(metric_plane(given), Cassini(given.a, given.f, given(kLat0)));
 }
 
-// The northing less its own cube, by the radii at the point: IOGP Publication 373-7-2, method 9833.
+// The northing less its own cube, by the radii at the point: IOGP Publication 373-7-2, method 9833;
+// the inverse by Newton's method, which finds nothing beyond the greatest northing that there is.
+// A point that fails ends its loop, for the block is asked again point by point.
 Made make_hyperbolic_cassini(const MethodArguments& given) {
   const MapForward<Cassini> forward{Cassini(given.a, given.f, given(kLat0))};
   const MapInverse<Cassini> inverse{forward.map};
@@ -292,23 +294,26 @@ Made make_hyperbolic_cassini(const MethodArguments& given) {
   return formula(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
       [=](TW_BLOCK) {
-        for (int i = 0; i < count && *status == TW_SUCCESS; ++i) {
-          const double lat = in[i].y;
-          *status = over_points(forward, 1, in + i, out + i);
-          out[i].y -= cube(lat) * out[i].y * out[i].y * out[i].y;
+        *status = over_points(forward, count, in, out);
+        for (int i = 0; i < count; ++i) {
+          out[i].y -= cube(in[i].y) * out[i].y * out[i].y * out[i].y;
         }
       },
       [=](TW_BLOCK) {
         for (int i = 0; i < count && *status == TW_SUCCESS; ++i) {
           const CoordinateTriple wanted = in[i];
           CoordinateTriple plane = wanted;
-          for (int pass = 0; pass < 30 && *status == TW_SUCCESS; ++pass) {
+          bool rest = false;
+          for (int pass = 0; pass < 30 && !rest && *status == TW_SUCCESS; ++pass) {
             *status = over_points(inverse, 1, &plane, out + i);
-            const double next = wanted.y + cube(out[i].y) * plane.y * plane.y * plane.y;
-            const bool rest = std::fabs(next - plane.y) < 1e-9;
-            plane.y = next;
-            if (rest) break;
+            const double c = cube(out[i].y);
+            const double step = (plane.y - c * plane.y * plane.y * plane.y - wanted.y) /
+                                (1 - 3 * c * plane.y * plane.y);
+            plane.y -= step;
+            // The next step would be a thousandth of this one or less, and rounding by the maximum.
+            rest = std::fabs(step) < 1e-6;
           }
+          if (!rest && *status == TW_SUCCESS) *status = TW_NOT_CONVERGED;
         }
       });
 }
@@ -321,8 +326,8 @@ Made make_polyconic(const MethodArguments& given) {
 Made make_equidistant_cylindrical(const MethodArguments& given) {
   const ExactMeridianArc arc(given.a, given.f);
   const double lat1 = given(kLat1);
+  require_parallel(given, lat1);
   const double parallel = transverse_radius(given, lat1) * std::cos(lat1);
-  require(parallel > 0, given, "the standard parallel lies at a pole");
   const double origin = arc.arc(given(kLat0));
   return pointwise(
       Plane{given(kLon0), parallel, 1, given(kX0), given(kY0) - origin},
@@ -339,8 +344,8 @@ Made make_equidistant_cylindrical_spherical(const MethodArguments& given) {
   double cos_lat1;
   TWstatus made;
   TWcyl_eqr_c(given(kLat1), &cos_lat1, &made);
+  require_parallel(given, given(kLat1));
   const double lat0 = given(kLat0);
-  require(cos_lat1 > 0, given, "the standard parallel lies at a pole");
   return formula(
       natural_plane(given, 1),
       [=](TW_BLOCK) { TWcyl_eqr_f(0, lat0, cos_lat1, count, in, out, status); },
@@ -349,7 +354,7 @@ Made make_equidistant_cylindrical_spherical(const MethodArguments& given) {
 
 Made make_equidistant_conic(const MethodArguments& given) {
   const EquidistantConic map(given.a, given.f, given(kLatF), given(kLat1), given(kLat2));
-  require(std::isfinite(map.rho0) && map.n != 0, given, "its standard parallels make no cone");
+  require(std::isfinite(map.rho0), given, "its standard parallels make no cone");
   return map_formula(Plane{given(kLonF), 1, 1, given(kXF), given(kYF)}, map);
 }
 
@@ -379,7 +384,7 @@ Made make_azimuthal_equidistant(const MethodArguments& given) {
       [=](TW_BLOCK) { *status = over_points(inverse, count, in, out); });
 }
 
-// IOGP Publication 373-7-2, method 9831.
+// IOGP Publication 373-7-2, method 9831; the inverse by Newton's method on the latitude.
 Made make_guam(const MethodArguments& given) {
   const double a = given.a;
   const double e2 = given.e2;
@@ -397,19 +402,28 @@ Made make_guam(const MethodArguments& given) {
         return PointAnswer{x, arc.arc(lat) - origin + bend(x, lat)};
       },
       [=](double x, double y) {
-        double lat = arc.latitude(origin + y);
-        for (int i = 0; i < 30; ++i) {
-          const double next = arc.latitude(origin + y - bend(x, lat));
-          const bool rest = std::fabs(next - lat) < 1e-16;
-          lat = next;
-          if (rest) break;
+        // Bent upwards by x, so that the root lies nearer to the equator; not to begin at a pole.
+        double lat = std::clamp(arc.latitude(origin + y), -1.5, 1.5);
+        bool rest = false;
+        for (int i = 0; i < 50 && !rest; ++i) {
+          const double s = std::sin(lat);
+          const double c = std::cos(lat);
+          const double w2 = 1 - e2 * s * s;
+          const double slope =
+              a * (1 - e2) / (w2 * std::sqrt(w2)) + x * x * std::sqrt(w2) / (2 * a * c * c);
+          const double next = lat - (arc.arc(lat) - origin + bend(x, lat) - y) / slope;
+          rest = std::fabs(next - lat) < 1e-14;
+          // Half of the way to a pole at most.
+          lat = std::fabs(next) < kHalfPi ? next : (lat + std::copysign(kHalfPi, next)) / 2;
         }
         const double s = std::sin(lat);
-        return PointAnswer{x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat)), lat, within(lat)};
+        const double lon = x * std::sqrt(1 - e2 * s * s) / (a * std::cos(lat));
+        return PointAnswer{lon, lat, rest && std::fabs(lon) <= kPi};
       });
 }
 
 Made make_colombia_urban(const MethodArguments& given) {
+  require(std::fabs(given(kLat0)) < kHalfPi - 1e-10, given, "its origin lies at a pole");
   const ColombiaUrban map(given.a, given.e2, given(kLat0), given(kPlaneHeight));
   return pointwise(
       Plane{given(kLon0), 1, 1, given(kX0), given(kY0)},
@@ -565,19 +579,19 @@ Made make_local_orthographic(const MethodArguments& given) {
 
 namespace {
 
-Made perspective(const MethodArguments& given, double tilt_a, double tilt_b, double turn) {
+Made perspective(const MethodArguments& given, double azimuth, double tilt) {
   const Perspective map(given);
-  const bool tilted = tilt_a != 0 || tilt_b != 0 || turn != kPi;
+  const bool tilted = azimuth != 0 || tilt != 0;
   const Plane plane = {given(kTopoLon), given.a, given.a, given(kX0), given(kY0)};
   // Longitude and latitude, or plane, of one point on the ellipsoid itself.
   const auto run = [=](bool inverse, CoordinateTriple* point) {
     TWstatus made = TW_SUCCESS;
     point->z = 0;
     if (tilted) {
-      (inverse ? TWpersp_i(1, map.e, 0, map.lat0, 0, map.h, map.p, map.phi_g, tilt_a, tilt_b, turn,
-                           1, point, point, &made)
-               : TWpersp_f(1, map.e, 0, map.lat0, 0, map.h, map.p, map.phi_g, tilt_a, tilt_b, turn,
-                           1, point, point, &made));
+      (inverse ? TWpersp_i(1, map.e, 0, map.lat0, 0, map.h, map.p, map.phi_g, azimuth, tilt, kPi, 1,
+                           point, point, &made)
+               : TWpersp_f(1, map.e, 0, map.lat0, 0, map.h, map.p, map.phi_g, azimuth, tilt, kPi, 1,
+                           point, point, &made));
     } else {
       (inverse ? TWpersp_vert_i : TWpersp_vert_f)(1, map.e, 0, map.lat0, 0, map.h, map.p, map.phi_g,
                                                   1, point, point, &made);
@@ -600,12 +614,10 @@ Made perspective(const MethodArguments& given, double tilt_a, double tilt_b, dou
 
 }  // namespace
 
-Made make_vertical_perspective(const MethodArguments& given) {
-  return perspective(given, 0, 0, kPi);
-}
+Made make_vertical_perspective(const MethodArguments& given) { return perspective(given, 0, 0); }
 
 Made make_tilted_perspective(const MethodArguments& given) {
-  return perspective(given, given(kAzimuth), given(kTilt), kPi);
+  return perspective(given, given(kAzimuth), given(kTilt));
 }
 
 Made make_imw_polyconic(const MethodArguments& given) {

@@ -338,8 +338,8 @@ constexpr Method kMethods[] = {
      "Stereographic", kNaturalScaled, make_stereographic},
     {9810, "Polar Stereographic (variant A)", "polar stereographic variant a", "stere",
      "Polar_Stereographic", "Stereographic_North_Pole", kNaturalScaled, make_polar_stereographic_a},
-    {9829, "Polar Stereographic (variant B)", "polar stereographic", "stere", "Polar_Stereographic",
-     "Stereographic_North_Pole", kPolarB, make_polar_stereographic_b},
+    {9829, "Polar Stereographic (variant B)", "polar stereographic variant b", "stere",
+     "Polar_Stereographic", "Stereographic_North_Pole", kPolarB, make_polar_stereographic_b},
     {9830, "Polar Stereographic (variant C)", "polar stereographic variant c", "stere",
      "Polar_Stereographic_Variant_C", "", kPolarC, make_polar_stereographic_c},
     {9811, "New Zealand Map Grid", "new zealand map grid|nzmg", "nzmg", "New_Zealand_Map_Grid",
@@ -510,16 +510,18 @@ std::string_view truth_of(int method) {
 
 void require(bool good, const MethodArguments& given, const char* why) {
   if (good) return;
-  const Method* method = method_by_code(given.definition.method);
-  throw Error("The projection " + std::string(method == nullptr ? "" : method->name) +
+  throw Error("The projection " + std::string(method_by_code(given.definition.method)->name) +
               " cannot be set up: " + why + ".");
 }
 
 void require(TWstatus word, const MethodArguments& given) {
   require(TW_OK(word), given,
           word == TW_BAD_LATITUDE ? "a latitude lies beyond a pole or at one that cannot serve"
-          : word == TW_BAD_ECCENTRICITY ? "the ellipsoid has no eccentricity below one"
-                                        : "its parameters do not fit together");
+                                  : "its parameters do not fit together");
+}
+
+void require_parallel(const MethodArguments& given, double lat) {
+  require(std::fabs(lat) < kHalfPi - 1e-10, given, "the standard parallel lies at a pole");
 }
 
 }  // namespace tidewater::detail

@@ -60,13 +60,21 @@ Area common(const Area& a, const Area& b) {
   result.south = std::max(a.south, b.south);
   result.north = std::min(a.north, b.north);
   double best = 0;
-  for (const double turn : {-360.0, 0.0, 360.0}) {
-    const double west = std::max(a.west, b.west + turn);
-    const double east = std::min(a.west + width(a), b.west + width(b) + turn);
-    if (east - west <= best) continue;
-    best = east - west;
-    result.west = west;
-    result.east = east > 180 && west < 180 ? east - 360 : east;
+  if (width(b) >= 360) {
+    best = width(a);
+  } else if (width(a) >= 360) {
+    result.west = b.west;
+    result.east = b.east;
+    best = width(b);
+  } else {
+    for (const double turn : {-360.0, 0.0, 360.0}) {
+      const double west = std::max(a.west, b.west + turn);
+      const double east = std::min(a.west + width(a), b.west + width(b) + turn);
+      if (east - west <= best) continue;
+      best = east - west;
+      result.west = west < 180 ? west : west - 360;
+      result.east = east > 180 ? east - 360 : east;
+    }
   }
   if (best <= 0 || result.south >= result.north) return a;
   result.name = a.name == b.name ? a.name : a.name + " and " + b.name;
@@ -119,13 +127,14 @@ std::vector<Link> expanded(const Link& link) {
   int at = datum_of(link.operation.source);
   for (const int code : link.operation.steps) {
     auto step = registry.operation(code);
-    if (!step) return {};
+    // Steps have no steps of their own: a store that says so might lead in a circle.
+    if (!step || !step->steps.empty()) return {};
     const int from = datum_of(step->source);
     const int to = datum_of(step->target);
     const bool reversed = from != at;
     if (reversed && to != at) return {};
     at = reversed ? from : to;
-    for (Link& inner : expanded({*std::move(step), reversed})) links.push_back(std::move(inner));
+    links.push_back({*std::move(step), reversed});
   }
   if (link.reversed) {
     std::reverse(links.begin(), links.end());
@@ -159,6 +168,23 @@ std::string hindrance(const OperationRecord& operation, const TransformationOpti
   return "the method " + Registry::shared().method_name(operation.method);
 }
 
+// Does a later operation between the same systems take its place?  Where the grids of all later
+// ones are not there, an older one serves if it can.
+bool replaced(const OperationRecord& operation, const TransformationOptions& options) {
+  if (operation.replaced_by == 0) return false;
+  if (!hindrance(operation, options).empty()) return true;
+  constexpr int kMost = 8;  // a store may say that two replace each other
+  int code = operation.replaced_by;
+  for (int i = 0; i < kMost && code != 0; ++i) {
+    const auto later = Registry::shared().operation(code);
+    const bool lacks_grid = later && is_shift_grid(later->method) &&
+                            shift_grid_file(*later, options.grid_folders).empty();
+    if (!lacks_grid) return true;
+    code = later->replaced_by;
+  }
+  return false;
+}
+
 std::optional<Way> way_of(const OperationRecord& operation, bool reversed,
                           const TransformationOptions& options) {
   Way way;
@@ -182,7 +208,7 @@ std::vector<Way> direct_ways(int source, int target, const TransformationOptions
   const int source_datum = datum_of(source);
   std::vector<Way> list;
   for (const OperationRecord& operation : registry.operations(source, target)) {
-    if (operation.replaced_by != 0) continue;
+    if (replaced(operation, options)) continue;
     if (auto way = way_of(operation, datum_of(operation.source) != source_datum, options)) {
       list.push_back(*std::move(way));
     }
@@ -207,7 +233,16 @@ std::vector<Way> direct_ways(int source, int target, const TransformationOptions
   return list;
 }
 
-Way joined(const Way& first, const Way& second) {
+// One way after the other; nothing where the second begins by taking back the first's last step:
+// that is a way to where the step began, and over there it is found without the step.
+std::optional<Way> joined(const Way& first, const Way& second) {
+  if (!first.links.empty() && !second.links.empty()) {
+    const Link& last = first.links.back();
+    const Link& next = second.links.front();
+    if (last.operation.code == next.operation.code && last.reversed != next.reversed) {
+      return std::nullopt;
+    }
+  }
   Way way = first;
   way.links.insert(way.links.end(), second.links.begin(), second.links.end());
   way.name += " + " + second.name;
@@ -259,7 +294,7 @@ bool usable(const std::vector<Way>& list, const Area& wanted) {
 std::optional<OperationRecord> rotation_from(int system) {
   const int datum = datum_of(system);
   const auto record = Registry::shared().datum(datum);
-  if (!record || record->meridian == kGreenwich || record->meridian == 0) return std::nullopt;
+  if (!record || record->meridian == kGreenwich) return std::nullopt;
   for (OperationRecord& operation : Registry::shared().operations(system)) {
     if (operation.method == kLongitudeRotation && datum_of(operation.source) == datum) {
       return std::move(operation);
@@ -274,23 +309,19 @@ std::vector<Way> turned_ways(int source, int target, const TransformationOptions
   const auto first = rotation_from(source);
   const auto last = rotation_from(target);
   const auto append = [&](int from, int to) {
-    for (Way& way : direct_ways(from, to, options)) {
-      if (first && from != source) way = joined(*way_of(*first, false, options), way);
-      if (last && to != target) way = joined(way, *way_of(*last, true, options));
-      list.push_back(std::move(way));
+    for (const Way& middle : direct_ways(from, to, options)) {
+      std::optional<Way> way = middle;
+      if (from != source) way = joined(*way_of(*first, false, options), *way);
+      if (way && to != target) way = joined(*way, *way_of(*last, true, options));
+      if (way) list.push_back(*std::move(way));
     }
   };
-  if (first && datum_of(first->target) == datum_of(target)) {
-    list.push_back(*way_of(*first, false, options));
-  } else if (first) {
-    append(first->target, target);
-  }
-  if (last && datum_of(last->target) == datum_of(source)) {
-    list.push_back(*way_of(*last, true, options));
-  } else if (last) {
-    append(source, last->target);
-  }
-  if (first && last) append(first->target, last->target);
+  // The rotation itself is among the ways by one operation.
+  const bool turn_first = first && datum_of(first->target) != datum_of(target);
+  const bool turn_last = last && datum_of(last->target) != datum_of(source);
+  if (turn_first) append(first->target, target);
+  if (turn_last) append(source, last->target);
+  if (turn_first && turn_last) append(first->target, last->target);
   return list;
 }
 
@@ -307,7 +338,8 @@ void add_ways_over(int source, int hub, int target, const Area& wanted,
   constexpr std::size_t kFew = 6;
   for (std::size_t i = 0; i < std::min(kFew, first.size()); ++i) {
     for (std::size_t j = 0; j < std::min(kFew, second.size()); ++j) {
-      if (coverage(first[i].area, second[j].area) > 0) list.push_back(joined(first[i], second[j]));
+      if (!(coverage(first[i].area, second[j].area) > 0)) continue;
+      if (auto way = joined(first[i], second[j])) list.push_back(*std::move(way));
     }
   }
 }
@@ -378,21 +410,18 @@ std::vector<Way> height_ways(int source, int target, const Definition& own, cons
     way.accuracy = operation.accuracy;
     way.area = area_of(operation);
     const int read_in = operation.interpolation;
-    const bool by_offset_grid = both && is_offset_grid(operation.method);
-    if (is_height_offset(operation.method)) {
-      way.missing = "";
-    } else if (by_offset_grid && read_in != 0 && datum_of(read_in) != own.datum.code) {
-      way.missing = "positions on the datum in which its grid is read";
-    } else if (by_offset_grid) {
-      if (geoid_grid_file(operation, options.grid_folders).empty()) {
+    const bool by_grid = both ? is_offset_grid(operation.method) : is_geoid_grid(operation.method);
+    if (by_grid) {
+      // Offsets are read at the source's positions, undulations at those of their own datum.
+      const int read_at = both ? own.datum.code : datum_of(operation.source);
+      if (read_in != 0 && datum_of(read_in) != read_at) {
+        way.missing = both ? "positions on the datum in which its grid is read"
+                           : "a grid that is read in another datum";
+      } else if (geoid_grid_file(operation, options.grid_folders).empty()) {
         way.missing = grid_names(operation);
       }
-    } else if (both || !is_geoid_grid(operation.method)) {
+    } else if (!is_height_offset(operation.method)) {
       way.missing = "the method " + registry.method_name(operation.method);
-    } else if (read_in != 0 && datum_of(read_in) != datum_of(operation.source)) {
-      way.missing = "a grid that is read in another datum";
-    } else if (geoid_grid_file(operation, options.grid_folders).empty()) {
-      way.missing = grid_names(operation);
     }
     list.push_back(std::move(way));
   };
@@ -437,19 +466,15 @@ Way way_by_operation(const OperationRecord& operation, bool reversed,
   return *std::move(way);
 }
 
-std::unique_ptr<const DatumStep> datum_step(const Link& link, const TransformationOptions& options,
-                                            bool flat) {
+std::unique_ptr<const Step> datum_step(const Link& link, const TransformationOptions& options,
+                                       bool flat) {
   const OperationRecord& operation = link.operation;
   const Frame source = frame_of(datum_from_registry(datum_of(operation.source)));
   const Frame target = frame_of(datum_from_registry(datum_of(operation.target)));
   if (is_similarity_or_offset(operation.method)) {
     return similarity_or_offset(link, source, target, options.epoch, flat);
   }
-  if (is_shift_grid(operation.method)) {
-    return shift_grid_step(link, source, target, options.grid_folders, flat);
-  }
-  throw Error(in_words(link) + " cannot be carried out: there is no formula for " +
-              Registry::shared().method_name(operation.method) + ".");
+  return shift_grid_step(link, source, target, options.grid_folders, flat);
 }
 
 }  // namespace tidewater::detail

@@ -38,7 +38,8 @@ Way way_by_operation(const OperationRecord& operation, bool reversed,
 // Is the datum the same, so that nothing has to be done?
 bool same_datum(const DatumDefinition& a, const DatumDefinition& b);
 
-// One datum step between longitudes from Greenwich, latitudes (radians) and heights.
+// A step between longitudes from Greenwich, latitudes (radians) and heights that tells of itself,
+// where no way does.
 class DatumStep : public Step {
  public:
   virtual std::string describe() const = 0;
@@ -59,8 +60,8 @@ double value_of(const OperationRecord& operation, int code);
 // Methods by parameters.
 bool is_similarity_or_offset(int method);
 bool depends_on_time(int method);
-std::unique_ptr<const DatumStep> similarity_or_offset(const Link& link, const Frame& source,
-                                                      const Frame& target, double epoch, bool flat);
+std::unique_ptr<const Step> similarity_or_offset(const Link& link, const Frame& source,
+                                                 const Frame& target, double epoch, bool flat);
 
 // Methods by grids of longitude and latitude shifts, or of geocentric translations.
 bool is_shift_grid(int method);
@@ -68,10 +69,9 @@ bool is_geocentric_grid(int method);
 // The file that serves an operation, empty where there is none in the folders.
 std::string shift_grid_file(const OperationRecord& operation,
                             const std::vector<std::string>& folders);
-std::unique_ptr<const DatumStep> shift_grid_step(const Link& link, const Frame& source,
-                                                 const Frame& target,
-                                                 const std::vector<std::string>& folders,
-                                                 bool flat);
+std::unique_ptr<const Step> shift_grid_step(const Link& link, const Frame& source,
+                                            const Frame& target,
+                                            const std::vector<std::string>& folders, bool flat);
 // A grid of the caller's.
 std::unique_ptr<const DatumStep> shift_grid_step(const std::string& file, bool reversed,
                                                  const Frame& source, const Frame& target,
@@ -114,10 +114,10 @@ int geographic_of(const Link& link);
 Area area_of_both(const Definition& source, const Definition& target,
                   const TransformationOptions& options);
 
-// What carries out one operation; null where it changes nothing.  `flat` takes every position to
-// lie on the ellipsoid.  Throws an Error where it cannot be carried out.
-std::unique_ptr<const DatumStep> datum_step(const Link& link, const TransformationOptions& options,
-                                            bool flat);
+// What carries out one operation of a way that lacks nothing; null where it changes nothing. `flat`
+// takes every position to lie on the ellipsoid.  Throws an Error where its grid cannot be read.
+std::unique_ptr<const Step> datum_step(const Link& link, const TransformationOptions& options,
+                                       bool flat);
 // Position vector parameters of a definition (towgs84), from its datum to WGS 84.
 std::unique_ptr<const DatumStep> towgs84_step(const DatumDefinition& datum, bool reversed,
                                               bool flat);

@@ -78,8 +78,10 @@ Definition definition_from_registry(int code) {
     result.datum = datum_from_registry(system->datum);
     const auto unit = need(registry.unit(system->unit), "unit", system->unit, of);
     result.unit = {unit.name, unit.code, unit.factor};
-    // Sexagesimal digits have no factor.
-    if (unit.factor == 0) result.unit = {"degree", 9102, kPi / 180};
+    // Sexagesimal digits have no factor; a plane in them has no size.
+    if (unit.factor == 0 && system->kind != SystemKind::projected) {
+      result.unit = {"degree", 9102, kPi / 180};
+    }
     result.axes = system->axes;
     if (system->kind == SystemKind::projected) {
       const auto conversion =

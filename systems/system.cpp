@@ -16,18 +16,26 @@ namespace {
 
 bool plane(const Definition& definition) { return definition.method != 0; }
 
+void need_size(const UnitDefinition& unit, const Definition& definition) {
+  if (!std::isfinite(unit.factor) || !(unit.factor > 0)) {
+    throw Error("The unit of " + definition.name + " has no size.");
+  }
+}
+
 }  // namespace
 
 SystemImpl::SystemImpl(Definition given)
     : definition(std::move(given)),
       projection(plane(definition) ? std::make_shared<const ProjectionImpl>(definition) : nullptr) {
-  if (definition.kind == SystemKind::vertical) return;
+  const bool vertical = definition.kind == SystemKind::vertical;
+  if (vertical || definition.kind == SystemKind::compound) {
+    need_size(definition.vertical_unit, definition);
+  }
+  if (vertical) return;
   const auto& ellipsoid = definition.datum.ellipsoid;
   // The constructor of an ellipsoid refuses what is none.
   (void)Ellipsoid(ellipsoid.a, ellipsoid.inverse_flattening);
-  if (!std::isfinite(definition.unit.factor) || !(definition.unit.factor > 0)) {
-    throw Error("The unit of " + definition.name + " has no size.");
-  }
+  need_size(definition.unit, definition);
 }
 
 }  // namespace detail
@@ -181,9 +189,8 @@ std::vector<FoundSystem> System::all() {
   const detail::Registry& registry = detail::Registry::shared();
   std::vector<FoundSystem> list;
   for (const int code : registry.systems()) {
-    if (auto record = registry.system(code)) {
-      list.push_back({code, std::move(record->name), record->kind});
-    }
+    auto record = *registry.system(code);
+    list.push_back({code, std::move(record.name), record.kind});
   }
   return list;
 }

@@ -52,8 +52,11 @@ bool has_height(const Definition& definition) {
 
 // Are the heights of two systems above the same surface?
 bool same_heights(const Definition& one, const Definition& other) {
-  if (one.vertical_code == 0 || other.vertical_code == 0) {
-    return one.vertical_code == other.vertical_code && one.vertical_name == other.vertical_name;
+  if (has_ellipsoidal_height(one) || has_ellipsoidal_height(other)) {
+    return has_ellipsoidal_height(one) && has_ellipsoidal_height(other);
+  }
+  if (one.vertical_code == other.vertical_code && one.vertical_name == other.vertical_name) {
+    return true;
   }
   const auto a = Registry::shared().system(one.vertical_code);
   const auto b = Registry::shared().system(other.vertical_code);
@@ -116,14 +119,12 @@ struct End {
         turned = -turned;
       }
     }
-    const char first = definition.axes.empty() ? 'E' : definition.axes[0];
-    swapped = options.own_axes && kind != SystemKind::geocentric && (first == 'N' || first == 'S');
-    if (kind == SystemKind::compound && definition.vertical_unit.factor > 0) {
-      sz = definition.vertical_unit.factor;
-    }
-    // Inside, heights count upwards.
-    if (kind == SystemKind::compound && definition.axes.size() > 2 && definition.axes[2] == 'D') {
-      sz = -sz;
+    const bool north_first = definition.axes.starts_with('N') || definition.axes.starts_with('S');
+    swapped = options.own_axes && kind != SystemKind::geocentric && north_first;
+    if (kind == SystemKind::compound) {
+      // Inside, heights count upwards.
+      sz = definition.axes.ends_with('D') ? -definition.vertical_unit.factor
+                                          : definition.vertical_unit.factor;
     }
   }
 
@@ -293,6 +294,7 @@ class TransformationImpl {
             : height_ways(one.vertical_code, other.vertical_code, one, wanted, options);
     const bool own_offsets = named_heights.size() == 1 && named_heights[0].starts_with("offset:");
     if (own_offsets) {
+      tell(named_heights[0]);
       add(offset_grid_step(named_heights[0].substr(7), options.grid_folders));
       accuracy = kNotANumber;
       go(one, other, true);
@@ -365,6 +367,7 @@ class TransformationImpl {
     for (const std::string& word : named) {
       if (!word.starts_with("geoid:")) continue;
       Way way;
+      way.name = word;
       way.accuracy = kNotANumber;
       return {end, way, geoid_step(word.substr(6), to_geoid, options.grid_folders)};
     }
@@ -380,7 +383,7 @@ class TransformationImpl {
     }
     std::string sentence = "No way is known between heights above the ellipsoid and " +
                            (end.vertical_name.empty() ? "those of " + end.name : end.vertical_name);
-    if (way == nullptr && !list.empty()) sentence += " by the operation that was named";
+    if (!named.empty()) sentence += " by the operation that was named";
     if (way != nullptr) {
       sentence = "The ways between heights above the ellipsoid and " + end.vertical_name +
                  " need what is not there: ";
@@ -395,12 +398,19 @@ class TransformationImpl {
                 "positions as they are.");
   }
 
-  // Tells of an operation on heights.
+  // What would give this transformation again, a word after the other.
+  void tell(const std::string& word) {
+    if (!operation.empty()) operation += " ";
+    operation += word;
+  }
+  void tell(const Link& link) {
+    tell((link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code));
+  }
+
+  // Tells of an operation on heights, or of the caller's grid, whose name is the way's.
   void note(const Way& way) {
-    for (const Link& link : way.links) {
-      if (!operation.empty()) operation += " ";
-      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
-    }
+    if (way.links.empty()) tell(way.name);
+    for (const Link& link : way.links) tell(link);
     accuracy += way.accuracy;
     if (area.name.empty() && !way.area.name.empty()) area = way.area;
   }
@@ -448,8 +458,7 @@ class TransformationImpl {
 
   void take(const Way& way, const TransformationOptions& options) {
     for (const Link& link : way.links) {
-      if (!operation.empty()) operation += " ";
-      operation += (link.reversed ? "-EPSG:" : "EPSG:") + std::to_string(link.operation.code);
+      tell(link);
       datum_words.push_back(in_words(link) + " (" +
                             Registry::shared().method_name(link.operation.method) + ")");
       if (auto step = datum_step(link, options, flat)) {
@@ -458,7 +467,8 @@ class TransformationImpl {
         datum_words.back() += ", which changes nothing";
       }
     }
-    if (way.links.empty()) datum_words.push_back(way.name);
+    // An ensemble and its member; the same datum has no name.
+    if (way.links.empty() && !way.name.empty()) datum_words.push_back(way.name);
     accuracy += way.accuracy;
     if (!way.area.name.empty()) area = way.area;
   }
@@ -542,6 +552,7 @@ class TransformationImpl {
       bool reversed = word.starts_with('-');
       if (reversed) word.erase(0, 1);
       if (word.starts_with("grid:")) {
+        tell((reversed ? "-" : "") + word);
         add(shift_grid_step(word.substr(5), reversed, frame_of(one.datum), frame_of(other.datum),
                             options.grid_folders));
         accuracy = kNotANumber;

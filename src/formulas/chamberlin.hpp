@@ -92,7 +92,7 @@ struct Chamberlin {
     double least = 1e300;
     for (int i = 0; i < 50; ++i) {
       Spot here;
-      if (!forward(at.lon, at.lat, &here)) return false;
+      if (!forward(at, &here)) return false;
       const double dx = x - here.x;
       const double dy = y - here.y;
       const double off = std::hypot(dx, dy);
@@ -103,18 +103,13 @@ struct Chamberlin {
         break;  // nothing is left but rounding
       }
       if (off < 1e-16) break;
-      // A step east and one north, short of the poles.
-      const double c = std::max(std::cos(at.lat), 1e-6);
-      const double north = at.lat > 0 ? -kStep : kStep;
       Spot e;
       Spot n;
-      if (!forward(at.lon + kStep / c, at.lat, &e) || !forward(at.lon, at.lat + north, &n)) {
-        return false;
-      }
+      if (!forward(moved(at, kStep, 0), &e) || !forward(moved(at, 0, kStep), &n)) return false;
       const double xe = (e.x - here.x) / kStep;
       const double ye = (e.y - here.y) / kStep;
-      const double xn = (n.x - here.x) / north;
-      const double yn = (n.y - here.y) / north;
+      const double xn = (n.x - here.x) / kStep;
+      const double yn = (n.y - here.y) / kStep;
       const double whole = xe * yn - xn * ye;
       if (!(std::fabs(whole) > 1e-6)) return false;
       double east = (dx * yn - dy * xn) / whole;
@@ -122,12 +117,7 @@ struct Chamberlin {
       const double shorter = std::min(1.0, 0.5 / std::hypot(east, up));
       east *= shorter;
       up *= shorter;
-      // Along the great circle, so that steps may pass a pole.
-      const double s = std::sin(at.lat);
-      const double px = std::cos(at.lat) - up * s;
-      const double pz = s + up * std::cos(at.lat);
-      at.lon = std::remainder(at.lon + std::atan2(east, px), 2 * kPi);
-      at.lat = std::atan2(pz, std::hypot(px, east));
+      at = moved(at, east, up);
     }
     return least < kNear;
   }
@@ -139,6 +129,17 @@ struct Chamberlin {
   GeodesicArc<double> line(const Position& from, const Position& to) const {
     return lines.any_line(from.lat * kDegreesPerRadian, from.lon * kDegreesPerRadian,
                           to.lat * kDegreesPerRadian, to.lon * kDegreesPerRadian);
+  }
+
+  bool forward(const Position& at, Spot* spot) const { return forward(at.lon, at.lat, spot); }
+
+  // A small way east and north along the great circle, so that it may pass a pole.
+  static Position moved(const Position& at, double east, double north) {
+    const double s = std::sin(at.lat);
+    const double c = std::cos(at.lat);
+    const double out = c - north * s;
+    return {std::remainder(at.lon + std::atan2(east, out), 2 * kPi),
+            std::atan2(s + north * c, std::hypot(out, east))};
   }
 
   Position start(const Spot& spot) const {

@@ -17,24 +17,10 @@ inline constexpr double kGaussSphereMark = -1.0;
 inline constexpr double kGaussForwardLatLimit = kHalfPi - 1e-12;
 inline constexpr double kGaussInverseLatLimit = kHalfPi - 1e-13;
 
-// A latitude of the sphere whose sine and cosine are needed as well or instead: what is not used
-// is not computed.
-template <class V>
-struct SphereLatitude {
-  V half;  // tan(pi/4 - |chi|/2)
-  V sign;
-  V sin, cos;
-
-  TW_INLINE V angle() const { return copysign(kHalfPi - 2.0 * octant_angle(half, V(1.0)), sign); }
-};
-
-// Of the sphere's isometric latitude psi = atanh(sin chi).
+// The latitude of the sphere whose isometric latitude is psi = atanh(sin chi).
 template <Number V>
-TW_INLINE SphereLatitude<V> sphere_latitude(V psi) {
-  const V t = exp(-abs(psi));
-  const V q = t * t;
-  const V inverse = 1.0 / (1.0 + q);
-  return {t, psi, copysign((1.0 - q) * inverse, psi), 2.0 * t * inverse};
+TW_INLINE V sphere_latitude(V psi) {
+  return copysign(kHalfPi - 2.0 * octant_angle(exp(-abs(psi)), V(1.0)), psi);
 }
 
 // psi = atanh(sin chi) of a latitude of the sphere.
@@ -59,7 +45,7 @@ struct GaussSphere {
 
   // Latitudes up to kGaussForwardLatLimit.
   template <Number V>
-  TW_INLINE SphereLatitude<V> forward_latitude(const SinCos<V>& lat) const {
+  TW_INLINE V forward_latitude(const SinCos<V>& lat) const {
     return sphere_latitude((isometric_latitude(e, lat) + t) * c);
   }
   // By contract: wrapped as TWmerc_f does it, then, after the change of ratio, as TWmerc_i does.

@@ -446,7 +446,8 @@ struct Geodesics {
     const SinCos<double> lambda12 = given.lambda12;
     if (lambda12.sin == 0 || beta1.cos == kTiny) {
       const auto at = meridian(beta1, beta2, lambda12);
-      if (at.sigma12 < 1 || reduced_length(beta1, beta2, at) >= 0) {
+      // From a pole every line is a meridian.
+      if (beta1.cos == kTiny || at.sigma12 < 1 || reduced_length(beta1, beta2, at) >= 0) {
         double below = 0;
         if constexpr (Area) below = meridian_area(lambda12, at.alpha2);
         return restored(given, length(at), lambda12, at.alpha2, below);

@@ -45,31 +45,27 @@ struct ObliqueMercator {
   // False on the line's own poles, where v has no bound.
   bool forward(double lon, double lat, double* u, double* v) const {
     const double angle = B * (lon - crossing);
-    double U;
-    if (std::fabs(lat) > kHalfPi - 1e-10) {
-      U = std::copysign(sin_gamma, lat * sin_gamma);
-      *u = A / B * std::copysign(kHalfPi, lat);
-    } else {
-      const double y = B * isometric_latitude(e, sincos(lat)) + log_h;
-      const double S = portable::sinh(y);
-      const double V = portable::sin(angle);
-      U = (S * sin_gamma - V * cos_gamma) / portable::cosh(y);
-      *u = A / B * portable::atan2(S * cos_gamma + V * sin_gamma, portable::cos(angle));
-    }
+    const double y = B * isometric_latitude(e, sincos(lat)) + log_h;
+    const double S = portable::sinh(y);
+    const double V = portable::sin(angle);
+    const double U = (S * sin_gamma - V * cos_gamma) / portable::cosh(y);
+    *u = A / B * portable::atan2(S * cos_gamma + V * sin_gamma, portable::cos(angle));
     *v = -A / B * portable::atanh(U);
     return std::fabs(U) < 1 - 1e-14;
   }
 
   void inverse(double u, double v, double* lon, double* lat) const {
-    const double q = -B / A * v;
-    const double S = portable::sinh(q);
-    const double T = portable::cosh(q);
+    const double S = portable::sinh(-B / A * v);
     const double along = B / A * u;
     const double V = portable::sin(along);
-    const double U = (V * cos_gamma + S * sin_gamma) / T;
-    *lon = crossing - portable::atan2(S * cos_gamma - V * sin_gamma, portable::cos(along)) / B;
-    *lat = std::fabs(U) >= 1 ? std::copysign(kHalfPi, U)
-                             : latitudes.of_isometric((portable::atanh(U) - log_h) / B);
+    const double C = portable::cos(along);
+    const double across = S * cos_gamma - V * sin_gamma;
+    *lon = crossing - portable::atan2(across, C) / B;
+    // artanh(up / cosh) is arsinh(up / out), which loses nothing next to a pole.
+    const double up = V * cos_gamma + S * sin_gamma;
+    const double out = portable::hypot(across, C);
+    *lat = out == 0 ? std::copysign(kHalfPi, up)
+                    : latitudes.of_isometric((portable::asinh(up / out) - log_h) / B);
   }
 };
 

@@ -37,20 +37,6 @@ TW_INLINE V sine_series(const C (&c)[N], SinCos<V> x) {
   return sum * x.sin;
 }
 
-// The sum of c[k - 1] cos(k x) for k from 1 to N.
-template <int N, class C, Number V>
-TW_INLINE V cosine_series(const C (&c)[N], SinCos<V> x) {
-  const V step = 2.0 * x.cos;
-  V next = 0.0;
-  V sum = c[N - 1];
-  for (int k = N - 2; k >= 0; --k) {
-    const V before = step * sum - next + c[k];
-    next = sum;
-    sum = before;
-  }
-  return sum * x.cos - next;
-}
-
 template <Number V>
 struct ComplexSums {
   ComplexOf<V> sine, slope;

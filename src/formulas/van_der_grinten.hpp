@@ -39,10 +39,9 @@ struct VanDerGrinten {
     const V root = sqrt(p * p * ((1.0 - u3) * (1.0 - u3)) + q * q * w);
     const V y = u * (4.0 * (p * p) * u + q * q * ((1.0 + u) * (1.0 + u))) /
                 (cube * (2.0 * u * (p * p) + q * q * (1.0 + u)) + 2.0 * u * p * root);
-    // Where the meridian or the pole makes a quotient of zeros.
+    // Where the origin or the pole makes a quotient of zeros.
     const auto pole = u == 1.0;
-    const auto central = q == 0.0;
-    return {copysign(select(pole, 0.0, kPi * select(central & (u == 0.0), 0.0, x)), lon),
+    return {copysign(select(pole, 0.0, kPi * x), lon),
             copysign(kPi * select(pole, 1.0, select(u == 0.0, 0.0, y)), lat), plain};
   }
 

@@ -68,7 +68,7 @@ TW_INLINE V wrap_turns_below_then_above(V d) {
 template <Number V>
 TW_INLINE V wrap_turns_above_then_at_or_below(V d) {
   V result = wrap_above_then_at_or_below(d);
-  mend(!(abs(result) <= kPi), result,
+  mend(!((result <= kPi) & (result > -kPi)), result,
        [&](int i) { return turns_above_then_at_or_below(lane(d, i)); });
   return result;
 }

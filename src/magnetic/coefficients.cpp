@@ -23,8 +23,9 @@ constexpr int64_t row_offset(int64_t n) { return n * (n + 1) / 2; }
 constexpr int64_t row_count(int32_t degree) { return std::max<int64_t>(int64_t{degree} + 1, 0); }
 
 // The rows of a triangular array that begins so many doubles into a block, from the C allocator;
-// null where that fails.  The block is not read: the rows of a null one are null.
-double** make_row_table(int32_t degree, double* block, int64_t first = 0) {
+// null where that fails.  The block is not read: the rows of a null one are null.  Not inline: a
+// compiler that saw the table released unread would leave out the allocation and its failure.
+[[gnu::noinline]] double** make_row_table(int32_t degree, double* block, int64_t first = 0) {
   const int64_t rows = row_count(degree);
   // Room for one pointer at least, so that null means a failure and nothing else.
   const auto places = static_cast<std::size_t>(std::max<int64_t>(rows, 1));

@@ -8,21 +8,19 @@
 
 namespace tidewater::points {
 
-// A kernel of three coordinates over the first two of `in` and the third of `out`.
+// A kernel of three coordinates, whose formula covers every point, over the first two of `in` and
+// the third of `out`.
 template <class Kernel>
-TWstatus over_points_and_heights(const Kernel& kernel, int32_t count, const CoordinateTriple* in,
-                                 CoordinateTriple* out) {
+void over_points_and_heights(const Kernel& kernel, int32_t count, const CoordinateTriple* in,
+                             CoordinateTriple* out) requires(!requires { &Kernel::other; }) {
   constexpr int32_t kMany = 256;
   CoordinateTriple given[kMany];
-  TWstatus status = TW_SUCCESS;
   for (int32_t done = 0; done < count;) {
     const int32_t some = std::min(kMany, count - done);
     for (int32_t i = 0; i < some; ++i) given[i] = {in[done + i].x, in[done + i].y, out[done + i].z};
-    const TWstatus word = over_points(kernel, some, given, out + done);
-    if (word != TW_SUCCESS) status = word;
+    over_points(kernel, some, given, out + done);
     done += some;
   }
-  return status;
 }
 
 }  // namespace tidewater::points

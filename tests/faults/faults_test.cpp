@@ -565,11 +565,13 @@ const Call kCalls[] = {
          return Bits().add(grid.undulation(-70, 40)).add(grid.undulation(-52.5, 58)).when(true);
        });
      }},
+#ifdef TIDEWATER_HAVE_TIFF
     {"ShiftGrid of a .tif",
      [] {
        return unless_thrown(
            [] { return shifted(tidewater::ShiftGrid(files() / "g.tif"), 25, 45); });
      }},
+#endif
     {"Transformation by the registry",
      [] {
        return transformed("EPSG:4230", "EPSG:2154", {3, 46, 0});

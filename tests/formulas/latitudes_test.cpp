@@ -46,6 +46,27 @@ TEST(Latitudes, ClosedFormsAndIterationGiveTheReferenceAtAnyFlattening) {
   }
 }
 
+// What the series leave out grows as the ninth power of the flattening: at the limit it is
+// rounding.
+TEST(Latitudes, SeriesAreTheClosedFormsUpToTheirLimit) {
+  for (const double n : {kLargestSeriesN, -kLargestSeriesN}) {
+    const double f = 2 * n / (1 + n);
+    for (int from = 0; from < kKinds; ++from) {
+      for (int to = 0; to < kKinds; ++to) {
+        if (from == to) continue;
+        const auto series =
+            latitude_series(static_cast<Latitude>(from), static_cast<Latitude>(to), n);
+        for (double lat = -1.5; lat < 1.6; lat += 0.25) {
+          EXPECT_NEAR(
+              series(lat),
+              exact_latitude(static_cast<Latitude>(from), static_cast<Latitude>(to), f, lat), 3e-15)
+              << n << ", " << from << " to " << to << " of " << lat;
+        }
+      }
+    }
+  }
+}
+
 TEST(Latitudes, PolesAndTheEquatorStayThemselves) {
   const double pole = 1.5707963267948966;
   for (int from = 0; from < kKinds; ++from) {

@@ -50,6 +50,14 @@ TEST(RhumbFormulas, PolesAreReachedAlongTheMeridian) {
   EXPECT_NEAR(up.length, quadrant, 1e-5);
   EXPECT_EQ(up.azimuth.sin, 0);
   EXPECT_GT(up.azimuth.cos, 0);
+  // It winds around the pole without end: all of its longitudes' share of a half of the earth,
+  // which has 510,065,621.724 km^2 (NIMA TR8350.2, table 3.3, by its authalic radius).
+  const double share = 510065621.724e6 / 2 * 50 / 360;
+  EXPECT_NEAR(up.area, share, 1e3);
+  EXPECT_NEAR(lines.inverse<true>(90.0, 10.0, 20.0, 60.0).area, share, 1e3);
+  EXPECT_NEAR(lines.inverse<true>(20.0, 10.0, -90.0, 60.0).area, -share, 1e3);
+  EXPECT_NEAR(lines.inverse<true>(90.0, 10.0, 90.0, 60.0).area, share, 1e3);
+  EXPECT_EQ(lines.inverse<true>(90.0, 10.0, -90.0, 60.0).area, 0);
   const auto over = lines.inverse(90.0, 10.0, -90.0, 60.0);
   EXPECT_NEAR(over.length, 2 * quadrant, 2e-5);
   EXPECT_LT(over.azimuth.cos, 0);

@@ -46,6 +46,7 @@ TEST(TransverseMercatorSeries, RefuseWhatIsTooFarAndNotANumber) {
   EXPECT_FALSE(map.forward(std::nan(""), 0.1).plain);
   EXPECT_FALSE(map.forward(0.1, std::nan("")).plain);
   const double limit = TransverseMercator::kLargestEasting * map.radius;
+  EXPECT_NEAR(limit, 3900e3 * 0.9996, 100);
   EXPECT_TRUE(map.inverse(limit * (1 - 1e-15), 1e6).plain);
   EXPECT_FALSE(map.inverse(limit * (1 + 1e-15), 1e6).plain);
   EXPECT_FALSE(map.inverse(-limit * (1 + 1e-15), 1e6).plain);

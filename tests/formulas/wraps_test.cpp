@@ -41,6 +41,33 @@ TEST(Wraps, WholeTurnsAreTheFiguresOfSingleSteps) {
   }
 }
 
+// Odd multiples of half a turn, which steps bring back exactly: the double of pi has zeros at its
+// end.
+TEST(Wraps, WholeTurnsEndAtHalfATurnOnTheSideThatTheyComeFrom) {
+  for (const double n : {3.0, 5.0, 7.0}) {
+    EXPECT_EQ(wrap_turns_below_then_above(-n * kPi), -kPi) << n;
+    EXPECT_EQ(wrap_turns_below_then_above(n * kPi), kPi) << n;
+    EXPECT_EQ(wrap_turns_above_then_at_or_below(-n * kPi), kPi) << n;
+    EXPECT_EQ(wrap_turns_above_then_at_or_below(n * kPi), kPi) << n;
+    EXPECT_EQ(turns_about(kPi, (1 - n) * kPi), 0) << n;
+    EXPECT_EQ(turns_about(kPi, (1 + n) * kPi), kTwoPi) << n;
+    EXPECT_EQ(turns_about(-kPi, (n - 1) * kPi), 0) << n;
+    EXPECT_EQ(turns_about(-kPi, -(n + 1) * kPi), -kTwoPi) << n;
+  }
+}
+
+TEST(Wraps, AboutAnyMeridian) {
+  for (const double lon0 : {-50.0, -2.0, 0.0, 3.0, 1000.0}) {
+    for (const double off : {-1e7, -40.0, -7.0, -3.0, 0.0, 3.0, 7.0, 40.0, 1e7}) {
+      EXPECT_NEAR(turns_about(lon0, lon0 + off), lon0 + std::remainder(off, kTwoPi), 1e-8)
+          << lon0 << " " << off;
+    }
+  }
+  EXPECT_EQ(turns_about(2.0, kInfinity), kInfinity);
+  EXPECT_TRUE(std::isnan(turns_about(2.0, kNaN)));
+  EXPECT_EQ(turns_about(kNaN, 2.0), 2);
+}
+
 TEST(Wraps, EndAtOnceForWhatCannotBeBroughtBack) {
   EXPECT_EQ(wrap_turns_below_then_above(1e300), 1e300);
   EXPECT_EQ(wrap_turns_below_then_above(-kInfinity), -kInfinity);

@@ -20,7 +20,6 @@ namespace {
 
 constexpr double kSentinel = -7.25e77;
 constexpr CoordinateTriple kNothing = {kSentinel, kSentinel, kSentinel};
-constexpr double kE = 0.0818191910428158;  // that of the adapters, GRS 80
 constexpr double kPi = 3.14159265358979323846;
 constexpr double kDegree = kPi / 180;
 

@@ -53,7 +53,7 @@ TEST_F(StoreOperations, PackByTheLayoutAndNotAByteMore) {
   RowBuffer row;
   EXPECT_EQ(OLB7R3_PF_get_next_row("t", row.bytes), TW_STORE_SUCCESS);
   EXPECT_EQ(row.text(0), "Zulu");
-  for (const std::size_t zero : {4, 8, 9, 24, 26}) EXPECT_EQ(row.bytes[zero], 0) << zero;
+  for (const std::size_t zero : {4u, 8u, 9u, 24u, 26u}) EXPECT_EQ(row.bytes[zero], 0) << zero;
   EXPECT_EQ(row.at<int16_t>(10), -2);
   EXPECT_EQ(row.at<int32_t>(12), 70000);
   EXPECT_EQ(row.at<double>(16), 0.1);

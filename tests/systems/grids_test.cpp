@@ -10,6 +10,7 @@
 #include <functional>
 #include <limits>
 #include <memory>
+#include <optional>
 #include <random>
 #include <thread>
 
@@ -33,7 +34,7 @@ namespace {
 using tidewater::GeoidGrid;  // not the C structure of that name
 
 constexpr double kDegree = kPi / 180;
-constexpr double kTenthOfMillimetre = 1e-4 / 6378137 / kDegree;  // degrees
+[[maybe_unused]] constexpr double kTenthOfMillimetre = 1e-4 / 6378137 / kDegree;  // degrees
 
 struct Box {
   double west, south, east, north;
@@ -97,7 +98,7 @@ double expect_as_peer(const ShiftGrid& grid, const std::string& peer_grid, const
 }
 #endif
 
-const struct {
+[[maybe_unused]] const struct {
   const char* name;
   Box box;
 } kRealGrids[] = {{"ntf_r93.gsb", {-5.49, 41.01, 9.99, 51.99}},
@@ -436,7 +437,7 @@ TEST_F(BadGrids, NationalHeadersThatCannotBe) {
                  "overlap");
   // Doubles of the first sub-grid's header.
   const double nan = std::numeric_limits<double>::quiet_NaN();
-  for (const std::size_t offset : {72, 88, 104, 120, 136, 152}) {
+  for (const std::size_t offset : {72u, 88u, 104u, 120u, 136u, 152u}) {
     for (const double v : {nan, HUGE_VAL, -HUGE_VAL, 0.0, -1e300, 1e300, 1e-300, -3600.0}) {
       if (v == 0 && offset == 104) continue;
       std::string bytes = file([](GsbFile&) {});
@@ -491,6 +492,242 @@ TEST_F(BadGrids, SizesThatNoFileHas) {
   expect_refused<GeoidGrid>("g.geo", std::string(bytes).replace(68, 4, most), "ends in");
 }
 
+// --- files as they come --------------------------------------------------------------------------
+
+// A sub-grid's bounds and shifts in other units than seconds, as the file's header says.
+TEST(ShiftGrids, UnitsOfNationalFiles) {
+  const ScratchFolder folder;
+  const auto bytes = [](const char* unit, double in_seconds) {
+    SubGrid g = {"A",
+                 "NONE",
+                 40 * 3600 / in_seconds,
+                 50 * 3600 / in_seconds,
+                 -20 * 3600 / in_seconds,
+                 10 * 3600 / in_seconds,
+                 3600 / in_seconds,
+                 [=](int r, int) { return static_cast<float>(r / in_seconds); },
+                 [=](int, int c) { return static_cast<float>(-2 * c / in_seconds); }};
+    std::string all = GsbFile{{g}}.bytes();
+    std::string name(unit);
+    name.resize(8, ' ');
+    return all.replace(56, 8, name);
+  };
+  for (const auto& [unit, in_seconds] :
+       {std::pair("SECONDS", 1.0), {"MINUTES", 60.0}, {"DEGREES", 3600.0}}) {
+    SCOPED_TRACE(unit);
+    folder.write("g.gsb", bytes(unit, in_seconds));
+    const ShiftGrid grid("g.gsb", {folder.directory()});
+    EXPECT_NEAR(grid.bounds()[0].west, -10, 1e-9);
+    EXPECT_NEAR(grid.bounds()[0].north, 50, 1e-9);
+    const Point p = grid.forward(Point{15, 43, 0});
+    EXPECT_NEAR((p.y - 43) * 3600, 3, 1e-6);
+    EXPECT_NEAR((p.x - 15) * 3600, 2 * 5, 1e-6);  // the fifth column from 20 east
+  }
+}
+
+TEST(ShiftGrids, TellWhatTheyAre) {
+  const ScratchFolder folder;
+  GsbFile file{{plane("A", "NONE", 40, 50, -20, 10, 1, 1)}};
+  folder.write("g.gsb", file.bytes());
+  const ShiftGrid grid("g.gsb", {folder.directory()});
+  EXPECT_EQ(grid.path(), (folder.path() / "g.gsb").string());
+  EXPECT_EQ(grid.source(), "OLD");
+  EXPECT_EQ(grid.target(), "NEW");
+  EXPECT_EQ(grid.describe(), "NTv2 grid of 11 rows and 31 columns, OLD to NEW");
+  // One system alone says nothing.
+  file.to = "        ";
+  folder.write("h.gsb", file.bytes());
+  EXPECT_EQ(ShiftGrid("h.gsb", {folder.directory()}).describe(),
+            "NTv2 grid of 11 rows and 31 columns");
+  // Capitals of another system's file names.
+  folder.write("H.GSB", file.bytes());
+  EXPECT_EQ(ShiftGrid("H.GSB", {folder.directory()}).describe(),
+            "NTv2 grid of 11 rows and 31 columns");
+  folder.write("B.GTX", gtx(10, 350, 1, 1, 3, 3, {1, 2, 3, 4, 5, 6, 7, 8, 9}));
+  const GeoidGrid geoid("B.GTX", {folder.directory()});
+  EXPECT_NEAR(geoid.undulation(-9, 11), 5, 1e-12);
+  EXPECT_EQ(geoid.path(), (folder.path() / "B.GTX").string());
+  EXPECT_EQ(geoid.describe(), "GTX grid of 3 rows and 3 columns");
+  // A path is a path, whatever folders there are.
+  EXPECT_EQ(ShiftGrid((folder.path() / "g.gsb").string(), {"/nowhere"}).source(), "OLD");
+}
+
+// The node marked by a shift of more than 180 seconds is none, in either file.
+TEST(ShiftGrids, NadconNodesWithoutData) {
+  const ScratchFolder folder;
+  const auto write = [&](const char* name, float odd) {
+    folder.write(name, GridFile{-20, 40, 25, 8,
+                                [odd](int r, int c) {
+                                  return r == 3 && c == 4 ? odd : 1.0F + static_cast<float>(c) / 8;
+                                }}
+                           .bytes());
+  };
+  const auto shifts = [&] { return ShiftGrid("g", {folder.directory()}); };
+  for (const float odd : {999.0F, -999.0F, 180.5F}) {
+    write("g.las", odd);
+    write("g.los", 2);
+    EXPECT_TRUE(std::isnan(shifts().forward(Point{-15.5, 43.5, 0}).x));
+    EXPECT_FALSE(std::isnan(shifts().forward(Point{-13.5, 43.5, 0}).x));
+    write("g.las", 2);
+    write("g.los", odd);
+    EXPECT_TRUE(std::isnan(shifts().forward(Point{-16.5, 42.5, 0}).y));
+  }
+  // From beyond an edge that has no data there is no way back.
+  folder.write(
+      "g.las",
+      GridFile{-20, 40, 25, 8, [](int, int c) { return c < 2 ? 999.0F : 900.0F / 3600; }}.bytes());
+  write("g.los", 2);
+  EXPECT_TRUE(std::isnan(shifts().inverse(Point{-20.3, 43.5, 0}).x));
+  EXPECT_TRUE(std::isnan(shifts().inverse(Point{-19.5, 43.5, 0}).x));
+  EXPECT_FALSE(std::isnan(shifts().inverse(Point{-17.5, 43.5, 0}).x));
+  write("g.las", 180);
+  write("g.los", 180);
+  const Point p = shifts().forward(Point{-16, 43, 0});  // the node itself
+  EXPECT_NEAR(p.y, 43 + 180.0 / 3600, 1e-9);
+  EXPECT_NEAR(p.x, -16 - 180.0 / 3600, 1e-9);  // positive west in the file
+}
+
+// The way back from just beyond an edge, where the shift leads in; and from where it does not.
+TEST(ShiftGrids, BackFromBeyondTheEdge) {
+  const ScratchFolder folder;
+  // A shift of half a degree to the north and to the east; nodes a degree apart.
+  SubGrid g = {"A",
+               "NONE",
+               40 * 3600,
+               44 * 3600,
+               -14 * 3600,
+               -10 * 3600,
+               3600,
+               [](int, int) { return 1800.0F; },
+               [](int, int) { return -1800.0F; }};
+  folder.write("g.gsb", GsbFile{{g}}.bytes());
+  const ShiftGrid grid("g.gsb", {folder.directory()});
+  const auto back = [&](double x, double y) {
+    TWstatus word = 77;
+    double z = 5;
+    const Coordinates<double> at = {&x, &y, &z};
+    int passes = 0;
+    const Summary summary = grid.inverse(1, at, at, &word, &passes);
+    EXPECT_EQ(summary.failed, word == TW_SUCCESS ? 0u : 1u);
+    EXPECT_LE(passes, 3);
+    return std::tuple(x, y, word);
+  };
+  // From inside; from beyond the northern and the eastern edge, out of inside.
+  EXPECT_EQ(std::get<2>(back(12, 42)), TW_SUCCESS);
+  const auto [x, y, word] = back(14.25, 44.25);
+  EXPECT_EQ(word, TW_SUCCESS);
+  EXPECT_NEAR(x, 13.75, 1e-12);
+  EXPECT_NEAR(y, 43.75, 1e-12);
+  // Inside, but out of outside: there no shift leads from.
+  EXPECT_EQ(std::get<2>(back(10.25, 42)), TW_I_OUTSIDE_CNT);
+  EXPECT_EQ(std::get<2>(back(12, 40.25)), TW_I_OUTSIDE_CNT);
+  // Beyond the edge by more than a shift leads, and by more than a cell.
+  EXPECT_EQ(std::get<2>(back(14.75, 42)), TW_I_OUTSIDE_CNT);
+  EXPECT_EQ(std::get<2>(back(16.5, 42)), TW_I_OUTSIDE_CNT);
+  EXPECT_EQ(std::get<2>(back(12, 46)), TW_I_OUTSIDE_CNT);
+}
+
+// A shift that grows as fast as the way to it never comes to rest.
+TEST(ShiftGrids, WaysBackThatDoNotConverge) {
+  const ScratchFolder folder;
+  // From node to node the shift falls by three spacings: the points of a cell are turned over.
+  SubGrid g = {"A",
+               "NONE",
+               40 * 3600,
+               50 * 3600,
+               -20 * 3600,
+               -10 * 3600,
+               3600,
+               [](int r, int) { return static_cast<float>((r % 2 == 0 ? 1 : -1) * 4000); },
+               [](int, int) { return 0.0F; }};
+  folder.write("g.gsb", GsbFile{{g}}.bytes());
+  const ShiftGrid grid("g.gsb", {folder.directory()});
+  double x = 15, y = 45.25;
+  TWstatus word = TW_SUCCESS;
+  int passes = 0;
+  const Coordinates<double> at = {&x, &y};
+  EXPECT_EQ(grid.inverse(1, at, at, &word, &passes).word, TW_NOT_CONVERGED);
+  EXPECT_EQ(word, TW_NOT_CONVERGED);
+  EXPECT_EQ(passes, 20);
+  EXPECT_TRUE(std::isnan(x) && std::isnan(y));
+  // The first failure's word is the summary's; the heights may be missing.
+  double xs[2] = {15, 0}, ys[2] = {45.25, 0};
+  const Summary both = grid.inverse(2, {xs, ys}, {xs, ys});
+  EXPECT_EQ(both.failed, 2u);
+  EXPECT_EQ(both.word, TW_NOT_CONVERGED);
+}
+
+TEST(GeoidGrids, BiquadraticWantsThreeRowsAndColumns) {
+  const ScratchFolder folder;
+  for (const auto& [rows, columns] : {std::pair(2, 24), {24, 2}}) {
+    folder.write("g.gtx", gtx(10, 350, 0.5, 0.5, rows, columns,
+                              std::vector<float>(static_cast<std::size_t>(rows * columns), 3)));
+    const std::string path = (folder.path() / "g.gtx").string();
+    EXPECT_EQ(GeoidGrid(path).undulation(350.25, 10.25), 3);
+    try {
+      GeoidGrid(path, {}, GeoidGrid::Interpolation::biquadratic);
+      ADD_FAILURE();
+    } catch (const Error& e) {
+      EXPECT_NE(std::string(e.what()).find("fewer than the three rows and columns of biquadratic"),
+                std::string::npos)
+          << e.what();
+    }
+  }
+}
+
+TEST(GeoidGrids, HeightsThatAreNotGivenAreZero) {
+  const ScratchFolder folder;
+  folder.write("h.gtx", gtx(10, 350, 1, 1, 2, 2, {4, 4, 4, 4}));
+  const GeoidGrid grid("h.gtx", {folder.directory()});
+  const double x = 350.5, y = 10.5;
+  double ox = 0, oy = 0, oz = 0;
+  EXPECT_TRUE(grid.forward(1, {&x, &y}, {&ox, &oy, &oz}));
+  EXPECT_EQ(oz, 4);
+  EXPECT_TRUE(grid.inverse(1, {&x, &y}, {&ox, &oy}));
+  EXPECT_EQ(ox, 350.5);
+}
+
+TEST_F(BadGrids, HeadersAndFilesThatDoNotFit) {
+  const GridFile las{-20, 40, 25, 8, [](int, int) { return 1.0F; }};
+  folder.write("g.las", las.bytes());
+  for (const int which : {0, 1, 2}) {
+    GridFile los = las;
+    if (which == 0) los.nc = 26;
+    if (which == 1) los.nr = 9;
+    if (which == 2) los.ymin = 41;
+    folder.write("g.los", los.bytes());
+    const std::string why = refusal<ShiftGrid>((folder.path() / "g.los").string());
+    EXPECT_NE(why.find("has a .las and a .los file of different headers"), std::string::npos)
+        << why;
+  }
+  GridFile narrow = las;
+  narrow.nc = 1;
+  expect_refused<GeoidGrid>("x.geo", narrow.bytes(), "fewer than two rows or columns");
+  narrow.nc = 25;
+  narrow.nr = 1;
+  expect_refused<GeoidGrid>("x.geo", narrow.bytes(), "fewer than two rows or columns");
+  // A pair of NADCON's holds no undulations; names that are none, or too short for an ending.
+  EXPECT_NE(refusal<GeoidGrid>((folder.path() / "g.las").string()).find("holds no undulations"),
+            std::string::npos);
+  EXPECT_NE(refusal<ShiftGrid>("").find("There is no grid file"), std::string::npos);
+  EXPECT_NE(refusal<ShiftGrid>("x").find("There is no grid file x."), std::string::npos);
+}
+
+TEST_F(BadGrids, FilesThatCannotBeRead) {
+  // A file of more than two gigabytes, with a hole instead of them.
+  folder.write("big.gsb", "NUM_OREC");
+  std::error_code error;
+  fs::resize_file(folder.path() / "big.gsb", std::uintmax_t{1} << 31, error);
+  if (!error) {
+    EXPECT_NE(refusal<ShiftGrid>((folder.path() / "big.gsb").string()).find("is larger than 2 GB"),
+              std::string::npos);
+  }
+  // The kernel's own, of which the file system tells more bytes than there are.
+  const std::string path = "/sys/devices/system/cpu/online";
+  if (!fs::is_regular_file(path)) GTEST_SKIP() << path << " is not there";
+  EXPECT_EQ(refusal<ShiftGrid>(path), "The grid file " + path + " cannot be read.");
+}
+
 #ifdef TIDEWATER_HAVE_TIFF
 
 // A band of a GeoTIFF: nodes from the north-west, by rows southwards.
@@ -508,20 +745,24 @@ struct TiffImage {
   bool tiled = false, separate = false, areas = false, overview = false, from_south = false;
   int compression = COMPRESSION_NONE, bits = 32, format = SAMPLEFORMAT_IEEEFP;
   std::string no_data = {};
+  std::vector<double> matrix = {};        // instead of scale and tie point
+  bool placed = true;                     // false: with neither
+  std::optional<std::string> metadata{};  // instead of the bands' own; empty: without any
 };
 
 constexpr std::uint32_t kScaleTag = 33550, kTieTag = 33922, kKeysTag = 34735, kMetadataTag = 42112,
-                        kNoDataTag = 42113;
+                        kNoDataTag = 42113, kMatrixTag = 34264;
 
 void add_geo_tags(TIFF* tiff) {
-  static char names[5][12] = {"scale", "tie", "keys", "metadata", "nodata"};
+  static char names[6][12] = {"scale", "tie", "keys", "metadata", "nodata", "matrix"};
   static const TIFFFieldInfo fields[] = {
       {kScaleTag, -1, -1, TIFF_DOUBLE, FIELD_CUSTOM, 1, 1, names[0]},
       {kTieTag, -1, -1, TIFF_DOUBLE, FIELD_CUSTOM, 1, 1, names[1]},
       {kKeysTag, -1, -1, TIFF_SHORT, FIELD_CUSTOM, 1, 1, names[2]},
       {kMetadataTag, -1, -1, TIFF_ASCII, FIELD_CUSTOM, 1, 0, names[3]},
-      {kNoDataTag, -1, -1, TIFF_ASCII, FIELD_CUSTOM, 1, 0, names[4]}};
-  TIFFMergeFieldInfo(tiff, fields, 5);
+      {kNoDataTag, -1, -1, TIFF_ASCII, FIELD_CUSTOM, 1, 0, names[4]},
+      {kMatrixTag, -1, -1, TIFF_DOUBLE, FIELD_CUSTOM, 1, 1, names[5]}};
+  TIFFMergeFieldInfo(tiff, fields, 6);
 }
 
 void append_sample(std::string* bytes, float value, const TiffImage& image) {
@@ -537,8 +778,9 @@ void append_sample(std::string* bytes, float value, const TiffImage& image) {
   }
 }
 
-void write_tiff(const std::string& path, const std::vector<TiffImage>& images) {
-  TIFF* const tiff = TIFFOpen(path.c_str(), "w");
+void write_tiff(const std::string& path, const std::vector<TiffImage>& images,
+                const char* mode = "w") {
+  TIFF* const tiff = TIFFOpen(path.c_str(), mode);
   ASSERT_NE(tiff, nullptr);
   for (const TiffImage& image : images) {
     add_geo_tags(tiff);
@@ -560,8 +802,12 @@ void write_tiff(const std::string& path, const std::vector<TiffImage>& images) {
     const double top = image.from_south ? image.south - half * image.dy
                                         : image.south + (image.rows - 1 + half) * image.dy;
     const double tie[6] = {0, 0, 0, image.west - half * image.dx, top, 0};
-    TIFFSetField(tiff, kScaleTag, 3, scale);
-    TIFFSetField(tiff, kTieTag, 6, tie);
+    if (!image.matrix.empty()) {
+      TIFFSetField(tiff, kMatrixTag, image.matrix.size(), image.matrix.data());
+    } else if (image.placed) {
+      TIFFSetField(tiff, kScaleTag, 3, scale);
+      TIFFSetField(tiff, kTieTag, 6, tie);
+    }
     const auto raster = static_cast<std::uint16_t>(image.areas ? 1 : 2);
     const std::uint16_t keys[] = {1, 1, 0, 3, 1024, 0, 1, 2, 1025, 0, 1, raster, 2048, 0, 1, 4326};
     TIFFSetField(tiff, kKeysTag, 16, keys);
@@ -583,7 +829,8 @@ void write_tiff(const std::string& path, const std::vector<TiffImage>& images) {
       if (band.scale != 1) add("SCALE", "scale", std::to_string(band.scale));
       if (band.offset != 0) add("OFFSET", "offset", std::to_string(band.offset));
     }
-    TIFFSetField(tiff, kMetadataTag, (xml + "</GDALMetadata>").c_str());
+    xml = image.metadata.value_or(xml + "</GDALMetadata>");
+    if (!xml.empty()) TIFFSetField(tiff, kMetadataTag, xml.c_str());
     if (!image.no_data.empty()) TIFFSetField(tiff, kNoDataTag, image.no_data.c_str());
     constexpr int kTile = 32;
     const int piece = image.tiled ? kTile : 1;
@@ -737,6 +984,132 @@ TEST(TiffGrids, BandsUnitsAndSubGrids) {
   EXPECT_TRUE(std::isnan(shift_at(11.5, 51.5).first));
 }
 
+// Where the nodes lie by a matrix, as some programs write it; samples of whole numbers without a
+// sign; files of the other order of bytes and of the form for large ones.
+TEST(TiffGrids, OtherFormsOfTheSame) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "g.tif").string();
+  const TiffImage plain{
+      10, 50, 1, 1, 4, 4, {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  const auto expect = [&](const TiffImage& image, double lon, double lat, const char* mode = "w") {
+    write_tiff(path, {image}, mode);
+    const ShiftGrid grid(path);
+    EXPECT_NEAR(grid.bounds()[0].west, 10, 1e-9);
+    EXPECT_NEAR(grid.bounds()[0].north, 53, 1e-9);
+    const Point p = grid.forward(Point{11.5, 51.5, 0});
+    EXPECT_NEAR((p.x - 11.5) * 3600, lon, 1e-8);
+    EXPECT_NEAR((p.y - 51.5) * 3600, lat, 1e-8);
+  };
+  expect(plain, 5, 3, "wb");
+  expect(plain, 5, 3, "w8");
+  TiffImage image = plain;
+  image.matrix = {1, 0, 0, 10, 0, -1, 0, 53, 0, 0, 0, 0, 0, 0, 0, 1};
+  expect(image, 5, 3);
+  image = plain;
+  image.format = SAMPLEFORMAT_UINT;
+  for (const int bits : {16, 32}) {
+    image.bits = bits;
+    expect(image, 5, 3);
+    // An offset alone, which the scale does not tell of.
+    image.bands[0].offset = 0.5;
+    expect(image, 5, 3.5);
+    image.bands[0].offset = 0;
+  }
+  image = plain;
+  for (Band& band : image.bands) band.unit = "radian";
+  image.bands[0].value = [](int, int) { return 0x1p-12F; };
+  image.bands[1].value = [](int, int) { return -0x1p-13F; };
+  expect(image, -0x1p-13 / kDegree * 3600, 0x1p-12 / kDegree * 3600);
+  for (Band& band : image.bands) band.unit = "arc-seconds per year";
+  expect(image, -0x1p-13, 0x1p-12);
+}
+
+TEST(TiffGrids, UndulationsWithAndWithoutWords) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "g.tif").string();
+  TiffImage image{10, 50, 1, 1, 4, 4, {flat_band("geoid_undulation", 30, "metre")}};
+  for (const char* unit : {"metre", "meter", "m", ""}) {
+    image.bands[0].unit = unit;
+    write_tiff(path, {image});
+    EXPECT_NEAR(GeoidGrid(path).undulation(11.5, 51.5), 30, 1e-12) << unit;
+  }
+  for (const char* description : {"", "vertical_offset"}) {
+    image.bands[0].description = description;
+    write_tiff(path, {image});
+    EXPECT_NEAR(GeoidGrid(path).undulation(11.5, 51.5), 30, 1e-12) << description;
+  }
+  // Without any metadata, and with such as no program writes.
+  for (const char* metadata :
+       {"", "<GDALMetadata><Item ", "<GDALMetadata><Item name=\"DESCRIPTION\"",
+        "<GDALMetadata><Item name=\"DESCRIPTION\" sample=\"0>geoid_undulation</Item>",
+        "<Item name=\"description\" sample=\"10\">nothing</Item>",
+        "<Item name=\"description\" sample=\"/\">nothing</Item>",
+        "<Item name=\"description\" sample=\":\">nothing</Item>",
+        "<Item name=\"description\" sample=\"0\">geoid_undulation</Item>"}) {
+    image.metadata = metadata;
+    write_tiff(path, {image});
+    EXPECT_NEAR(GeoidGrid(path).undulation(11.5, 51.5), 30, 1e-12) << metadata;
+  }
+  image.metadata.reset();
+  const auto refused = [&](const char* part) {
+    write_tiff(path, {image});
+    const std::string why = refusal<GeoidGrid>(path);
+    EXPECT_NE(why.find(part), std::string::npos) << why;
+  };
+  image.bands[0].description = "something else";
+  refused("has no band of undulations");
+  image.bands = {flat_band("", 30, "metre"), flat_band("", 31, "metre")};
+  refused("has no band of undulations");
+  image.bands = {flat_band("geoid_undulation", 30, "foot")};
+  refused("has figures in the unit foot, not in metres");
+}
+
+// Sub-grids that name no parents lie in the smallest that holds them, whatever their order.
+TEST(TiffGrids, SubGridsByTheirExtents) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "g.tif").string();
+  const auto image = [](double west, double south, double step, int nodes, float shift) {
+    return TiffImage{west,
+                     south,
+                     step,
+                     step,
+                     nodes,
+                     nodes,
+                     {flat_band("latitude_offset", shift), flat_band("longitude_offset", 0)}};
+  };
+  const TiffImage whole = image(10, 50, 1, 11, 1);         // 10 to 20, 50 to 60
+  const TiffImage child = image(12, 52, 0.5, 9, 2);        // 12 to 16, 52 to 56
+  const TiffImage grandchild = image(13, 53, 0.25, 9, 3);  // 13 to 15, 53 to 55
+  const TiffImage north = image(12, 61, 0.5, 5, 4);        // beyond the north, the south, the east
+  const TiffImage south = image(12, 45, 0.5, 5, 5);
+  const TiffImage east = image(21, 52, 0.5, 5, 6);
+  for (const auto& order : {std::vector{whole, child, grandchild, north, south, east},
+                            std::vector{whole, grandchild, child, east, south, north},
+                            std::vector{whole, south, grandchild, north, east, child}}) {
+    write_tiff(path, order);
+    const ShiftGrid grid(path);
+    EXPECT_EQ(grid.bounds().size(), 4u);
+    for (const auto& [lon, lat, seconds] : {std::tuple(11.0, 51.0, 1),
+                                            {12.2, 52.2, 2},
+                                            {14.0, 54.0, 3},
+                                            {15.5, 54.0, 2},
+                                            {13.0, 62.0, 4},
+                                            {13.0, 46.0, 5},
+                                            {22.0, 53.0, 6}}) {
+      EXPECT_NEAR((grid.forward(Point{lon, lat, 0}).y - lat) * 3600, seconds, 1e-8)
+          << lon << " " << lat;
+    }
+  }
+  // Twice the same place
+  write_tiff(path, {whole, child, child});
+  EXPECT_NE(refusal<ShiftGrid>(path).find("overlap"), std::string::npos);
+  // The first may have a parent by name that is not there.
+  TiffImage orphan = whole;
+  orphan.parent = "P";
+  write_tiff(path, {orphan});
+  EXPECT_NE(refusal<ShiftGrid>(path).find("is not there"), std::string::npos);
+}
+
 TEST(TiffGrids, GeoidAgainstItsGtx) {
   const std::string path = kProjData + "egm96_15.gtx";
   if (!fs::exists(path)) GTEST_SKIP() << "egm96_15.gtx is not installed";
@@ -794,6 +1167,39 @@ TEST_F(BadGrids, TiffsThatCannotBe) {
   image = plain;
   image.overview = true;
   expect({image}, "no image at full size");
+  image = plain;
+  image.placed = false;
+  expect({image}, "does not tell where its nodes lie");
+  for (const int turned : {1, 4}) {
+    image.matrix = {1, 0, 0, 10, 0, -1, 0, 53, 0, 0, 0, 0, 0, 0, 0, 1};
+    image.matrix[static_cast<std::size_t>(turned)] = 0.1;
+    expect({image}, "does not tell where its nodes lie");
+  }
+  image.matrix = {1, 0, 0, 10};
+  expect({image}, "does not tell where its nodes lie");
+  image = plain;
+  image.format = SAMPLEFORMAT_UINT;
+  image.bits = 8;
+  expect({image}, "no floats or integers of a usual size");
+  image.format = SAMPLEFORMAT_INT;
+  image.bits = 64;
+  expect({image}, "no floats or integers of a usual size");
+  image.format = SAMPLEFORMAT_IEEEFP;
+  image.bits = 16;
+  expect({image}, "no floats or integers of a usual size");
+  image = plain;
+  while (image.bands.size() < 17) image.bands.push_back(flat_band("", 1));
+  expect({image}, "bands past counting");
+  image = plain;
+  image.bands = {flat_band("latitude_offset", 3)};
+  expect({image}, "no bands of datum shifts");
+  image.bands = {flat_band("", 3)};
+  expect({image}, "no bands of datum shifts");
+  image.bands = {flat_band("", 3), flat_band("geoid_undulation", 3)};
+  expect({image}, "no bands of datum shifts");
+  image = plain;
+  image.overview = true;
+  expect(std::vector<TiffImage>(1001, image), "images past counting");
   TiffImage child{10.5, 50.5, 0.5, 0.5, 3, 3, plain.bands};
   TiffImage other = child;
   other.west = 11;
@@ -808,6 +1214,35 @@ TEST_F(BadGrids, TiffsThatCannotBe) {
   expect({plain, child}, "is not there");
   write_tiff(path, {plain});
   EXPECT_NE(refusal<GeoidGrid>(path).find("no band of undulations"), std::string::npos);
+}
+
+// Tiles larger than any memory, or of no size, as a damaged header has them.
+TEST_F(BadGrids, TiffsWhoseTilesCannotBe) {
+  const std::string path = (folder.path() / "x.tif").string();
+  TiffImage image{
+      10, 50, 1, 1, 40, 40, {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
+  image.tiled = true;
+  write_tiff(path, {image});
+  const std::string good = file_bytes(path);
+  EXPECT_EQ(refusal<ShiftGrid>(path), "");
+  // The entries of the tiles' width and height in the directory: tag, type, count, value.
+  const auto with = [&](int width, int height) {
+    std::string bytes = good;
+    for (const auto& [tag, value] : {std::pair(322, width), {323, height}}) {
+      const std::string entry = {
+          static_cast<char>(tag & 0xff), static_cast<char>(tag >> 8), 3, 0, 1, 0, 0, 0};
+      const std::size_t at = bytes.find(entry);
+      EXPECT_NE(at, std::string::npos);
+      bytes[at + 8] = static_cast<char>(value & 0xff);
+      bytes[at + 9] = static_cast<char>(value >> 8);
+    }
+    return bytes;
+  };
+  expect_refused("y.tif", with(0x7ff0, 0x7ff0), "tiles or rows of a size that cannot be");
+  for (const auto& [width, height] : {std::pair(0, 32), {32, 0}, {0, 0}}) {
+    folder.write("y.tif", with(width, height));
+    EXPECT_NE(refusal<ShiftGrid>((folder.path() / "y.tif").string()), "") << width << " " << height;
+  }
 }
 
 TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
@@ -943,6 +1378,67 @@ TEST(GridOperations, GeocentricTranslationsGoThereAndBack) {
   }
 }
 
+// Every point of the array its own word, with heights above the ellipsoid and without; a grid that
+// never comes to rest.
+TEST(GridOperations, GeocentricTranslationsOfAnyHeight) {
+  const ScratchFolder folder;
+  const std::string path = (folder.path() / "fr_ign_gr3df97a.tif").string();
+  write_tiff(path, {translations()});
+  const Transformation flat = by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+  const Transformation high = by_operation("EPSG:4275", "EPSG:4965", "EPSG:9327", folder.path());
+  for (const Point& p : points_in({-5, 42, 9, 51}, 50)) {
+    const Point above = high.forward({p.x, p.y, 1000});
+    const Point ground = flat.forward({p.x, p.y, 1000});
+    EXPECT_EQ(ground.z, 1000);
+    EXPECT_GT(std::fabs(above.z - 1000), 1);  // two ellipsoids
+    EXPECT_LT(apart(above.x, ground.x), 1e-6);
+    EXPECT_NEAR(above.y, ground.y, 1e-6);
+    const Point back = high.inverse(above);
+    // Geocentric coordinates come back within two micrometres.
+    EXPECT_LT(apart(back.x, p.x), 1e-12);
+    EXPECT_NEAR(back.y, p.y, 3e-11);
+    EXPECT_NEAR(back.z, 1000, 1e-6);
+  }
+  const auto word_of = [](const Transformation& map, double x, double y, bool back) {
+    TWstatus word = TW_SUCCESS;
+    const Coordinates<double> at = {&x, &y};
+    back ? map.inverse(1, at, at, {&word, 1}) : map.forward(1, at, at, {&word, 1});
+    EXPECT_EQ(std::isnan(x), word != TW_SUCCESS);
+    return word;
+  };
+  EXPECT_EQ(word_of(flat, 20, 45, false), TW_I_OUTSIDE_CNT);
+  EXPECT_EQ(word_of(flat, 20, 45, true), TW_I_OUTSIDE_CNT);
+  TiffImage wild = translations();
+  wild.bands[1].value = [](int row, int column) { return (row + column) % 2 == 0 ? 9e5F : -9e5F; };
+  write_tiff(path, {wild});
+  const Transformation lost = by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+  EXPECT_EQ(word_of(lost, 2.3, 47.3, false), TW_NOT_CONVERGED);
+  EXPECT_EQ(word_of(lost, 2.3, 47.3, true), TW_SUCCESS);
+  // A national grid by that name holds no translations; each of the three bands must be there.
+  folder.write("fr_ign_gr3df97a.tif", GsbFile{{plane("A", "NONE", 40, 50, -20, 10, 1, 1)}}.bytes());
+  try {
+    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+    ADD_FAILURE();
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find("of NTv2's form holds no translations"),
+              std::string::npos)
+        << error.what();
+  }
+  for (std::size_t k = 0; k < 3; ++k) {
+    TiffImage lacking = translations();
+    lacking.bands[k].description = "w_translation";
+    write_tiff(path, {lacking});
+    try {
+      by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
+      ADD_FAILURE();
+    } catch (const Error& error) {
+      EXPECT_NE(std::string(error.what()).find("no bands of geocentric translations"),
+                std::string::npos)
+          << error.what();
+    }
+  }
+}
+
 // The form in which the grid of NTv1 is handed out today.
 TEST(GridOperations, FirstNationalTransformationOfCanada) {
   const ScratchFolder folder;
@@ -969,6 +1465,69 @@ TEST(GridOperations, FirstNationalTransformationOfCanada) {
 }
 
 #endif
+
+// A grid of the caller's between the datums of two systems, there and turned round, alone and
+// before an operation of the registry; a sentence where it is none.
+TEST(GridOperations, GridsOfTheCallers) {
+  const ScratchFolder folder;
+  folder.write("own.gsb", GsbFile{{plane("A", "NONE", 40, 55, -20, 10, 1, 1)}}.bytes());
+  const ShiftGrid grid("own.gsb", {folder.directory()});
+  const auto map = [&](const char* source, const char* target, const std::string& operation) {
+    TransformationOptions options;
+    options.operation = operation;
+    options.grid_folders = {folder.directory()};
+    return Transformation(System(source), System(target), options);
+  };
+  const Transformation there = map("EPSG:4277", "EPSG:4258", "grid:own.gsb");
+  const Transformation back = map("EPSG:4258", "EPSG:4277", "-grid:own.gsb");
+  const Transformation by_path =
+      map("EPSG:4277", "EPSG:4258", "grid:" + (folder.path() / "own.gsb").string());
+  // Its longitudes are from the source's own meridian: those of Paris are handed to it as they are.
+  const Transformation paris = map("EPSG:4807", "EPSG:4258", "grid:own.gsb");
+  const Transformation joined = map("EPSG:4277", "EPSG:4326", "grid:own.gsb EPSG:1149");
+  EXPECT_TRUE(std::isnan(there.accuracy()));
+  // What they tell of themselves makes them again.
+  EXPECT_EQ(there.operation(), "grid:own.gsb");
+  EXPECT_EQ(back.operation(), "-grid:own.gsb");
+  EXPECT_EQ(joined.operation(), "grid:own.gsb EPSG:1149");
+  EXPECT_NE(there.describe().find("NTv2 grid of 16 rows and 31 columns, OLD to NEW " +
+                                  (folder.path() / "own.gsb").string()),
+            std::string::npos)
+      << there.describe();
+  EXPECT_NE(back.describe().find("inverse of NTv2 grid"), std::string::npos) << back.describe();
+  EXPECT_NE(joined.describe().find("EPSG:1149"), std::string::npos) << joined.describe();
+  for (const Point& p : points_in({-8, 41, 18, 54}, 50)) {
+    const Point expected = grid.forward(p);
+    for (const Transformation* one : {&there, &by_path, &joined}) {
+      EXPECT_NEAR(one->forward(p).x, expected.x, 1e-12);
+      EXPECT_NEAR(one->forward(p).y, expected.y, 1e-12);
+    }
+    EXPECT_NEAR(back.forward(expected).x, p.x, 1e-10);
+    EXPECT_NEAR(back.inverse(p).y, expected.y, 1e-12);
+    EXPECT_NEAR(paris.forward(p).x, expected.x, 1e-12);
+    EXPECT_NEAR(paris.forward(p).y, expected.y, 1e-12);
+  }
+  EXPECT_THROW(map("EPSG:4277", "EPSG:4258", "grid:none.gsb"), Error);
+}
+
+// What is missing is told by the registry's name, and by PROJ's where that has the grid at all.
+TEST(GridOperations, CandidatesTellTheFilesThatTheyNeed) {
+  bool seen[3] = {};
+  for (const Candidate& candidate :
+       Transformation::candidates(System("EPSG:4267"), System("EPSG:4269"))) {
+    if (candidate.steps == "EPSG:9111") {
+      seen[0] = true;
+      EXPECT_EQ(candidate.missing, "the grid SK27-83.gsb");
+    } else if (candidate.steps == "EPSG:1462") {
+      seen[1] = true;
+      EXPECT_EQ(candidate.missing, "the grid GS2783v1.QUE");
+    } else if (candidate.steps == "EPSG:8555") {
+      seen[2] = true;
+      EXPECT_EQ(candidate.missing, "the method NADCON5 (2D)");
+    }
+  }
+  for (const bool one : seen) EXPECT_TRUE(one);
+}
 
 // A .gtx file: a header of four doubles and two counts, then the rows from the south, big-endian.
 std::string gtx(double west, double south, double step, int rows, int columns,
@@ -1021,7 +1580,16 @@ TEST(GridOperations, OffsetsBetweenVerticalDatums) {
     EXPECT_EQ(own.forward(p).z, to.z);
   }
   EXPECT_TRUE(std::isnan(own.accuracy()));
+  EXPECT_EQ(own.operation(), "offset:auckht1946-nzvd2016.gtx");
   EXPECT_TRUE(std::isnan(there.forward({160, -36, 5}).z));
+  // Positions on another datum would be read a hundred metres off; the way over the ellipsoid wants
+  // a grid that is not there.
+  try {
+    const Transformation wrong = map("EPSG:4272+7839", "EPSG:4272+5759");
+    ADD_FAILURE() << wrong.describe();
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find("nzgeoid2016"), std::string::npos) << error.what();
+  }
 #ifdef TIDEWATER_HAVE_PROJ
   const std::string definition = "+proj=vgridshift +multiplier=1 +grids=" +
                                  (folder.path() / "auckht1946-nzvd2016.gtx").string();

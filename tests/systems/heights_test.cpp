@@ -116,6 +116,17 @@ TEST(Heights, OffsetAndSlopeOfTheGuidanceNote) {
   EXPECT_EQ(map.inverse(there).z, 473);
 }
 
+// The Caspian Sea stands 28 m below the Baltic: what lies 30 m below the one lies 2 m below the
+// other, also where the heights of either count upwards.
+TEST(Heights, OffsetsBetweenDepths) {
+  const Transformation depths = between("EPSG:4284+5612", "EPSG:4284+5706");
+  EXPECT_EQ(depths.operation(), "EPSG:5440");
+  EXPECT_NEAR(depths.forward({50, 40, 30}).z, 2, 1e-12);
+  EXPECT_NEAR(depths.inverse({50, 40, 2}).z, 30, 1e-12);
+  EXPECT_NEAR(between("EPSG:4284+5705", "EPSG:4284+5706").forward({50, 40, -30}).z, 2, 1e-12);
+  EXPECT_NEAR(between("EPSG:4284+5611", "EPSG:4284+5705").forward({50, 40, -2}).z, -30, 1e-12);
+}
+
 TEST(Heights, ByGridOfTheCallers) {
   if (!std::filesystem::exists(kGeoid)) GTEST_SKIP() << "PROJ's " << kGeoid << " is not installed";
   const Point at = {8, 46, 100};
@@ -137,14 +148,100 @@ TEST(Heights, UnitsAndDepthsOfOneSurface) {
   EXPECT_NEAR(feet.z, 120 * 39.37 / 12, 1e-9);  // US survey feet
   const Point depth = between("EPSG:4269+5703", "EPSG:4269+6357").forward({-100, 40, 120});
   EXPECT_NEAR(depth.z, -120, 1e-12);
+  const Point below = between("EPSG:4269+6357", "EPSG:4269+5703").forward({-100, 40, 120});
+  EXPECT_NEAR(below.z, -120, 1e-12);
   const Transformation map = between("EPSG:27572+5720", "EPSG:2154+5720");
   EXPECT_EQ(map.forward({600000, 2200000, 77}).z, 77);
   EXPECT_EQ(map.inverse(map.forward({600000, 2200000, 77})).z, 77);
 }
 
+// A made-up vertical datum of WGS 84's compound system, in WKT.
+std::string own_heights(const std::string& name, const std::string& rest = "UNIT[\"metre\",1]") {
+  return "COMPD_CS[\"mine\",GEOGCS[\"WGS 84\",DATUM[\"WGS_1984\",SPHEROID[\"WGS 84\",6378137,"
+         "298.257223563]],PRIMEM[\"Greenwich\",0],UNIT[\"degree\",0.0174532925199433],"
+         "AUTHORITY[\"EPSG\",\"4326\"]],VERT_CS[\"" +
+         name + "\",VERT_DATUM[\"own\",2005]," + rest + "]]";
+}
+
+// Heights that no registry knows are those of their own name alone, and nothing but a grid leads
+// there, not even from heights above the ellipsoid, which have no name either.
+TEST(Heights, OfADefinitionsOwnSurface) {
+  const std::string metres = own_heights("harbour");
+  const std::string feet = own_heights("harbour", "UNIT[\"foot\",0.3048]");
+  EXPECT_NEAR(between(metres.c_str(), feet.c_str()).forward({8, 46, 30.48}).z, 100, 1e-12);
+  EXPECT_TRUE(has(refusal(metres.c_str(), own_heights("quay").c_str()), "and harbour"));
+  EXPECT_TRUE(has(refusal("EPSG:4979", metres.c_str()),
+                  "No way is known between heights above the ellipsoid and harbour; name a grid"));
+  EXPECT_TRUE(has(refusal("EPSG:4979", own_heights("").c_str()), "those of mine; name a grid"));
+  EXPECT_TRUE(has(refusal(own_heights("").c_str(), "EPSG:4978"), "those of mine; name a grid"));
+  EXPECT_TRUE(has(refusal("EPSG:4979", metres.c_str(), "EPSG:10084"),
+                  "and harbour by the operation that was named"));
+  // A code that this registry lacks is the same as itself, and as nothing else.
+  const auto coded = [](const char* name, const char* code) {
+    return own_heights(name, "UNIT[\"metre\",1],AUTHORITY[\"EPSG\",\"" + std::string(code) + "\"]");
+  };
+  EXPECT_EQ(between(coded("a", "99991").c_str(), coded("a", "99991").c_str()).forward({8, 46, 5}).z,
+            5);
+  EXPECT_TRUE(has(refusal(coded("a", "99991").c_str(), coded("a", "99992").c_str()), "No way"));
+  EXPECT_TRUE(has(refusal(coded("a", "99991").c_str(), "EPSG:4326+5773"), "No way"));
+  EXPECT_TRUE(has(refusal(coded("a", "99991").c_str(), "EPSG:4326+5773"), "No way"));
+  EXPECT_TRUE(has(refusal("EPSG:4326+5773", coded("a", "99991").c_str()), "No way"));
+  // By a name of its own a code is still that of the registry.
+  EXPECT_EQ(between(coded("a", "5773").c_str(), "EPSG:4326+5773").forward({8, 46, 5}).z, 5);
+}
+
+// Operations on heights and on positions may be named together, in any order; each is used or told.
+TEST(Heights, NamedTogetherWithPositions) {
+  if (!std::filesystem::exists(kGeoid)) GTEST_SKIP() << "PROJ's " << kGeoid << " is not installed";
+  // OSGB36 to WGS 84 by the older of the registry's similarities, then heights above EGM96.
+  const Transformation both =
+      between("EPSG:4277+5701", "EPSG:4979", "geoid:egm96_15.gtx EPSG:1314");
+  const Transformation other_order =
+      between("EPSG:4277+5701", "EPSG:4979", "EPSG:1314 geoid:egm96_15.gtx");
+  const Transformation positions = between("EPSG:4277", "EPSG:4326", "EPSG:1314");
+  const Point at = {-2, 53, 100};
+  const Point there = both.forward(at);
+  EXPECT_EQ(other_order.forward(at).z, there.z);
+  EXPECT_EQ(other_order.forward(at).x, there.x);
+  const Point flat = positions.forward(at);
+  // Heights above Airy's ellipsoid move some tens of metres, which is worth millimetres on the way.
+  EXPECT_NEAR(there.x, flat.x, 2e-7);
+  EXPECT_NEAR(there.y, flat.y, 2e-7);
+  EXPECT_EQ(both.operation(), "geoid:egm96_15.gtx EPSG:1314");
+  EXPECT_EQ(between("EPSG:4277+5701", "EPSG:4979", both.operation().c_str()).forward(at).z,
+            there.z);
+  // Two steps of positions.
+  const Transformation chain =
+      between("EPSG:4277+5701", "EPSG:4937", "geoid:egm96_15.gtx EPSG:1314 EPSG:1149");
+  EXPECT_TRUE(has(chain.describe(), "EPSG:1314") && has(chain.describe(), "EPSG:1149"));
+  EXPECT_NEAR(chain.forward(at).x, there.x, 1e-9);
+  // A sign is taken, as the heights of the two systems give the direction.
+  EXPECT_EQ(between("EPSG:4979", "EPSG:4326+5773", "-EPSG:10084").forward({8, 46, 0}).z,
+            between("EPSG:4979", "EPSG:4326+5773", "EPSG:10084").forward({8, 46, 0}).z);
+  // What finds nothing to do is told.
+  for (const char* rest : {"EPSG:1671", "EPSG:1671 EPSG:1149", "EPSG:99999999", "nonsense"}) {
+    const std::string why =
+        refusal("EPSG:4979", "EPSG:4326+5773", ("EPSG:10084 " + std::string(rest)).c_str());
+    EXPECT_TRUE(has(why, ("There is no change of datum for \"" + std::string(rest) +
+                          "\" between WGS 84 and WGS 84 + EGM96 height.")
+                             .c_str()))
+        << why;
+  }
+  // A named grid that is not there is told alone, without the others.
+  const std::string why = refusal("EPSG:4979", "EPSG:2154+5720", "EPSG:8885");
+  EXPECT_TRUE(has(why, "needs the grid RAF18.mnt (or fr_ign_RAF18.tif); name a grid")) << why;
+  EXPECT_FALSE(has(why, "RAF20")) << why;
+}
+
 TEST(Heights, RefusalsNameWhatIsMissing) {
   EXPECT_TRUE(has(refusal("EPSG:4979", "EPSG:2154+5720"), "needs the grid RAF20.tac"));
   EXPECT_TRUE(has(refusal("EPSG:5720", "EPSG:4979"), "A height alone is not a position"));
+  EXPECT_TRUE(has(refusal("EPSG:4979", "EPSG:5720"), "A height alone is not a position"));
+  // Between two vertical datums by a method that is not computed here, and by an operation that is
+  // of other ones.
+  EXPECT_TRUE(has(refusal("EPSG:4267+7968", "EPSG:4267+5703"), "and NGVD29 height (m); name"));
+  EXPECT_TRUE(has(refusal("EPSG:4258+5728", "EPSG:4258+5730", "EPSG:4441"),
+                  "and LN02 height by the operation that was named; name"));
   EXPECT_TRUE(has(between("EPSG:4979", "EPSG:4326+5720", "no shift").describe(), "nothing"));
 }
 

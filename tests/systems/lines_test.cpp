@@ -21,7 +21,6 @@ namespace {
 
 constexpr double kA = 6378137;
 constexpr double kF = 1 / 298.257223563;
-constexpr double kDegree = 0.017453292519943295;
 
 struct Pairs {
   std::vector<double> lon1, lat1, lon2, lat2;
@@ -113,10 +112,10 @@ TEST(Lines, EveryLevelGivesTheSameBits) {
   for (const points::Level level : levels()) {
     ASSERT_TRUE(points::ask_for_level(level));
     std::vector<std::vector<double>> out(20, std::vector<double>(n + 1, -7));
-    const auto ends = [&](int k) {
+    const auto ends = [&](std::size_t k) {
       return LineEnds{out[k].data(), out[k + 1].data(), out[k + 2].data(), out[k + 3].data()};
     };
-    const auto courses = [&](int k) {
+    const auto courses = [&](std::size_t k) {
       return LineCourses{out[k].data(), out[k + 1].data(), out[k + 2].data(), out[k + 3].data()};
     };
     const LineStarts starts = {pairs.lon1.data(), pairs.lat1.data(), pairs.lon2.data(),
@@ -214,6 +213,50 @@ TEST(Lines, AlongIsDirect) {
   for (std::size_t i = 0; i < 6; ++i) EXPECT_EQ(lat[i], rhumb.direct(20, -35, 77, lengths[i]).lat);
 }
 
+// Lengths that are none, in the middle of a line's points and at every width; starts that are none.
+TEST(Lines, PointsAlongALineFailAlone) {
+  const double none = std::nan("");
+  std::vector<double> lengths;
+  for (int i = 0; i < 600; ++i) {
+    lengths.push_back(i % 100 == 50 ? none : i % 100 == 60 ? 1e15 : 1000.0 * i);
+  }
+  const std::size_t n = lengths.size();
+  const Geodesic geodesic(kA, kF);
+  const Rhumb rhumb(kA, kF);
+  const points::Level before = points::level();
+  for (const points::Level level : levels()) {
+    points::ask_for_level(level);
+    for (const bool straight : {true, false}) {
+      std::vector<double> lon(n, -7), lat(n, -7), azimuth(n, -7), area(n, -7);
+      const LineEnds ends = {lon.data(), lat.data(), azimuth.data(), area.data()};
+      const Summary summary = straight ? geodesic.along(20, 10, 77, n, lengths.data(), ends)
+                                       : rhumb.along(20, 10, 77, n, lengths.data(), ends);
+      EXPECT_EQ(summary.failed, 12u);
+      EXPECT_EQ(summary.word, static_cast<TWstatus>(TW_RANGE_ERROR));
+      for (std::size_t i = 0; i < n; ++i) {
+        const LineEnd alone = straight ? geodesic.direct(20, 10, 77, lengths[i])
+                                       : rhumb.direct(20, 10, 77, lengths[i]);
+        const bool bad = i % 100 == 50 || i % 100 == 60;
+        ASSERT_EQ(std::isnan(lat[i]), bad) << i;
+        if (bad) {
+          ASSERT_TRUE(std::isnan(lon[i]) && std::isnan(azimuth[i]) && std::isnan(area[i])) << i;
+        } else {
+          ASSERT_EQ(lat[i], alone.lat) << i;
+          ASSERT_EQ(area[i], alone.area) << i;
+        }
+      }
+    }
+  }
+  points::ask_for_level(before);
+  for (const double azimuth : {none, 1.1e9, -HUGE_VAL}) {
+    std::vector<double> lat(n, 1);
+    const Summary summary =
+        geodesic.along(20, 10, azimuth, n, lengths.data(), {nullptr, lat.data(), nullptr, nullptr});
+    EXPECT_EQ(summary.failed, n);
+    EXPECT_TRUE(std::isnan(lat[0]) && std::isnan(lat[n - 1]));
+  }
+}
+
 TEST(Lines, WrongEllipsoidsAreRefusedWithASentence) {
   const auto sentence = [](double a, double f) -> std::string {
     try {
@@ -227,6 +270,9 @@ TEST(Lines, WrongEllipsoidsAreRefusedWithASentence) {
   EXPECT_EQ(sentence(1, 0.1),
             "Lines are served on ellipsoids of flattening -0.01 to 0.01, not 0.100000.");
   EXPECT_THROW(Rhumb(std::nan(""), 0), Error);
+  EXPECT_EQ(sentence(HUGE_VAL, 0), "Lines need a semi-major axis above zero, not inf.");
+  EXPECT_EQ(Rhumb(Ellipsoid("WGS 84")).direct(10, 20, 30, 4e5).lat,
+            Rhumb(6378137, 1 / 298.257223563).direct(10, 20, 30, 4e5).lat);
   EXPECT_THROW(Rhumb(1, std::nan("")), Error);
   EXPECT_EQ(Geodesic(kA, kF).a(), kA);
   EXPECT_EQ(Rhumb(kA, kF).f(), kF);
@@ -256,12 +302,18 @@ TEST(Lines, PolygonsOfTheSphere) {
   const double westwards[] = {90, -30, -150};
   EXPECT_NEAR(rhumb.polygon(3, westwards, south).area, pi, 4e-15);
   EXPECT_NEAR(rhumb.polygon(3, around, north).perimeter, 2 * pi * std::cos(pi / 6), 4e-15);
+  // Half a turn is taken eastwards, from either side of the Earth.
+  const double half[] = {0, 180};
+  EXPECT_NEAR(rhumb.polygon(2, half, north).area, pi, 4e-15);
+  EXPECT_NEAR(rhumb.polygon(2, half, north).perimeter, 2 * pi * std::cos(pi / 6), 4e-15);
   EXPECT_EQ(geodesic.polygon(0, nullptr, nullptr).area, 0);
   const double one[] = {3};
   EXPECT_EQ(geodesic.polygon(1, one, one).perimeter, 0);
 }
 
 #ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
+
+constexpr double kDegree = 0.017453292519943295;
 
 int lines_to_compare() {
   const char* asked = std::getenv("TIDEWATER_LINES");

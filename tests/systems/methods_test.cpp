@@ -6,8 +6,10 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 #include <string_view>
 
+#include "points/over_points.hpp"
 #include "projection_impl.hpp"
 #include "tidewater/transformation.hpp"
 
@@ -87,66 +89,83 @@ TEST(Methods, ModifiedKrovakStaysByTheOldOne) {
   EXPECT_GT(most, 0.02);
 }
 
+namespace {
+
+// A method with parameters that make a map, and a position on it.
+struct Sample {
+  Projection map;
+  double lon, lat;
+};
+
+Sample sample_of(const detail::Method& method) {
+  std::vector<std::pair<std::string, double>> parameters;
+  double lon = 3;
+  double lat = 47;
+  for (const auto& parameter : method.parameters) {
+    const auto* kind = detail::parameter_kind(parameter.code);
+    const std::string_view form = kind->short_form;
+    double value = kind->usual;
+    if (form == "lat0") value = 46;
+    if (form == "lat1") value = 44;
+    if (form == "lat2") value = 49;
+    if (form == "lon0" || form == "lon1") value = 2;
+    if (form == "lon2") value = 5;
+    if (form == "azimuth") value = 40;
+    if (form == "gamma") value = 38;
+    if (form == "x0") value = 600000;
+    if (form == "y0") value = -200000;
+    if (form == "h") value = 5900000;
+    if (form == "colat") value = 30;
+    if (form == "lat3") value = 30;
+    if (form == "lon3") value = 4;
+    if (form == "inclination") value = 99;
+    if (form == "days") value = 0.07;
+    if (form == "satellite") value = 4;
+    if (form == "path") value = 199;
+    if (kind->quantity == detail::Quantity::angle && kind->usual != 0)
+      value *= 180 / 3.14159265358979324;
+    parameters.emplace_back(kind->name, value);
+  }
+  // What is of some other part of the Earth.
+  if (method.code == 9810 || method.code == 9829 || method.code == 9830) {
+    parameters[0].second = method.code == 9810 ? 90 : 71;
+  }
+  if (method.code == detail::kBipolarConic) {
+    lon = -100;
+    lat = 10;
+  }
+  if (method.code == 9811) {
+    parameters[0].second = -41;
+    parameters[1].second = 173;
+    lon = 174;
+    lat = -40;
+  }
+  if (method.code == detail::kObliqueLambert) {
+    parameters[2].second = -1;
+    parameters[3].second = 1;
+    parameters[4].second = 30;
+  }
+  if (method.code == detail::kMalaya) {
+    lon = 102;
+    lat = 4.5;
+  }
+  return {Projection(method.name, parameters,
+                     method.code == detail::kMalaya ? Ellipsoid(6377304.063, 300.8017)
+                                                    : Ellipsoid("International 1924")),
+          lon, lat};
+}
+
+}  // namespace
+
 // Every method has complete entries, can be made, goes forth and back, and has conformal,
 // equal-area or other factors that agree with its name.
 TEST(Methods, EveryOneGoesForthAndBack) {
   for (const detail::Method& method : detail::methods()) {
     SCOPED_TRACE(std::string(method.name));
-    std::vector<std::pair<std::string, double>> parameters;
-    double lon = 3;
-    double lat = 47;
     for (const auto& parameter : method.parameters) {
-      const auto* kind = detail::parameter_kind(parameter.code);
-      ASSERT_NE(kind, nullptr);
-      const std::string_view form = kind->short_form;
-      double value = kind->usual;
-      if (form == "lat0") value = 46;
-      if (form == "lat1") value = 44;
-      if (form == "lat2") value = 49;
-      if (form == "lon0" || form == "lon1") value = 2;
-      if (form == "lon2") value = 5;
-      if (form == "azimuth") value = 40;
-      if (form == "gamma") value = 38;
-      if (form == "x0") value = 600000;
-      if (form == "y0") value = -200000;
-      if (form == "h") value = 5900000;
-      if (form == "colat") value = 30;
-      if (form == "lat3") value = 30;
-      if (form == "lon3") value = 4;
-      if (form == "inclination") value = 99;
-      if (form == "days") value = 0.07;
-      if (form == "satellite") value = 4;
-      if (form == "path") value = 199;
-      if (kind->quantity == detail::Quantity::angle && kind->usual != 0)
-        value *= 180 / 3.14159265358979324;
-      parameters.emplace_back(kind->name, value);
+      ASSERT_NE(detail::parameter_kind(parameter.code), nullptr);
     }
-    // What is of some other part of the Earth.
-    if (method.code == 9810 || method.code == 9829 || method.code == 9830) {
-      parameters[0].second = method.code == 9810 ? 90 : 71;
-    }
-    if (method.code == detail::kBipolarConic) {
-      lon = -100;
-      lat = 10;
-    }
-    if (method.code == 9811) {
-      parameters[0].second = -41;
-      parameters[1].second = 173;
-      lon = 174;
-      lat = -40;
-    }
-    if (method.code == detail::kObliqueLambert) {
-      parameters[2].second = -1;
-      parameters[3].second = 1;
-      parameters[4].second = 30;
-    }
-    if (method.code == detail::kMalaya) {
-      lon = 102;
-      lat = 4.5;
-    }
-    const Projection map(method.name, parameters,
-                         method.code == detail::kMalaya ? Ellipsoid(6377304.063, 300.8017)
-                                                        : Ellipsoid("International 1924"));
+    const auto [map, lon, lat] = sample_of(method);
     EXPECT_EQ(map.method_code(), method.code);
     EXPECT_GT(map.truth().size(), 10u);
     const Point there = map.forward({lon, lat});
@@ -158,6 +177,164 @@ TEST(Methods, EveryOneGoesForthAndBack) {
     EXPECT_GT(factors.areal, 0);
     // h k is the areal scale times the sine of the angle between the graticule's lines.
     EXPECT_LE(factors.areal, factors.meridional * factors.parallel * (1 + 1e-9));
+  }
+}
+
+namespace {
+
+// What an array call gave: points and their words.
+struct Answers {
+  std::vector<Point> points;
+  std::vector<TWstatus> words;
+  Summary summary;
+};
+
+Answers run_array(const Projection& map, const std::vector<Point>& in, bool back) {
+  Answers out = {
+      std::vector<Point>(in.size(), {-7, -7, -7}), std::vector<TWstatus>(in.size(), 12345), {}};
+  const Coordinates<const double> from = {&in[0].x, &in[0].y, &in[0].z, 3};
+  const Coordinates<double> to = {&out.points[0].x, &out.points[0].y, &out.points[0].z, 3};
+  out.summary = back ? map.inverse(in.size(), from, to, {out.words.data(), 1})
+                     : map.forward(in.size(), from, to, {out.words.data(), 1});
+  return out;
+}
+
+bool same_bits(const Point& one, const Point& other) {
+  return std::memcmp(&one, &other, sizeof one) == 0 ||
+         (std::isnan(one.x) && std::isnan(one.y) && std::isnan(one.z) && std::isnan(other.x) &&
+          std::isnan(other.y) && std::isnan(other.z));
+}
+
+}  // namespace
+
+// Whatever the method, the place in a block and the processor's width: a point that fails leaves
+// every other point what it is alone, and has its own word.
+TEST(Methods, AFailingPointDisturbsNoOther) {
+  std::vector<points::Level> levels;
+  const points::Level before = points::level();
+  for (int i = 0; i < points::kLevels; ++i) {
+    const auto level = static_cast<points::Level>(i);
+    if (points::ask_for_level(level)) levels.push_back(level);
+  }
+  const double nan = std::nan("");
+  for (const detail::Method& method : detail::methods()) {
+    SCOPED_TRACE(std::string(method.name));
+    const auto [map, lon, lat] = sample_of(method);
+    std::vector<Point> good;
+    for (int i = 0; i < 260; ++i) {
+      good.push_back({lon + 0.003 * (i % 97) - 0.1, lat + 0.007 * (i % 41) - 0.1, 1.0 * i});
+    }
+    for (const bool back : {false, true}) {
+      SCOPED_TRACE(back ? "inverse" : "forward");
+      // Some of these are on some maps.
+      std::vector<Point> bad = {
+          {lon, 91.5},      {nan, lat},        {lon, nan},        {lon + 179.9, 0},
+          {lon + 90, 1e-9}, {lon + 120, -lat}, {lon + 180, -lat}, {lon + 100, -lat / 2},
+          {lon, 90},        {lon, -90}};
+      if (back) {
+        const Point at = map.forward({lon, lat});
+        bad = {{nan, at.y},          {at.x, nan},        {1e12, at.y},         {at.x, -1e12},
+               {at.x + 2.1e7, at.y}, {at.x, at.y + 2e7}, {at.x, at.y - 2.6e7}, {-5e7, 5e7},
+               {at.x - 1.3e7, at.y}, {-3e5, at.y},       {at.x, at.y + 1.1e7}, {at.x, at.y - 9e6}};
+      }
+      std::vector<Point> in = back ? run_array(map, good, false).points : good;
+      ASSERT_EQ(run_array(map, in, back).summary.failed, 0u);
+      std::vector<Point> alone(in.size());
+      for (std::size_t i = 0; i < in.size(); ++i) {
+        alone[i] = run_array(map, {in[i]}, back).points[0];
+      }
+      for (const Point& odd : bad) {
+        SCOPED_TRACE(std::to_string(odd.x) + " " + std::to_string(odd.y));
+        const Answers odd_alone = run_array(map, {odd}, back);
+        for (const points::Level level : levels) {
+          points::ask_for_level(level);
+          for (const auto& [count, at] : {std::pair<std::size_t, std::size_t>{2, 0},
+                                          {2, 1},
+                                          {19, 0},
+                                          {19, 9},
+                                          {19, 18},
+                                          {37, 20},
+                                          {260, 130}}) {
+            std::vector<Point> mixed(in.begin(), in.begin() + static_cast<std::ptrdiff_t>(count));
+            mixed[at] = odd;
+            const Answers all = run_array(map, mixed, back);
+            EXPECT_EQ(all.summary.failed, odd_alone.summary.failed);
+            EXPECT_EQ(all.words[at], odd_alone.words[0]);
+            EXPECT_TRUE(same_bits(all.points[at], odd_alone.points[0]))
+                << all.points[at].x << " " << all.points[at].y << " for " << odd_alone.points[0].x
+                << " " << odd_alone.points[0].y;
+            for (std::size_t i = 0; i < count; ++i) {
+              if (i == at) continue;
+              ASSERT_EQ(all.words[i], TW_SUCCESS) << i << " of " << count;
+              ASSERT_TRUE(same_bits(all.points[i], alone[i])) << i << " of " << count;
+            }
+          }
+        }
+        points::ask_for_level(before);
+      }
+    }
+  }
+}
+
+// Zones of any width, counted from any meridian; where a zone is so wide that its ends are no part
+// of its map, they fail alone.
+TEST(Methods, ZonesOfOtherWidths) {
+  const Ellipsoid grs80("GRS80");
+  const Projection map("transverse mercator zoned", {{"lonfirst", 0}, {"width", 3}, {"x0", 500000}},
+                       grs80);
+  for (const auto& [lon, zone] : {std::pair(1.0, 1), {4.6, 2}, {-1.0, 120}, {-178.9, 61}}) {
+    const double centre = 3 * zone - 1.5;
+    const Projection one("transverse mercator", {{"lon0", centre > 180 ? centre - 360 : centre}},
+                         grs80);
+    const Point at = map.forward({lon, 50});
+    const Point there = one.forward({lon, 50});
+    EXPECT_NEAR(at.x, zone * 1e6 + 500000 + there.x, 1e-6);
+    EXPECT_NEAR(at.y, there.y, 1e-6);
+    EXPECT_NEAR(map.inverse(at).x, lon, 1e-10);
+  }
+  EXPECT_TRUE(std::isnan(map.inverse({121.5e6, 5e6}).x));
+  const Projection wide("transverse mercator zoned", {{"lonfirst", -180}, {"width", 120}}, grs80);
+  const std::vector<Point> in = {{-120, 10, 0}, {-179, 1, 0}, {-110, 20, 0}, {59, 2, 0}, {0, 3, 0}};
+  const Answers out = run_array(wide, in, false);
+  EXPECT_EQ(out.words, (std::vector<TWstatus>{TW_SUCCESS, TW_RANGE_ERROR, TW_SUCCESS,
+                                              TW_RANGE_ERROR, TW_SUCCESS}));
+  for (const std::size_t i : std::vector<std::size_t>{0, 2, 4})
+    EXPECT_EQ(out.points[i].x, wide.forward(in[i]).x);
+}
+
+// Inverses by iteration lead back from all of the map, not from the neighbourhood of the origin
+// alone, or say that they do not.
+TEST(Methods, IteratedInversesLeadBackFromAfar) {
+  struct Case {
+    const char* method;
+    double farthest;  // latitude
+    double lon;       // longitude
+    double x, y;      // a place of the plane where nothing lies
+  };
+  const Ellipsoid grs80("GRS80");
+  for (const Case& c :
+       {Case{"hyperbolic cassini", 80, 50, 0, 6.1e6}, Case{"guam", 89, 175, 2.5e7, 9.9e6},
+        Case{"lambert near conformal", 85, 60, 0, 3e8}}) {
+    SCOPED_TRACE(c.method);
+    const Projection map(c.method, {{"lat0", c.lon == 60 ? -40 : 0}, {"lon0", 0}}, grs80);
+    for (double lat = -c.farthest; lat <= c.farthest; lat += 1) {
+      for (double lon = -c.lon; lon <= c.lon; lon += c.lon / 7) {
+        // The hyperbolic grid folds where the sphere's northing is the square root of two.
+        const double northing =
+            std::atan2(std::tan(std::fabs(lat) / 57.29577951), std::cos(lon / 57.29577951));
+        if (c.farthest == 80 && northing > 1.38) continue;
+        const Point there = map.forward({lon, lat});
+        const Point back = map.inverse(there);
+        EXPECT_NEAR(back.x, lon, 1e-8) << lat;
+        EXPECT_NEAR(back.y, lat, 1e-8) << lon;
+      }
+    }
+    TWstatus word = TW_SUCCESS;
+    double x = c.x, y = c.y;
+    const Coordinates<double> at = {&x, &y};
+    EXPECT_EQ(map.inverse(1, at, at, {&word, 1}).failed, 1u) << x << " " << y;
+    EXPECT_NE(word, TW_SUCCESS);
+    EXPECT_TRUE(std::isnan(x) && std::isnan(y));
   }
 }
 
@@ -191,6 +368,301 @@ TEST(Methods, ConvergenceIsTheBearingOfGridNorth) {
   const double east = (north.x - 4) * std::cos(0.872664626) * 6388000;
   const double along = (north.y - 50) * 6370000;
   EXPECT_NEAR(std::atan2(east, along) * 57.29577951, factors.convergence, 0.01);
+}
+
+namespace {
+
+using Parameters = std::vector<std::pair<std::string, double>>;
+
+std::string refusal(const char* method, const Parameters& parameters,
+                    const Ellipsoid& ellipsoid = Ellipsoid("GRS80")) {
+  try {
+    const Projection map(method, parameters, ellipsoid);
+    return "not refused";
+  } catch (const Error& error) {
+    return error.what();
+  }
+}
+
+bool has(const std::string& text, const char* part) { return text.find(part) != std::string::npos; }
+
+// Two maps of one plane, at some places.
+void expect_same(const Projection& one, const Projection& other, double lon, double lat) {
+  for (const double d : {0.0, 1.5, -2.25}) {
+    const Point a = one.forward({lon + d, lat - d / 3});
+    const Point b = other.forward({lon + d, lat - d / 3});
+    EXPECT_NEAR(a.x, b.x, 1e-6) << one.method();
+    EXPECT_NEAR(a.y, b.y, 1e-6) << one.method();
+  }
+}
+
+}  // namespace
+
+TEST(Methods, AParallelAtAPoleMakesNoCylinderAndNoCone) {
+  for (const char* method : {"mercator", "mercator variant c", "cylindrical equal area",
+                             "cylindrical equal area spherical", "equidistant cylindrical",
+                             "equidistant cylindrical spherical"}) {
+    for (const double lat : {90.0, -90.0}) {
+      EXPECT_TRUE(has(refusal(method, {{"lat1", lat}}), "the standard parallel lies at a pole"))
+          << method << " " << refusal(method, {{"lat1", lat}});
+    }
+    EXPECT_EQ(refusal(method, {{"lat1", 89.999}}), "not refused") << method;
+  }
+  for (const char* method : {"albers", "equidistant conic"}) {
+    EXPECT_TRUE(has(refusal(method, {{"lat1", 30}, {"lat2", -30}}), "make no cone")) << method;
+    EXPECT_TRUE(has(refusal(method, {{"lat1", 0}, {"lat2", 0}}), "make no cone")) << method;
+    EXPECT_EQ(refusal(method, {{"lat1", 0}, {"lat2", 30}}), "not refused") << method;
+  }
+  EXPECT_TRUE(has(refusal("lambert near conformal", {{"lat0", 0}}), "makes no cone"));
+  EXPECT_TRUE(has(refusal("krovak", {{"lat0", 49.5}, {"colat", 30}, {"lat1", 0}}), "not finite"))
+      << refusal("krovak", {{"lat0", 49.5}, {"colat", 30}, {"lat1", 0}});
+  EXPECT_TRUE(has(refusal("oblique mercator", {{"lat0", 90}}), "its centre lies at a pole"));
+  EXPECT_TRUE(has(refusal("transverse mercator zoned", {{"width", 0}}), "zone width"));
+  EXPECT_TRUE(has(refusal("transverse mercator", {}, Ellipsoid(6378137, 100)), "above 1/150"));
+  EXPECT_TRUE(
+      has(refusal("lambert conformal", {{"lat1", 90}, {"lat2", 80}}), "do not fit together"));
+  EXPECT_TRUE(has(refusal("krovak", {{"lat0", -90}, {"colat", 30}, {"lat1", 78}}), "not finite"));
+  EXPECT_TRUE(has(refusal("colombia urban", {{"lat0", 90}}), "its origin lies at a pole"));
+  EXPECT_TRUE(has(refusal("imw polyconic", {{"lat1", 90}}), "at one that cannot serve"));
+  EXPECT_TRUE(has(refusal("vertical perspective", {{"h", 0}}), "height of the viewpoint"));
+  EXPECT_TRUE(has(refusal("chamberlin", {}), "make no triangle"));
+  EXPECT_TRUE(has(refusal("chamberlin", {}, Ellipsoid(6378137, 50)), "flattening of 0.01"));
+  EXPECT_TRUE(has(refusal("azimuthal equidistant", {}, Ellipsoid(6378137, 50)), "of 0.01"));
+}
+
+TEST(Methods, SatellitesAndTheirPaths) {
+  for (const double satellite : {1.0, 2.0, 3.0, 4.0, 5.0, 7.0}) {
+    const bool first_system = satellite <= 3;
+    EXPECT_EQ(refusal("landsat", {{"satellite", satellite}, {"path", first_system ? 251. : 233.}}),
+              "not refused");
+    for (const double path : {0.0, 1.5, first_system ? 252.0 : 234.0, -3.0}) {
+      EXPECT_TRUE(has(refusal("landsat", {{"satellite", satellite}, {"path", path}}),
+                      first_system ? "its paths are 1 to 251" : "its paths are 1 to 233"))
+          << satellite << " " << path;
+    }
+  }
+  for (const double satellite : {0.0, 2.5, 6.0, 8.0}) {
+    EXPECT_TRUE(has(refusal("landsat", {{"satellite", satellite}, {"path", 1}}),
+                    "the satellites are Landsat 1 to 5 and 7"));
+  }
+  EXPECT_TRUE(has(refusal("space oblique mercator", {{"inclination", 99}, {"days", 1}}),
+                  "less than a day"));
+  EXPECT_TRUE(has(refusal("space oblique mercator", {{"inclination", 99}, {"days", 0}}),
+                  "less than a day"));
+  EXPECT_TRUE(has(refusal("space oblique mercator", {{"inclination", 180}, {"days", 0.07}}),
+                  "between 0 and 180 degrees"));
+  EXPECT_TRUE(has(refusal("malaya grid", {}, Ellipsoid(6377304.063, 300.7)), "Everest 1830"));
+}
+
+// What is not given has its usual value, which may be another parameter's; methods and parameters
+// go by any of their names.
+TEST(Methods, UsualValuesAndOtherNames) {
+  const Ellipsoid grs80("GRS80");
+  const Parameters oblique = {{"lat0", 46}, {"lon0", 7}, {"azimuth", 40}, {"k0", 0.9999}};
+  Parameters with_gamma = oblique;
+  with_gamma.emplace_back("gamma", 40);
+  for (const char* method : {"oblique mercator", "oblique mercator variant a"}) {
+    expect_same(Projection(method, oblique, grs80), Projection(method, with_gamma, grs80), 8, 47);
+  }
+  expect_same(Projection("lambert conformal", {{"lat0", 46}, {"lat1", 45}}, grs80),
+              Projection("lambert conformal", {{"lat0", 46}, {"lat1", 45}, {"lat2", 45}}, grs80), 3,
+              47);
+  const Projection by_words("Lambert Conic Conformal (2SP)",
+                            {{"latitude of origin", 46.5},
+                             {"central meridian", 3},
+                             {"first standard parallel", 44},
+                             {"second standard parallel", 49},
+                             {"false easting", 700000},
+                             {"false northing", 6600000}},
+                            grs80);
+  EXPECT_EQ(by_words.method(), "Lambert Conic Conformal (2SP)");
+  EXPECT_EQ(by_words.method_code(), 9802);
+  for (const char* method :
+       {"EPSG:9802", "lcc", "Lambert_Conformal_Conic_2SP", "Lambert_Conformal_Conic"}) {
+    expect_same(by_words,
+                Projection(method,
+                           {{"Latitude of false origin", 46.5},
+                            {"Longitude of false origin", 3},
+                            {"Latitude of 1st standard parallel", 44},
+                            {"Latitude of 2nd standard parallel", 49},
+                            {"Easting at false origin", 700000},
+                            {"Northing at false origin", 6600000}},
+                           grs80),
+                2, 46);
+    expect_same(by_words,
+                Projection(method,
+                           {{"lat_0", 46.5},
+                            {"lon_0", 3},
+                            {"standard_parallel_1", 44},
+                            {"Standard_Parallel_2", 49},
+                            {"x_0", 700000},
+                            {"false_northing", 6600000}},
+                           grs80),
+                2, 46);
+  }
+  EXPECT_TRUE(has(refusal("EPSG:1", {}), "There is no projection method \"EPSG:1\""));
+  EXPECT_TRUE(has(refusal("EPSG:what", {}), "There is no projection method \"EPSG:what\""));
+  EXPECT_TRUE(has(refusal("", {}), "There is no projection method \"\""));
+  EXPECT_TRUE(has(refusal("--", {}), "There is no projection method \"--\""));
+  EXPECT_TRUE(has(refusal("mercator", {{"lon0", 721}}), "is more than two turns"));
+  EXPECT_TRUE(has(refusal("mercator", {{"x0", HUGE_VAL}}), "is no finite number"));
+  EXPECT_TRUE(has(refusal("lambert conformal", {{"lat1", 45}, {"x0", 1e5}, {"lat2", 90.001}}),
+                  "beyond a pole"));
+  // A method whose scale is no k0.
+  EXPECT_TRUE(has(refusal("Lambert Conic Conformal (2SP Michigan)",
+                          {{"lat0", 43}, {"lat1", 44}, {"lat2", 45}, {"kell", 0}}),
+                  "do not fit together"));
+  EXPECT_TRUE(has(refusal("lambert conformal michigan",
+                          {{"lat0", 43}, {"lat1", 44}, {"lat2", 45}, {"kell", 1e308}}),
+                  "do not fit together"));
+  // Each method's words and its name lead to it.
+  for (const detail::Method& method : detail::methods()) {
+    std::string_view rest = method.words;
+    while (!rest.empty()) {
+      const std::string_view words = rest.substr(0, rest.find('|'));
+      rest.remove_prefix(std::min(words.size() + 1, rest.size()));
+      EXPECT_EQ(detail::method_by_words(words)->code, method.code) << words;
+    }
+    EXPECT_EQ(detail::method_by_words(method.name)->code, method.code) << method.name;
+  }
+  const System polar("polar stereographic lat1=-71 lon0=0 ellps=WGS84");
+  const Point there = polar.projection()->forward({30, -75});
+  const Point registered = System("EPSG:3031").projection()->forward({30, -75});
+  EXPECT_NEAR(there.x, registered.x, 1e-8);
+  EXPECT_NEAR(there.y, registered.y, 1e-8);
+}
+
+// A definition from elsewhere may bring what no method has, or name a method that there is not.
+TEST(Methods, DefinitionsThatTheTableDoesNotKnow) {
+  detail::Definition definition;
+  definition.kind = SystemKind::projected;
+  definition.datum.ellipsoid = {"GRS 1980", 7019, 6378137, 298.257222101};
+  definition.method = 9807;
+  definition.parameters = {{8802, 0.1}, {424242, std::nan("")}};
+  const Projection map(std::make_shared<const detail::ProjectionImpl>(definition));
+  expect_same(map,
+              Projection("transverse mercator", {{"lon0", 0.1 * 180 / 3.14159265358979324}},
+                         Ellipsoid("GRS80")),
+              6, 47);
+  // It is told by nobody.
+  EXPECT_EQ(map.parameters().size(), 5u);
+  for (const char* name : {"", "mine"}) {
+    definition.method = 9999;
+    definition.name = name;
+    try {
+      const detail::ProjectionImpl none(definition);
+      ADD_FAILURE();
+    } catch (const Error& error) {
+      EXPECT_EQ(std::string(error.what()),
+                "There is no formula for the projection method EPSG:9999 of " +
+                    std::string(*name == 0 ? "the system" : name) + ".");
+    }
+  }
+}
+
+// The same formulas by two roads: polar and oblique aspects, the hemispheres of a cone.
+TEST(Methods, AspectsMeet) {
+  const Ellipsoid intl("International 1924");
+  for (const double pole : {90.0, -90.0}) {
+    const double lat = pole * 0.9;
+    const Projection variant_a("polar stereographic variant a", {{"lat0", pole}, {"lon0", 20}},
+                               intl);
+    expect_same(Projection("stereographic", {{"lat0", pole}, {"lon0", 20}}, intl), variant_a, 30,
+                lat);
+    // The scale of a parallel at the pole itself is the pole's.
+    expect_same(Projection("polar stereographic variant b", {{"lat1", pole}, {"lon0", 20}}, intl),
+                variant_a, 30, lat);
+    // Equal area about a pole: that of the ellipsoid, and on the sphere the oblique formula.
+    const Projection area("azimuthal equal area", {{"lat0", pole}, {"lon0", 20}}, intl);
+    EXPECT_NEAR(area.factors({50, lat}).areal, 1, 1e-9);
+    const Point at_pole = area.inverse({0, 0});
+    EXPECT_EQ(at_pole.y, pole);
+    EXPECT_EQ(at_pole.x, 20);
+    EXPECT_TRUE(std::isnan(area.inverse({1.3e7, 1.3e7}).x));
+    const Ellipsoid sphere(6371000, 0);
+    const Projection round("azimuthal equal area", {{"lat0", pole}, {"lon0", 20}}, sphere);
+    const Point there = round.forward({50, lat});
+    const double rho = 2 * 6371000 * std::sin(4.5 * 3.14159265358979324 / 180);
+    EXPECT_NEAR(there.x, rho / 2, 1e-6);  // thirty degrees off
+    EXPECT_NEAR(there.y, (pole > 0 ? -1 : 1) * rho * std::sqrt(0.75), 1e-6);
+  }
+  // A cone and its image beyond the equator.
+  for (const char* method : {"lambert near conformal", "equidistant conic", "albers"}) {
+    SCOPED_TRACE(method);
+    const auto cone = [&](double sign) {
+      Parameters parameters = {{"lat0", sign * 40}, {"lon0", 0}};
+      if (std::string(method) != "lambert near conformal") {
+        parameters.emplace_back("lat1", sign * 35);
+        parameters.emplace_back("lat2", sign * 45);
+      }
+      return Projection(method, parameters, intl);
+    };
+    const Projection north = cone(1), south = cone(-1);
+    for (const double lon : {-30.0, 0.0, 12.0}) {
+      const Point up = north.forward({lon, 50});
+      const Point down = south.forward({lon, -50});
+      EXPECT_NEAR(down.x, up.x, 1e-7);
+      EXPECT_NEAR(down.y, -up.y, 1e-7);
+      const Point back = south.inverse(down);
+      EXPECT_NEAR(back.x, lon, 1e-10);
+      EXPECT_NEAR(back.y, -50, 1e-10);
+    }
+  }
+  // A perspective that is turned and not tilted is the vertical one, turned.
+  const Projection vertical("vertical perspective", {{"lat0", 40}, {"lon0", 0}, {"h", 2e6}}, intl);
+  const Projection level("tilted perspective", {{"lat0", 40}, {"lon0", 0}, {"h", 2e6}}, intl);
+  expect_same(vertical, level, 2, 41);
+  const Projection tilted("tilted perspective",
+                          {{"lat0", 40}, {"lon0", 0}, {"h", 2e6}, {"tilt", 20}, {"azimuth", 0}},
+                          intl);
+  EXPECT_GT(std::hypot(tilted.forward({2, 42}).x - vertical.forward({2, 42}).x,
+                       tilted.forward({2, 42}).y - vertical.forward({2, 42}).y),
+            1000);
+}
+
+// Rounding may bring a latitude a hair beyond a pole, in degrees or in the plane: that is the pole,
+// and what lies beyond it is not.
+TEST(Methods, AHairBeyondAPoleIsThePole) {
+  const Ellipsoid grs80("GRS80");
+  const double hair = 3e-11;
+  for (const char* method : {"equidistant cylindrical", "cylindrical equal area", "sinusoidal"}) {
+    const Projection map(method, {{"lon0", 10}}, grs80);
+    for (const double pole : {90.0, -90.0}) {
+      const Point at = map.forward({12, pole});
+      const Point beyond = map.forward({12, pole + std::copysign(hair, pole)});
+      EXPECT_EQ(beyond.x, at.x) << method;
+      EXPECT_EQ(beyond.y, at.y) << method;
+      EXPECT_TRUE(std::isnan(map.forward({12, pole * (1 + 1e-9)}).x)) << method;
+    }
+  }
+  // Tunisia's grid counts by degrees of latitude.
+  const Projection mining("tunisia mining", {{"lat0", 0}, {"lon0", 0}}, grs80);
+  const double north = mining.forward({0, 90}).y;
+  const double south = mining.forward({0, -90}).y;
+  EXPECT_EQ(mining.inverse({0, north * (1 + 3e-13)}).y, 90);
+  EXPECT_EQ(mining.inverse({0, south * (1 + 3e-13)}).y, -90);
+  EXPECT_TRUE(std::isnan(mining.inverse({0, north * (1 + 1e-9)}).y));
+  EXPECT_NEAR(mining.inverse({0, south / 3}).y, -30, 1e-12);
+}
+
+// Where a point or its neighbours have no place on the map the factors have none; a sphere has.
+TEST(Methods, FactorsAtTheEdges) {
+  const Projection map("mercator", {}, Ellipsoid(6371000, 0));
+  EXPECT_NEAR(map.factors({10, 60}).areal, 4, 1e-8);
+  EXPECT_NEAR(map.factors({10, 60}).parallel, 2, 1e-9);
+  const double nan = std::nan("");
+  const double lon[] = {10, nan, 10, 10}, lat[] = {60, 45, nan, 89.9};
+  Factors out[4];
+  TWstatus words[4];
+  const Summary summary = map.factors(4, Coordinates<const double>{lon, lat}, out, {words, 1});
+  EXPECT_EQ(summary.failed, 3u);
+  EXPECT_EQ(words[0], TW_SUCCESS);
+  EXPECT_NE(words[1], TW_SUCCESS);
+  EXPECT_EQ(words[2], TW_BAD_LATITUDE);
+  EXPECT_EQ(words[3], TW_BAD_LATITUDE);
+  for (int i = 1; i < 4; ++i) EXPECT_TRUE(std::isnan(out[i].convergence)) << i;
+  // Without words.
+  EXPECT_EQ(map.factors(4, Coordinates<const double>{lon, lat}, out).failed, 3u);
 }
 
 TEST(Methods, RefusalsAreSentences) {

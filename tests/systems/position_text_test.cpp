@@ -138,7 +138,7 @@ TEST(PositionFromText, WhatIsAmbiguousOrWrongIsRefused) {
 TEST(PositionFromText, NothingElseHappensToGarbage) {
   const std::string alphabet = "0123456789.,;:+-NSEW d'\"m\t/e";
   unsigned seed = 12345;
-  for (int i = 0; i < 200000; ++i) {
+  for (unsigned i = 0; i < 200000; ++i) {
     std::string text;
     const unsigned length = 1 + i % 24;
     for (unsigned k = 0; k < length; ++k) {

@@ -22,6 +22,7 @@
 #include "csv.hpp"
 #include "store_path.hpp"
 #include "support/data.hpp"
+#include "support/little_memory.hpp"
 #include "system_impl.hpp"
 #include "text_forms.hpp"
 
@@ -988,6 +989,7 @@ TEST_F(RegistryStores, WithHolesRefuseWhatStandsOnThem) {
 
 // A program that stands where there is no store says where it looked, also one found by its name.
 TEST_F(RegistryStores, ThatAreNowhereAreLookedForBesideTheProgram) {
+  TIDEWATER_NEED_NEW_PROCESS();
   constexpr const char* kCopied = "TIDEWATER_COPIED_TEST";
   if (std::getenv(kCopied) != nullptr) {
     std::cout << sentence([] { detail::store_path(); }) << std::endl;
@@ -998,7 +1000,8 @@ TEST_F(RegistryStores, ThatAreNowhereAreLookedForBesideTheProgram) {
   const std::string arguments =
       " --gtest_filter=RegistryStores.ThatAreNowhereAreLookedForBesideTheProgram > " +
       path("printed");
-  const std::string before = std::string("unset TIDEWATER_STORE; ") + kCopied + "=1 ";
+  const std::string before =
+      std::string("unset TIDEWATER_STORE GTEST_TOTAL_SHARDS GTEST_SHARD_INDEX; ") + kCopied + "=1 ";
   for (const std::string& call :
        {before + program.string(), before + "PATH=" + folder_.path().string() + " copied_test"}) {
     EXPECT_EQ(std::system((call + arguments).c_str()), 0) << call;

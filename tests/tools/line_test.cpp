@@ -28,11 +28,11 @@ std::string python(const std::string& command, const std::string& program,
   return r.status == 0 ? r.out : r.out + r.err;
 }
 
+#ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
 std::vector<double> solved(const std::string& options, const std::string& line) {
   return numbers(shell("tidewater line " + options, line + "\n").out);
 }
 
-#ifdef TIDEWATER_HAVE_GEOGRAPHICLIB
 double turn_between(double a, double b) { return std::fabs(std::remainder(a - b, 360)); }
 
 // Metres between two positions in degrees.

@@ -71,6 +71,20 @@ TEST(Attitude, MatrixIsTheProductOfThreeTurns) {
   EXPECT_NEAR(m[6] * x + m[7] * y + m[8] * z, z3, 1e-15);
 }
 
+// One turn alone, of which the table has cosines on the diagonal and sines beside it.
+TEST(Attitude, MatrixOfASingleTurn) {
+  const double c = std::cos(0.4), s = std::sin(0.4);
+  const double turns[][3] = {{0.4, 0, 0}, {0, 0.4, 0}, {0, 0, 0.4}};
+  const double expected[][9] = {
+      {1, 0, 0, 0, c, s, 0, -s, c}, {c, 0, -s, 0, 1, 0, s, 0, c}, {c, s, 0, -s, c, 0, 0, 0, 1}};
+  for (int turn = 0; turn < 3; ++turn) {
+    double m[9];
+    TWstatus status = 0;
+    TWcalc_matrix(turns[turn][0], turns[turn][1], turns[turn][2], m, &status);
+    for (int i = 0; i < 9; ++i) EXPECT_NEAR(m[i], expected[turn][i], 1e-16) << turn << " " << i;
+  }
+}
+
 TEST(Attitude, LookingStraightDown) {
   expect_angles(tsa(0, 0, 0), 0, -kPi, 0);
   const Angles turned = tsa(0, 0, 1);
@@ -129,6 +143,10 @@ TEST(Attitude, GeocentricRotationsLookingStraightDown) {
   EXPECT_LT(r.a, 1e-12);
   // g1 = 0, g2 = 1: swing = -atan2(-(cos lon), -0) = pi/2
   EXPECT_NEAR(r.b, kPi / 2, 1e-15);
+  // A turn of 0.7 about the axis seen from the meridian of 0.4: -atan2(-cos 0.3, -sin 0.3), which
+  // is a right angle and 0.3.
+  EXPECT_NEAR(tsa_of_w(0, 0, 0.7, 0.4, kPi / 2).b, kPi / 2 + 0.3, 1e-15);
+  EXPECT_NEAR(tsa_of_w(0, 0, 0.4, 0.7, kPi / 2).b, kPi / 2 - 0.3, 1e-15);
 }
 
 TEST(Attitude, WyAtTheEndOfItsRange) {

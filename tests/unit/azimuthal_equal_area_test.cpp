@@ -418,7 +418,7 @@ TEST(AzimuthalEqualArea, AgreesWithProj) {
 
 TEST(AzimuthalEqualArea, TakesTheQpThatItIsGiven) {
   // The latitude is the one whose q is what the geometry gives with that qp, by bisection here.
-  const auto [a, e] = Ellipsoid::grs80();
+  const double e = Ellipsoid::grs80().e;
   const double e2 = e * e;
   const auto q_of = [&](double lat) {
     const double s = std::sin(lat);

@@ -115,6 +115,27 @@ TEST(Bonne, ConstantsFail) {
   EXPECT_NE(held.r0, kUntouched);
 }
 
+TEST(Bonne, AnEllipsoidThatIsNoneEndsTheArray) {
+  const Bonne good(0.08, 0.7, 0.2);
+  for (const double e : {1.5, -0.1}) {
+    const Points in = {{0.2, 0.7, 0}, {0.3, 0.5, 0}, {0.2, 0.7, 0}};
+    Points out = untouched(3);
+    TWstatus status = 0;
+    TWbonne_f(0.2, 0.7, e, good.e2, good.c1, good.r0, 3, in.data(), out.data(), &status);
+    EXPECT_EQ(status, TW_BAD_ECCENTRICITY);
+    expect_near(out[0], 0, 0, 0);  // the origin needs no arc
+    expect_untouched(out[1]);
+    expect_untouched(out[2]);
+    const Points plane = {{0, 0, 0}, {0.1, 0.1, 0}, {0, 0, 0}};
+    out = untouched(3);
+    TWbonne_i(0.2, 0.7, e, good.e2, good.c1, good.r0, 3, plane.data(), out.data(), &status);
+    EXPECT_EQ(status, TW_BAD_ECCENTRICITY);
+    expect_near(out[0], 0.2, 0.7, 0);
+    expect_untouched(out[1]);
+    expect_untouched(out[2]);
+  }
+}
+
 TEST(Bonne, OriginIsExactlyZero) {
   for (const double e : {0.0, 0.08}) {
     const Bonne p(e, 0.7, 0.2);
@@ -139,7 +160,7 @@ TEST(Bonne, StandardParallelTakesItsOwnRadius) {
   Points out = untouched(3);
   TWstatus status = 0;
   TWbonne_f(0, lat1, e, p.e2, p.c1, 50, 3, in.data(), out.data(), &status);
-  for (int i = 0; i < 2; ++i) {
+  for (std::size_t i = 0; i < 2; ++i) {
     expect_near(out[i], p.c1 * std::sin(std::sin(lat1) * d),
                 p.c1 - p.c1 * std::cos(std::sin(lat1) * d), 1e-12);
   }

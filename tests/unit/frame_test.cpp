@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cmath>
+#include <string>
+
 #include "support/points.hpp"
 
 using namespace tidewater::test;
@@ -135,6 +138,19 @@ TEST(Precision, OfLargeNumbers) {
   EXPECT_EQ(precision(TWmax_f_prec, 1e15), 0);
   EXPECT_EQ(precision(TWmax_f_prec, 1e300), 0);
   EXPECT_EQ(precision(TWmax_f_prec, kNaN), 0);
+}
+
+// The fewest places change at each power of ten, and nowhere else.
+TEST(Precision, ChangesAtEachPowerOfTen) {
+  for (int n = 0; n <= 14; ++n) {
+    const double power = std::stod("1e" + std::to_string(n));
+    EXPECT_EQ(precision(TWmax_f_prec, power), 14 - n) << n;
+    EXPECT_EQ(precision(TWmax_f_prec, std::nextafter(power, 0)), 15 - n) << n;
+    const double part = std::stod("1e-" + std::to_string(n));
+    if (n == 0) continue;
+    EXPECT_EQ(precision(TWmin_f_prec, std::nextafter(part, 1)), 14 + n) << n;
+    EXPECT_EQ(precision(TWmin_f_prec, part), 15 + n) << n;
+  }
 }
 
 TEST(Precision, OfSmallNumbers) {

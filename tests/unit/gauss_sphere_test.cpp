@@ -328,7 +328,7 @@ TEST(GaussSphere, SchreiberEndsAfterAFailingFirstStage) {
   TWg_schreiber(e, 0, s.c, s.t, s.R, m.A0, m.A2, m.A4, m.A6, m.A8, m.M0, 0.5, 2, p.data(), p.data(),
                 &status);
   EXPECT_EQ(status, TW_BAD_LATITUDE);
-  for (int i = 0; i < 2; ++i) expect_near(p[i], first[i].x, first[i].y, first[i].z, 0);
+  for (std::size_t i = 0; i < 2; ++i) expect_near(p[i], first[i].x, first[i].y, first[i].z, 0);
 }
 
 }  // namespace

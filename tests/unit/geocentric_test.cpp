@@ -42,12 +42,13 @@ TEST(Geocentric, AxisAndCentre) {
 TEST(Geocentric, JustOffTheAxisTakesTheGeneralRoad) {
   const auto [a, e] = Ellipsoid::wgs84();
   const double b = a * std::sqrt(1 - e * e);
-  const Points in = {{0, 2e-9, b + 10}, {-1e-9, 0, -b - 10}};
+  const Points in = {{0, 2e-9, b + 10}, {-1e-9, 0, -b - 10}, {0, 1e-9, 1e80}};
   Points out = untouched(in.size());
   TWstatus status = 0;
-  TWxyz_to_llh(a, e, 2, in.data(), out.data(), &status);
+  TWxyz_to_llh(a, e, 3, in.data(), out.data(), &status);
   expect_near(out[0], kPi / 2, kPi / 2, 10, 1e-8);
   expect_near(out[1], kPi, -kPi / 2, 10, 1e-8);
+  expect_near(out[2], kPi / 2, kPi / 2, 1e80, 1e64);
 }
 
 TEST(Geocentric, TheStatedFormulaToTheLastBits) {

@@ -234,6 +234,9 @@ TEST(GeodesicDirect, AlongTheEquator) {
   EXPECT_NEAR(direct({3, 0, 0}, kPi / 2, a, {a, e}).end.x, 4 - 2 * kPi, 1e-15);
   EXPECT_NEAR(direct({-3, 0, 0}, -kPi / 2, a, {a, e}).end.x, -4 + 2 * kPi, 1e-15);
   EXPECT_NEAR(direct({0.25, 0, 0}, kPi / 2, 20 * kPi * a, {a, e}).end.x, 0.25, 1e-13);
+  // Half a turn stays on the side that it comes from.
+  EXPECT_EQ(direct({0, 0, 0}, kPi / 2, kPi, {1, e}).end.x, kPi);
+  EXPECT_EQ(direct({0, 0, 0}, -kPi / 2, kPi, {1, e}).end.x, -kPi);
   // Just off the equator it is an ordinary line.
   EXPECT_GT(direct({0, 0, 0}, kPi / 2 - 1e-10, 1e6, {a, e}).end.y, 0);
 }
@@ -427,6 +430,20 @@ TEST(GeodesicInverse, AtAPole) {
   r = inverse({2, 0.7, 0}, {-1, -kPi / 2, 0}, wgs84);
   EXPECT_EQ(r.azimuth, kPi);
   EXPECT_EQ(r.back, 0);
+  // Also on the other side of the earth, where no antipode is meant.
+  r = inverse({0, 0.7, 0}, {kPi, kPi / 2, 0}, wgs84);
+  EXPECT_NEAR(r.distance, quarter - arc_of(wgs84, 0.7), 1e-8);
+  EXPECT_EQ(r.azimuth, 0);
+  // By contract: so near to the pole that its sine is 1 the iteration finds nothing, and the answer
+  // is the sine of the sphere's arc between the reduced latitudes.
+  const double sine = wgs84.a * cos_reduced(wgs84.e, 0.3);
+  for (const double sign : {1.0, -1.0}) {
+    const double pole = sign * (kPi / 2 - 1e-9);
+    r = inverse({1.5, pole, 0}, {-1, sign * 0.3, 0}, wgs84);
+    EXPECT_NEAR(r.distance, sine, 0.02);
+    r = inverse({1.5, sign * 0.3, 0}, {-1, pole, 0}, wgs84);
+    EXPECT_NEAR(r.distance, sine, 0.02);
+  }
   // Within 1e-14 of the pole is at the pole, further off is not.
   EXPECT_EQ(inverse({2, 0.7, 0}, {-1, kPi / 2 - 9e-15, 0}, wgs84).azimuth, 0);
   EXPECT_NE(inverse({2, 0.7, 0}, {-1, kPi / 2 - 2e-14, 0}, wgs84).azimuth, 0);

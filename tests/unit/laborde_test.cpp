@@ -119,7 +119,7 @@ TEST(Laborde, CubicIsZPlusCZCubed) {
   TWstatus status = 0;
   TWlabor_f(k.A, k.B, 3, in.data(), out.data(), &status);
   EXPECT_EQ(status, TW_SUCCESS);
-  for (int i = 0; i < 3; ++i) {
+  for (std::size_t i = 0; i < 3; ++i) {
     const Complex z(in[i].y, in[i].x);
     const Complex w = z + Complex(k.A, k.B) * z * z * z;
     expect_near(out[i], w.imag(), w.real(), kUntouched, 1e-16);
@@ -220,7 +220,7 @@ TEST(Laborde, ScaleOfTheCubicByHand) {
   TWstatus status = 0;
   TWlabor_s(1.1, A, B, 2, in.data(), out.data(), &status);
   EXPECT_EQ(status, TW_SUCCESS);
-  for (int i = 0; i < 2; ++i) {
+  for (std::size_t i = 0; i < 2; ++i) {
     const Complex z(in[i].y, in[i].x);
     const double k = std::abs(1.0 + 3.0 * Complex(B, A) * z * z) * (i == 0 ? 0.9 : 1) * 1.1;
     expect_near(out[i], k, k, k * k, 1e-15);
@@ -236,6 +236,29 @@ TEST(Laborde, ScaleOfTheCubicByHand) {
   one[0].z = 1;
   TWlabor_s(1, 1, 0, 1, at.data(), one.data(), &status);  // 1 + 12 i: re < im
   EXPECT_NEAR(one[0].x, std::hypot(1, 12), 4e-15);
+}
+
+// The third element is an input, and goes along in arrays of any length.
+TEST(Laborde, ScaleOfManyPointsIsThatOfEach) {
+  const Cubic cubic(0.3);
+  for (const int32_t count : {1, 255, 256, 257, 600}) {
+    const auto size = static_cast<std::size_t>(count);
+    Points in(size), out(size + 1, kUntouchedPoint);
+    for (std::size_t i = 0; i < size; ++i) {
+      in[i] = {0.0001 * static_cast<double>(i), 0.02, 7};
+      out[i] = {8, 9, 1 + 0.001 * static_cast<double>(i)};
+    }
+    Points each = out;
+    TWstatus status = 0;
+    TWlabor_s(0.9995, cubic.A, cubic.B, count, in.data(), out.data(), &status);
+    EXPECT_EQ(status, TW_SUCCESS);
+    for (std::size_t i = 0; i < size; ++i) {
+      TWlabor_s(0.9995, cubic.A, cubic.B, 1, &in[i], &each[i], &status);
+      ASSERT_EQ(out[i].x, each[i].x) << count << " " << i;
+      ASSERT_EQ(out[i].z, each[i].z) << count << " " << i;
+    }
+    expect_untouched(out[size]);
+  }
 }
 
 TEST(Laborde, ScaleOfTheChain) {
@@ -271,7 +294,7 @@ TEST(Laborde, ScaleOfAFailingArray) {
   TWg_schreiber(p.e, p.lon0, p.c, p.t, p.R, p.A0, p.A2, p.A4, p.A6, p.A8, p.M0, 0.9995, 2,
                 stages.data(), stages.data(), &status);
   EXPECT_EQ(status, TW_BAD_LATITUDE);
-  for (int i = 0; i < 2; ++i) {  // multiplied by R whatever the word, and not taken further
+  for (std::size_t i = 0; i < 2; ++i) {  // multiplied by R whatever the word, and not taken further
     EXPECT_EQ(chain[i].x, stages[i].x * p.R);
     EXPECT_EQ(chain[i].y, stages[i].y * p.R);
     EXPECT_EQ(chain[i].z, stages[i].z);

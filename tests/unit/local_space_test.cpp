@@ -112,6 +112,56 @@ TEST(LocalSpace, AzimuthThatCannotBeTold) {
   EXPECT_EQ(f.azimuth, kUntouched);
 }
 
+// On the unit sphere, from a point of the first axis: the line's own length is the limit's.
+TEST(LocalSpace, TwoPointsNoFartherApartThanTheLimitAreOne) {
+  for (const double apart : {1e-15, std::nextafter(1e-15, 1), 1.5e-15}) {
+    Frame f;
+    TWlsr_c(0, 1, 0, 0, 0, 0, &f.azimuth, &f.x0, &f.y0, &f.z0, 0, 0, 0, 0, apart, 0, f.m,
+            &f.status);
+    EXPECT_EQ(f.status, apart > 1e-15 ? TW_SUCCESS : TW_BAD_PARAMETER) << apart;
+    EXPECT_EQ(f.azimuth, apart > 1e-15 ? 0 : kUntouched) << apart;
+    EXPECT_EQ(f.m[2], apart > 1e-15 ? 1 : kUntouched) << apart;
+  }
+}
+
+// A line of length 1 straight up, but for so little to the north or to the east.
+TEST(LocalSpace, AzimuthOfALineThatIsAlmostUpright) {
+  for (const double aside : {1e-15, std::nextafter(1e-15, 1), 1.5e-15}) {
+    for (const bool east : {false, true}) {
+      Frame f;
+      TWlsr_c(0, 1, 0, 0, 0, 0, &f.azimuth, &f.x0, &f.y0, &f.z0, 0, 0, 0, east ? aside / 2 : 0,
+              east ? 0 : aside / 2, 1, f.m, &f.status);
+      EXPECT_EQ(f.m[east ? 5 : 2], aside);
+      // East is also the second column's, as if the origin were a pole.
+      EXPECT_EQ(f.status, aside > 1e-15 ? TW_SUCCESS : TW_BAD_PARAMETER) << aside << east;
+      EXPECT_EQ(f.azimuth, aside > 1e-15 ? (east ? kPi / 2 : 0) : kUntouched) << aside << east;
+    }
+  }
+}
+
+// Rows 1 and 0 are the vector products of the normal and the line, and of row 1 and the normal.
+TEST(LocalSpace, RowsOfTwoPointsAreVectorProducts) {
+  const CoordinateTriple origin = {0.7, -0.6, 300};
+  CoordinateTriple ends[] = {{0.68, -0.63, 1000}, {0.73, -0.55, -200}};
+  const Frame f = by_points(origin, ends[0], ends[1]);
+  EXPECT_EQ(f.status, TW_SUCCESS);
+  TWstatus status = 0;
+  TWllh_to_xyz(kEarth.a, kEarth.e, 2, ends, ends, &status);
+  const double d[] = {ends[1].x - ends[0].x, ends[1].y - ends[0].y, ends[1].z - ends[0].z};
+  const double length = std::hypot(d[0], d[1], d[2]);
+  const double up[] = {std::cos(-0.6) * std::cos(0.7), std::cos(-0.6) * std::sin(0.7),
+                       std::sin(-0.6)};
+  for (int i = 0; i < 3; ++i) {
+    const int j = (i + 1) % 3, k = (i + 2) % 3;
+    EXPECT_NEAR(f.m[3 + i], (up[j] * d[k] - up[k] * d[j]) / length, 1e-13);
+    EXPECT_NEAR(f.m[i], f.m[3 + j] * up[k] - f.m[3 + k] * up[j], 1e-15);
+    EXPECT_NEAR(f.m[6 + i], up[i], 1e-16);
+  }
+  // The first row lies along the line's horizontal part.
+  const double rise = (up[0] * d[0] + up[1] * d[1] + up[2] * d[2]) / length;
+  for (int i = 0; i < 3; ++i) EXPECT_NEAR(f.m[i], d[i] / length - rise * up[i], 1e-13);
+}
+
 TEST(LocalSpace, AtAPoleTheAzimuthComesFromTheFirstColumns) {
   // At the north pole with lon0 = 0.5 the line runs along the meridian of 0.5 + 0.3 east, away from
   // the pole: azimuth, from the meridian of lon0, by hand pi - 0.3.
@@ -122,10 +172,14 @@ TEST(LocalSpace, AtAPoleTheAzimuthComesFromTheFirstColumns) {
     // the rows: row 1 = normal x line, row 0 = row 1 x normal
     EXPECT_NEAR(f.m[2], 0, 1e-15);
     EXPECT_NEAR(f.m[5], 0, 1e-15);
-    const double expected =
-        sign > 0 ? std::atan2(f.m[1], -f.m[0]) + 0.5 : std::atan2(f.m[1], f.m[0]) - 0.5;
-    EXPECT_EQ(f.azimuth, expected);
+    // By the south pole the meridian of lon0 runs north, and its azimuths the other way.
+    EXPECT_NEAR(f.azimuth, sign > 0 ? kPi - 0.3 : 0.3, 1e-12);
     EXPECT_NEAR(std::atan2(f.m[1], f.m[0]), 0.8, 1e-12);  // x points along the meridian of 0.8
+    // Along the first axis itself, where nothing is left of the second column.
+    const Frame along = by_points({0.5, sign * lat, 0}, {kPi, sign * 1.5, 0}, {0, sign * 1.5, 0});
+    EXPECT_EQ(along.status, TW_SUCCESS);
+    EXPECT_NEAR(along.m[1], 0, 1e-15);
+    EXPECT_NEAR(std::remainder(along.azimuth - (sign > 0 ? kPi + 0.5 : -0.5), 2 * kPi), 0, 1e-12);
   }
 }
 

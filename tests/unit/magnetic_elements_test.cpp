@@ -171,7 +171,7 @@ TEST(MagneticElements, AgreeWithExplicitLegendreFunctions) {
   ASSERT_EQ(f.var(points), TW_SUCCESS);
   const double a = f.synthesis.a, e2 = f.synthesis.e * f.synthesis.e;
   for (std::size_t i = 0; i < points.size(); ++i) {
-    const auto [lambda, phi, h] = points[i];
+    const double lambda = points[i].x, phi = points[i].y, h = points[i].z;
     const double nu = a / std::sqrt(1 - e2 * std::sin(phi) * std::sin(phi));
     const double across = (nu + h) * std::cos(phi), along = ((1 - e2) * nu + h) * std::sin(phi);
     const double theta = std::atan2(across, along),

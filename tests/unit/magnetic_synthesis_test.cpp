@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <random>
 
@@ -467,6 +468,100 @@ TEST(HarmonicSum, AnArrayGivesTheFiguresAndLeavesTheCachesOfItsPointsOneByOne) {
         }
       }
     }
+  }
+}
+
+// By contract the sums and sines of the last point stand for a point that has not left it,
+// whatever has become of them: in an array as point by point.
+TEST(HarmonicSum, WhatIsLeftOfTheLastPointStandsInAnArrayToo) {
+  struct Change {
+    const char* what;
+    std::vector<int16_t> modes;  // whose figures it changes
+    void (*make)(Synthesis&);
+  };
+  const Change changes[] = {
+      {"nothing", {}, [](Synthesis&) {}},
+      {"north, cosines", {0, 1}, [](Synthesis& s) { s.cache.dC[3] += 1; }},
+      {"north, sines", {0, 1}, [](Synthesis& s) { s.cache.dS[2] += 1; }},
+      {"value, cosines", {0, 1}, [](Synthesis& s) { s.cache.C[2] += 1; }},
+      {"value, sines", {0, 1}, [](Synthesis& s) { s.cache.S[1] += 1; }},
+      {"east, cosines", {0, 2}, [](Synthesis& s) { s.cache.lC[1] += 1; }},
+      {"east, sines", {0, 2}, [](Synthesis& s) { s.cache.lS[4] += 1; }},
+      {"down, cosines", {0, 3}, [](Synthesis& s) { s.cache.rC[0] += 1; }},
+      {"down, sines", {0, 3}, [](Synthesis& s) { s.cache.rS[5] += 1; }},
+      {"q cos", {0, 1}, [](Synthesis& s) { s.cache.tcos *= 1.25; }},
+      {"q sin", {0, 1, 2, 3}, [](Synthesis& s) { s.cache.tsin *= 1.25; }},
+      {"scale of north", {0, 1}, [](Synthesis& s) { s.cache.scale_theta *= 2; }},
+      {"scale of east", {0, 2}, [](Synthesis& s) { s.cache.scale_lambda *= 2; }},
+      {"scale of down", {0, 3}, [](Synthesis& s) { s.cache.scale_r *= 2; }},
+      {"a cosine", {0, 1, 2, 3}, [](Synthesis& s) { s.rec_b(2, 2) += 1; }},
+      {"a sine", {0, 1, 2, 3}, [](Synthesis& s) { s.rec_b(3, 2) += 1; }},
+      {"cosine of nothing", {0, 1, 3}, [](Synthesis& s) { s.rec_b(0, 0) += 1; }}};
+  const CoordinateTriple here = geocentric(0.7, 0.3, kRadius);
+  std::vector<CoordinateTriple> points(3, here);
+  for (int i = 0; i < 9; ++i) points.push_back(geocentric(0.7, 0.3 + 0.1 * i, kRadius));
+  for (int i = 0; i < 9; ++i) points.push_back(geocentric(0.7 + 0.1 * i, 0.3, kRadius));
+  for (const Change& change : changes) {
+    for (int16_t mode = 0; mode <= 3; ++mode) {
+      Coefficients c(6);
+      Coefficients::fill(c, 11);
+      Synthesis at_once(6), in_turn(6);
+      const CoordinateTriple unchanged = at_once.at(mode, c, here);
+      in_turn.at(mode, c, here);
+      change.make(at_once);
+      change.make(in_turn);
+      std::vector<CoordinateTriple> a(points.size(), kUntouchedPoint), b = a;
+      at_once.sum(mode, c, static_cast<int32_t>(points.size()), points.data(), a.data());
+      for (std::size_t i = 0; i < points.size(); ++i) in_turn.sum(mode, c, 1, &points[i], &b[i]);
+      const bool differs = a[0].x != unchanged.x || a[0].y != unchanged.y || a[0].z != unchanged.z;
+      const bool expected =
+          std::find(change.modes.begin(), change.modes.end(), mode) != change.modes.end();
+      EXPECT_EQ(differs, expected) << change.what << ", mode " << mode;
+      for (std::size_t i = 0; i < points.size(); ++i) {
+        ASSERT_EQ(a[i].x, b[i].x) << change.what << ", mode " << mode << ", point " << i;
+        ASSERT_EQ(a[i].y, b[i].y) << change.what << ", mode " << mode << ", point " << i;
+        ASSERT_EQ(a[i].z, b[i].z) << change.what << ", mode " << mode << ", point " << i;
+      }
+    }
+  }
+}
+
+// The first constant of the recursion multiplies every sum; it is 1 unless a caller sets it.
+TEST(HarmonicSum, TheFirstConstantIsAFactor) {
+  Coefficients c(5);
+  Coefficients::fill(c, 13);
+  std::vector<CoordinateTriple> points;
+  for (int i = 0; i < 20; ++i) points.push_back(geocentric(0.3 + 0.1 * i, 0.2 * i, kRadius));
+  for (int16_t mode = 0; mode <= 4; ++mode) {
+    Synthesis plain(5), doubled(5);
+    doubled.rec_a(0, 0) = 2;
+    for (const int32_t count : {1, 20}) {
+      std::vector<CoordinateTriple> a(points.size(), {0, 0, 0}), b = a;
+      plain.sum(mode, c, count, points.data(), a.data());
+      doubled.sum(mode, c, count, points.data(), b.data());
+      for (std::size_t i = 0; i < points.size(); ++i) {
+        EXPECT_EQ(b[i].x, 2 * a[i].x) << mode << " " << i;
+        EXPECT_EQ(b[i].y, 2 * a[i].y) << mode << " " << i;
+        EXPECT_EQ(b[i].z, 2 * a[i].z) << mode << " " << i;
+      }
+    }
+  }
+}
+
+// Degrees above those that are computed several points at once.
+TEST(HarmonicSum, AnArrayOfAHighDegreeIsThatOfItsPoints) {
+  const int32_t degree = 66;
+  Coefficients c(degree);
+  Coefficients::fill(c, 12);
+  Synthesis at_once(degree), in_turn(degree);
+  std::vector<CoordinateTriple> points, a(20, kUntouchedPoint);
+  for (int i = 0; i < 20; ++i) points.push_back(geocentric(0.3 + 0.1 * i, 0.2 * i, kRadius));
+  at_once.sum(0, c, 20, points.data(), a.data());
+  for (std::size_t i = 0; i < points.size(); ++i) {
+    const CoordinateTriple b = in_turn.at(0, c, points[i]);
+    EXPECT_EQ(a[i].x, b.x);
+    EXPECT_EQ(a[i].y, b.y);
+    EXPECT_EQ(a[i].z, b.z);
   }
 }
 

@@ -82,6 +82,22 @@ TEST(ObliqueLambert, AnUprightConeIsTheLambertConic) {
   for (std::size_t i = 0; i < 2; ++i) {
     expect_near(out[i], expected[i].x, expected[i].y, expected[i].z, 0);
   }
+  // Nor on the way back.
+  Points given = expected, plane = expected, back = untouched(2), expected_back = untouched(2);
+  EXPECT_EQ(cone.inverse(given, back), TW_SUCCESS);
+  TWlam_i(0, 0.3, c, n, rho0, 2, expected_back.data(), plane.data(), &status);
+  for (std::size_t i = 0; i < 2; ++i) {
+    expect_near(back[i], expected_back[i].x, expected_back[i].y, 0);
+    expect_near(back[i], in[i].x, in[i].y, 1e-14);
+  }
+  // With a pole aside of lon0, or short of the geographic one, it turns: by the offset.
+  for (const bool aside : {true, false}) {
+    Cone turned = cone;
+    (aside ? turned.s_lon : turned.s_lat) -= 0.1;
+    given = expected;
+    EXPECT_EQ(turned.inverse(given, back), TW_SUCCESS);
+    EXPECT_GT(std::fabs(back[0].x - in[0].x), 0.01) << aside;
+  }
   // Both sides of the margin of 1e-13: a pole further off turns the graticule, by the offset.
   cone.offset = 1;
   cone.s_lat = kPi / 2 - 0.9e-13;
@@ -130,6 +146,23 @@ TEST(ObliqueLambert, PoleFromAnAzimuth) {
     at.lat0 = sign * (kPi / 2 - 3e-12);
     at.set_up();
     EXPECT_NE(at.pole_lon, 0.3);
+  }
+}
+
+// The sphere is that of the middle parallel; where that would lie beyond a pole, of the origin.
+TEST(ObliqueLambert, SphereOfAMiddleParallelBeyondThePole) {
+  for (const double sign : {1.0, -1.0}) {
+    for (const double spread : {0.3, 0.5}) {
+      Cone cone = {kE, 0.3, sign * 1.2, sign * spread, sign * spread};
+      cone.pole_lon = 0.4;
+      cone.pole_lat = 1;
+      cone.set_up();
+      double chi0 = 0, c = 0, t = 0, radius = 0;
+      TWstatus status = 0;
+      TWgaussII_c(kE, spread < 0.4 ? sign * 1.5 : sign * 1.2, &chi0, &c, &t, &radius, &status);
+      EXPECT_EQ(cone.g_c, c) << spread;
+      EXPECT_EQ(cone.g_t, t) << spread;
+    }
   }
 }
 

@@ -114,6 +114,20 @@ TEST(ObliqueMercator, TwoPointsOnTheLineGiveTheSameProjection) {
   EXPECT_NEAR(two.alpha, line.alpha, 1e-13);
 }
 
+// By symmetry the line of two points on a parallel runs due east half-way between them.
+TEST(ObliqueMercator, TwoPointsOnOneParallel) {
+  const Oblique p(2, 0.08, 0.2, 0.7, 0.5, 0.7, 0.7, 0);
+  EXPECT_EQ(p.status, TW_SUCCESS);
+  const Points in = {{0.2, 0.7, 0}, {0.5, 0.7, 0}, {0.35, 0.72, 0}};
+  Points out = in;
+  EXPECT_EQ(p.uv_k(0, in, out), TW_SUCCESS);
+  EXPECT_NEAR(out[0].y, 0, 1e-14);  // on the line
+  EXPECT_NEAR(out[1].y, 0, 1e-14);
+  // North of the line, which bulges by the square of half the chord times tan(0.7) / 2.
+  EXPECT_NEAR(std::fabs(out[2].y), 0.02 - std::pow(0.15 * std::cos(0.7), 2) * std::tan(0.7) / 2,
+              2e-4);
+}
+
 TEST(ObliqueMercator, NegativeAzimuthGainsATurn) {
   const Oblique azimuth(0, 0.08, 0, 0, 0, 0, 0.6, -0.1);
   EXPECT_EQ(azimuth.status, TW_SUCCESS);
@@ -326,10 +340,10 @@ TEST(ObliqueMercator, FailureLeavesTheArrayUnrotatedAndUnscaled) {
   Points skew = untouched(5), out = untouched(5);
   p.uv_k(1, in, skew);
   EXPECT_EQ(p.forward(in, out), TW_RANGE_ERROR);
-  for (int i = 0; i < 5; ++i) expect_near(out[i], skew[i].x, skew[i].y, 0);
+  for (std::size_t i = 0; i < 5; ++i) expect_near(out[i], skew[i].x, skew[i].y, 0);
   out = untouched(5);
   EXPECT_EQ(p.scale(2, in, out), TW_RANGE_ERROR);
-  for (int i = 0; i < 5; ++i) {
+  for (std::size_t i = 0; i < 5; ++i) {
     EXPECT_EQ(out[i].x, skew[i].x);
     EXPECT_EQ(out[i].y, skew[i].y);
     EXPECT_NE(out[i].z, kUntouched);  // k is written at a failing point, too

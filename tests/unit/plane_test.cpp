@@ -43,6 +43,9 @@ TEST(Plane, DeviationOfTheOddPoints) {
   EXPECT_EQ(deviation(bent, 2), 0);
   EXPECT_EQ(deviation(bent, 0), 0);
   EXPECT_EQ(deviation(bent, -7), 0);
+  // A chord of (3, 4) from (1, 1), which the point (2, 5) stands |4 3 - 1 4| / 5 off.
+  const Points slanting = {{1, 1, 0}, {2, 5, 0}, {4, 5, 0}};
+  EXPECT_DOUBLE_EQ(deviation(slanting, 3), 1.6);
   const Points high = {{0, 0, 0}, {0, 7, 0}, {0, 0, 0}};
   EXPECT_EQ(deviation(high, 3), 0);  // a chord of no length: nothing divided by nothing
 }

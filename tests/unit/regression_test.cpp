@@ -103,6 +103,15 @@ TEST(Regression, PowersBeyondTheTableReadNothingElse) {
   const Model next = {{}, {}, {term(1, 10, 0), term(1, 0, 10)}};
   EXPECT_NEAR(next.run({degrees(8), degrees(5), 0}, 1, 0).z, std::pow(4, 10) + std::pow(3, 10),
               1e-6);
+  // One such power of either base, in any of the three sums: U = 4, V = 3.
+  const CoordinateTriple at = {degrees(8), degrees(5), 0};
+  for (const MreTerm& odd : {term(1, -2, 1), term(1, 2, -1), term(1, 10, 0), term(1, 0, 10)}) {
+    const double sum = std::pow(4, odd.power_u) * std::pow(3, odd.power_v);
+    const Model in_lon = {{odd}, {}, {}}, in_lat = {{}, {odd}, {}}, in_height = {{}, {}, {odd}};
+    EXPECT_NEAR(in_lon.run(at, 1, 0).x, at.x + sum * kSecond, 1e-15 * sum);
+    EXPECT_NEAR(in_lat.run(at, 1, 0).y, at.y + sum * kSecond, 1e-15 * sum);
+    EXPECT_NEAR(in_height.run(at, 1, 0).z, sum, 1e-14 * sum);
+  }
 }
 
 TEST(Regression, NothingToDo) {

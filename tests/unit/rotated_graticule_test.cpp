@@ -118,7 +118,7 @@ TEST(RotatedGraticule, NorthPoleCopiesWithoutTheOffset) {
   TWstatus status = 0;
   TWrotgrat_f(0.5, 0.5, 0.2, kPi / 2 - 0.9e-12, 1.5, 2, in.data(), out.data(), &status);
   EXPECT_EQ(status, TW_SUCCESS);
-  for (int i = 0; i < 2; ++i) {
+  for (std::size_t i = 0; i < 2; ++i) {
     EXPECT_EQ(out[i].x, in[i].x);
     EXPECT_EQ(out[i].y, in[i].y);
     EXPECT_EQ(out[i].z, kUntouched);

@@ -72,6 +72,22 @@ TEST(Sinusoidal, ConstantsFail) {
   EXPECT_NE(held.m0, kUntouched);
 }
 
+// The arc refuses the ellipsoid; on the origin's parallel none is asked for.
+TEST(Sinusoidal, AnEllipsoidThatIsNoneEndsTheArray) {
+  for (const double e : {1.5, -0.1}) {
+    const Sinusoidal p(e, 0.5, 0.2);
+    for (const bool forward : {true, false}) {
+      const double on_parallel = forward ? 0.5 : 0;
+      const Points in = {{0.2, on_parallel, 0}, {0.3, 0.7, 0}, {0.2, on_parallel, 0}};
+      Points out = untouched(3);
+      EXPECT_EQ(forward ? p.forward(in, out) : p.inverse(in, out), TW_BAD_ECCENTRICITY);
+      EXPECT_EQ(out[0].y, forward ? 0 : 0.5);
+      expect_untouched(out[1]);
+      expect_untouched(out[2]);
+    }
+  }
+}
+
 TEST(Sinusoidal, SmallDifferencesCountAsNone) {
   const Sinusoidal p(0.08, 0.5, 0.25);
   const Points in = {{0.25 + 0.9e-12, 0.5 + 0.9e-12, 0}, {0.25 + 1.2e-12, 0.5 + 1.2e-12, 0}};

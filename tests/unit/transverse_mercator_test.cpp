@@ -258,7 +258,7 @@ TEST(TransverseMercator, ScaleAtThePoles) {
                      {0.1, kPi / 2 - 1.1e-10, 0}},
                     out),
             TW_SUCCESS);  // no word at a pole, however far the meridian
-  for (int i = 0; i < 3; ++i) expect_near(out[i], 0.9996, 0.9996, 0.9996 * 0.9996, 0);
+  for (std::size_t i = 0; i < 3; ++i) expect_near(out[i], 0.9996, 0.9996, 0.9996 * 0.9996, 0);
   EXPECT_NEAR(out[3].x, 0.9996, 1e-15);
 }
 
@@ -270,13 +270,13 @@ TEST(TransverseMercator, ForwardAndScale) {
   p.scale(0.9996, in, scale);
   for (auto& point : both) point.z = 1;
   EXPECT_EQ(p.forward_and_scale(0.9996, in, both), TW_SUCCESS);
-  for (int i = 0; i < 4; ++i) {
+  for (std::size_t i = 0; i < 4; ++i) {
     expect_near(both[i], plane[i].x, plane[i].y, scale[i].x, 1e-15);
   }
   EXPECT_EQ(both[2].z, 0.9996);
   // z of the output is multiplied, so a second call compounds; z of the input is not read.
   EXPECT_EQ(p.forward_and_scale(0.9996, in, both), TW_SUCCESS);
-  for (int i = 0; i < 4; ++i) EXPECT_NEAR(both[i].z, scale[i].x * scale[i].x, 1e-15);
+  for (std::size_t i = 0; i < 4; ++i) EXPECT_NEAR(both[i].z, scale[i].x * scale[i].x, 1e-15);
   // In place the caller's z is scaled.
   Points same = in;
   p.forward_and_scale(1, same, same);

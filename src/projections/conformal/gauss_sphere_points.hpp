@@ -16,7 +16,7 @@ struct GaussForward {
   template <Number V>
   TW_INLINE Answer<V> operator()(V lon, V lat) const {
     const auto mapped = !(abs(lat) > kGaussForwardLatLimit);
-    const V chi = sphere.forward_latitude(sincos(select(mapped, lat, 0.0))).angle();
+    const V chi = sphere.forward_latitude(sincos(select(mapped, lat, 0.0)));
     return {select(mapped, sphere.forward_longitude(lon), lon - sphere.lon0),
             select(mapped, chi, lat)};
   }

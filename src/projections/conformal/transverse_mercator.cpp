@@ -67,6 +67,7 @@ void TWt_merc_s(double e, double k0, double lon0, int32_t count, const Coordinat
 void TWt_merc_xyk(double e, double lon0, double A0, double A2, double A4, double A6, double A8,
                   double M0, double k0, int32_t count, const CoordinateTriple* in,
                   CoordinateTriple* out, TWstatus* status) {
-  *status = over_points_and_heights(
-      TransverseForwardAndScale{{e, lon0, {A0, A2, A4, A6, A8}, M0}, k0}, count, in, out);
+  *status = TW_SUCCESS;
+  over_points_and_heights(TransverseForwardAndScale{{e, lon0, {A0, A2, A4, A6, A8}, M0}, k0}, count,
+                          in, out);
 }

@@ -52,7 +52,8 @@ void TWlabor_i(int16_t mode, double A, double B, double C, double D, int32_t cou
 
 void TWlabor_s(double k0, double A, double B, int32_t count, const CoordinateTriple* in,
                CoordinateTriple* out, TWstatus* status) {
-  *status = over_points_and_heights(LabordeScale{k0, A, B}, count, in, out);
+  *status = TW_SUCCESS;
+  over_points_and_heights(LabordeScale{k0, A, B}, count, in, out);
 }
 
 void TWlaborde_c(double e, double lon0, double lat0, double azimuth, double* chi0, double* c,
