@@ -1482,7 +1482,7 @@ TEST(GridOperations, GridsOfTheCallers) {
   const Transformation back = map("EPSG:4258", "EPSG:4277", "-grid:own.gsb");
   const Transformation by_path =
       map("EPSG:4277", "EPSG:4258", "grid:" + (folder.path() / "own.gsb").string());
-  // Its longitudes are from the source's own meridian: those of Paris are handed to it as they are.
+  // Its longitudes are from Greenwich, whatever meridian the system has.
   const Transformation paris = map("EPSG:4807", "EPSG:4258", "grid:own.gsb");
   const Transformation joined = map("EPSG:4277", "EPSG:4326", "grid:own.gsb EPSG:1149");
   EXPECT_TRUE(std::isnan(there.accuracy()));
@@ -1504,10 +1504,27 @@ TEST(GridOperations, GridsOfTheCallers) {
     }
     EXPECT_NEAR(back.forward(expected).x, p.x, 1e-10);
     EXPECT_NEAR(back.inverse(p).y, expected.y, 1e-12);
-    EXPECT_NEAR(paris.forward(p).x, expected.x, 1e-12);
-    EXPECT_NEAR(paris.forward(p).y, expected.y, 1e-12);
+    const Point from_paris = paris.forward({p.x - 2.33722917, p.y, 0});
+    EXPECT_NEAR(from_paris.x, expected.x, 1e-12);
+    EXPECT_NEAR(from_paris.y, expected.y, 1e-12);
   }
   EXPECT_THROW(map("EPSG:4277", "EPSG:4258", "grid:none.gsb"), Error);
+}
+
+// The grid of France on the old maps of its zones, alone and behind the rotation to Greenwich that
+// the registry puts before it; the easting and northing are PROJ's.
+TEST(GridOperations, TheGridOfFranceFromParis) {
+  if (!fs::exists(kProjData + "ntf_r93.gsb")) GTEST_SKIP() << "ntf_r93.gsb is not installed";
+  for (const char* operation : {"grid:ntf_r93.gsb", "EPSG:1763 grid:ntf_r93.gsb", ""}) {
+    const Transformation map =
+        by_operation("EPSG:27572", "EPSG:2154", operation, fs::path(kProjData));
+    const Point there = map.forward({600000, 2200000});
+    EXPECT_NEAR(there.x, 649398.87, 0.005) << operation;
+    EXPECT_NEAR(there.y, 6633524.19, 0.005) << operation;
+    const Point back = map.inverse(there);
+    EXPECT_NEAR(back.x, 600000, 1e-4) << operation;
+    EXPECT_NEAR(back.y, 2200000, 1e-4) << operation;
+  }
 }
 
 // What is missing is told by the registry's name, and by PROJ's where that has the grid at all.
