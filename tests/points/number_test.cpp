@@ -86,7 +86,8 @@ TEST(Level, IsWhatWasAskedForWhereThereIsSuchAOne) {
   EXPECT_EQ(level(), Level::one_by_one);
   for (const Level wanted : kAll) {
     const Level before = level();
-    EXPECT_EQ(level(), ask_for_level(wanted) ? wanted : before);
+    const bool there = ask_for_level(wanted);
+    EXPECT_EQ(level(), there ? wanted : before);
   }
 }
 
