@@ -857,6 +857,9 @@ void write_tiff(const std::string& path, const std::vector<TiffImage>& images,
               }
             }
           }
+          // Of bits that no grid has there are fewer bytes than libtiff takes.
+          const tmsize_t taken = image.tiled ? TIFFTileSize(tiff) : TIFFScanlineSize(tiff);
+          bytes.resize(std::max(bytes.size(), static_cast<std::size_t>(taken)));
           const auto sample = static_cast<std::uint16_t>(plane);
           if (image.tiled) {
             TIFFWriteTile(tiff, bytes.data(), static_cast<std::uint32_t>(x),
