@@ -728,6 +728,14 @@ TEST_F(BadGrids, FilesThatCannotBeRead) {
   EXPECT_EQ(refusal<ShiftGrid>(path), "The grid file " + path + " cannot be read.");
 }
 
+Transformation by_operation(const char* source, const char* target, const char* operation,
+                            const fs::path& folder) {
+  TransformationOptions options;
+  options.operation = operation;
+  options.grid_folders = {folder.string()};
+  return Transformation(System(source), System(target), options);
+}
+
 #ifdef TIDEWATER_HAVE_TIFF
 
 // A band of a GeoTIFF: nodes from the north-west, by rows southwards.
@@ -1282,14 +1290,6 @@ TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
 }
 
 // --- grids in the registry's operations ----------------------------------------------------------
-
-Transformation by_operation(const char* source, const char* target, const char* operation,
-                            const fs::path& folder) {
-  TransformationOptions options;
-  options.operation = operation;
-  options.grid_folders = {folder.string()};
-  return Transformation(System(source), System(target), options);
-}
 
 // Translations about those of the whole country, over France as the institute's grid lies.
 TiffImage translations() {

@@ -14,6 +14,7 @@
 #include "operation.hpp"
 #include "support/data.hpp"
 #include "support/grids.hpp"
+#include "support/little_memory.hpp"
 #include "systems/made_store.hpp"
 
 namespace tidewater::test {
@@ -913,6 +914,7 @@ bool all_is_answered() {
 }  // namespace
 
 TEST(RegistryThatLies, GivesSentences) {
+  TIDEWATER_NEED_NEW_PROCESS();
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   const StoreSources sources;
   const std::string values = ",-87,9001,-98,9001,-121,9001,0,0,0,0,0,0,0,0";
