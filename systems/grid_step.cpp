@@ -233,12 +233,12 @@ std::unique_ptr<const Step> shift_grid_step(const Link& link, const Frame& sourc
 }
 
 std::unique_ptr<const DatumStep> shift_grid_step(const std::string& file, bool reversed,
-                                                 const Frame& source, const Frame& target,
                                                  const std::vector<std::string>& folders) {
   ShiftGrid grid(file, folders_for(file, folders));
   std::string words = (reversed ? "inverse of " : "") + grid.describe() + " " + grid.path();
-  return std::make_unique<ShiftGridStep>(std::move(grid), reversed, reversed ? target : source,
-                                         reversed ? source : target, std::move(words));
+  const Frame greenwich = {};
+  return std::make_unique<ShiftGridStep>(std::move(grid), reversed, greenwich, greenwich,
+                                         std::move(words));
 }
 
 }  // namespace tidewater::detail

@@ -13,6 +13,7 @@ namespace tidewater::detail {
 namespace {
 
 constexpr int kWgs84 = 4326;
+constexpr int kEtrs89 = 4258;
 constexpr int kGreenwich = 8901;
 constexpr int kLongitudeRotation = 9601;
 
@@ -201,6 +202,17 @@ std::optional<Way> way_of(const OperationRecord& operation, bool reversed,
   return way;
 }
 
+// A datum ensemble and its members are one within the ensemble's accuracy, in metres.
+std::optional<double> ensemble_accuracy(int whole, int part) {
+  const auto record = Registry::shared().datum(datum_of(whole));
+  if (!record) return std::nullopt;
+  const auto& members = record->members;
+  if (std::find(members.begin(), members.end(), datum_of(part)) == members.end()) {
+    return std::nullopt;
+  }
+  return record->ensemble_accuracy;
+}
+
 // The ways between the datums of two registered systems by one operation of the registry, which may
 // be a concatenated one.
 std::vector<Way> direct_ways(int source, int target, const TransformationOptions& options) {
@@ -213,17 +225,8 @@ std::vector<Way> direct_ways(int source, int target, const TransformationOptions
       list.push_back(*std::move(way));
     }
   }
-  // A datum ensemble and its members are one within the ensemble's accuracy.
-  const auto member = [&](int whole, int part) -> std::optional<double> {
-    const auto record = registry.datum(datum_of(whole));
-    if (!record) return std::nullopt;
-    const int datum = datum_of(part);
-    const auto& members = record->members;
-    if (std::find(members.begin(), members.end(), datum) == members.end()) return std::nullopt;
-    return record->ensemble_accuracy;
-  };
-  auto accuracy = member(source, target);
-  if (!accuracy) accuracy = member(target, source);
+  auto accuracy = ensemble_accuracy(source, target);
+  if (!accuracy) accuracy = ensemble_accuracy(target, source);
   if (accuracy) {
     Way way;
     way.name = "a datum ensemble and its member taken as one";
@@ -352,17 +355,21 @@ std::vector<Way> ways_between(int source, int target, const Area& wanted,
   const bool to_pivot = datum_of(source) == pivot || datum_of(target) == pivot;
   if (!to_pivot) add_ways_over(source, kWgs84, target, wanted, options, list);
   if (usable(list, wanted)) return list;
-  // Any other datum in between.
-  const Registry& registry = Registry::shared();
+  // Any other datum in between: the ensemble of which an end is a member, and what an operation
+  // leads to from either end.
   std::vector<int> seen = {datum_of(source), datum_of(target), pivot};
-  const int near = datum_of(source) == pivot ? target : source;
-  for (const OperationRecord& operation : registry.operations(near)) {
-    const int hub =
-        datum_of(operation.source) == datum_of(near) ? operation.target : operation.source;
+  const auto over = [&](int hub) {
     const int datum = datum_of(hub);
-    if (datum == 0 || std::find(seen.begin(), seen.end(), datum) != seen.end()) continue;
+    if (std::find(seen.begin(), seen.end(), datum) != seen.end()) return;
     seen.push_back(datum);
     add_ways_over(source, hub, target, wanted, options, list);
+  };
+  for (const int end : {source, target}) {
+    if (ensemble_accuracy(kEtrs89, end)) over(kEtrs89);
+    if (datum_of(end) == pivot) continue;
+    for (const OperationRecord& operation : Registry::shared().operations(end)) {
+      over(datum_of(operation.source) == datum_of(end) ? operation.target : operation.source);
+    }
   }
   return list;
 }

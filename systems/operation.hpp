@@ -72,9 +72,8 @@ std::string shift_grid_file(const OperationRecord& operation,
 std::unique_ptr<const Step> shift_grid_step(const Link& link, const Frame& source,
                                             const Frame& target,
                                             const std::vector<std::string>& folders, bool flat);
-// A grid of the caller's.
+// A grid of the caller's, whose longitudes are from Greenwich.
 std::unique_ptr<const DatumStep> shift_grid_step(const std::string& file, bool reversed,
-                                                 const Frame& source, const Frame& target,
                                                  const std::vector<std::string>& folders);
 
 // Where a grid of the caller's is looked for: a path is taken as it is.

@@ -365,6 +365,9 @@ UnitDefinition read_unit(Words& words) {
     double factor = words.number("to_meter", text->substr(0, slash));
     if (slash != text->npos) factor /= words.number("to_meter", text->substr(slash + 1));
     if (!(factor > 0) || !std::isfinite(factor)) words.refuse("+to_meter must be above zero");
+    if (name && std::fabs(factor - unit.factor) > 1e-9 * factor) {
+      words.refuse("+units and +to_meter are two different units");
+    }
     if (factor != unit.factor) unit = {"", 0, factor};
   }
   return unit;
@@ -427,7 +430,10 @@ int method_code(Words& words, std::string_view name, const std::string& axes) {
   }
   if (name == "merc") {
     if (is_web_mercator(words)) return 1024;
-    return zero("lat_ts") ? 9804 : 9805;
+    // With a parallel of true scale there is no other scale, were it the equator.
+    const Given* k = words.peek(words.has("k_0") ? "k_0" : "k");
+    const bool other = k != nullptr && words.number(k->key, k->value) != 1;
+    return zero("lat_ts") && !(other && words.has("lat_ts")) ? 9804 : 9805;
   }
   if (name == "webmerc") return 1024;
   if (name == "omerc") {

@@ -48,8 +48,7 @@ class CheckedFormula final : public Formula {
       if (!(std::fabs(out[i].x) <= kPi + kPoleRounding)) return TW_RANGE_ERROR;
       back[i] = {kNotANumber, kNotANumber, 0};
     }
-    const TWstatus again = formula_->forward(count, out, back);
-    if (!TW_OK(again)) return again;
+    formula_->forward(count, out, back);  // where it fails it leaves what is no number
     // In units of the semi-major axis: half a metre is not what it guards against.
     constexpr double kApart = 1e-7;
     for (int i = 0; i < count; ++i) {
@@ -125,9 +124,8 @@ ProjectionImpl::ProjectionImpl(const Definition& definition)
         std::make_unique<const CheckedFormula>(std::move(formula_), sure_radius(method_->code));
   }
   const Plane& plane = formula_->plane;
-  if (!(std::isfinite(plane.sx) && std::isfinite(plane.sy) && std::isfinite(plane.x0) &&
-        std::isfinite(plane.y0)) ||
-      plane.sx == 0 || plane.sy == 0) {
+  // No scale that a map has is so small that its square is nothing.
+  if (!std::isfinite(plane.sx + plane.sy + plane.x0 + plane.y0) || plane.sx * plane.sy == 0) {
     throw Error("The parameters of " + std::string(method_->name) + " do not fit together.");
   }
 }

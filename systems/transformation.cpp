@@ -553,8 +553,7 @@ class TransformationImpl {
       if (reversed) word.erase(0, 1);
       if (word.starts_with("grid:")) {
         tell((reversed ? "-" : "") + word);
-        add(shift_grid_step(word.substr(5), reversed, frame_of(one.datum), frame_of(other.datum),
-                            options.grid_folders));
+        add(shift_grid_step(word.substr(5), reversed, options.grid_folders));
         accuracy = kNotANumber;
         continue;
       }

@@ -379,6 +379,7 @@ void read_parameters(const WktNode& owner, const WktNode& name, const UnitDefini
   std::vector<Given> given;
   for (const WktNode& child : owner.children) {
     if (!child.is("PARAMETER")) continue;
+    if (child.text(0).empty()) refuse(child, "has no name");
     given.push_back(
         {&child, bare(child.text(0)), code_of(child), need_figure(child, 1), any_unit(child)});
   }
@@ -428,6 +429,11 @@ void read_area(const WktNode& system, Definition& definition) {
     definition.west = need_figure(*box, 1);
     definition.north = need_figure(*box, 2);
     definition.east = need_figure(*box, 3);
+    const auto within = [](double degrees, double limit) { return std::fabs(degrees) <= limit; };
+    if (!within(definition.south, 90) || !within(definition.north, 90) ||
+        !within(definition.west, 180) || !within(definition.east, 180)) {
+      refuse(*box, "has a side that is not on the earth");
+    }
     if (definition.area.empty()) definition.area = "as given";
   }
 }

@@ -37,10 +37,11 @@ struct TransformationOptions {
   /**
    * The datum step: empty lets the registry's best operation be chosen; "EPSG:1671" names one;
    * several follow each other, "EPSG:1234 EPSG:5678"; "grid:ntf_r93.gsb" a grid file of the
-   * caller's, from the source's datum to the target's ("-grid:..." the other way round);
-   * "geoid:egm96_15.gtx" undulations of the caller's between a compound system's heights and the
-   * ellipsoid of its datum; "offset:file.gtx" offsets that are added to heights of the source to
-   * give those of the target; "no shift" leaves datum and heights unchanged.
+   * caller's, from the source's datum to the target's ("-grid:..." the other way round), its
+   * longitudes from Greenwich; "geoid:egm96_15.gtx" undulations of the caller's between a compound
+   * system's heights and the ellipsoid of its datum; "offset:file.gtx" offsets that are added to
+   * heights of the source to give those of the target; "no shift" leaves datum and heights
+   * unchanged.
    */
   std::string operation;
   /** Folders in which grids are looked for, before the usual ones. */

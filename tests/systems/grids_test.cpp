@@ -728,6 +728,14 @@ TEST_F(BadGrids, FilesThatCannotBeRead) {
   EXPECT_EQ(refusal<ShiftGrid>(path), "The grid file " + path + " cannot be read.");
 }
 
+Transformation by_operation(const char* source, const char* target, const char* operation,
+                            const fs::path& folder) {
+  TransformationOptions options;
+  options.operation = operation;
+  options.grid_folders = {folder.string()};
+  return Transformation(System(source), System(target), options);
+}
+
 #ifdef TIDEWATER_HAVE_TIFF
 
 // A band of a GeoTIFF: nodes from the north-west, by rows southwards.
@@ -857,6 +865,9 @@ void write_tiff(const std::string& path, const std::vector<TiffImage>& images,
               }
             }
           }
+          // Of bits that no grid has there are fewer bytes than libtiff takes.
+          const tmsize_t taken = image.tiled ? TIFFTileSize(tiff) : TIFFScanlineSize(tiff);
+          bytes.resize(std::max(bytes.size(), static_cast<std::size_t>(taken)));
           const auto sample = static_cast<std::uint16_t>(plane);
           if (image.tiled) {
             TIFFWriteTile(tiff, bytes.data(), static_cast<std::uint32_t>(x),
@@ -1280,14 +1291,6 @@ TEST_F(BadGrids, DamagedTiffsDoNoHarm) {
 
 // --- grids in the registry's operations ----------------------------------------------------------
 
-Transformation by_operation(const char* source, const char* target, const char* operation,
-                            const fs::path& folder) {
-  TransformationOptions options;
-  options.operation = operation;
-  options.grid_folders = {folder.string()};
-  return Transformation(System(source), System(target), options);
-}
-
 // Translations about those of the whole country, over France as the institute's grid lies.
 TiffImage translations() {
   const auto band = [](const char* name, double mean, double along, double across) {
@@ -1482,7 +1485,7 @@ TEST(GridOperations, GridsOfTheCallers) {
   const Transformation back = map("EPSG:4258", "EPSG:4277", "-grid:own.gsb");
   const Transformation by_path =
       map("EPSG:4277", "EPSG:4258", "grid:" + (folder.path() / "own.gsb").string());
-  // Its longitudes are from the source's own meridian: those of Paris are handed to it as they are.
+  // Its longitudes are from Greenwich, whatever meridian the system has.
   const Transformation paris = map("EPSG:4807", "EPSG:4258", "grid:own.gsb");
   const Transformation joined = map("EPSG:4277", "EPSG:4326", "grid:own.gsb EPSG:1149");
   EXPECT_TRUE(std::isnan(there.accuracy()));
@@ -1504,10 +1507,27 @@ TEST(GridOperations, GridsOfTheCallers) {
     }
     EXPECT_NEAR(back.forward(expected).x, p.x, 1e-10);
     EXPECT_NEAR(back.inverse(p).y, expected.y, 1e-12);
-    EXPECT_NEAR(paris.forward(p).x, expected.x, 1e-12);
-    EXPECT_NEAR(paris.forward(p).y, expected.y, 1e-12);
+    const Point from_paris = paris.forward({p.x - 2.33722917, p.y, 0});
+    EXPECT_NEAR(from_paris.x, expected.x, 1e-12);
+    EXPECT_NEAR(from_paris.y, expected.y, 1e-12);
   }
   EXPECT_THROW(map("EPSG:4277", "EPSG:4258", "grid:none.gsb"), Error);
+}
+
+// The grid of France on the old maps of its zones, alone and behind the rotation to Greenwich that
+// the registry puts before it; the easting and northing are PROJ's.
+TEST(GridOperations, TheGridOfFranceFromParis) {
+  if (!fs::exists(kProjData + "ntf_r93.gsb")) GTEST_SKIP() << "ntf_r93.gsb is not installed";
+  for (const char* operation : {"grid:ntf_r93.gsb", "EPSG:1763 grid:ntf_r93.gsb", ""}) {
+    const Transformation map =
+        by_operation("EPSG:27572", "EPSG:2154", operation, fs::path(kProjData));
+    const Point there = map.forward({600000, 2200000});
+    EXPECT_NEAR(there.x, 649398.87, 0.005) << operation;
+    EXPECT_NEAR(there.y, 6633524.19, 0.005) << operation;
+    const Point back = map.inverse(there);
+    EXPECT_NEAR(back.x, 600000, 1e-4) << operation;
+    EXPECT_NEAR(back.y, 2200000, 1e-4) << operation;
+  }
 }
 
 // What is missing is told by the registry's name, and by PROJ's where that has the grid at all.

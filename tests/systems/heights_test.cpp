@@ -7,6 +7,7 @@
 #include <numbers>
 #include <string>
 
+#include "operation.hpp"
 #include "registry.hpp"
 #include "tidewater/transformation.hpp"
 
@@ -114,6 +115,22 @@ TEST(Heights, OffsetAndSlopeOfTheGuidanceNote) {
   EXPECT_DOUBLE_EQ(there.x, 9 + 40.0 / 60);
   EXPECT_NEAR(there.z, 472.69, 0.005);
   EXPECT_EQ(map.inverse(there).z, 473);
+}
+
+// The methods by geoid are those that the registry names so, whatever the form of their grids.
+TEST(Heights, MethodsByGeoidAreTheRegistrys) {
+  int count = 0;
+  for (int code = 1000; code < 10000; ++code) {
+    const std::string name = detail::Registry::shared().method_name(code);
+    bool by_geoid = false;
+    for (const char* words : {"Geographic3D to GravityRelatedHeight", "Geographic3D to Depth",
+                              "Geog3D to Geog2D+GravityRelatedHeight", "Geog3D to Geog2D+Depth"}) {
+      by_geoid |= has(name, words);
+    }
+    EXPECT_EQ(detail::is_geoid_grid(code), by_geoid) << code << " " << name;
+    count += by_geoid ? 1 : 0;
+  }
+  EXPECT_GT(count, 20);
 }
 
 // The Caspian Sea stands 28 m below the Baltic: what lies 30 m below the one lies 2 m below the

@@ -926,6 +926,7 @@ TEST(RegistryFiles, EllipsoidsAreListed) {
 // The process's own registry, read from a store in which something is missing that others refer to:
 // each in a process of its own.
 TEST_F(RegistryStores, WithHolesRefuseWhatStandsOnThem) {
+  TIDEWATER_NEED_NEW_PROCESS();
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   struct Hole {
     const char* sql;

@@ -124,6 +124,12 @@ TEST(Wkt, ContradictionsAreRefused) {
       tmerc(R"(PARAMETER["latitude_of_origin",10],PARAMETER["latitude_of_origin",20])"),
       "\"latitude_of_origin\" has two different values");
   expect_wkt_refused(tmerc(R"(PARAMETER["false_easting",1e308],UNIT["u",1000])"), "out of range");
+  expect_wkt_refused(tmerc(R"(PARAMETER[latitude_of_origin,0])"), "PARAMETER has no name");
+  for (const char* box : {"-91,0,0,0", "0,-181,0,0", "0,0,90.5,0", "0,0,0,1e300"}) {
+    expect_wkt_refused(
+        R"(GEOGCRS["g",DATUM["d",ELLIPSOID["s",6378137,298.25]],BBOX[)" + std::string(box) + "]]",
+        "BBOX has a side that is not on the earth");
+  }
   for (const char* unit : {R"(UNIT["degree",0.0174532925199433])", R"(UNIT["radian",1])",
                            R"(UNIT["grad",0.01570796326794897])"}) {
     expect_wkt_refused(tmerc(unit), "unit of angle where a length is needed");
@@ -676,6 +682,7 @@ TEST(ProjText, OneNameForSeveralMethods) {
       {"+proj=lcc +lat_1=46 +lat_2=48 +axis=wnu", 9802, kLat2, 48},
       {"+proj=merc +k=0.99", 9804, kK0, 0.99},
       {"+proj=merc +lat_ts=0", 9804, kK0, 1},
+      {"+proj=merc +lat_ts=0 +k=1", 9804, kK0, 1},
       {"+proj=merc +lat_ts=-41", 9805, kLat1, -41},
       {"+proj=webmerc", 1024, kLon0, 0},
       // Of web maps only a sphere of WGS 84's axis without a grid.
@@ -759,6 +766,8 @@ TEST(ProjText, EllipsoidsUnitsAndMeridians) {
   EXPECT_EQ(unit("+to_meter=1200/3937").factor, 1200.0 / 3937);
   EXPECT_EQ(unit("+units=m +to_meter=1").code, 9001);
   EXPECT_EQ(unit("+units=us-ft").code, 9003);
+  EXPECT_EQ(unit("+units=us-ft +to_meter=0.304800609601").code, 0);
+  expect_proj_refused("+proj=tmerc +units=km +to_meter=1", "two different units");
   expect_proj_refused("+proj=tmerc +to_meter=1/0", "above zero");
   expect_proj_refused("+proj=tmerc +to_meter=-1", "above zero");
   const auto meridian = [](const std::string& pm) {
@@ -869,6 +878,8 @@ TEST(ProjText, RefusesWhatItDoesNotUnderstand) {
   expect_proj_refused("+proj=tmerc +k=x", "+k=x is no number");
   expect_proj_refused("+proj=laea +k_0=2", "+k_0 is not known here; Lambert Azimuthal");
   expect_proj_refused("+proj=laea +k=0", "+k is not known here");
+  expect_proj_refused("+proj=merc +lat_ts=0 +k_0=2",
+                      "+k_0 is not known here; Mercator (variant B)");
   expect_proj_refused("+proj=tmerc +x_0=inf", "no number");
   expect_proj_refused("+proj=tmerc +lon_0=400d", "beyond 360");
   expect_proj_refused("+proj=utm +zone=0", "+zone from 1 to 60");
