@@ -55,6 +55,8 @@ TEST(RhumbFormulas, PolesAreReachedAlongTheMeridian) {
   const double share = 510065621.724e6 / 2 * 50 / 360;
   EXPECT_NEAR(up.area, share, 1e3);
   EXPECT_NEAR(lines.inverse<true>(90.0, 10.0, 20.0, 60.0).area, share, 1e3);
+  EXPECT_NEAR(lines.inverse<true>(87.0, 10.0, 90.0, 60.0).area, share, 1e3);
+  EXPECT_NEAR(lines.inverse<true>(-90.0, 10.0, -89.5, 60.0).area, -share, 1e3);
   EXPECT_NEAR(lines.inverse<true>(20.0, 10.0, -90.0, 60.0).area, -share, 1e3);
   EXPECT_NEAR(lines.inverse<true>(90.0, 10.0, 90.0, 60.0).area, share, 1e3);
   EXPECT_EQ(lines.inverse<true>(90.0, 10.0, -90.0, 60.0).area, 0);

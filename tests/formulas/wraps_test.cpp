@@ -44,7 +44,7 @@ TEST(Wraps, WholeTurnsAreTheFiguresOfSingleSteps) {
 // Odd multiples of half a turn, which steps bring back exactly: the double of pi has zeros at its
 // end.
 TEST(Wraps, WholeTurnsEndAtHalfATurnOnTheSideThatTheyComeFrom) {
-  for (const double n : {3.0, 5.0, 7.0}) {
+  for (const double n : {1.0, 3.0, 5.0, 7.0}) {
     EXPECT_EQ(wrap_turns_below_then_above(-n * kPi), -kPi) << n;
     EXPECT_EQ(wrap_turns_below_then_above(n * kPi), kPi) << n;
     EXPECT_EQ(wrap_turns_above_then_at_or_below(-n * kPi), kPi) << n;

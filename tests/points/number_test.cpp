@@ -84,6 +84,9 @@ TEST(Number, TheLesserAndTheGreaterAreTheSecondWhereNeitherIs) {
 TEST(Level, IsWhatWasAskedForWhereThereIsSuchAOne) {
   EXPECT_TRUE(ask_for_level(Level::one_by_one));
   EXPECT_EQ(level(), Level::one_by_one);
+#if defined(TIDEWATER_BASELINE_LANES)
+  EXPECT_TRUE(ask_for_level(Level::baseline));
+#endif
   for (const Level wanted : kAll) {
     const Level before = level();
     const bool there = ask_for_level(wanted);
