@@ -135,7 +135,7 @@ TEST(Mgrs, ImpossibleReferencesAreRefused) {
   expect_refused("31UDQ482511193", "odd number");
   expect_refused("31UDQ 4825 11932", "unequal length");
   expect_refused("31UDQ 482 51 11932", "unequal length");
-  for (const std::size_t count : {23, 24, 1000}) {
+  for (const std::size_t count : {23u, 24u, 1000u}) {
     expect_refused("31UDQ" + std::string(count, '1'), "more than 11 digits each");
   }
   expect_refused(std::string(1000, '3'), "no grid reference");
