@@ -12,11 +12,10 @@ namespace {
 bool has(Level wanted) {
   switch (wanted) {
     case Level::one_by_one:
-      return true;
 #if defined(TIDEWATER_BASELINE_LANES)
     case Level::baseline:
-      return true;
 #endif
+      return true;
 #if defined(TIDEWATER_WIDE_LANES)
     case Level::avx2:
       return __builtin_cpu_supports("avx2");

@@ -127,7 +127,8 @@ struct StereographicObliqueInverse {
     const V lat = select(at.centre, lat0, inverse.of_conformal(at.chi, at.sin_chi, at.cos_chi));
     const V lon = select(at.centre | at_stereographic_pole(lat), lon0, at.lon);
     // The passes of the stated iteration are never used up at e up to 0.1, but on a not-a-number.
-    const Mask<V> plain = everywhere<V>(abs(e) <= kSeriesEccentricity) & (lat == lat);
+    const Mask<V> number = lat == lat;  // NOLINT(misc-redundant-expression)
+    const Mask<V> plain = everywhere<V>(abs(e) <= kSeriesEccentricity) & number;
     return {lon, lat, plain};
   }
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
@@ -160,8 +161,8 @@ struct StereographicPolarInverse {
     const V lat = select(centre, lat0, side * found);
     const V lon = select(centre | at_stereographic_pole(lat), lon0, longitude(x, y));
     // Six passes of the stated iteration are enough at e up to 0.1.
-    const Mask<V> plain =
-        centre | (everywhere<V>(abs(e) <= kSeriesEccentricity) & (found == found));
+    const Mask<V> number = found == found;  // NOLINT(misc-redundant-expression)
+    const Mask<V> plain = centre | (everywhere<V>(abs(e) <= kSeriesEccentricity) & number);
     return {lon, lat, plain};
   }
   Next other(const CoordinateTriple& in, CoordinateTriple* out, TWstatus* status) const;
