@@ -166,7 +166,6 @@ const Files& files() {
 }
 
 // --- The C library
-// --------------------------------------------------------------------------------
 
 std::string directory_of(const char* name) { return files() / name + "/"; }
 
@@ -428,7 +427,6 @@ Outcome catalogue() {
 }
 
 // --- The systems layer
-// ----------------------------------------------------------------------------
 
 template <class Kind>
 Outcome shifted(const Kind& kind, double lon, double lat) {
@@ -680,7 +678,6 @@ INSTANTIATE_TEST_SUITE_P(All, Faults, ::testing::ValuesIn(kCalls), [](const auto
 });
 
 // --- The registry's first load
-// --------------------------------------------------------------------------
 
 // What a process tells that has loaded the registry with a fault in it, and then without.
 struct Load {
@@ -762,7 +759,6 @@ TEST(RegistryFirstLoad, EveryRead) { fail_first_load(Fault::kRead); }
 TEST(RegistryFirstLoad, EveryReadShort) { fail_first_load(Fault::kShortRead); }
 
 // --- Who allocates
-// --------------------------------------------------------------------------------------
 
 std::set<std::string> called_ones, allocating, reading;
 std::optional<Injected> counted;
@@ -802,7 +798,6 @@ TEST(WhoAllocates, TheseAlone) {
 }
 
 // --- Signals
-// --------------------------------------------------------------------------------------
 
 // Starts a command with its output in a file, sends it a signal after some time, and waits for it.
 void interrupt(const std::vector<std::string>& words, const std::string& output, int signal,

@@ -313,7 +313,6 @@ TEST(Transformation, CandidatesOfTheSameStepsStandOnce) {
 }
 
 // --- ways that the registry has no single operation for
-// -------------------------------------------
 
 // Through another datum, or through the same one on Greenwich: what the single steps give one after
 // the other, which the peer vouches for.
@@ -479,7 +478,6 @@ TEST(Transformation, AreasOfWaysOverThe180thMeridian) {
 }
 
 // --- definitions that no registry has
-// -------------------------------------------------------------
 
 // A definition names its datum only; the registry's operations of that datum serve it.
 TEST(Transformation, DefinitionsByTheirDatumAlone) {
@@ -666,7 +664,6 @@ TEST(Transformation, NoShiftBetweenSystemsOfOneDatumSaysNothing) {
 }
 
 // --- named operations
-// -----------------------------------------------------------------------------
 
 TEST(Transformation, SeveralNamedOperationsFollowEachOther) {
   const Transformation chain{System("4277"), System("4171"),
@@ -707,7 +704,6 @@ TEST(Transformation, NamedOperationsThatCannotServe) {
 }
 
 // --- points
-// ---------------------------------------------------------------------------------------
 
 TEST(Transformation, FiguresBeyondAllUseAreRefused) {
   const Transformation map{System("EPSG:32631"), System("EPSG:4979")};
@@ -873,7 +869,6 @@ TEST(Transformation, FailingPointsDisturbNoOthersWhateverTheMethod) {
 }
 
 // --- registries that lie
-// --------------------------------------------------------------------------
 
 namespace {
 
