@@ -313,7 +313,8 @@ Made make_hyperbolic_cassini(const MethodArguments& given) {
             // The next step would be a thousandth of this one or less, and rounding by the maximum.
             rest = std::fabs(step) < 1e-6;
           }
-          if (!rest && *status == TW_SUCCESS) *status = TW_NOT_CONVERGED;
+          if (*status != TW_SUCCESS) return;
+          *status = rest ? over_points(inverse, 1, &plane, out + i) : TW_NOT_CONVERGED;
         }
       });
 }

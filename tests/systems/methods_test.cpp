@@ -338,6 +338,18 @@ TEST(Methods, IteratedInversesLeadBackFromAfar) {
   }
 }
 
+// A step after which the next would be nothing is taken, too.
+TEST(Methods, IteratedInversesLoseNothingNearby) {
+  const Projection map("hyperbolic cassini", {{"lat0", -16.25}, {"lon0", 179.5}},
+                       Ellipsoid("GRS80"));
+  for (const double off : {-1.5, -1.2, -0.9, -0.005, -0.003, 0.0, 0.004, 0.0053, 1.0, 1.4}) {
+    const double lat = -16.25 + off;
+    const Point back = map.inverse(map.forward({179, lat}));
+    EXPECT_NEAR(back.x, 179, 2e-13);
+    EXPECT_NEAR(back.y, lat, 2e-13);  // 22 nm
+  }
+}
+
 TEST(Methods, ConformalOnesHaveNoAngularDistortion) {
   for (const char* text : {"2154", "32631", "27572", "3395", "2056", "28992", "5041", "5513"}) {
     const auto map = System(text).projection();
