@@ -36,6 +36,17 @@ using tidewater::GeoidGrid;  // not the C structure of that name
 constexpr double kDegree = kPi / 180;
 [[maybe_unused]] constexpr double kTenthOfMillimetre = 1e-4 / 6378137 / kDegree;  // degrees
 
+// What is refused says why.
+template <class Action>
+void expect_refused(const Action& action, const std::string& part) {
+  try {
+    action();
+    ADD_FAILURE() << "taken, where " << part;
+  } catch (const Error& error) {
+    EXPECT_NE(std::string(error.what()).find(part), std::string::npos) << error.what();
+  }
+}
+
 struct Box {
   double west, south, east, north;
 };
@@ -664,14 +675,8 @@ TEST(GeoidGrids, BiquadraticWantsThreeRowsAndColumns) {
                               std::vector<float>(static_cast<std::size_t>(rows * columns), 3)));
     const std::string path = (folder.path() / "g.gtx").string();
     EXPECT_EQ(GeoidGrid(path).undulation(350.25, 10.25), 3);
-    try {
-      GeoidGrid(path, {}, GeoidGrid::Interpolation::biquadratic);
-      ADD_FAILURE();
-    } catch (const Error& e) {
-      EXPECT_NE(std::string(e.what()).find("fewer than the three rows and columns of biquadratic"),
-                std::string::npos)
-          << e.what();
-    }
+    expect_refused([&] { GeoidGrid(path, {}, GeoidGrid::Interpolation::biquadratic); },
+                   "fewer than the three rows and columns of biquadratic");
   }
 }
 
@@ -1357,12 +1362,8 @@ TEST(GridOperations, GeocentricTranslationsGoThereAndBack) {
 #endif
   // Without the grid the refusal names it; a file of another kind is refused.
   fs::remove(path);
-  try {
-    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
-    ADD_FAILURE();
-  } catch (const Error& error) {
-    EXPECT_NE(std::string(error.what()).find("gr3df97a"), std::string::npos) << error.what();
-  }
+  expect_refused([&] { by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path()); },
+                 "gr3df97a");
   TiffImage shifts{-5.5,
                    41,
                    0.5,
@@ -1371,14 +1372,8 @@ TEST(GridOperations, GeocentricTranslationsGoThereAndBack) {
                    23,
                    {flat_band("latitude_offset", 3), flat_band("longitude_offset", 5)}};
   write_tiff(path, {shifts});
-  try {
-    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
-    ADD_FAILURE();
-  } catch (const Error& error) {
-    EXPECT_NE(std::string(error.what()).find("no bands of geocentric translations"),
-              std::string::npos)
-        << error.what();
-  }
+  expect_refused([&] { by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path()); },
+                 "no bands of geocentric translations");
 }
 
 // Every point of the array its own word, with heights above the ellipsoid and without; a grid that
@@ -1419,26 +1414,14 @@ TEST(GridOperations, GeocentricTranslationsOfAnyHeight) {
   EXPECT_EQ(word_of(lost, 2.3, 47.3, true), TW_SUCCESS);
   // A national grid by that name holds no translations; each of the three bands must be there.
   folder.write("fr_ign_gr3df97a.tif", GsbFile{{plane("A", "NONE", 40, 50, -20, 10, 1, 1)}}.bytes());
-  try {
-    by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
-    ADD_FAILURE();
-  } catch (const Error& error) {
-    EXPECT_NE(std::string(error.what()).find("of NTv2's form holds no translations"),
-              std::string::npos)
-        << error.what();
-  }
+  expect_refused([&] { by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path()); },
+                 "of NTv2's form holds no translations");
   for (std::size_t k = 0; k < 3; ++k) {
     TiffImage lacking = translations();
     lacking.bands[k].description = "w_translation";
     write_tiff(path, {lacking});
-    try {
-      by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path());
-      ADD_FAILURE();
-    } catch (const Error& error) {
-      EXPECT_NE(std::string(error.what()).find("no bands of geocentric translations"),
-                std::string::npos)
-          << error.what();
-    }
+    expect_refused([&] { by_operation("EPSG:4275", "EPSG:4171", "EPSG:9327", folder.path()); },
+                   "no bands of geocentric translations");
   }
 }
 
@@ -1604,12 +1587,8 @@ TEST(GridOperations, OffsetsBetweenVerticalDatums) {
   EXPECT_TRUE(std::isnan(there.forward({160, -36, 5}).z));
   // Positions on another datum would be read a hundred metres off; the way over the ellipsoid wants
   // a grid that is not there.
-  try {
-    const Transformation wrong = map("EPSG:4272+7839", "EPSG:4272+5759");
-    ADD_FAILURE() << wrong.describe();
-  } catch (const Error& error) {
-    EXPECT_NE(std::string(error.what()).find("nzgeoid2016"), std::string::npos) << error.what();
-  }
+  expect_refused([&] { const Transformation wrong = map("EPSG:4272+7839", "EPSG:4272+5759"); },
+                 "nzgeoid2016");
 #ifdef TIDEWATER_HAVE_PROJ
   const std::string definition = "+proj=vgridshift +multiplier=1 +grids=" +
                                  (folder.path() / "auckht1946-nzvd2016.gtx").string();
